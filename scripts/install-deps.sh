@@ -1,0 +1,25 @@
+#!/usr/bin/env bash
+# Installs the Debian packages that building and testing Quimbel needs.
+# Safe to run again: apt-get skips what is already installed. Needs root (or sudo).
+set -euo pipefail
+
+packages=(
+  cmake ninja-build pkg-config g++ clang-format
+  qt6-base-dev
+  xvfb xauth fonts-dejavu-core
+  libsqlcipher-dev sqlcipher
+  libgsf-1-dev
+  libgtest-dev libgmock-dev libbenchmark-dev
+  libcli11-dev
+)
+
+missing=()
+for p in "${packages[@]}"; do
+  dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")
+done
+[ ${#missing[@]} -eq 0 ] && exit 0
+
+sudo=""
+[ "$(id -u)" -ne 0 ] && sudo="sudo"
+$sudo apt-get update -q
+DEBIAN_FRONTEND=noninteractive $sudo apt-get install -y -q --no-install-recommends "${missing[@]}"
