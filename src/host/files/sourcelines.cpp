@@ -1,0 +1,119 @@
+// SPDX-License-Identifier: MIT
+// Line splitting in one pass over the bytes: each byte is looked at once, to find the line end, a NUL that
+// marks a binary file, and the length limit the IDE enforces.
+#include "host/files/sourcelines.h"
+
+#include "host/files/ansi.h"
+#include "ide/error.h"
+
+#include <algorithm>
+
+namespace host {
+namespace {
+
+[[noreturn]] void throwLineError(const QString& fileName, int lineNumber, const QString& problem) {
+  throw ide::Error(ide::err::InvalidFileFormat,
+                   QStringLiteral("%1, line %2: %3").arg(fileName).arg(lineNumber).arg(problem));
+}
+
+}  // namespace
+
+QByteArrayView lineEndBytes(LineEnd end) {
+  switch (end) {
+    case LineEnd::CRLF:
+      return QByteArrayView("\r\n", 2);
+    case LineEnd::LF:
+      return QByteArrayView("\n", 1);
+    case LineEnd::CR:
+      return QByteArrayView("\r", 1);
+    case LineEnd::None:
+      break;
+  }
+  return {};
+}
+
+std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fileName) {
+  std::vector<SourceLine> lines;
+  const char* data = bytes.data();
+  const qsizetype size = bytes.size();
+  qsizetype lineStart = 0;
+  qsizetype position = 0;
+  while (lineStart < size) {
+    // Find the end of this line, refusing binary content on the way.
+    while (position < size) {
+      const char byte = data[position];
+      if (byte == '\n' || byte == '\r') break;
+      if (byte == '\0') {
+        throwLineError(fileName, static_cast<int>(lines.size()) + 1, QStringLiteral("not a text file"));
+      }
+      ++position;
+    }
+    const qsizetype length = position - lineStart;
+    if (length > kMaxLineLength) {
+      throwLineError(fileName, static_cast<int>(lines.size()) + 1,
+                     QStringLiteral("line longer than %1 characters").arg(kMaxLineLength));
+    }
+    SourceLine line{decodeAnsi(QByteArrayView(data + lineStart, length)), LineEnd::None};
+    if (position < size) {
+      if (data[position] == '\n') {
+        line.end = LineEnd::LF;
+        position += 1;
+      } else if (position + 1 < size && data[position + 1] == '\n') {
+        line.end = LineEnd::CRLF;
+        position += 2;
+      } else {
+        line.end = LineEnd::CR;
+        position += 1;
+      }
+    }
+    lines.push_back(std::move(line));
+    lineStart = position;
+  }
+  return lines;
+}
+
+void appendSourceLine(QByteArray& out, const SourceLine& line, const QString& fileName, int lineNumber) {
+  qsizetype bad = 0;
+  if (!appendAnsi(out, line.text, &bad)) {
+    const QString code = QString::number(line.text.at(bad).unicode(), 16).toUpper().rightJustified(4, u'0');
+    throwLineError(fileName, lineNumber,
+                   QStringLiteral("the character U+%1 in column %2 has no code in the ANSI code page")
+                       .arg(code)
+                       .arg(bad + 1));
+  }
+  out.append(lineEndBytes(line.end));
+}
+
+LineEnd lineEndAt(const std::vector<SourceLine>& lines, std::size_t position) {
+  for (std::size_t i = std::min(position, lines.size()); i > 0; --i) {
+    if (lines[i - 1].end != LineEnd::None) return lines[i - 1].end;
+  }
+  for (std::size_t i = position; i < lines.size(); ++i) {
+    if (lines[i].end != LineEnd::None) return lines[i].end;
+  }
+  return LineEnd::CRLF;
+}
+
+void insertSourceLine(std::vector<SourceLine>& lines, std::size_t position, QString text) {
+  position = std::min(position, lines.size());
+  SourceLine line{std::move(text), lineEndAt(lines, position)};
+  if (position == lines.size() && position > 0 && lines[position - 1].end == LineEnd::None) {
+    lines[position - 1].end = line.end;
+    line.end = LineEnd::None;
+  }
+  lines.insert(lines.begin() + static_cast<std::ptrdiff_t>(position), std::move(line));
+}
+
+QByteArray writeSourceLines(const std::vector<SourceLine>& lines, const QString& fileName) {
+  qsizetype total = 0;
+  for (const SourceLine& line : lines)
+    total += line.text.size() + 2;
+  QByteArray out;
+  out.reserve(total);
+  int lineNumber = 0;
+  for (const SourceLine& line : lines)
+    appendSourceLine(out, line, fileName, ++lineNumber);
+  return out;
+}
+
+}  // namespace host

@@ -1,0 +1,50 @@
+// SPDX-License-Identifier: MIT
+// A VB6 source file as lines of text, each with the line end it had on disk, so that a file is written
+// back with exactly the bytes it was read from.
+#pragma once
+
+#include <QByteArray>
+#include <QByteArrayView>
+#include <QString>
+
+#include <cstddef>
+#include <vector>
+
+namespace host {
+
+/// The IDE refuses physical lines longer than this.
+inline constexpr int kMaxLineLength = 1023;
+
+enum class LineEnd : quint8 { CRLF, LF, CR, None };
+
+struct SourceLine {
+  QString text;
+  LineEnd end = LineEnd::CRLF;
+};
+
+/// The characters of a line end.
+QByteArrayView lineEndBytes(LineEnd end);
+
+/// Splits ANSI bytes into lines. A file that holds a NUL byte is not text; a line longer than
+/// kMaxLineLength characters is refused. Both throw ide::Error (number 321) whose description names
+/// `fileName` and the 1-based line, e.g. "Module1.bas, line 12: line longer than 1023 characters".
+/// The last line has LineEnd::None when the file does not end with a line end; an empty file gives no lines.
+std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fileName);
+
+/// Joins lines back into ANSI bytes. Throws ide::Error (number 321) naming `fileName` and the line when a
+/// character cannot be written in the code page.
+QByteArray writeSourceLines(const std::vector<SourceLine>& lines, const QString& fileName);
+
+/// Appends one line (text and end) to `out`; throws as writeSourceLines.
+void appendSourceLine(QByteArray& out, const SourceLine& line, const QString& fileName, int lineNumber);
+
+/// The line end to give a new line at `position`: the one of the line before it, else of the line after
+/// it, else CRLF.
+LineEnd lineEndAt(const std::vector<SourceLine>& lines, std::size_t position);
+
+/// Inserts `text` as a new line before `position`, ending like its neighbours. Appended after a last line
+/// that has no line end, the new line becomes the one without an end and the old last line gets one, so
+/// that the two stay separate lines.
+void insertSourceLine(std::vector<SourceLine>& lines, std::size_t position, QString text);
+
+}  // namespace host

@@ -1,0 +1,139 @@
+// SPDX-License-Identifier: MIT
+// Tests of whole-file reads and atomic writes in a temporary directory: the error numbers and descriptions
+// of each failure, and that a failed write leaves the old file as it was.
+#include "host/files/fileio.h"
+
+#include "ide/error.h"
+
+#include <gtest/gtest.h>
+
+#include <QDir>
+#include <QFile>
+#include <QTemporaryDir>
+
+namespace host {
+namespace {
+
+template <typename Action>
+ide::Error expectError(Action&& action) {
+  try {
+    action();
+  } catch (const ide::Error& error) {
+    return error;
+  }
+  ADD_FAILURE() << "no ide::Error thrown";
+  return ide::Error(0, {});
+}
+
+void writePlainFile(const QString& path, const QByteArray& bytes) {
+  QFile file(path);
+  ASSERT_TRUE(file.open(QIODevice::WriteOnly));
+  ASSERT_EQ(file.write(bytes), bytes.size());
+}
+
+QByteArray readPlainFile(const QString& path) {
+  QFile file(path);
+  if (!file.open(QIODevice::ReadOnly)) return "<unreadable>";
+  return file.readAll();
+}
+
+/// Whether permission bits bind this process (they do not for root).
+bool permissionsApply(const QString& unreadablePath) {
+  QFile probe(unreadablePath);
+  return !probe.open(QIODevice::ReadOnly);
+}
+
+class FileIoTest : public ::testing::Test {
+ protected:
+  void SetUp() override { ASSERT_TRUE(m_directory.isValid()); }
+  QString path(const QString& name) const { return m_directory.filePath(name); }
+
+  QTemporaryDir m_directory;
+};
+
+TEST_F(FileIoTest, ReadsTheBytesAsTheyAre) {
+  const QByteArray bytes("Attribute VB_Name = \"Module1\"\r\n\xE7\xE3o\r\n\x81\x00\xFF", 39);
+  writePlainFile(path("Module1.bas"), bytes);
+  EXPECT_EQ(readFileBytes(path("Module1.bas")), bytes);
+}
+
+TEST_F(FileIoTest, ReadsAnEmptyFile) {
+  writePlainFile(path("empty.bas"), {});
+  EXPECT_TRUE(readFileBytes(path("empty.bas")).isEmpty());
+}
+
+TEST_F(FileIoTest, MissingFileIsFileNotFound) {
+  const QString missing = path("Missing.bas");
+  const ide::Error error = expectError([&] { readFileBytes(missing); });
+  EXPECT_EQ(error.number(), ide::err::FileNotFound);
+  EXPECT_EQ(error.description(), QStringLiteral("File not found: ") + missing);
+}
+
+TEST_F(FileIoTest, DirectoryIsUnreadable) {
+  ASSERT_TRUE(QDir(m_directory.path()).mkdir(QStringLiteral("Forms")));
+  const ide::Error error = expectError([&] { readFileBytes(path("Forms")); });
+  EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
+  EXPECT_TRUE(
+      error.description().startsWith(QStringLiteral("Cannot read ") + path("Forms") + QStringLiteral(": ")))
+      << error.what();
+}
+
+TEST_F(FileIoTest, UnreadableFileIsAccessError) {
+  const QString locked = path("Locked.frm");
+  writePlainFile(locked, "VERSION 5.00\r\n");
+  ASSERT_TRUE(QFile::setPermissions(locked, QFileDevice::Permissions()));
+  if (!permissionsApply(locked)) GTEST_SKIP() << "permission bits do not apply to this user (root)";
+  const ide::Error error = expectError([&] { readFileBytes(locked); });
+  EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
+  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot read ") + locked + QStringLiteral(": ")))
+      << error.what();
+  EXPECT_GT(error.description().size(),
+            (QStringLiteral("Cannot read ") + locked + QStringLiteral(": ")).size())
+      << "the reason is given";
+}
+
+TEST_F(FileIoTest, WriteCreatesAFile) {
+  writeFileAtomically(path("New.bas"), "Attribute VB_Name = \"New\"\r\n");
+  EXPECT_EQ(readPlainFile(path("New.bas")), QByteArray("Attribute VB_Name = \"New\"\r\n"));
+}
+
+TEST_F(FileIoTest, WriteReplacesTheContentAndLeavesNoTemporaryFile) {
+  writePlainFile(path("Class1.cls"), "old content that is longer than the new one\r\n");
+  writeFileAtomically(path("Class1.cls"), "new\r\n");
+  EXPECT_EQ(readPlainFile(path("Class1.cls")), QByteArray("new\r\n"));
+  EXPECT_EQ(QDir(m_directory.path()).entryList(QDir::Files), QStringList{QStringLiteral("Class1.cls")});
+}
+
+TEST_F(FileIoTest, WriteIntoReadOnlyDirectoryFailsAndKeepsTheOldFile) {
+  const QString subdirectory = path("ReadOnly");
+  ASSERT_TRUE(QDir(m_directory.path()).mkdir(QStringLiteral("ReadOnly")));
+  const QString target = subdirectory + QStringLiteral("/Form1.frm");
+  writePlainFile(target, "old\r\n");
+  ASSERT_TRUE(QFile::setPermissions(subdirectory, QFileDevice::ReadOwner | QFileDevice::ExeOwner));
+  const bool bound = !QFile(subdirectory + QStringLiteral("/probe")).open(QIODevice::WriteOnly);
+  if (!bound) {
+    QFile::remove(subdirectory + QStringLiteral("/probe"));
+    QFile::setPermissions(subdirectory,
+                          QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
+    GTEST_SKIP() << "permission bits do not apply to this user (root)";
+  }
+  const ide::Error error = expectError([&] { writeFileAtomically(target, "new\r\n"); });
+  QFile::setPermissions(subdirectory,
+                        QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
+  EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
+  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot write ") + target + QStringLiteral(": ")))
+      << error.what();
+  EXPECT_EQ(readPlainFile(target), QByteArray("old\r\n"));
+  EXPECT_EQ(QDir(subdirectory).entryList(QDir::Files), QStringList{QStringLiteral("Form1.frm")});
+}
+
+TEST_F(FileIoTest, WriteIntoMissingDirectoryFails) {
+  const QString target = path("NoSuchFolder/Module1.bas");
+  const ide::Error error = expectError([&] { writeFileAtomically(target, "x"); });
+  EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
+  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot write ") + target + QStringLiteral(": ")))
+      << error.what();
+}
+
+}  // namespace
+}  // namespace host
