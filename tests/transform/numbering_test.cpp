@@ -1,0 +1,493 @@
+// SPDX-License-Identifier: MIT
+// Adding and removing line numbers, line by line and over whole procedures walked as the numbering
+// command walks them.
+#include "transform/numbering.h"
+
+#include "printers.h"
+#include "procedurewalk.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+namespace transform {
+namespace {
+
+constexpr qint32 kMax = std::numeric_limits<qint32>::max();
+constexpr qint32 kMin = std::numeric_limits<qint32>::min();
+
+// One NumberLine call, as the first numbered line of a procedure with start 10000 and interval 5 by default.
+struct Numbered {
+  QString line;
+  bool changed = false;
+  qint32 number = 0;
+  bool continuation = false;
+};
+
+Numbered numberOne(const QString& text, qint32 running = 9995, bool continuation = false,
+                   qint32 interval = 5) {
+  Numbered out{text, false, running, continuation};
+  out.changed = NumberLine(out.line, out.number, out.continuation, interval);
+  return out;
+}
+
+QString unnumbered(const QString& text, bool expectChange) {
+  QString line = text;
+  EXPECT_EQ(UnnumberLine(line), expectChange) << text.toStdString();
+  return line;
+}
+
+// --- Lines that never get a number ---
+
+TEST(NumberLineSkips, BlankLinesAreUnchangedAndEndAContinuation) {
+  for (const QString& text :
+       {QString(), QStringLiteral("    "), QStringLiteral("\t"), QStringLiteral(" \t ")}) {
+    const Numbered n = numberOne(text, 9995, true);
+    EXPECT_FALSE(n.changed);
+    EXPECT_EQ(n.line, text);
+    EXPECT_EQ(n.number, 9995);
+    EXPECT_FALSE(n.continuation);
+  }
+}
+
+TEST(NumberLineSkips, CommentLinesAreUnchangedAndEndAContinuation) {
+  for (const QString& text : {QStringLiteral("' nota"), QStringLiteral("    ' nota"),
+                              QStringLiteral("\t' nota"), QStringLiteral("'x _")}) {
+    const Numbered n = numberOne(text, 9995, true);
+    EXPECT_FALSE(n.changed) << text.toStdString();
+    EXPECT_EQ(n.line, text);
+    EXPECT_EQ(n.number, 9995);
+    EXPECT_FALSE(n.continuation);
+  }
+}
+
+TEST(NumberLineSkips, DeclarationsDirectivesAndCaseLinesGetNoNumber) {
+  for (const QString& text : {
+           QStringLiteral("Private Const A = 1"),
+           QStringLiteral("    Public X As Long"),
+           QStringLiteral("Friend Function F() As Long"),
+           QStringLiteral("        Case 1"),
+           QStringLiteral("Case Else"),
+           QStringLiteral("Event Changed()"),
+           QStringLiteral("Sub Foo()"),
+           QStringLiteral("Function Bar() As Long"),
+           QStringLiteral("Property Get Nome() As String"),
+           QStringLiteral("#If DEBUG Then"),
+           QStringLiteral("\t#End If"),
+       }) {
+    const Numbered n = numberOne(text);
+    EXPECT_FALSE(n.changed) << text.toStdString();
+    EXPECT_EQ(n.line, text);
+    EXPECT_EQ(n.number, 9995);
+    EXPECT_FALSE(n.continuation);
+  }
+}
+
+TEST(NumberLineSkips, ContinuedDeclarationOrCaseMarksTheNextLineAsContinuation) {
+  Numbered n = numberOne(QStringLiteral("Private Declare Function GetTickCount Lib \"kernel32\" _"));
+  EXPECT_FALSE(n.changed);
+  EXPECT_TRUE(n.continuation);
+  n = numberOne(QStringLiteral("        Case 1, 2, _"));
+  EXPECT_FALSE(n.changed);
+  EXPECT_TRUE(n.continuation);
+}
+
+TEST(NumberLineSkips, ProcedureEndsAreUnchanged) {
+  for (const QString& text :
+       {QStringLiteral("End Sub"), QStringLiteral("End Function"), QStringLiteral("End Property")}) {
+    const Numbered n = numberOne(text);
+    EXPECT_FALSE(n.changed);
+    EXPECT_EQ(n.line, text);
+    EXPECT_EQ(n.number, 9995);
+  }
+}
+
+TEST(NumberLineSkips, KeywordsAreCaseSensitive) {
+  EXPECT_EQ(numberOne(QStringLiteral("private_x = 1")).line, QStringLiteral("10000 private_x = 1"));
+  EXPECT_EQ(numberOne(QStringLiteral("Cases = 2")).line, QStringLiteral("10000 Cases = 2"));
+}
+
+// --- Continued statements get one number, on their first line ---
+
+TEST(NumberLineContinuation, StatementOverThreeLinesIsNumberedOnItsFirstLineOnly) {
+  qint32 number = 9995;
+  bool continuation = false;
+  QString first = QStringLiteral("    x = 1 + _");
+  QString second = QStringLiteral("        2 + _");
+  QString third = QStringLiteral("        3");
+  QString next = QStringLiteral("    y = x");
+
+  EXPECT_TRUE(NumberLine(first, number, continuation, 5));
+  EXPECT_EQ(first, QStringLiteral("10000     x = 1 + _"));
+  EXPECT_TRUE(continuation);
+  EXPECT_FALSE(NumberLine(second, number, continuation, 5));
+  EXPECT_EQ(second, QStringLiteral("        2 + _"));
+  EXPECT_TRUE(continuation);
+  EXPECT_FALSE(NumberLine(third, number, continuation, 5));
+  EXPECT_EQ(third, QStringLiteral("        3"));
+  EXPECT_FALSE(continuation);
+  EXPECT_TRUE(NumberLine(next, number, continuation, 5));
+  EXPECT_EQ(next, QStringLiteral("10005     y = x"));
+  EXPECT_EQ(number, 10005);
+}
+
+TEST(NumberLineContinuation, BlankOrCommentLineEndsTheContinuation) {
+  const QStringList walked = numberProcedure({
+      QStringLiteral("Sub A()"),
+      QStringLiteral("x = 1 + _"),
+      QString(),
+      QStringLiteral("y = 2"),
+      QStringLiteral("z = 3 + _"),
+      QStringLiteral("\t' nota"),
+      QStringLiteral("w = 4"),
+      QStringLiteral("End Sub"),
+  });
+  const QStringList expected = {
+      QStringLiteral("Sub A()"),     QStringLiteral("10000 x = 1 + _"), QString(),
+      QStringLiteral("10005 y = 2"), QStringLiteral("10010 z = 3 + _"), QStringLiteral("\t' nota"),
+      QStringLiteral("10015 w = 4"), QStringLiteral("End Sub"),
+  };
+  EXPECT_EQ(walked, expected);
+}
+
+// --- How a number goes in ---
+
+TEST(NumberLineRules, IndentedStatementGetsNumberSpaceAndItsIndentation) {
+  const Numbered n = numberOne(QStringLiteral("    x = 1"));
+  EXPECT_TRUE(n.changed);
+  EXPECT_EQ(n.line, QStringLiteral("10000     x = 1"));
+  EXPECT_EQ(n.number, 10000);
+  EXPECT_FALSE(n.continuation);
+}
+
+TEST(NumberLineRules, OneWordLineGetsTwoSpaces) {
+  EXPECT_EQ(numberOne(QStringLiteral("Else")).line, QStringLiteral("10000  Else"));
+  EXPECT_EQ(numberOne(QStringLiteral("    Loop")).line, QStringLiteral("10000      Loop"));
+  EXPECT_EQ(numberOne(QStringLiteral("Next")).number, 10000);
+}
+
+TEST(NumberLineRules, EachNumberedLineAddsTheInterval) {
+  qint32 number = 9995;
+  bool continuation = false;
+  QString a = QStringLiteral("Dim i As Long");
+  QString b = QStringLiteral("End If");
+  QString c = QStringLiteral("End Select");
+  NumberLine(a, number, continuation, 5);
+  NumberLine(b, number, continuation, 5);
+  NumberLine(c, number, continuation, 5);
+  EXPECT_EQ(a, QStringLiteral("10000 Dim i As Long"));
+  EXPECT_EQ(b, QStringLiteral("10005 End If"));
+  EXPECT_EQ(c, QStringLiteral("10010 End Select"));
+  EXPECT_EQ(number, 10010);
+}
+
+TEST(NumberLineRules, ExistingNumberFollowedBySpaceIsReplaced) {
+  EXPECT_EQ(numberOne(QStringLiteral("10 x = 1")).line, QStringLiteral("10000  x = 1"));
+  EXPECT_EQ(numberOne(QStringLiteral("-5 x = 1")).line, QStringLiteral("10000  x = 1"));
+}
+
+TEST(NumberLineRules, ExistingNumberAfterIndentationKeepsTheIndentationAfterTheNewNumber) {
+  // indent "  ", then the text from the blank after the old number on.
+  EXPECT_EQ(numberOne(QStringLiteral("  20 x = 1")).line, QStringLiteral("10000    x = 1"));
+}
+
+TEST(NumberLineRules, NumericLabelWithColonBecomesALineNumber) {
+  const Numbered n = numberOne(QStringLiteral("10: x = 1"));
+  EXPECT_TRUE(n.changed);
+  EXPECT_EQ(n.line, QStringLiteral("10000  x = 1"));
+  EXPECT_EQ(n.number, 10000);
+  EXPECT_EQ(numberOne(QStringLiteral("  10: x = 1")).line, QStringLiteral("10000    x = 1"));
+}
+
+TEST(NumberLineRules, NumberInFrontOfACommentIsDroppedAndTakesNoNumber) {
+  Numbered n = numberOne(QStringLiteral("10 ' nota"));
+  EXPECT_TRUE(n.changed);
+  EXPECT_EQ(n.line, QStringLiteral("' nota"));
+  EXPECT_EQ(n.number, 9995);
+  n = numberOne(QStringLiteral("    10' nota"));
+  EXPECT_EQ(n.line, QStringLiteral("    ' nota"));
+  EXPECT_EQ(n.number, 9995);
+}
+
+TEST(NumberLineRules, LineHoldingOnlyANumberIsEmptied) {
+  for (const QString& text :
+       {QStringLiteral("10"), QStringLiteral("   10  "), QStringLiteral("\t-5"), QStringLiteral("1.5")}) {
+    const Numbered n = numberOne(text);
+    EXPECT_TRUE(n.changed) << text.toStdString();
+    EXPECT_EQ(n.line, QString());
+    EXPECT_EQ(n.number, 9995);
+  }
+}
+
+TEST(NumberLineRules, TextEndingInPointOrCommaIsNotANumber) {
+  EXPECT_EQ(numberOne(QStringLiteral("10.")).line, QStringLiteral("10000  10."));
+  EXPECT_EQ(numberOne(QStringLiteral("10. x")).line, QStringLiteral("10000 10. x"));
+  EXPECT_EQ(numberOne(QStringLiteral("10, x")).line, QStringLiteral("10000 10, x"));
+  EXPECT_EQ(numberOne(QStringLiteral("10.: x")).line, QStringLiteral("10000 10.: x"));
+}
+
+TEST(NumberLineRules, ColonsAndQuotesInsideCodeAreNotLabelsOrComments) {
+  EXPECT_EQ(numberOne(QStringLiteral("x = a: y = b")).line, QStringLiteral("10000 x = a: y = b"));
+  EXPECT_EQ(numberOne(QStringLiteral("MsgBox \"it's\"")).line, QStringLiteral("10000 MsgBox \"it's\""));
+  EXPECT_EQ(numberOne(QStringLiteral("10 MsgBox \"a:b\"")).line, QStringLiteral("10000  MsgBox \"a:b\""));
+}
+
+TEST(NumberLineRules, NegativeNumbersAreWrittenWithAMinus) {
+  const Numbered n = numberOne(QStringLiteral("x = 1"), -15, false, 5);
+  EXPECT_EQ(n.line, QStringLiteral("-10 x = 1"));
+  EXPECT_EQ(n.number, -10);
+}
+
+TEST(NumberLineRules, ContinuedStatementSetsTheFlag) {
+  const Numbered n = numberOne(QStringLiteral("x = 1 + _"));
+  EXPECT_EQ(n.line, QStringLiteral("10000 x = 1 + _"));
+  EXPECT_TRUE(n.continuation);
+}
+
+// --- Alphanumeric labels ---
+
+TEST(NumberLineLabels, LineBeginningWithALabelIsNeverNumbered) {
+  for (const QString& text :
+       {QStringLiteral("ErrorHandler:"), QStringLiteral("Erro: x = 1"), QStringLiteral("    Saida:"),
+        QStringLiteral("Ação:"), QStringLiteral("Label_1: ' nota"), QStringLiteral("\tFim:")}) {
+    const Numbered n = numberOne(text);
+    EXPECT_FALSE(n.changed) << text.toStdString();
+    EXPECT_EQ(n.line, text);
+    EXPECT_EQ(n.number, 9995);
+  }
+}
+
+TEST(NumberLineLabels, KeywordFollowedByColonIsAStatement) {
+  EXPECT_EQ(numberOne(QStringLiteral("Else:")).line, QStringLiteral("10000  Else:"));
+  EXPECT_EQ(numberOne(QStringLiteral("    Else: x = 1")).line, QStringLiteral("10000     Else: x = 1"));
+  EXPECT_EQ(numberOne(QStringLiteral("End:")).line, QStringLiteral("10000  End:"));
+  EXPECT_EQ(numberOne(QStringLiteral("Resume: x = 1")).line, QStringLiteral("10000 Resume: x = 1"));
+  EXPECT_EQ(numberOne(QStringLiteral("else:")).line, QStringLiteral("10000  else:"));
+}
+
+TEST(NumberLineLabels, LabelWithSpaceBeforeTheColonOrNameCallIsNumbered) {
+  EXPECT_EQ(numberOne(QStringLiteral("Foo x:=1")).line, QStringLiteral("10000 Foo x:=1"));
+  EXPECT_EQ(numberOne(QStringLiteral("1Erro: x")).line, QStringLiteral("10000 1Erro: x"));
+}
+
+TEST(NumberLineLabels, ContinuedStatementAfterALabelKeepsItsContinuationUnnumbered) {
+  const QStringList walked = numberProcedure({
+      QStringLiteral("Sub A()"),
+      QStringLiteral("Erro: x = 1 + _"),
+      QStringLiteral("    2"),
+      QStringLiteral("y = 3"),
+      QStringLiteral("End Sub"),
+  });
+  const QStringList expected = {
+      QStringLiteral("Sub A()"),     QStringLiteral("Erro: x = 1 + _"), QStringLiteral("    2"),
+      QStringLiteral("10000 y = 3"), QStringLiteral("End Sub"),
+  };
+  EXPECT_EQ(walked, expected);
+}
+
+// --- Running numbers never wrap ---
+
+TEST(NumberLineOverflow, LastRepresentableNumberIsWritten) {
+  const Numbered n = numberOne(QStringLiteral("x = 1"), kMax - 5, false, 5);
+  EXPECT_EQ(n.line, QStringLiteral("2147483647 x = 1"));
+  EXPECT_EQ(n.number, kMax);
+}
+
+TEST(NumberLineOverflow, PassingTheLargestNumberThrowsAndChangesNothing) {
+  QString line = QStringLiteral("    x = 1 + _");
+  qint32 number = kMax - 4;
+  bool continuation = false;
+  EXPECT_THROW(NumberLine(line, number, continuation, 5), LineNumberOverflow);
+  EXPECT_EQ(line, QStringLiteral("    x = 1 + _"));
+  EXPECT_EQ(number, kMax - 4);
+  EXPECT_FALSE(continuation);
+}
+
+TEST(NumberLineOverflow, PassingTheSmallestNumberThrows) {
+  QString line = QStringLiteral("Else");
+  qint32 number = kMin + 2;
+  bool continuation = false;
+  EXPECT_THROW(NumberLine(line, number, continuation, -5), LineNumberOverflow);
+  EXPECT_EQ(line, QStringLiteral("Else"));
+  EXPECT_EQ(number, kMin + 2);
+}
+
+TEST(NumberLineOverflow, OverflowIsAnObjectModelErrorNumberSix) {
+  QString line = QStringLiteral("10: x = 1");
+  qint32 number = kMax;
+  bool continuation = false;
+  try {
+    NumberLine(line, number, continuation, 1);
+    FAIL() << "no overflow reported";
+  } catch (const ide::Error& error) {
+    EXPECT_EQ(error.number(), 6);
+    EXPECT_EQ(error.description(), QStringLiteral("Overflow"));
+  }
+}
+
+TEST(NumberLineOverflow, LinesThatTakeNoNumberDoNotOverflow) {
+  Numbered n = numberOne(QStringLiteral("10 ' nota"), kMax);
+  EXPECT_EQ(n.line, QStringLiteral("' nota"));
+  n = numberOne(QStringLiteral("Case 1"), kMax);
+  EXPECT_FALSE(n.changed);
+  n = numberOne(QStringLiteral("10"), kMax);
+  EXPECT_EQ(n.line, QString());
+  EXPECT_EQ(n.number, kMax);
+}
+
+// --- Tabs are blanks ---
+
+TEST(NumberLineTabs, LeadingTabsAreKeptExactly) {
+  EXPECT_EQ(numberOne(QStringLiteral("\tx = 1")).line, QStringLiteral("10000 \tx = 1"));
+  EXPECT_EQ(numberOne(QStringLiteral("\t\tElse")).line, QStringLiteral("10000  \t\tElse"));
+  EXPECT_EQ(numberOne(QStringLiteral(" \tx = 1\t")).line, QStringLiteral("10000  \tx = 1\t"));
+}
+
+TEST(NumberLineTabs, TabAfterAnOldNumberSeparatesIt) {
+  EXPECT_EQ(numberOne(QStringLiteral("10\tx = 1")).line, QStringLiteral("10000 \tx = 1"));
+  EXPECT_EQ(numberOne(QStringLiteral("\t10 x = 1")).line, QStringLiteral("10000 \t x = 1"));
+}
+
+TEST(NumberLineTabs, TrailingTabDoesNotHideTheContinuationMark) {
+  const Numbered n = numberOne(QStringLiteral("x = 1 + _\t"));
+  EXPECT_TRUE(n.continuation);
+}
+
+// --- Removing numbers ---
+
+TEST(UnnumberLineRules, NumberAndOneSpaceAreRemovedAndTheRestKept) {
+  EXPECT_EQ(unnumbered(QStringLiteral("10000 x = 1"), true), QStringLiteral("x = 1"));
+  EXPECT_EQ(unnumbered(QStringLiteral("10000     x = 1"), true), QStringLiteral("    x = 1"));
+  EXPECT_EQ(unnumbered(QStringLiteral("10000  Else"), true), QStringLiteral(" Else"));
+  EXPECT_EQ(unnumbered(QStringLiteral("-5 x"), true), QStringLiteral("x"));
+  EXPECT_EQ(unnumbered(QStringLiteral("10000 ' nota"), true), QStringLiteral("' nota"));
+}
+
+TEST(UnnumberLineRules, NumberColonAndSpaceAreRemoved) {
+  EXPECT_EQ(unnumbered(QStringLiteral("10000: x = 1"), true), QStringLiteral("x = 1"));
+  EXPECT_EQ(unnumbered(QStringLiteral("  10:   x = 1"), true), QStringLiteral("    x = 1"));
+  EXPECT_EQ(unnumbered(QStringLiteral("10000: "), true), QString());
+}
+
+TEST(UnnumberLineRules, LineWhoseFirstWordIsNotANumberIsUnchanged) {
+  for (const QString& text : {QStringLiteral("x = 1"), QStringLiteral("    Else"),
+                              QStringLiteral("Erro: x = 1"), QStringLiteral("10000"), QStringLiteral("10. x"),
+                              QStringLiteral("10, x"), QStringLiteral("' 10 x")}) {
+    EXPECT_EQ(unnumbered(text, false), text);
+  }
+}
+
+TEST(UnnumberLineRules, BlankLinesAreUnchanged) {
+  for (const QString& text : {QString(), QStringLiteral("   "), QStringLiteral("\t")}) {
+    EXPECT_EQ(unnumbered(text, false), text);
+  }
+}
+
+TEST(UnnumberLineRules, TabsCountAsBlanks) {
+  EXPECT_EQ(unnumbered(QStringLiteral("\t10000 x"), true), QStringLiteral("\tx"));
+  EXPECT_EQ(unnumbered(QStringLiteral("10000\tx"), true), QStringLiteral("x"));
+  EXPECT_EQ(unnumbered(QStringLiteral("10000 \t\tx"), true), QStringLiteral("\t\tx"));
+}
+
+TEST(UnnumberLineContinuation, ContinuationLinesKeepTheirLeadingNumber) {
+  bool continuation = false;
+  QString first = QStringLiteral("10000 x = a + _");
+  QString second = QStringLiteral("    2 * b + _");
+  QString third = QStringLiteral("    3");
+  QString next = QStringLiteral("10005 y = 1");
+  EXPECT_TRUE(UnnumberLine(first, continuation));
+  EXPECT_EQ(first, QStringLiteral("x = a + _"));
+  EXPECT_TRUE(continuation);
+  EXPECT_FALSE(UnnumberLine(second, continuation));
+  EXPECT_EQ(second, QStringLiteral("    2 * b + _"));
+  EXPECT_TRUE(continuation);
+  EXPECT_FALSE(UnnumberLine(third, continuation));
+  EXPECT_FALSE(continuation);
+  EXPECT_TRUE(UnnumberLine(next, continuation));
+  EXPECT_EQ(next, QStringLiteral("y = 1"));
+}
+
+TEST(UnnumberLineContinuation, BlankLineEndsTheContinuation) {
+  bool continuation = true;
+  QString blank;
+  QString numbered = QStringLiteral("10 x");
+  EXPECT_FALSE(UnnumberLine(blank, continuation));
+  EXPECT_FALSE(continuation);
+  EXPECT_TRUE(UnnumberLine(numbered, continuation));
+  EXPECT_EQ(numbered, QStringLiteral("x"));
+}
+
+TEST(UnnumberLineContinuation, SingleLineRuleAloneTakesAnyLeadingNumber) {
+  EXPECT_EQ(unnumbered(QStringLiteral("    2 * b"), true), QStringLiteral("    * b"));
+}
+
+// --- Whole procedures ---
+
+TEST(NumberProcedureWalk, NumberingStartsAfterAThreeLineHeader) {
+  const QStringList walked = numberProcedure({
+      QStringLiteral("Private Function Soma(ByVal a As Long, _"),
+      QStringLiteral("                      ByVal b As Long, _"),
+      QStringLiteral("                      ByVal c As Long) As Long"),
+      QStringLiteral("    Soma = a + b + c"),
+      QStringLiteral("End Function"),
+  });
+  const QStringList expected = {
+      QStringLiteral("Private Function Soma(ByVal a As Long, _"),
+      QStringLiteral("                      ByVal b As Long, _"),
+      QStringLiteral("                      ByVal c As Long) As Long"),
+      QStringLiteral("10000     Soma = a + b + c"),
+      QStringLiteral("End Function"),
+  };
+  EXPECT_EQ(walked, expected);
+}
+
+TEST(NumberProcedureWalk, TrailingBlankLinesAndTheEndLineAreLeftAlone) {
+  const QStringList walked = numberProcedure({
+      QStringLiteral("Public Sub Limpar()"),
+      QStringLiteral("    x = 0"),
+      QStringLiteral("    Else"),
+      QStringLiteral("End Sub"),
+      QString(),
+      QStringLiteral("   "),
+  });
+  const QStringList expected = {
+      QStringLiteral("Public Sub Limpar()"),
+      QStringLiteral("10000     x = 0"),
+      QStringLiteral("10005      Else"),
+      QStringLiteral("End Sub"),
+      QString(),
+      QStringLiteral("   "),
+  };
+  EXPECT_EQ(walked, expected);
+}
+
+TEST(NumberProcedureWalk, RenumberingReplacesOldNumbersAndRestartsPerProcedure) {
+  const QStringList first = numberProcedure({QStringLiteral("Sub A()"), QStringLiteral("10 x = 1"),
+                                             QStringLiteral("20: y = 2"), QStringLiteral("End Sub")},
+                                            100, 10);
+  const QStringList expected = {QStringLiteral("Sub A()"), QStringLiteral("100  x = 1"),
+                                QStringLiteral("110  y = 2"), QStringLiteral("End Sub")};
+  EXPECT_EQ(first, expected);
+  const QStringList second = numberProcedure(
+      {QStringLiteral("Sub B()"), QStringLiteral("z = 3"), QStringLiteral("End Sub")}, 100, 10);
+  EXPECT_EQ(second[1], QStringLiteral("100 z = 3"));
+}
+
+TEST(NumberProcedureWalk, RemovingNumbersRestoresTheCode) {
+  const QStringList numbered = numberProcedure({
+      QStringLiteral("Sub A()"),
+      QStringLiteral("    If x Then"),
+      QStringLiteral("        y = 1 + _"),
+      QStringLiteral("            2"),
+      QStringLiteral("    End If"),
+      QStringLiteral("End Sub"),
+  });
+  const QStringList expected = {
+      QStringLiteral("Sub A()"),       QStringLiteral("    If x Then"), QStringLiteral("        y = 1 + _"),
+      QStringLiteral("            2"), QStringLiteral("    End If"),    QStringLiteral("End Sub"),
+  };
+  EXPECT_EQ(unnumberProcedure(numbered), expected);
+}
+
+}  // namespace
+}  // namespace transform

@@ -1,0 +1,137 @@
+// SPDX-License-Identifier: MIT
+// Scaling of long runs onto a progress bar of at most 32767 steps.
+#include "transform/progress.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+namespace transform {
+namespace {
+
+class FakeBar : public ProgressSink {
+ public:
+  int minimum() const override { return m_minimum; }
+  void setMinimum(int minimum) override { m_minimum = minimum; }
+  int maximum() const override { return m_maximum; }
+  void setMaximum(int maximum) override { m_maximum = maximum; }
+  int value() const override { return m_value; }
+  void setValue(int value) override {
+    m_value = value;
+    ++valueWrites;
+  }
+  bool isVisible() const override { return m_visible; }
+  void setVisible(bool visible) override { m_visible = visible; }
+
+  int valueWrites = 0;
+
+ private:
+  int m_minimum = 5;
+  int m_maximum = 100;
+  int m_value = 7;
+  bool m_visible = false;
+};
+
+class ProgressScaleTest : public ::testing::Test {
+ protected:
+  FakeBar bar;
+  ProgressScale progress{bar};
+};
+
+TEST_F(ProgressScaleTest, SmallRunTakesOneStepPerUnit) {
+  progress.SetProgressRange(250);
+  EXPECT_EQ(bar.minimum(), 0);
+  EXPECT_EQ(bar.maximum(), 250);
+  EXPECT_EQ(bar.value(), 0);
+  EXPECT_EQ(progress.scale(), 1.0);
+  EXPECT_EQ(progress.totalUnits(), 250);
+  progress.AdvanceProgress(1);
+  progress.AdvanceProgress(40);
+  EXPECT_EQ(bar.value(), 41);
+}
+
+TEST_F(ProgressScaleTest, RangeUpTo32767IsNotScaled) {
+  progress.SetProgressRange(32767);
+  EXPECT_EQ(bar.maximum(), 32767);
+  EXPECT_EQ(progress.scale(), 1.0);
+}
+
+TEST_F(ProgressScaleTest, EmptyOrNegativeRunGivesAOneStepBar) {
+  progress.SetProgressRange(0);
+  EXPECT_EQ(bar.maximum(), 1);
+  EXPECT_EQ(progress.scale(), 1.0);
+  progress.SetProgressRange(-5);
+  EXPECT_EQ(bar.minimum(), 0);
+  EXPECT_EQ(bar.maximum(), 1);
+  EXPECT_EQ(progress.scale(), 1.0);
+}
+
+TEST_F(ProgressScaleTest, LargerRunIsScaledTo32767Steps) {
+  progress.SetProgressRange(32768);
+  EXPECT_EQ(bar.maximum(), 32767);
+  EXPECT_DOUBLE_EQ(progress.scale(), 32768.0 / 32767.0);
+}
+
+TEST_F(ProgressScaleTest, FortyThousandMembersFillTheBarBeforeTheLastOne) {
+  progress.SetProgressRange(40000);
+  EXPECT_EQ(bar.maximum(), 32767);
+  EXPECT_DOUBLE_EQ(progress.scale(), 40000.0 / 32767.0);
+  progress.AdvanceProgress(1);
+  EXPECT_EQ(bar.value(), 1);  // 1 / 1.2207 rounds to one whole step
+  for (int member = 2; member <= 32767; ++member)
+    progress.AdvanceProgress(1);
+  EXPECT_EQ(bar.value(), 32767);
+  const int writes = bar.valueWrites;
+  for (int member = 32768; member <= 40000; ++member)
+    progress.AdvanceProgress(1);
+  EXPECT_EQ(bar.value(), 32767);
+  EXPECT_EQ(bar.valueWrites, writes);  // a full bar is left alone
+}
+
+TEST_F(ProgressScaleTest, StepsAreRounded) {
+  progress.SetProgressRange(3 * 32767);  // three units per step
+  progress.AdvanceProgress(1);
+  EXPECT_EQ(bar.value(), 0);
+  progress.AdvanceProgress(2);
+  EXPECT_EQ(bar.value(), 1);
+  progress.AdvanceProgress(4);
+  EXPECT_EQ(bar.value(), 2);
+  progress.AdvanceProgress(3000);
+  EXPECT_EQ(bar.value(), 1002);
+}
+
+TEST_F(ProgressScaleTest, HalfStepRoundsUp) {
+  progress.SetProgressRange(2 * 32767);
+  progress.AdvanceProgress(1);
+  EXPECT_EQ(bar.value(), 1);
+}
+
+TEST_F(ProgressScaleTest, NeverPastTheMaximum) {
+  progress.SetProgressRange(10);
+  progress.AdvanceProgress(7);
+  progress.AdvanceProgress(7);
+  EXPECT_EQ(bar.value(), 10);
+  progress.SetProgressRange(100);
+  progress.AdvanceProgress(std::numeric_limits<qint32>::max());
+  EXPECT_EQ(bar.value(), 100);
+}
+
+TEST_F(ProgressScaleTest, ZeroUnitsMoveNothing) {
+  progress.SetProgressRange(10);
+  const int writes = bar.valueWrites;
+  progress.AdvanceProgress(0);
+  EXPECT_EQ(bar.value(), 0);
+  EXPECT_EQ(bar.valueWrites, writes);
+}
+
+TEST_F(ProgressScaleTest, NewRangeStartsAnEmptyBarAndLeavesVisibilityToTheCaller) {
+  progress.SetProgressRange(10);
+  progress.AdvanceProgress(4);
+  bar.setVisible(true);
+  progress.SetProgressRange(20);
+  EXPECT_EQ(bar.value(), 0);
+  EXPECT_TRUE(bar.isVisible());
+}
+
+}  // namespace
+}  // namespace transform
