@@ -77,7 +77,7 @@ void appendNumber(QString& out, qint32 number) {
   out.append(QLatin1StringView(digits, end - digits));
 }
 
-// number & separator & rest..., sized once.
+// The number, the separator, the indentation and the rest, in one allocation.
 QString numbered(qint32 number, QStringView separator, QStringView indent, QStringView rest) {
   QString out;
   out.reserve(12 + separator.size() + indent.size() + rest.size());
@@ -152,7 +152,7 @@ bool UnnumberLine(QString& line) {
   const QStringView t = whole.sliced(indent.size());
   if (isBlankLine(t)) return false;
 
-  qsizetype cut = -1;
+  qsizetype cut = 0;
   const qsizetype colon = t.indexOf(u": ");
   if (colon > 0 && isUsableNumber(t.first(colon))) {
     cut = colon + 2;
