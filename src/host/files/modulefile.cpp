@@ -1,0 +1,242 @@
+// SPDX-License-Identifier: MIT
+// One pass over a module's lines: the header parts in the order the IDE writes them, then the code with its
+// hidden attribute lines moved aside and remembered by the code line they follow.
+#include "host/files/modulefile.h"
+
+#include "ide/error.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace host {
+namespace {
+
+bool isBlank(QChar character) {
+  return character == u' ' || character == u'\t';
+}
+
+qsizetype skipBlanks(QStringView text, qsizetype from) {
+  while (from < text.size() && isBlank(text[from]))
+    ++from;
+  return from;
+}
+
+/// Whether the line's first word is `word` (case-insensitively), followed by a blank or the line's end;
+/// `after` receives the position after the word.
+bool startsWithWord(QStringView text, QStringView word, qsizetype* after = nullptr) {
+  const qsizetype start = skipBlanks(text, 0);
+  if (text.size() - start < word.size()) return false;
+  if (text.mid(start, word.size()).compare(word, Qt::CaseInsensitive) != 0) return false;
+  const qsizetype end = start + word.size();
+  if (end < text.size() && !isBlank(text[end])) return false;
+  if (after) *after = end;
+  return true;
+}
+
+bool isObjectLine(QStringView text) {
+  const qsizetype start = skipBlanks(text, 0);
+  if (text.mid(start, 6).compare(u"Object", Qt::CaseInsensitive) != 0) return false;
+  const qsizetype next = skipBlanks(text, start + 6);
+  return next < text.size() && text[next] == u'=';
+}
+
+/// For "Attribute <name> = <value>": the name and the raw value (trimmed); nothing for other lines.
+struct AttributeParts {
+  QStringView name;
+  QStringView value;
+};
+
+std::optional<AttributeParts> splitAttribute(QStringView text) {
+  qsizetype position = 0;
+  if (!startsWithWord(text, u"Attribute", &position)) return std::nullopt;
+  position = skipBlanks(text, position);
+  const qsizetype equals = text.indexOf(u'=', position);
+  if (equals < 0) return std::nullopt;
+  return AttributeParts{text.mid(position, equals - position).trimmed(), text.mid(equals + 1).trimmed()};
+}
+
+bool isModuleAttribute(QStringView text) {
+  qsizetype position = 0;
+  if (!startsWithWord(text, u"Attribute", &position)) return false;
+  position = skipBlanks(text, position);
+  return text.mid(position, 3).compare(u"VB_", Qt::CaseInsensitive) == 0;
+}
+
+/// A line ending in " _" continues on the next physical line (comments included).
+bool continuesOnNextLine(QStringView text) {
+  QStringView trimmed = text;
+  while (!trimmed.isEmpty() && isBlank(trimmed.back()))
+    trimmed.chop(1);
+  if (!trimmed.endsWith(u'_')) return false;
+  return trimmed.size() == 1 || isBlank(trimmed[trimmed.size() - 2]);
+}
+
+[[noreturn]] void failAt(const QString& fileName, std::size_t lineIndex, const QString& problem) {
+  throw ide::Error(ide::err::InvalidFileFormat,
+                   QStringLiteral("%1, line %2: %3").arg(fileName).arg(lineIndex + 1).arg(problem));
+}
+
+}  // namespace
+
+ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QString& fileName) {
+  ModuleSource source;
+  std::size_t position = 0;
+  const std::size_t count = lines.size();
+
+  if (count > 0 && startsWithWord(lines[0].text, u"VERSION")) {
+    source.preamble.push_back(lines[position++]);
+    while (position < count && isObjectLine(lines[position].text))
+      source.preamble.push_back(lines[position++]);
+    qsizetype afterBegin = 0;
+    if (position < count && startsWithWord(lines[position].text, u"Begin", &afterBegin)) {
+      if (skipBlanks(lines[position].text, afterBegin) == lines[position].text.size()) {
+        // A class's BEGIN ... END block of persisted settings: kept raw.
+        const std::size_t beginIndex = position;
+        std::size_t end = position + 1;
+        while (end < count && lines[end].text.trimmed().compare(u"END", Qt::CaseInsensitive) != 0)
+          ++end;
+        if (end == count) failAt(fileName, beginIndex, QStringLiteral("BEGIN without END"));
+        source.preamble.insert(source.preamble.end(), lines.begin() + static_cast<std::ptrdiff_t>(position),
+                               lines.begin() + static_cast<std::ptrdiff_t>(end + 1));
+        position = end + 1;
+      } else {
+        source.form = FormDescription::parse(lines, position, fileName);
+      }
+    }
+  }
+  while (position < count && isModuleAttribute(lines[position].text)) {
+    source.moduleAttributes.push_back(lines[position++]);
+  }
+
+  source.code.reserve(count - position);
+  bool continued = false;
+  for (; position < count; ++position) {
+    const SourceLine& line = lines[position];
+    if (!continued && startsWithWord(line.text, u"Attribute")) {
+      source.memberAttributes.push_back(MemberAttributeLine{static_cast<int>(source.code.size()), line});
+      continue;
+    }
+    source.code.push_back(line);
+    continued = continuesOnNextLine(line.text);
+  }
+  return source;
+}
+
+ModuleSource parseModule(QByteArrayView bytes, const QString& fileName) {
+  return parseModuleLines(readSourceLines(bytes, fileName), fileName);
+}
+
+QByteArray writeModule(const ModuleSource& source, const QString& fileName) {
+  std::vector<SourceLine> formLines;
+  if (source.form) source.form->appendLines(formLines);
+
+  // Edits may have appended member attributes out of order; write each after its code line all the same.
+  std::vector<const MemberAttributeLine*> attributes;
+  attributes.reserve(source.memberAttributes.size());
+  for (const MemberAttributeLine& attribute : source.memberAttributes)
+    attributes.push_back(&attribute);
+  const auto byCodeLine = [](const MemberAttributeLine* left, const MemberAttributeLine* right) {
+    return left->afterCodeLine < right->afterCodeLine;
+  };
+  if (!std::is_sorted(attributes.begin(), attributes.end(), byCodeLine)) {
+    std::stable_sort(attributes.begin(), attributes.end(), byCodeLine);
+  }
+
+  qsizetype estimate = 0;
+  for (const std::vector<SourceLine>* part :
+       {&source.preamble, &std::as_const(formLines), &source.moduleAttributes, &source.code}) {
+    for (const SourceLine& line : *part)
+      estimate += line.text.size() + 2;
+  }
+  for (const MemberAttributeLine& attribute : source.memberAttributes)
+    estimate += attribute.line.text.size() + 2;
+
+  QByteArray out;
+  out.reserve(estimate);
+  int lineNumber = 0;
+  bool previousEnded = true;
+  const auto write = [&](const SourceLine& line) {
+    // Only the last line of a file read from disk lacks a line end; after edits put lines behind it, it
+    // needs one to stay a line of its own.
+    if (!previousEnded) out.append("\r\n");
+    appendSourceLine(out, line, fileName, ++lineNumber);
+    previousEnded = line.end != LineEnd::None;
+  };
+  for (const std::vector<SourceLine>* part :
+       {&source.preamble, &std::as_const(formLines), &source.moduleAttributes}) {
+    for (const SourceLine& line : *part)
+      write(line);
+  }
+  auto nextAttribute = attributes.begin();
+  const auto writeAttributesThrough = [&](int codeLine) {
+    while (nextAttribute != attributes.end() && (*nextAttribute)->afterCodeLine <= codeLine) {
+      write((*nextAttribute)->line);
+      ++nextAttribute;
+    }
+  };
+  writeAttributesThrough(0);
+  int codeLine = 0;
+  for (const SourceLine& line : source.code) {
+    write(line);
+    writeAttributesThrough(++codeLine);
+  }
+  while (nextAttribute != attributes.end())
+    write((*nextAttribute++)->line);
+  return out;
+}
+
+std::optional<QString> moduleAttribute(const ModuleSource& source, QStringView name) {
+  for (const SourceLine& line : source.moduleAttributes) {
+    const std::optional<AttributeParts> parts = splitAttribute(line.text);
+    if (parts && parts->name.compare(name, Qt::CaseInsensitive) == 0) return parts->value.toString();
+  }
+  return std::nullopt;
+}
+
+void setModuleAttribute(ModuleSource& source, const QString& name, const QString& rawValue) {
+  const QString text = QStringLiteral("Attribute %1 = %2").arg(name, rawValue);
+  for (SourceLine& line : source.moduleAttributes) {
+    const std::optional<AttributeParts> parts = splitAttribute(line.text);
+    if (parts && parts->name.compare(name, Qt::CaseInsensitive) == 0) {
+      if (parts->value != rawValue) line.text = text;
+      return;
+    }
+  }
+  // A new header line ends like the header around it; code follows, so it always needs a line end.
+  LineEnd end = lineEndAt(source.moduleAttributes, source.moduleAttributes.size());
+  if (source.moduleAttributes.empty()) end = lineEndAt(source.preamble, source.preamble.size());
+  if (source.moduleAttributes.empty() && source.preamble.empty()) end = lineEndAt(source.code, 0);
+  if (!source.moduleAttributes.empty() && source.moduleAttributes.back().end == LineEnd::None) {
+    source.moduleAttributes.back().end = end;
+  }
+  source.moduleAttributes.push_back(SourceLine{text, end});
+}
+
+QString moduleName(const ModuleSource& source) {
+  const std::optional<QString> value = moduleAttribute(source, u"VB_Name");
+  if (!value) return {};
+  return unquoteVbString(*value).value_or(*value);
+}
+
+void setModuleName(ModuleSource& source, const QString& name) {
+  const bool hadName = moduleAttribute(source, u"VB_Name").has_value();
+  if (hadName) {
+    setModuleAttribute(source, QStringLiteral("VB_Name"), quoteVbString(name));
+  } else {
+    // VB_Name is always the first header attribute.
+    LineEnd end = LineEnd::CRLF;
+    if (!source.moduleAttributes.empty()) {
+      end = lineEndAt(source.moduleAttributes, 0);
+    } else if (!source.preamble.empty()) {
+      end = lineEndAt(source.preamble, source.preamble.size());
+    } else {
+      end = lineEndAt(source.code, 0);
+    }
+    source.moduleAttributes.insert(
+        source.moduleAttributes.begin(),
+        SourceLine{QStringLiteral("Attribute VB_Name = ") + quoteVbString(name), end});
+  }
+  if (source.form) source.form->root().setName(name);
+}
+
+}  // namespace host

@@ -1,0 +1,406 @@
+// SPDX-License-Identifier: MIT
+// Tests of module files: how standard modules, classes and forms split into header, code and hidden member
+// attributes; byte-identical writing; renaming; header attributes; and the errors for malformed headers.
+#include "host/files/modulefile.h"
+
+#include "testtext.h"
+
+#include <gtest/gtest.h>
+
+namespace host {
+namespace {
+
+using testing::asText;
+using testing::expectError;
+using testing::replacedOnce;
+using testing::windowsFile;
+
+constexpr const char* kStandardModule = R"(Attribute VB_Name = "modPrincipal"
+Option Explicit
+
+' Ponto de entrada: abre a conexão e mostra a janela principal.
+Public gUsuario As String
+
+Public Sub Main()
+    gUsuario = Environ$("USERNAME")
+    frmPrincipal.Show
+End Sub
+)";
+
+constexpr const char* kCollectionClass = R"(VERSION 1.0 CLASS
+BEGIN
+  MultiUse = -1  'True
+  Persistable = 0  'NotPersistable
+  DataBindingBehavior = 0  'vbNone
+  DataSourceBehavior  = 0  'vbNone
+  MTSTransactionMode  = 0  'NotAnMTSObject
+END
+Attribute VB_Name = "clsPedidos"
+Attribute VB_GlobalNameSpace = False
+Attribute VB_Creatable = True
+Attribute VB_PredeclaredId = False
+Attribute VB_Exposed = False
+Attribute VB_Ext_KEY = "SavedWithClassBuilder6" ,"Yes"
+Option Explicit
+
+Private mCol As Collection
+Private WithEvents mRelogio As clsRelogio
+Attribute mRelogio.VB_VarHelpID = -1
+
+' Item padrão da coleção: Pedidos(1) é o mesmo que Pedidos.Item(1).
+Public Property Get Item(ByVal Chave As Variant) As clsPedido
+Attribute Item.VB_UserMemId = 0
+Attribute Item.VB_Description = "Devolve um pedido pela posição ou pela chave."
+    Set Item = mCol(Chave)
+End Property
+
+Public Function NewEnum() As IUnknown
+Attribute NewEnum.VB_UserMemId = -4
+Attribute NewEnum.VB_MemberFlags = "40"
+    Set NewEnum = mCol.[_NewEnum]
+End Function
+)";
+
+constexpr const char* kForm = R"(VERSION 5.00
+Object = "{831FDD16-0C5C-11D2-A9FC-0000F8754DA1}#2.0#0"; "MSCOMCTL.OCX"
+Object = "{F9043C88-F6F2-101A-A3C9-08002B2F49FB}#1.2#0"; "COMDLG32.OCX"
+Begin VB.Form frmSobre 
+   BorderStyle     =   3  'Fixed Dialog
+   Caption         =   "Sobre a Loja"
+   ClientHeight    =   2055
+   ClientLeft      =   45
+   ClientTop       =   330
+   ClientWidth     =   4680
+   LinkTopic       =   "Form1"
+   ScaleHeight     =   2055
+   ScaleWidth      =   4680
+   StartUpPosition =   1  'CenterOwner
+   Begin VB.Label lblVersao 
+      Caption         =   "Versão"
+      Height          =   255
+      Left            =   120
+      TabIndex        =   0
+      Top             =   120
+      Width           =   4455
+   End
+End
+Attribute VB_Name = "frmSobre"
+Attribute VB_GlobalNameSpace = False
+Attribute VB_Creatable = False
+Attribute VB_PredeclaredId = True
+Attribute VB_Exposed = False
+Option Explicit
+
+Private Sub Form_Load()
+    lblVersao.Caption = "Versão " & App.Major & "." & App.Minor
+End Sub
+)";
+
+std::vector<QString> texts(const std::vector<SourceLine>& lines) {
+  std::vector<QString> result;
+  for (const SourceLine& line : lines)
+    result.push_back(line.text);
+  return result;
+}
+
+// --- Splitting -------------------------------------------------------------------------------------------
+
+TEST(ModuleFileTest, StandardModuleHasOnlyItsNameAsHeader) {
+  const QByteArray bytes = windowsFile(kStandardModule);
+  const ModuleSource module = parseModule(bytes, QStringLiteral("modPrincipal.bas"));
+  EXPECT_TRUE(module.preamble.empty());
+  EXPECT_FALSE(module.form.has_value());
+  ASSERT_EQ(module.moduleAttributes.size(), 1u);
+  EXPECT_EQ(module.moduleAttributes[0].text, u"Attribute VB_Name = \"modPrincipal\"");
+  ASSERT_EQ(module.code.size(), 9u);
+  EXPECT_EQ(module.code[0].text, u"Option Explicit");
+  EXPECT_EQ(module.code[2].text,
+            QString::fromUtf8("' Ponto de entrada: abre a conexão e mostra a janela principal."));
+  EXPECT_EQ(module.code[8].text, u"End Sub");
+  EXPECT_TRUE(module.memberAttributes.empty());
+  EXPECT_EQ(moduleName(module), u"modPrincipal");
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("modPrincipal.bas"))), asText(bytes));
+}
+
+TEST(ModuleFileTest, ClassKeepsItsBeginBlockAndHidesMemberAttributes) {
+  const QByteArray bytes = windowsFile(kCollectionClass);
+  const ModuleSource module = parseModule(bytes, QStringLiteral("clsPedidos.cls"));
+  ASSERT_EQ(module.preamble.size(), 8u);
+  EXPECT_EQ(module.preamble.front().text, u"VERSION 1.0 CLASS");
+  EXPECT_EQ(module.preamble.back().text, u"END");
+  EXPECT_FALSE(module.form.has_value());
+  ASSERT_EQ(module.moduleAttributes.size(), 6u);
+  EXPECT_EQ(module.moduleAttributes[5].text, u"Attribute VB_Ext_KEY = \"SavedWithClassBuilder6\" ,\"Yes\"");
+
+  const std::vector<QString> code = texts(module.code);
+  ASSERT_EQ(code.size(), 13u);
+  EXPECT_EQ(code[0], u"Option Explicit");
+  EXPECT_EQ(code[3], u"Private WithEvents mRelogio As clsRelogio");
+  EXPECT_EQ(code[6], u"Public Property Get Item(ByVal Chave As Variant) As clsPedido");
+  EXPECT_EQ(code[7], u"    Set Item = mCol(Chave)");
+  EXPECT_EQ(code[10], u"Public Function NewEnum() As IUnknown");
+  EXPECT_EQ(code[11], u"    Set NewEnum = mCol.[_NewEnum]");
+
+  ASSERT_EQ(module.memberAttributes.size(), 5u);
+  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 4);
+  EXPECT_EQ(module.memberAttributes[0].line.text, u"Attribute mRelogio.VB_VarHelpID = -1");
+  EXPECT_EQ(module.memberAttributes[1].afterCodeLine, 7);
+  EXPECT_EQ(module.memberAttributes[1].line.text, u"Attribute Item.VB_UserMemId = 0");
+  EXPECT_EQ(module.memberAttributes[2].afterCodeLine, 7);
+  EXPECT_EQ(module.memberAttributes[3].afterCodeLine, 11);
+  EXPECT_EQ(module.memberAttributes[4].line.text, u"Attribute NewEnum.VB_MemberFlags = \"40\"");
+
+  EXPECT_EQ(moduleName(module), u"clsPedidos");
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("clsPedidos.cls"))), asText(bytes));
+}
+
+TEST(ModuleFileTest, FormHasObjectLinesAndADescription) {
+  const QByteArray bytes = windowsFile(kForm);
+  const ModuleSource module = parseModule(bytes, QStringLiteral("frmSobre.frm"));
+  EXPECT_EQ(texts(module.preamble),
+            (std::vector<QString>{
+                "VERSION 5.00", "Object = \"{831FDD16-0C5C-11D2-A9FC-0000F8754DA1}#2.0#0\"; \"MSCOMCTL.OCX\"",
+                "Object = \"{F9043C88-F6F2-101A-A3C9-08002B2F49FB}#1.2#0\"; \"COMDLG32.OCX\""}));
+  ASSERT_TRUE(module.form.has_value());
+  EXPECT_EQ(module.form->root().name(), u"frmSobre");
+  ASSERT_EQ(module.form->root().children().size(), 1u);
+  EXPECT_EQ(module.form->root().children()[0]->property(u"Caption"), QString::fromUtf8("\"Versão\""));
+  EXPECT_EQ(module.moduleAttributes.size(), 5u);
+  ASSERT_EQ(module.code.size(), 5u);
+  EXPECT_EQ(module.code[0].text, u"Option Explicit");
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(bytes));
+}
+
+TEST(ModuleFileTest, KeepsUnixAndMixedLineEndsAndAMissingFinalEnd) {
+  for (const QByteArray& bytes :
+       {QByteArray(
+            "Attribute VB_Name = \"m\"\nOption Explicit\nPublic Sub A()\nAttribute A.VB_Description = \"x\"\n"
+            "End Sub"),
+        QByteArray("VERSION 1.0 CLASS\r\nBEGIN\n  MultiUse = -1  'True\rEND\r\nAttribute VB_Name = \"c\"\n"),
+        QByteArray("Attribute VB_Name = \"m\"\r\nAttribute Foo.VB_UserMemId = 0")}) {
+    const ModuleSource module = parseModule(bytes, QStringLiteral("m.bas"));
+    EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))), asText(bytes));
+  }
+}
+
+TEST(ModuleFileTest, EmptyFileHasNoParts) {
+  const ModuleSource module = parseModule(QByteArrayView(), QStringLiteral("Module1.bas"));
+  EXPECT_TRUE(module.preamble.empty());
+  EXPECT_TRUE(module.moduleAttributes.empty());
+  EXPECT_TRUE(module.code.empty());
+  EXPECT_EQ(moduleName(module), u"");
+  EXPECT_TRUE(writeModule(module, QStringLiteral("Module1.bas")).isEmpty());
+}
+
+TEST(ModuleFileTest, AttributeWordsAreMatchedCaseInsensitivelyAndAsWholeWords) {
+  const QByteArray bytes = windowsFile(R"(attribute vb_name = "modX"
+Public Sub Total()
+  ATTRIBUTE Total.VB_Description = "soma"
+    Attributes = 1
+End Sub
+)");
+  const ModuleSource module = parseModule(bytes, QStringLiteral("modX.bas"));
+  ASSERT_EQ(module.moduleAttributes.size(), 1u);
+  EXPECT_EQ(moduleName(module), u"modX");
+  ASSERT_EQ(module.memberAttributes.size(), 1u);
+  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 1);
+  EXPECT_EQ(module.code.size(), 3u) << "\"Attributes = 1\" is code";
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("modX.bas"))), asText(bytes));
+}
+
+TEST(ModuleFileTest, ContinuedLinesAreNeverAttributes) {
+  const QByteArray bytes = windowsFile(R"(Attribute VB_Name = "modApi"
+Private Declare Function GetTickCount Lib "kernel32" _
+    Attribute _
+    () As Long
+' comentário que continua _
+Attribute na linha seguinte
+)");
+  const ModuleSource module = parseModule(bytes, QStringLiteral("modApi.bas"));
+  EXPECT_TRUE(module.memberAttributes.empty());
+  EXPECT_EQ(module.code.size(), 5u);
+}
+
+TEST(ModuleFileTest, HeaderAttributesOnlyStartTheFile) {
+  // A module attribute after the first code line is a member attribute like any other.
+  const ModuleSource module = parseModule(windowsFile(R"(Attribute VB_Name = "m"
+Option Explicit
+Attribute VB_Creatable = False
+)"),
+                                          QStringLiteral("m.bas"));
+  EXPECT_EQ(module.moduleAttributes.size(), 1u);
+  ASSERT_EQ(module.memberAttributes.size(), 1u);
+  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 1);
+}
+
+TEST(ModuleFileTest, AttributesBeforeTheFirstCodeLineStayThere) {
+  const QByteArray bytes =
+      windowsFile("Attribute VB_Name = \"m\"\nAttribute Foo.VB_UserMemId = 0\nOption Explicit\n");
+  const ModuleSource module = parseModule(bytes, QStringLiteral("m.bas"));
+  ASSERT_EQ(module.memberAttributes.size(), 1u);
+  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 0);
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))), asText(bytes));
+}
+
+// --- Writing after edits ---------------------------------------------------------------------------------
+
+TEST(ModuleFileTest, MemberAttributesFollowTheirCodeLineAfterEdits) {
+  const QByteArray bytes = windowsFile(kCollectionClass);
+  ModuleSource module = parseModule(bytes, QStringLiteral("clsPedidos.cls"));
+  // Insert a line above Item's header and move its attributes down with it, as an editor does.
+  module.code.insert(module.code.begin() + 5, SourceLine{QStringLiteral("' Atenção: base 1"), LineEnd::CRLF});
+  for (MemberAttributeLine& attribute : module.memberAttributes) {
+    if (attribute.afterCodeLine >= 6) ++attribute.afterCodeLine;
+  }
+  EXPECT_EQ(
+      asText(writeModule(module, QStringLiteral("clsPedidos.cls"))),
+      asText(replacedOnce(bytes, "' Item padrão da coleção", "' Atenção: base 1\n' Item padrão da coleção")));
+}
+
+TEST(ModuleFileTest, WritesAttributesAddedOutOfOrderAfterTheirLines) {
+  ModuleSource module = parseModule(
+      windowsFile("Attribute VB_Name = \"m\"\nPublic x\nPublic Sub A()\nEnd Sub\n"), QStringLiteral("m.bas"));
+  module.memberAttributes.push_back({2, {QStringLiteral("Attribute A.VB_UserMemId = 0"), LineEnd::CRLF}});
+  module.memberAttributes.push_back({1, {QStringLiteral("Attribute x.VB_VarUserMemId = 0"), LineEnd::CRLF}});
+  module.memberAttributes.push_back(
+      {9, {QStringLiteral("Attribute Z.VB_MemberFlags = \"40\""), LineEnd::CRLF}});
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))),
+            asText(windowsFile("Attribute VB_Name = \"m\"\nPublic x\nAttribute x.VB_VarUserMemId = 0\n"
+                               "Public Sub A()\nAttribute A.VB_UserMemId = 0\nEnd Sub\n"
+                               "Attribute Z.VB_MemberFlags = \"40\"\n")));
+}
+
+TEST(ModuleFileTest, ALastLineWithoutEndGetsOneWhenLinesFollowIt) {
+  ModuleSource module = parseModule("Attribute VB_Name = \"m\"\r\nOption Explicit", QStringLiteral("m.bas"));
+  module.code.push_back({QStringLiteral("Dim x"), LineEnd::None});
+  EXPECT_EQ(writeModule(module, QStringLiteral("m.bas")),
+            QByteArray("Attribute VB_Name = \"m\"\r\nOption Explicit\r\nDim x"));
+}
+
+TEST(ModuleFileTest, WritingNamesTheFileLineOfAnUnwritableCharacter) {
+  ModuleSource module = parseModule(windowsFile(kCollectionClass), QStringLiteral("clsPedidos.cls"));
+  module.code[7].text = QString::fromUtf16(u"    Set Item = mCol(\"\u4E2D\")");
+  const ide::Error error = expectError([&] { writeModule(module, QStringLiteral("clsPedidos.cls")); });
+  EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
+  // 8 preamble lines, 6 header attributes, 7 code lines and 3 member attributes come before it.
+  EXPECT_TRUE(error.description().startsWith(u"clsPedidos.cls, line 25: the character U+4E2D in column 22"))
+      << error.what();
+}
+
+// --- Names and header attributes -------------------------------------------------------------------------
+
+TEST(ModuleFileTest, RenamingAFormRewritesTheNameLineAndTheBeginLine) {
+  const QByteArray bytes = windowsFile(kForm);
+  ModuleSource module = parseModule(bytes, QStringLiteral("frmSobre.frm"));
+  setModuleName(module, QStringLiteral("frmCreditos"));
+  EXPECT_EQ(moduleName(module), u"frmCreditos");
+  QByteArray expected = replacedOnce(bytes, "Begin VB.Form frmSobre \n", "Begin VB.Form frmCreditos \n");
+  expected =
+      replacedOnce(expected, "Attribute VB_Name = \"frmSobre\"\n", "Attribute VB_Name = \"frmCreditos\"\n");
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmCreditos.frm"))), asText(expected));
+}
+
+TEST(ModuleFileTest, RenamingAClassRewritesOnlyTheNameLine) {
+  const QByteArray bytes = windowsFile(kCollectionClass);
+  ModuleSource module = parseModule(bytes, QStringLiteral("clsPedidos.cls"));
+  setModuleName(module, QStringLiteral("clsEncomendas"));
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("clsPedidos.cls"))),
+            asText(replacedOnce(bytes, "Attribute VB_Name = \"clsPedidos\"",
+                                "Attribute VB_Name = \"clsEncomendas\"")));
+}
+
+TEST(ModuleFileTest, RenamingAModuleWithoutNameLineAddsOne) {
+  ModuleSource module = parseModule("Option Explicit\nDim x\n", QStringLiteral("sem nome.bas"));
+  EXPECT_EQ(moduleName(module), u"");
+  setModuleName(module, QStringLiteral("modNovo"));
+  EXPECT_EQ(writeModule(module, QStringLiteral("modNovo.bas")),
+            QByteArray("Attribute VB_Name = \"modNovo\"\nOption Explicit\nDim x\n"));
+
+  ModuleSource classWithoutName = parseModule(
+      windowsFile("VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nEND\nAttribute VB_Exposed = False\n"),
+      QStringLiteral("c.cls"));
+  setModuleName(classWithoutName, QStringLiteral("clsNovo"));
+  EXPECT_EQ(asText(writeModule(classWithoutName, QStringLiteral("c.cls"))),
+            asText(windowsFile("VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nEND\n"
+                               "Attribute VB_Name = \"clsNovo\"\nAttribute VB_Exposed = False\n")));
+}
+
+TEST(ModuleFileTest, ReadsAndWritesHeaderAttributes) {
+  const QByteArray bytes = windowsFile(kForm);
+  ModuleSource module = parseModule(bytes, QStringLiteral("frmSobre.frm"));
+  EXPECT_EQ(moduleAttribute(module, u"VB_PredeclaredId"), u"True");
+  EXPECT_EQ(moduleAttribute(module, u"vb_name"), u"\"frmSobre\"");
+  EXPECT_FALSE(moduleAttribute(module, u"VB_Description").has_value());
+
+  setModuleAttribute(module, QStringLiteral("VB_Exposed"), QStringLiteral("False"));  // unchanged
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(bytes));
+
+  setModuleAttribute(module, QStringLiteral("VB_PredeclaredId"), QStringLiteral("False"));
+  setModuleAttribute(module, QStringLiteral("VB_Description"), QStringLiteral("\"Janela Sobre\""));
+  QByteArray expected =
+      replacedOnce(bytes, "Attribute VB_PredeclaredId = True\n", "Attribute VB_PredeclaredId = False\n");
+  expected = replacedOnce(expected, "Attribute VB_Exposed = False\n",
+                          "Attribute VB_Exposed = False\nAttribute VB_Description = \"Janela Sobre\"\n");
+  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(expected));
+}
+
+TEST(ModuleFileTest, NameWithQuotesIsQuotedAndUnquoted) {
+  ModuleSource module;
+  setModuleName(module, QStringLiteral("a\"b"));
+  EXPECT_EQ(module.moduleAttributes[0].text, u"Attribute VB_Name = \"a\"\"b\"");
+  EXPECT_EQ(moduleName(module), u"a\"b");
+}
+
+TEST(ModuleFileTest, CopiesOfAFormModuleAreIndependent) {
+  const ModuleSource module = parseModule(windowsFile(kForm), QStringLiteral("frmSobre.frm"));
+  ModuleSource copy = module;
+  setModuleName(copy, QStringLiteral("frmOutro"));
+  EXPECT_EQ(module.form->root().name(), u"frmSobre");
+  EXPECT_EQ(copy.form->root().name(), u"frmOutro");
+}
+
+// --- Errors ----------------------------------------------------------------------------------------------
+
+struct MalformedModule {
+  const char* fileName;
+  const char* text;
+  const char* description;
+};
+
+class ModuleFileErrorTest : public ::testing::TestWithParam<MalformedModule> {};
+
+TEST_P(ModuleFileErrorTest, NamesTheFileAndTheLine) {
+  const MalformedModule& sample = GetParam();
+  const QString fileName = QString::fromLatin1(sample.fileName);
+  const ide::Error error = expectError([&] { parseModule(windowsFile(sample.text), fileName); });
+  EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
+  EXPECT_EQ(error.description(), QString::fromUtf8(sample.description));
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Malformed, ModuleFileErrorTest,
+    ::testing::Values(
+        MalformedModule{"clsX.cls",
+                        "VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nAttribute VB_Name = \"clsX\"\n",
+                        "clsX.cls, line 2: BEGIN without END"},
+        MalformedModule{
+            "frmX.frm",
+            "VERSION 5.00\nObject = \"{0}#1.0#0\"; \"x.ocx\"\nBegin VB.Form frmX \n   Caption = \"x\"\n"
+            "Attribute VB_Name = \"frmX\"\n",
+            "frmX.frm, line 5: unexpected text in the form description: Attribute VB_Name = \"frmX\""},
+        MalformedModule{"frmX.frm", "VERSION 5.00\nBegin VB.Form frmX \n   Caption = \"x\"\n",
+                        "frmX.frm, line 2: Begin VB.Form frmX has no matching End"},
+        MalformedModule{"frmX.frm", "VERSION 5.00\nBegin VB.Form frmX \n   ação sem sentido\nEnd\n",
+                        "frmX.frm, line 3: unexpected text in the form description: ação sem sentido"},
+        MalformedModule{"ctlX.ctl", "VERSION 5.00\nBegin VB.UserControl ctlX \n   BeginProperty Font \nEnd\n",
+                        "ctlX.ctl, line 4: End where EndProperty was expected"}));
+
+TEST(ModuleFileErrorTest, PassesOnLineErrors) {
+  const ide::Error error = expectError(
+      [] { parseModule(QByteArray("Attribute VB_Name = \"m\"\r\nx\0y\r\n", 30), QStringLiteral("m.bas")); });
+  EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
+  EXPECT_EQ(error.description(), u"m.bas, line 2: not a text file");
+}
+
+}  // namespace
+}  // namespace host
