@@ -6,6 +6,7 @@
 #include "ide/error.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace host {
 namespace {
@@ -491,13 +492,17 @@ FormNode& FormNode::insertChild(std::unique_ptr<FormNode> child, int position) {
   return result;
 }
 
-FormNode* FormNode::findNode(QStringView name, int index) {
+const FormNode* FormNode::findNode(QStringView name, int index) const {
   if (this->name().compare(name, Qt::CaseInsensitive) == 0 && (index < 0 || this->index() == index))
     return this;
-  for (FormNode* child : m_children) {
-    if (FormNode* found = child->findNode(name, index)) return found;
+  for (const FormNode* child : m_children) {
+    if (const FormNode* found = child->findNode(name, index)) return found;
   }
   return nullptr;
+}
+
+FormNode* FormNode::findNode(QStringView name, int index) {
+  return const_cast<FormNode*>(std::as_const(*this).findNode(name, index));
 }
 
 void FormNode::appendLines(std::vector<SourceLine>& out) const {

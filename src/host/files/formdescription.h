@@ -160,6 +160,7 @@ class FormNode final : public PropertyGroup {
 
   /// The first node of this subtree (this one included) with the name, and the index unless it is -1.
   FormNode* findNode(QStringView name, int index = -1);
+  const FormNode* findNode(QStringView name, int index = -1) const;
 
   void appendLines(std::vector<SourceLine>& out) const;
 
