@@ -1,0 +1,707 @@
+// SPDX-License-Identifier: MIT
+#include "host/code/codetext.h"
+
+#include "host/code/findmatcher.h"
+#include "ide/error.h"
+
+#include <QHash>
+#include <QSet>
+
+#include <algorithm>
+
+namespace host {
+namespace {
+
+/// Splits text at CRLF, CR or LF; a trailing line end yields a last, empty line, as the IDE inserts it.
+std::vector<QStringView> splitLines(QStringView text) {
+  std::vector<QStringView> parts;
+  qsizetype start = 0;
+  for (qsizetype i = 0; i < text.size(); ++i) {
+    const QChar c = text[i];
+    if (c != u'\r' && c != u'\n') continue;
+    parts.push_back(text.sliced(start, i - start));
+    if (c == u'\r' && i + 1 < text.size() && text[i + 1] == u'\n') ++i;
+    start = i + 1;
+  }
+  parts.push_back(text.sliced(start));
+  return parts;
+}
+
+void checkLength(QStringView line) {
+  if (line.size() > kMaxLineLength) ide::raise(ide::err::LineTooLong);
+}
+
+QString nameKey(QStringView name, ide::ProcKind kind) {
+  QString key = name.toString().toCaseFolded();
+  key.append(QChar(u'0' + static_cast<int>(kind)));
+  return key;
+}
+
+/// "Attribute Owner.VB_Name = value": the owner and the attribute name (empty when not of that form).
+struct AttributeParts {
+  qsizetype ownerStart = -1;
+  QStringView owner;
+  QStringView attribute;
+  QStringView value;
+};
+
+AttributeParts splitAttribute(QStringView text) {
+  AttributeParts parts;
+  qsizetype i = 0;
+  while (i < text.size() && (text[i] == u' ' || text[i] == u'\t'))
+    ++i;
+  constexpr QLatin1StringView kWord("Attribute");
+  if (!text.sliced(i).startsWith(kWord, Qt::CaseInsensitive)) return parts;
+  i += kWord.size();
+  while (i < text.size() && (text[i] == u' ' || text[i] == u'\t'))
+    ++i;
+  const qsizetype dot = text.indexOf(u'.', i);
+  const qsizetype equals = text.indexOf(u'=', i);
+  if (dot < 0 || (equals >= 0 && equals < dot)) return parts;
+  parts.ownerStart = i;
+  parts.owner = text.sliced(i, dot - i).trimmed();
+  const qsizetype attributeEnd = equals < 0 ? text.size() : equals;
+  parts.attribute = text.sliced(dot + 1, attributeEnd - dot - 1).trimmed();
+  if (equals >= 0) parts.value = text.sliced(equals + 1).trimmed();
+  return parts;
+}
+
+bool sameName(QStringView a, QStringView b) {
+  return a.compare(b, Qt::CaseInsensitive) == 0;
+}
+
+}  // namespace
+
+struct CodeText::Index {
+  std::vector<ProcInfo> procs;
+  QHash<QString, size_t> byName;  // folded name + kind digit -> procs index
+  int declarationLines = 0;
+
+  bool membersValid = false;
+  std::vector<MemberInfo> members;
+  /// Declare statements: listed as methods and answered by the procedure queries.
+  std::vector<ProcInfo> declares;
+};
+
+CodeText::CodeText() : m_index(std::make_unique<Index>()) {}
+CodeText::~CodeText() = default;
+
+// ---------------------------------------------------------------------------------------------------
+// Loading and storing
+
+CodeText::Line CodeText::makeLine(QStringView text, bool isContinuation, LineEnd end) const {
+  Line line;
+  line.text = text.toString();
+  line.end = end;
+  line.cls = isContinuation ? LineClass::Continuation : classifyStatement(text);
+  line.continues = continuesOnNextLine(text);
+  return line;
+}
+
+void CodeText::load(std::vector<SourceLine> code, std::vector<MemberAttributeLine> attributes) {
+  const int removed = countOfLines();
+  m_lines.clear();
+  m_lines.reserve(code.size());
+  m_markers.clear();
+  m_orphanAttributes.clear();
+  bool continuation = false;
+  for (SourceLine& source : code) {
+    Line line;
+    line.cls = continuation ? LineClass::Continuation : classifyStatement(source.text);
+    line.continues = continuesOnNextLine(source.text);
+    line.text = std::move(source.text);
+    line.end = source.end;
+    continuation = line.continues;
+    if (isStructural(line.cls)) m_markers.push_back(static_cast<int>(m_lines.size()) + 1);
+    m_lines.push_back(std::move(line));
+  }
+  for (MemberAttributeLine& attribute : attributes) {
+    if (attribute.afterCodeLine < 1 || attribute.afterCodeLine > countOfLines()) {
+      m_orphanAttributes.push_back(std::move(attribute.line));
+      continue;
+    }
+    auto& slot = m_lines[static_cast<size_t>(attribute.afterCodeLine - 1)].attributes;
+    if (!slot) slot = std::make_unique<std::vector<SourceLine>>();
+    slot->push_back(std::move(attribute.line));
+  }
+  touch(1, removed, countOfLines(), true);
+}
+
+void CodeText::store(std::vector<SourceLine>& code, std::vector<MemberAttributeLine>& attributes) {
+  code.clear();
+  attributes.clear();
+  code.reserve(m_lines.size());
+
+  // Attributes of deleted lines go back to a member of their owner's name, unless it has one already.
+  std::vector<std::pair<int, SourceLine>> rehomed;
+  QSet<QString> taken;
+  for (const SourceLine& orphan : m_orphanAttributes) {
+    const AttributeParts parts = splitAttribute(orphan.text);
+    if (parts.owner.isEmpty()) continue;
+    Line* attachedTo = nullptr;
+    findMemberAttribute(parts.owner, parts.attribute, &attachedTo);
+    const QString key = (parts.owner.toString() + u'.' + parts.attribute.toString()).toCaseFolded();
+    if (attachedTo || taken.contains(key)) continue;
+    if (const int anchor = memberAnchorLine(parts.owner)) {
+      rehomed.emplace_back(anchor, orphan);
+      taken.insert(key);
+    }
+  }
+
+  for (int n = 1; n <= countOfLines(); ++n) {
+    const Line& line = m_lines[static_cast<size_t>(n - 1)];
+    code.push_back(SourceLine{line.text, line.end});
+    if (!line.attributes) continue;
+    // The owner of a header's attributes is the procedure it declares now (it may have been renamed).
+    std::optional<ProcHeader> header;
+    if (line.cls == LineClass::ProcHeader || line.cls == LineClass::Continuation) {
+      int start = n;
+      while (start > 1 && m_lines[static_cast<size_t>(start - 1)].cls == LineClass::Continuation)
+        --start;
+      if (m_lines[static_cast<size_t>(start - 1)].cls == LineClass::ProcHeader)
+        header = parseProcHeader(statementText(start, statementEnd(start)));
+    }
+    for (const SourceLine& attribute : *line.attributes) {
+      SourceLine out = attribute;
+      const AttributeParts parts = splitAttribute(attribute.text);
+      if (header && !parts.owner.isEmpty() && !sameName(parts.owner, header->name)) {
+        out.text = attribute.text.left(parts.ownerStart) + header->name +
+                   attribute.text.sliced(parts.ownerStart + parts.owner.size());
+      }
+      attributes.push_back(MemberAttributeLine{n, std::move(out)});
+    }
+  }
+  for (auto& [anchor, line] : rehomed)
+    attributes.push_back(MemberAttributeLine{anchor, std::move(line)});
+  std::stable_sort(attributes.begin(), attributes.end(),
+                   [](const MemberAttributeLine& a, const MemberAttributeLine& b) {
+                     return a.afterCodeLine < b.afterCodeLine;
+                   });
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Reading
+
+void CodeText::checkLineNumber(int line, int last) const {
+  if (line < 1 || line > last) ide::raise(ide::err::SubscriptOutOfRange);
+}
+
+QString CodeText::lines(int startLine, int count) const {
+  if (count < 0) ide::raise(ide::err::InvalidProcedureCall);
+  if (startLine < 1) ide::raise(ide::err::SubscriptOutOfRange);
+  if (count == 0 || startLine > countOfLines()) return {};
+  const int last = std::min(countOfLines(), startLine + count - 1);
+  if (startLine == last) return line(startLine);
+  QString joined;
+  for (int n = startLine; n <= last; ++n) {
+    if (n > startLine) joined += QLatin1StringView("\r\n");
+    joined += line(n);
+  }
+  return joined;
+}
+
+int CodeText::statementEnd(int firstLine) const {
+  int last = firstLine;
+  while (last < countOfLines() && m_lines[static_cast<size_t>(last - 1)].continues)
+    ++last;
+  return last;
+}
+
+QString CodeText::statementText(int firstLine, int lastLine) const {
+  if (firstLine == lastLine) return line(firstLine);
+  std::vector<QStringView> parts;
+  for (int n = firstLine; n <= lastLine; ++n)
+    parts.push_back(line(n));
+  return joinContinuedLines(parts);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// The index
+
+CodeText::Index& CodeText::index() {
+  if (!m_indexValid) rebuildIndex();
+  return *m_index;
+}
+
+void CodeText::rebuildIndex() {
+  Index& index = *m_index;
+  index.procs.clear();
+  index.byName.clear();
+  index.membersValid = false;
+  index.members.clear();
+  index.declares.clear();
+
+  ProcInfo* open = nullptr;
+  for (const int marker : m_markers) {
+    const Line& line = m_lines[static_cast<size_t>(marker - 1)];
+    if (line.cls == LineClass::ProcHeader) {
+      const int headerEnd = statementEnd(marker);
+      auto header = parseProcHeader(statementText(marker, headerEnd));
+      if (!header) continue;
+      if (open) open->endLine = marker - 1;  // a header without its End line runs up to the next header
+      ProcInfo& proc = index.procs.emplace_back();
+      proc.name = std::move(header->name);
+      proc.kind = header->kind;
+      proc.isFunction = header->isFunction;
+      proc.scope = header->scope;
+      proc.isStatic = header->isStatic;
+      proc.bodyLine = marker;
+      proc.headerEnd = headerEnd;
+      open = &proc;
+    } else if (open) {  // an End line; one with no header above it closes nothing
+      open->endLine = marker;
+      open = nullptr;
+    }
+  }
+  if (open) open->endLine = countOfLines();
+
+  for (size_t i = 0; i < index.procs.size(); ++i) {
+    const QString key = nameKey(index.procs[i].name, index.procs[i].kind);
+    if (!index.byName.contains(key)) index.byName.insert(key, i);  // a duplicate answers with the first
+  }
+
+  m_firstHeaderLine = index.procs.empty() ? 0 : index.procs.front().bodyLine;
+  if (m_firstHeaderLine > 0) {
+    // Blank and comment lines right above the first header belong to it; a continued comment too.
+    int n = m_firstHeaderLine - 1;
+    while (n > 0) {
+      int start = n;
+      while (start > 1 && m_lines[static_cast<size_t>(start - 1)].cls == LineClass::Continuation)
+        --start;
+      if (!isBlankOrComment(m_lines[static_cast<size_t>(start - 1)].cls)) break;
+      n = start - 1;
+    }
+    index.declarationLines = n;
+  } else {
+    int n = countOfLines();
+    while (n > 0 && m_lines[static_cast<size_t>(n - 1)].cls == LineClass::Blank)
+      --n;
+    index.declarationLines = n;
+  }
+  m_indexValid = true;
+}
+
+int CodeText::countOfDeclarationLines() {
+  return index().declarationLines;
+}
+
+const std::vector<ProcInfo>& CodeText::procedures() {
+  return index().procs;
+}
+
+const ProcInfo* CodeText::findProc(QStringView name, ide::ProcKind kind) {
+  Index& idx = index();
+  const auto found = idx.byName.constFind(nameKey(name.trimmed(), kind));
+  if (found != idx.byName.cend()) return &idx.procs[*found];
+  if (kind == ide::ProcKind::Proc) {
+    members();  // also collects the Declare statements
+    for (const ProcInfo& declare : idx.declares)
+      if (sameName(declare.name, name.trimmed())) return &declare;
+  }
+  return nullptr;
+}
+
+namespace {
+[[noreturn]] void raiseNotDefined() {
+  ide::raise(ide::err::SubOrFunctionNotDefined);
+}
+}  // namespace
+
+bool CodeText::isDeclare(const ProcInfo* proc) const {
+  const auto& procs = m_index->procs;
+  return proc < procs.data() || proc >= procs.data() + procs.size();
+}
+
+int CodeText::procStartLine(QStringView name, ide::ProcKind kind) {
+  const ProcInfo* proc = findProc(name, kind);
+  if (!proc) raiseNotDefined();
+  // A Declare statement starts where it stands: it sits in the declarations, not between procedures.
+  if (isDeclare(proc)) return proc->bodyLine;
+  const Index& idx = *m_index;
+  const size_t i = static_cast<size_t>(proc - idx.procs.data());
+  return i == 0 ? idx.declarationLines + 1 : idx.procs[i - 1].endLine + 1;
+}
+
+int CodeText::procBodyLine(QStringView name, ide::ProcKind kind) {
+  const ProcInfo* proc = findProc(name, kind);
+  if (!proc) raiseNotDefined();
+  return proc->bodyLine;
+}
+
+int CodeText::procCountLines(QStringView name, ide::ProcKind kind) {
+  const ProcInfo* proc = findProc(name, kind);
+  if (!proc) raiseNotDefined();
+  if (isDeclare(proc)) return proc->headerEnd - proc->bodyLine + 1;
+  const Index& idx = *m_index;
+  const size_t i = static_cast<size_t>(proc - idx.procs.data());
+  const int start = procStartLine(name, kind);
+  const int end = i + 1 == idx.procs.size() ? countOfLines() : proc->endLine;
+  return end - start + 1;
+}
+
+QString CodeText::procOfLine(int line, ide::ProcKind& kind) {
+  checkLineNumber(line, countOfLines());
+  const Index& idx = index();
+  kind = ide::ProcKind::Proc;
+  if (idx.procs.empty() || line <= idx.declarationLines) return {};
+  // The owner is the first procedure whose End line is at or below the line; the last one owns the rest.
+  auto it = std::lower_bound(idx.procs.begin(), idx.procs.end(), line,
+                             [](const ProcInfo& proc, int value) { return proc.endLine < value; });
+  if (it == idx.procs.end()) it = std::prev(idx.procs.end());
+  kind = it->kind;
+  return it->name;
+}
+
+const std::vector<MemberInfo>& CodeText::members() {
+  Index& idx = index();
+  if (idx.membersValid) return idx.members;
+  idx.members.clear();
+  idx.declares.clear();
+  QHash<QString, size_t> seen;  // folded name -> members index
+  auto add = [&](MemberInfo info) {
+    const QString key = info.name.toCaseFolded();
+    if (seen.contains(key)) return;
+    seen.insert(key, idx.members.size());
+    idx.members.push_back(std::move(info));
+  };
+
+  const int declarationsEnd = m_firstHeaderLine > 0 ? m_firstHeaderLine - 1 : countOfLines();
+  int blockDepth = 0;  // inside Type or Enum: the lines are fields, not members
+  for (int n = 1; n <= declarationsEnd; ++n) {
+    const LineClass cls = m_lines[static_cast<size_t>(n - 1)].cls;
+    switch (cls) {
+      case LineClass::TypeBegin:
+      case LineClass::EnumBegin:
+        ++blockDepth;
+        break;
+      case LineClass::TypeEnd:
+      case LineClass::EnumEnd:
+        blockDepth = std::max(0, blockDepth - 1);
+        break;
+      case LineClass::Variable:
+      case LineClass::Const:
+      case LineClass::Event:
+      case LineClass::Declare: {
+        if (blockDepth > 0) break;
+        const int last = statementEnd(n);
+        const auto decl = parseDeclaration(statementText(n, last));
+        if (!decl) break;
+        for (const QString& name : decl->names) {
+          add(MemberInfo{name, decl->type, decl->scope, decl->isStatic, n});
+          if (cls == LineClass::Declare) {
+            ProcInfo declare;
+            declare.name = name;
+            declare.scope = decl->scope;
+            declare.bodyLine = n;
+            declare.headerEnd = last;
+            declare.endLine = last;
+            idx.declares.push_back(std::move(declare));
+          }
+        }
+        break;
+      }
+      default:
+        break;
+    }
+  }
+  for (size_t i = 0; i < idx.procs.size(); ++i) {
+    const ProcInfo& proc = idx.procs[i];
+    const int start = i == 0 ? idx.declarationLines + 1 : idx.procs[i - 1].endLine + 1;
+    add(MemberInfo{proc.name,
+                   proc.kind == ide::ProcKind::Proc ? ide::MemberType::Method : ide::MemberType::Property,
+                   proc.scope, proc.isStatic, start});
+  }
+  idx.membersValid = true;
+  return idx.members;
+}
+
+std::optional<MemberInfo> CodeText::member(QStringView name) {
+  for (const MemberInfo& info : members())
+    if (sameName(info.name, name)) return info;
+  return std::nullopt;
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Member attributes
+
+std::vector<std::pair<int, int>> CodeText::memberLineRanges(QStringView member) {
+  std::vector<std::pair<int, int>> ranges;
+  const auto info = this->member(member);
+  if (!info) return ranges;
+  if (info->type == ide::MemberType::Property || info->type == ide::MemberType::Method) {
+    const auto kinds = info->type == ide::MemberType::Property
+                           ? std::vector{ide::ProcKind::Get, ide::ProcKind::Let, ide::ProcKind::Set}
+                           : std::vector{ide::ProcKind::Proc};
+    for (const ide::ProcKind kind : kinds)
+      if (const ProcInfo* proc = findProc(member, kind)) ranges.emplace_back(proc->bodyLine, proc->headerEnd);
+  } else {
+    ranges.emplace_back(info->line, statementEnd(info->line));
+  }
+  return ranges;
+}
+
+int CodeText::memberAnchorLine(QStringView member) {
+  const auto ranges = memberLineRanges(member);
+  return ranges.empty() ? 0 : ranges.front().second;
+}
+
+SourceLine* CodeText::findMemberAttribute(QStringView member, QStringView attribute, Line** owner) {
+  auto matches = [&](const SourceLine& line) {
+    const AttributeParts parts = splitAttribute(line.text);
+    return sameName(parts.owner, member) && sameName(parts.attribute, attribute);
+  };
+  // A member's attributes follow the lines of its declaration (any accessor of a property).
+  for (const auto& [first, last] : memberLineRanges(member)) {
+    for (int n = first; n <= last; ++n) {
+      Line& line = m_lines[static_cast<size_t>(n - 1)];
+      if (!line.attributes) continue;
+      for (SourceLine& attributeLine : *line.attributes) {
+        if (!matches(attributeLine)) continue;
+        if (owner) *owner = &line;
+        return &attributeLine;
+      }
+    }
+  }
+  for (SourceLine& orphan : m_orphanAttributes) {
+    if (!matches(orphan)) continue;
+    if (owner) *owner = nullptr;
+    return &orphan;
+  }
+  return nullptr;
+}
+
+std::optional<QString> CodeText::memberAttribute(QStringView member, QStringView attribute) {
+  const SourceLine* line = findMemberAttribute(member, attribute, nullptr);
+  if (!line) return std::nullopt;
+  return splitAttribute(line->text).value.toString();
+}
+
+void CodeText::setMemberAttribute(QStringView member, QStringView attribute,
+                                  const std::optional<QString>& valueText) {
+  Line* owner = nullptr;
+  if (SourceLine* existing = findMemberAttribute(member, attribute, &owner)) {
+    if (valueText) {
+      const AttributeParts parts = splitAttribute(existing->text);
+      const qsizetype valueStart =
+          parts.value.isNull() ? existing->text.size() : parts.value.data() - existing->text.constData();
+      existing->text = existing->text.left(valueStart) + *valueText;
+    } else if (owner) {
+      std::erase_if(*owner->attributes, [existing](const SourceLine& l) { return &l == existing; });
+    } else {
+      std::erase_if(m_orphanAttributes, [existing](const SourceLine& l) { return &l == existing; });
+    }
+    ++m_changeCount;
+    return;
+  }
+  if (!valueText) return;
+  const int anchor = memberAnchorLine(member);
+  if (anchor == 0) ide::raise(ide::err::SubscriptOutOfRange);
+  const auto info = this->member(member);
+  auto& slot = m_lines[static_cast<size_t>(anchor - 1)].attributes;
+  if (!slot) slot = std::make_unique<std::vector<SourceLine>>();
+  slot->push_back(SourceLine{QStringLiteral("Attribute %1.%2 = %3").arg(info->name, attribute, *valueText),
+                             newLineEnd()});
+  ++m_changeCount;
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Editing
+
+LineEnd CodeText::newLineEnd() const {
+  for (const Line& line : m_lines)
+    if (line.end != LineEnd::None) return line.end;
+  return LineEnd::CRLF;
+}
+
+void CodeText::shiftMarkers(int fromLine, int delta) {
+  auto it = std::lower_bound(m_markers.begin(), m_markers.end(), fromLine);
+  for (; it != m_markers.end(); ++it)
+    *it += delta;
+}
+
+void CodeText::updateMarker(int lineNumber, bool wasStructural, bool isNowStructural) {
+  if (wasStructural == isNowStructural) return;
+  const auto it = std::lower_bound(m_markers.begin(), m_markers.end(), lineNumber);
+  if (isNowStructural)
+    m_markers.insert(it, lineNumber);
+  else if (it != m_markers.end() && *it == lineNumber)
+    m_markers.erase(it);
+}
+
+void CodeText::insertMarkers(int firstLine, int count) {
+  for (int n = firstLine; n < firstLine + count; ++n)
+    updateMarker(n, false, isStructural(m_lines[static_cast<size_t>(n - 1)].cls));
+}
+
+/// Re-reads one line whose predecessor changed: it may have started or stopped being a continuation.
+void CodeText::reclassifyFrom(size_t index) {
+  if (index >= m_lines.size()) return;
+  Line& line = m_lines[index];
+  const bool continuation = index > 0 && m_lines[index - 1].continues;
+  const LineClass cls = continuation ? LineClass::Continuation : classifyStatement(line.text);
+  if (cls == line.cls) return;
+  updateMarker(static_cast<int>(index) + 1, isStructural(line.cls), isStructural(cls));
+  line.cls = cls;
+}
+
+void CodeText::touch(int firstLine, int removed, int inserted, bool structural) {
+  ++m_changeCount;
+  if (structural || removed != inserted ||
+      (m_indexValid && (m_firstHeaderLine == 0 || firstLine <= m_firstHeaderLine)))
+    m_indexValid = false;
+  for (Listener* listener : std::vector<Listener*>(m_listeners))
+    listener->linesChanged(firstLine, removed, inserted);
+}
+
+void CodeText::replaceLine(int line, QStringView text) {
+  checkLineNumber(line, countOfLines());
+  const auto parts = splitLines(text);
+  for (const QStringView part : parts)
+    checkLength(part);
+  const size_t i = static_cast<size_t>(line - 1);
+  Line& target = m_lines[i];
+  const bool continuation = i > 0 && m_lines[i - 1].continues;
+
+  if (parts.size() == 1) {
+    const LineClass cls = continuation ? LineClass::Continuation : classifyStatement(text);
+    const bool continues = continuesOnNextLine(text);
+    bool structural = isStructural(cls) || isStructural(target.cls) || continues != target.continues;
+    if (!structural && cls == LineClass::Continuation) {
+      // A header's continuation line carries part of the header (its name, or its own continuation).
+      int start = line;
+      while (start > 1 && m_lines[static_cast<size_t>(start - 1)].cls == LineClass::Continuation)
+        --start;
+      structural = m_lines[static_cast<size_t>(start - 1)].cls == LineClass::ProcHeader;
+    }
+    updateMarker(line, isStructural(target.cls), isStructural(cls));
+    target.text = text.toString();
+    target.cls = cls;
+    if (continues != target.continues) {
+      target.continues = continues;
+      reclassifyFrom(i + 1);
+    }
+    touch(line, 1, 1, structural);
+    return;
+  }
+
+  // Several lines: the first replaces the line (which keeps its hidden attributes), the rest follow it.
+  const LineEnd end = target.end == LineEnd::None ? newLineEnd() : target.end;
+  const LineEnd lastEnd = target.end;
+  updateMarker(line, isStructural(target.cls), false);
+  target.text = parts.front().toString();
+  target.continues = continuesOnNextLine(target.text);
+  target.cls = continuation ? LineClass::Continuation : classifyStatement(target.text);
+  target.end = end;
+  const bool targetStructural = isStructural(target.cls);
+  std::vector<Line> added;
+  added.reserve(parts.size() - 1);
+  bool previousContinues = target.continues;
+  for (size_t k = 1; k < parts.size(); ++k) {
+    added.push_back(makeLine(parts[k], previousContinues, k + 1 == parts.size() ? lastEnd : end));
+    previousContinues = added.back().continues;
+  }
+  const int count = static_cast<int>(added.size());
+  shiftMarkers(line + 1, count);
+  m_lines.insert(m_lines.begin() + static_cast<std::ptrdiff_t>(i + 1), std::make_move_iterator(added.begin()),
+                 std::make_move_iterator(added.end()));
+  updateMarker(line, false, targetStructural);  // `target` may have moved with the insertion
+  insertMarkers(line + 1, count);
+  reclassifyFrom(i + 1 + added.size());
+  touch(line, 1, count + 1, true);
+}
+
+void CodeText::insertLines(int line, QStringView text) {
+  checkLineNumber(line, countOfLines() + 1);
+  const auto parts = splitLines(text);
+  for (const QStringView part : parts)
+    checkLength(part);
+  const size_t at = static_cast<size_t>(line - 1);
+  const LineEnd end = newLineEnd();
+  const bool appendingAfterUnterminated =
+      at == m_lines.size() && at > 0 && m_lines[at - 1].end == LineEnd::None;
+
+  std::vector<Line> added;
+  added.reserve(parts.size());
+  bool previousContinues = at > 0 && m_lines[at - 1].continues;
+  for (const QStringView part : parts) {
+    added.push_back(makeLine(part, previousContinues, end));
+    previousContinues = added.back().continues;
+  }
+  if (appendingAfterUnterminated) {
+    // The file ended without a line end: it still does, after the new last line.
+    m_lines[at - 1].end = end;
+    added.back().end = LineEnd::None;
+  }
+  const int count = static_cast<int>(added.size());
+  shiftMarkers(line, count);
+  m_lines.insert(m_lines.begin() + static_cast<std::ptrdiff_t>(at), std::make_move_iterator(added.begin()),
+                 std::make_move_iterator(added.end()));
+  insertMarkers(line, count);
+  reclassifyFrom(at + static_cast<size_t>(count));
+  touch(line, 0, count, true);
+}
+
+void CodeText::addFromString(QStringView text) {
+  insertLines(countOfLines() + 1, text);
+}
+
+void CodeText::deleteLines(int startLine, int count) {
+  if (count < 0) ide::raise(ide::err::InvalidProcedureCall);
+  if (count == 0) return;
+  checkLineNumber(startLine, countOfLines());
+  checkLineNumber(startLine + count - 1, countOfLines());
+  const auto first = m_lines.begin() + static_cast<std::ptrdiff_t>(startLine - 1);
+  const auto last = first + count;
+  const bool removesLast = last == m_lines.end();
+  const LineEnd lastEnd = std::prev(last)->end;
+  for (auto it = first; it != last; ++it) {
+    if (!it->attributes) continue;
+    for (SourceLine& attribute : *it->attributes)
+      m_orphanAttributes.push_back(std::move(attribute));
+  }
+  m_lines.erase(first, last);
+  if (removesLast && !m_lines.empty() && lastEnd == LineEnd::None) m_lines.back().end = LineEnd::None;
+
+  const auto low = std::lower_bound(m_markers.begin(), m_markers.end(), startLine);
+  const auto high = std::lower_bound(low, m_markers.end(), startLine + count);
+  m_markers.erase(low, high);
+  shiftMarkers(startLine + count, -count);
+  reclassifyFrom(static_cast<size_t>(startLine - 1));
+  touch(startLine, count, 0, true);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Find
+
+bool CodeText::find(QStringView target, int& startLine, int& startColumn, int& endLine, int& endColumn,
+                    bool wholeWord, bool matchCase, bool patternSearch) const {
+  // The IDE refuses the two options together.
+  if (matchCase && patternSearch) ide::raise(ide::err::InvalidProcedureCall);
+  if (startLine < 1 || startColumn < 1) ide::raise(ide::err::InvalidProcedureCall);
+  const int count = countOfLines();
+  const int lastLine = (endLine == -1 || endLine > count) ? count : endLine;
+  if (target.isEmpty() || startLine > lastLine) return false;
+  const FindMatcher matcher(target, wholeWord, matchCase, patternSearch);
+  for (int n = startLine; n <= lastLine; ++n) {
+    const QString& text = line(n);
+    const qsizetype from = n == startLine ? startColumn - 1 : 0;
+    // The end column is the last column a match may occupy.
+    const qsizetype limit = (n == lastLine && endLine != -1 && endColumn != -1) ? endColumn : text.size();
+    if (const auto match = matcher.findIn(text, from, limit)) {
+      startLine = endLine = n;
+      startColumn = static_cast<int>(match->first) + 1;
+      endColumn = static_cast<int>(match->second) + 1;
+      return true;
+    }
+  }
+  return false;
+}
+
+void CodeText::addListener(Listener* listener) {
+  m_listeners.push_back(listener);
+}
+void CodeText::removeListener(Listener* listener) {
+  std::erase(m_listeners, listener);
+}
+
+}  // namespace host

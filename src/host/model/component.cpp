@@ -1,0 +1,288 @@
+// SPDX-License-Identifier: MIT
+// Components: their files, names, code modules, designers and windows.
+#include "host/files/ansi.h"
+#include "host/files/fileio.h"
+#include "host/model/designer.h"
+#include "host/model/events.h"
+#include "host/model/objects.h"
+#include "host/model/vbe.h"
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+
+namespace host {
+namespace {
+
+bool hasModuleText(ide::ComponentType type) {
+  return type != ide::ComponentType::ResFile && type != ide::ComponentType::RelatedDocument;
+}
+
+/// The text of a new component, as the IDE writes a fresh one.
+QString newComponentText(ide::ComponentType type, const QString& name) {
+  switch (type) {
+    case ide::ComponentType::ClassModule:
+      return QStringLiteral(
+                 "VERSION 1.0 CLASS\r\nBEGIN\r\n  MultiUse = -1  'True\r\n  Persistable = 0  "
+                 "'NotPersistable\r\n"
+                 "  DataBindingBehavior = 0  'vbNone\r\n  DataSourceBehavior  = 0  'vbNone\r\n"
+                 "  MTSTransactionMode  = 0  'NotAnMTSObject\r\nEND\r\nAttribute VB_Name = \"%1\"\r\n"
+                 "Attribute VB_GlobalNameSpace = False\r\nAttribute VB_Creatable = True\r\n"
+                 "Attribute VB_PredeclaredId = False\r\nAttribute VB_Exposed = False\r\n")
+          .arg(name);
+    case ide::ComponentType::VBForm:
+    case ide::ComponentType::VBMDIForm: {
+      const bool mdi = type == ide::ComponentType::VBMDIForm;
+      return QStringLiteral(
+                 "VERSION 5.00\r\nBegin VB.%2 %1 \r\n   Caption         =   \"%1\"\r\n   ClientHeight    =   "
+                 "3090\r\n"
+                 "   ClientLeft      =   60\r\n   ClientTop       =   450\r\n   ClientWidth     =   4680\r\n"
+                 "   LinkTopic       =   \"%1\"\r\n   ScaleHeight     =   3090\r\n   ScaleWidth      =   "
+                 "4680\r\n"
+                 "   StartUpPosition =   3  'Windows Default\r\nEnd\r\nAttribute VB_Name = \"%1\"\r\n"
+                 "Attribute VB_GlobalNameSpace = False\r\nAttribute VB_Creatable = False\r\n"
+                 "Attribute VB_PredeclaredId = True\r\nAttribute VB_Exposed = False\r\n")
+          .arg(name, mdi ? QStringLiteral("MDIForm") : QStringLiteral("Form"));
+    }
+    default:
+      return QStringLiteral("Attribute VB_Name = \"%1\"\r\n").arg(name);
+  }
+}
+
+ide::FileType fileTypeOf(ide::ComponentType type) {
+  switch (type) {
+    case ide::ComponentType::VBForm:
+    case ide::ComponentType::VBMDIForm:
+      return ide::FileType::Form;
+    case ide::ComponentType::ClassModule:
+      return ide::FileType::Class;
+    case ide::ComponentType::UserControl:
+      return ide::FileType::UserControl;
+    case ide::ComponentType::PropPage:
+      return ide::FileType::PropertyPage;
+    case ide::ComponentType::DocObject:
+      return ide::FileType::DocObject;
+    case ide::ComponentType::ResFile:
+      return ide::FileType::Res;
+    case ide::ComponentType::ActiveXDesigner:
+    case ide::ComponentType::MSForm:
+      return ide::FileType::Designers;
+    case ide::ComponentType::RelatedDocument:
+      return ide::FileType::Binary;
+    default:
+      return ide::FileType::Module;
+  }
+}
+
+}  // namespace
+
+ComponentImpl::ComponentImpl(const std::shared_ptr<ProjectImpl>& project, ide::ComponentType type,
+                             QString filePath)
+    : m_project(project), m_type(type), m_filePath(std::move(filePath)) {}
+
+ComponentImpl::~ComponentImpl() = default;
+
+void ComponentImpl::load() {
+  if (!hasModuleText(m_type)) {
+    if (!QFileInfo::exists(m_filePath))
+      ide::raise(ide::err::FileNotFound, QStringLiteral("File not found: %1").arg(m_filePath));
+    m_name = QFileInfo(m_filePath).fileName();
+    return;
+  }
+  adopt(parseModule(readFileBytes(m_filePath), m_filePath));
+  if (m_name.isEmpty()) m_name = QFileInfo(m_filePath).completeBaseName();
+  m_changed = false;
+}
+
+void ComponentImpl::create(const QString& name) {
+  const auto bytes = encodeAnsi(newComponentText(m_type, name));
+  if (!bytes) ide::raise(ide::err::InvalidName);
+  adopt(parseModule(*bytes, name));
+  m_changed = true;
+}
+
+void ComponentImpl::adopt(ModuleSource source) {
+  m_source = std::move(source);
+  m_name = moduleName(m_source);
+  if (m_source.form &&
+      m_source.form->root().className().compare(QLatin1StringView("VB.MDIForm"), Qt::CaseInsensitive) == 0)
+    m_type = ide::ComponentType::VBMDIForm;
+  auto self = shared_from_this();
+  m_module = std::make_shared<CodeModuleImpl>(self);
+  m_module->text().load(std::move(m_source.code), std::move(m_source.memberAttributes));
+  m_source.code.clear();
+  m_source.memberAttributes.clear();
+  m_savedChangeCount = m_module->text().changeCount();
+  if (m_source.form) m_form = std::make_shared<FormImpl>(self, *m_source.form);
+}
+
+void ComponentImpl::save(bool force) {
+  if (!m_module) return;  // binary documents are never written
+  if (!force && !IsDirty()) return;
+  if (m_filePath.isEmpty()) ide::raise(ide::err::BadFileNameOrNumber);
+  struct CodeParts {
+    ModuleSource& source;
+    ~CodeParts() {
+      source.code.clear();
+      source.memberAttributes.clear();
+    }
+  } parts{m_source};
+  m_module->text().store(m_source.code, m_source.memberAttributes);
+  writeFileAtomically(m_filePath, writeModule(m_source, m_filePath));
+  m_savedChangeCount = m_module->text().changeCount();
+  m_changed = false;
+}
+
+bool ComponentImpl::IsDirty() {
+  if (m_changed) return true;
+  return m_module && m_module->text().changeCount() != m_savedChangeCount;
+}
+
+void ComponentImpl::setName(const QString& name) {
+  auto project = m_project.lock();
+  if (!project) ide::raise(ide::err::ObjectVariableNotSet);
+  if (name == m_name) return;
+  project->checkComponentName(name, this);
+  const QString oldName = m_name;
+  m_name = name;
+  if (m_module) setModuleName(m_source, name);
+  m_changed = true;
+  project->componentEntryChanged(*this, oldName);
+  project->vbe()->fireComponentRenamed(shared_from_this(), oldName);
+}
+
+ide::Ref<ide::VBForm> ComponentImpl::Designer() {
+  return m_form;
+}
+
+ide::Ref<ide::Properties> ComponentImpl::Properties() {
+  if (m_form) return m_form->Root()->Properties();
+  return makeNameOnlyProperties(shared_from_this());
+}
+
+ide::Ref<ide::VBComponents> ComponentImpl::Collection() {
+  auto project = m_project.lock();
+  if (!project) ide::raise(ide::err::ObjectVariableNotSet);
+  return project;
+}
+
+QString ComponentImpl::FileNames(int index) {
+  if (index == 1) return m_filePath;
+  if (index == 2 && FileCount() == 2) return binaryFilePath();
+  ide::raise(ide::err::SubscriptOutOfRange);
+}
+
+QString ComponentImpl::binaryFilePath() const {
+  if (m_filePath.isEmpty() || !m_source.form) return {};
+  const QFileInfo info(m_filePath);
+  // Forms keep their binary properties in a .frx (.ctx, .pgx, .dox for the others) beside them.
+  static const std::pair<const char*, const char*> kBinary[] = {
+      {"frm", "frx"}, {"ctl", "ctx"}, {"pag", "pgx"}, {"dob", "dox"}, {"dsr", "dsx"}};
+  for (const auto& [source, binary] : kBinary)
+    if (info.suffix().compare(QLatin1StringView(source), Qt::CaseInsensitive) == 0)
+      return info.path() + u'/' + info.completeBaseName() + u'.' + QLatin1StringView(binary);
+  return {};
+}
+
+int ComponentImpl::FileCount() {
+  const QString binary = binaryFilePath();
+  return !binary.isEmpty() && QFileInfo::exists(binary) ? 2 : 1;
+}
+
+void ComponentImpl::SaveAs(const QString& fileName) {
+  auto project = m_project.lock();
+  if (!project) ide::raise(ide::err::ObjectVariableNotSet);
+  if (!m_module) ide::raise(ide::err::InvalidProcedureCall);
+  QString target =
+      QFileInfo(fileName).isAbsolute() ? fileName : QDir(project->directory()).absoluteFilePath(fileName);
+  target = QFileInfo(target).absoluteFilePath();
+  const QString oldPath = m_filePath;
+  const QString oldBinary = FileCount() == 2 ? binaryFilePath() : QString();
+  m_filePath = target;
+  try {
+    save(true);
+    // The binary file goes along, under the name the description refers to it by.
+    if (!oldBinary.isEmpty() && QFileInfo(oldPath).absolutePath() != QFileInfo(target).absolutePath()) {
+      const QString copy = QFileInfo(target).absolutePath() + u'/' + QFileInfo(oldBinary).fileName();
+      QFile::remove(copy);
+      if (!QFile::copy(oldBinary, copy))
+        ide::raise(ide::err::PathFileAccessError, QStringLiteral("Cannot write %1").arg(copy));
+    }
+  } catch (...) {
+    m_filePath = oldPath;
+    throw;
+  }
+  project->componentEntryChanged(*this, m_name);
+  if (oldPath != target) project->vbe()->fireFileNameChanged(project, fileTypeOf(m_type), target, oldPath);
+}
+
+std::shared_ptr<FormImpl> ComponentImpl::form() {
+  return m_form;
+}
+
+QString ComponentImpl::designerKind() const {
+  switch (m_type) {
+    case ide::ComponentType::VBForm:
+    case ide::ComponentType::VBMDIForm:
+      return QStringLiteral("Form");
+    case ide::ComponentType::UserControl:
+      return QStringLiteral("UserControl");
+    case ide::ComponentType::PropPage:
+      return QStringLiteral("PropertyPage");
+    case ide::ComponentType::DocObject:
+      return QStringLiteral("UserDocument");
+    default:
+      return QStringLiteral("Designer");
+  }
+}
+
+std::shared_ptr<WindowImpl> ComponentImpl::designerWindow() {
+  if (!m_form) return nullptr;
+  if (!m_designerWindow) {
+    auto project = m_project.lock();
+    if (!project) ide::raise(ide::err::ObjectVariableNotSet);
+    std::weak_ptr<ComponentImpl> weak = shared_from_this();
+    m_designerWindow = std::make_shared<WindowImpl>(
+        project->vbe(), ide::WindowType::Designer,
+        [weak] {
+          auto c = weak.lock();
+          auto p = c ? c->project() : nullptr;
+          return c && p ? QStringLiteral("%1 - %2 (%3)").arg(p->Name(), c->Name(), c->designerKind())
+                        : QString();
+        },
+        QStringLiteral("DesignerWindow"));
+    m_designerWindow->setComponent(shared_from_this());
+  }
+  return m_designerWindow;
+}
+
+ide::Ref<ide::Window> ComponentImpl::DesignerWindow() {
+  if (!m_form) ide::raise(ide::err::InvalidProcedureCall);
+  return designerWindow();
+}
+
+void ComponentImpl::Activate() {
+  auto project = m_project.lock();
+  if (!project) ide::raise(ide::err::ObjectVariableNotSet);
+  if (m_form) {
+    project->vbe()->activateWindow(designerWindow());
+  } else if (m_module) {
+    m_module->pane()->Show();
+  } else {
+    project->vbe()->selectComponent(shared_from_this());
+  }
+}
+
+void ComponentImpl::closeWindows() {
+  if (m_module && m_module->hasPane()) m_module->pane()->window()->Close();
+  if (m_designerWindow) m_designerWindow->Close();
+}
+
+void ComponentImpl::detach() {
+  if (m_form)
+    if (auto project = m_project.lock(); project && project->vbe())
+      project->vbe()->events().forgetForm(m_form.get());
+  m_project.reset();
+}
+
+}  // namespace host

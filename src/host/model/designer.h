@@ -1,0 +1,98 @@
+// SPDX-License-Identifier: MIT
+// Form designers: the form description of a component seen as the form's root control and the controls
+// on it, with their properties read and written through the IDE's property tables. Every control keeps
+// its identity while it stays on the form; renaming, re-indexing, adding and removing fire the control
+// events.
+#pragma once
+
+#include "host/files/formdescription.h"
+#include "ide/vbide.h"
+
+#include <QString>
+
+#include <map>
+#include <memory>
+#include <vector>
+
+namespace host {
+
+class ComponentImpl;
+class FormImpl;
+
+class ControlImpl final : public ide::VBControl, public std::enable_shared_from_this<ControlImpl> {
+ public:
+  ControlImpl(const std::shared_ptr<FormImpl>& form, FormNode* node);
+
+  QString ClassName() override;
+  ide::Ref<ide::Properties> Properties() override;
+  ide::Ref<ide::VBForm> Parent() override;
+  ide::Ref<ide::VBControl> Container() override;
+
+  /// The control's node in the form description; null once the control left the form.
+  FormNode* node() const { return m_node; }
+  void detach() { m_node = nullptr; }
+  std::shared_ptr<FormImpl> form() const { return m_form.lock(); }
+  /// The form description node, or error 91 when the control left the form.
+  FormNode& liveNode();
+
+  /// Reads a property: what the form description says, else the class's default. Error 9 for a property
+  /// the control does not have.
+  QVariant property(const QString& name);
+  /// Writes a property, converted to its type (error 380 when the value does not fit). Name and Index
+  /// rename the control; the form's Name renames its component.
+  void setProperty(const QString& name, const QVariant& value);
+  /// The names of the control's properties: its class's, then any others its description holds.
+  QStringList propertyNames();
+  bool hasProperty(const QString& name);
+
+ private:
+  std::weak_ptr<FormImpl> m_form;
+  FormNode* m_node;
+};
+
+class FormImpl final : public ide::VBForm, public std::enable_shared_from_this<FormImpl> {
+ public:
+  FormImpl(const std::shared_ptr<ComponentImpl>& component, FormDescription& description);
+
+  ide::Ref<ide::VBControls> VBControls() override;
+  ide::Ref<ide::VBControls> SelectedVBControls() override;
+  ide::Ref<ide::VBControl> Root() override { return control(&m_description.root()); }
+  ide::Ref<ide::VBComponent> Parent() override;
+
+  /// The control object of a node (made once per node).
+  std::shared_ptr<ControlImpl> control(FormNode* node);
+  /// Every control on the form (not the form itself), in the description's order.
+  std::vector<std::shared_ptr<ControlImpl>> controls();
+  std::shared_ptr<ControlImpl> findControl(const QString& name, int index = -1);
+  /// Adds a new control of an intrinsic class ("VB.TextBox" or "TextBox") into `container` (the form
+  /// when empty), named as the IDE names new controls; fires the control's addition.
+  std::shared_ptr<ControlImpl> addControl(const QString& progId,
+                                          const std::shared_ptr<ControlImpl>& container);
+  /// Removes a control and the controls inside it; fires their removal first.
+  void removeControl(const std::shared_ptr<ControlImpl>& control);
+  /// The designer's selection.
+  const std::vector<std::weak_ptr<ControlImpl>>& selection() const { return m_selection; }
+  void setSelection(const std::vector<std::shared_ptr<ControlImpl>>& controls);
+
+  std::shared_ptr<ComponentImpl> component() const { return m_component.lock(); }
+  FormDescription& description() { return m_description; }
+  /// Something on the form changed (the component must be saved; a designer view redraws).
+  void changed(ControlImpl* control);
+  /// Emitted after any change of a control (null: controls were added or removed).
+  ide::Signal<ControlImpl*> controlChanged;
+
+ private:
+  std::weak_ptr<ComponentImpl> m_component;
+  FormDescription& m_description;
+  std::map<const FormNode*, std::shared_ptr<ControlImpl>> m_controls;
+  std::vector<std::weak_ptr<ControlImpl>> m_selection;
+};
+
+/// The property collection of a control, or of a module component (which has only its Name).
+std::shared_ptr<ide::Properties> makeControlProperties(const std::shared_ptr<ControlImpl>& control);
+std::shared_ptr<ide::Properties> makeNameOnlyProperties(const std::shared_ptr<ComponentImpl>& component);
+
+/// The prefix of new controls' names ("Text" for a TextBox, "Command" for a CommandButton ...).
+QString defaultNamePrefix(const QString& className);
+
+}  // namespace host

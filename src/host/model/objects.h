@@ -1,0 +1,298 @@
+// SPDX-License-Identifier: MIT
+// The objects of the IDE model. They know each other closely (a code module tells its pane about edits, a
+// component fires its project's events ...), so they are declared together; each part is implemented in
+// its own file. Objects hold their owners weakly: an object that has left the IDE (a removed component,
+// a closed project) stays valid for whoever still holds it, and its operations that need the IDE fail with
+// error 91.
+#pragma once
+
+#include "host/code/codetext.h"
+#include "host/files/modulefile.h"
+#include "host/files/projectfile.h"
+#include "ide/vbide.h"
+
+#include <QString>
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <vector>
+
+namespace host {
+
+class VbeImpl;
+class ProjectImpl;
+class ComponentImpl;
+class CodeModuleImpl;
+class CodePaneImpl;
+class WindowImpl;
+class FormImpl;
+class ControlImpl;
+
+// ---------------------------------------------------------------------------------------------------
+// Windows and panes
+
+class WindowImpl final : public ide::Window, public std::enable_shared_from_this<WindowImpl> {
+ public:
+  WindowImpl(const std::shared_ptr<VbeImpl>& vbe, ide::WindowType type, std::function<QString()> caption,
+             QString className);
+  ~WindowImpl() override;
+
+  QString Caption() override { return m_caption ? m_caption() : QString(); }
+  ide::HWnd hWnd() override { return m_hwnd; }
+  ide::WindowType Type() override { return m_type; }
+  ide::WindowState WindowState() override { return m_state; }
+  void setWindowState(ide::WindowState state) override;
+  bool Visible() override { return m_hwnd != 0 && m_visible; }
+  void setVisible(bool visible) override;
+  void SetFocus() override;
+  void Close() override;
+
+  /// Creates the window in the window system if it is not open.
+  void open();
+  bool isOpen() const { return m_hwnd != 0; }
+  std::shared_ptr<ComponentImpl> component() const { return m_component.lock(); }
+  void setComponent(const std::shared_ptr<ComponentImpl>& component) { m_component = component; }
+  std::shared_ptr<CodePaneImpl> pane() const { return m_pane.lock(); }
+  void setPane(const std::shared_ptr<CodePaneImpl>& pane) { m_pane = pane; }
+  /// Told when the window opens, closes, changes state or visibility (the desktop host follows it).
+  ide::Signal<WindowImpl*> changed;
+
+ private:
+  qintptr ownProc(ide::HWnd hwnd, unsigned message, quintptr wParam, qintptr lParam);
+
+  std::weak_ptr<VbeImpl> m_vbe;
+  ide::WindowType m_type;
+  std::function<QString()> m_caption;
+  QString m_className;
+  ide::HWnd m_hwnd = 0;
+  ide::WindowState m_state = ide::WindowState::Normal;
+  bool m_visible = true;
+  std::weak_ptr<ComponentImpl> m_component;
+  std::weak_ptr<CodePaneImpl> m_pane;
+};
+
+class CodePaneImpl final : public ide::CodePane, public std::enable_shared_from_this<CodePaneImpl> {
+ public:
+  explicit CodePaneImpl(const std::shared_ptr<CodeModuleImpl>& module);
+
+  ide::Ref<ide::CodeModule> CodeModule() override;
+  ide::Ref<ide::Window> Window() override;
+  int TopLine() override { return m_topLine; }
+  void setTopLine(int line) override;
+  int CountOfVisibleLines() override { return m_visibleLines; }
+  void GetSelection(int& startLine, int& startColumn, int& endLine, int& endColumn) override;
+  void SetSelection(int startLine, int startColumn, int endLine, int endColumn) override;
+  void Show() override;
+
+  struct Selection {
+    int startLine = 1, startColumn = 1, endLine = 1, endColumn = 1;
+  };
+  const Selection& selection() const { return m_selection; }
+  std::shared_ptr<WindowImpl> window();
+  /// What the view (the desktop host's editor, or a test) reports: scrolling, caret, visible height.
+  /// These do not announce `viewRequest`, which is for requests coming from the object model.
+  void viewScrolled(int topLine);
+  void viewSelectionChanged(const Selection& selection);
+  void setCountOfVisibleLines(int lines);
+  /// Keeps the selection on its text when lines above it are inserted or deleted.
+  void linesChanged(int firstLine, int removed, int inserted);
+  /// The object model moved the view (TopLine or SetSelection): the view should follow.
+  ide::Signal<CodePaneImpl*> viewRequest;
+
+ private:
+  std::weak_ptr<CodeModuleImpl> m_module;
+  std::shared_ptr<WindowImpl> m_window;
+  int m_topLine = 1;
+  int m_visibleLines = 40;
+  Selection m_selection;
+};
+
+// ---------------------------------------------------------------------------------------------------
+// Code
+
+class CodeModuleImpl final : public ide::CodeModule,
+                             public std::enable_shared_from_this<CodeModuleImpl>,
+                             private CodeText::Listener {
+ public:
+  explicit CodeModuleImpl(const std::shared_ptr<ComponentImpl>& component);
+  ~CodeModuleImpl() override;
+
+  ide::Ref<ide::VBComponent> Parent() override;
+  QString Name() override;
+  ide::Ref<ide::CodePane> CodePane() override;
+  ide::Ref<ide::Members> Members() override;
+  QString Lines(int startLine, int count) override { return m_text.lines(startLine, count); }
+  int CountOfLines() override { return m_text.countOfLines(); }
+  int CountOfDeclarationLines() override { return m_text.countOfDeclarationLines(); }
+  void InsertLines(int line, const QString& text) override;
+  void DeleteLines(int startLine, int count) override;
+  void ReplaceLine(int line, const QString& text) override;
+  void AddFromString(const QString& text) override;
+  int ProcStartLine(const QString& procName, ide::ProcKind kind) override;
+  int ProcBodyLine(const QString& procName, ide::ProcKind kind) override;
+  int ProcCountLines(const QString& procName, ide::ProcKind kind) override;
+  QString ProcOfLine(int line, ide::ProcKind& kind) override { return m_text.procOfLine(line, kind); }
+  bool Find(const QString& target, int& startLine, int& startColumn, int& endLine, int& endColumn,
+            bool wholeWord, bool matchCase, bool patternSearch) override;
+
+  CodeText& text() { return m_text; }
+  std::shared_ptr<ComponentImpl> component() const { return m_component.lock(); }
+  std::shared_ptr<CodePaneImpl> pane();
+  bool hasPane() const { return m_pane != nullptr; }
+
+ private:
+  void linesChanged(int firstLine, int removed, int inserted) override;
+  void checkEditable();
+
+  std::weak_ptr<ComponentImpl> m_component;
+  CodeText m_text;
+  std::shared_ptr<CodePaneImpl> m_pane;
+};
+
+// ---------------------------------------------------------------------------------------------------
+// Components
+
+class ComponentImpl final : public ide::VBComponent, public std::enable_shared_from_this<ComponentImpl> {
+ public:
+  /// A component of the given type whose file is `filePath` (empty for a new one); load() or create() next.
+  ComponentImpl(const std::shared_ptr<ProjectImpl>& project, ide::ComponentType type, QString filePath);
+  ~ComponentImpl() override;
+
+  QString Name() override { return m_name; }
+  void setName(const QString& name) override;
+  ide::ComponentType Type() override { return m_type; }
+  ide::Ref<ide::CodeModule> CodeModule() override { return m_module; }
+  ide::Ref<ide::VBForm> Designer() override;
+  ide::Ref<ide::Properties> Properties() override;
+  ide::Ref<ide::VBComponents> Collection() override;
+  bool Saved() override { return !IsDirty(); }
+  bool IsDirty() override;
+  QString FileNames(int index) override;
+  int FileCount() override;
+  void SaveAs(const QString& fileName) override;
+  void Activate() override;
+  ide::Ref<ide::Window> DesignerWindow() override;
+
+  /// Reads the component's file (module files, or nothing for binary documents). Throws ide::Error naming
+  /// the file and line for anything unreadable.
+  void load();
+  /// Sets up a new component of its type, named `name`.
+  void create(const QString& name);
+  /// Writes the component's file when it changed (or when `force`), to its path.
+  void save(bool force = false);
+  QString filePath() const { return m_filePath; }
+  void setFilePath(const QString& path) { m_filePath = path; }
+  std::shared_ptr<ProjectImpl> project() const { return m_project.lock(); }
+  std::shared_ptr<CodeModuleImpl> codeModule() const { return m_module; }
+  std::shared_ptr<FormImpl> form();
+  ModuleSource& source() { return m_source; }
+  /// The designer window (made on first use; empty for components without a designer).
+  std::shared_ptr<WindowImpl> designerWindow();
+  std::shared_ptr<WindowImpl> designerWindowIfAny() const { return m_designerWindow; }
+  /// Closes the component's code and designer windows.
+  void closeWindows();
+  /// The binary file beside a form (.frx ...), whether it exists or not; empty for other components.
+  QString binaryFilePath() const;
+  bool hasCode() const { return m_module != nullptr; }
+  bool hasDesigner() const { return m_source.form.has_value(); }
+  /// The part of the caption after the name: "(Code)", "(Form)", "(UserControl)" ...
+  QString designerKind() const;
+  void markChanged() { m_changed = true; }
+  /// Left the IDE: removed from its project or its project closed.
+  void detach();
+  bool attached() const { return !m_project.expired(); }
+
+ private:
+  void adopt(ModuleSource source);
+
+  std::weak_ptr<ProjectImpl> m_project;
+  ide::ComponentType m_type;
+  QString m_filePath;
+  QString m_name;
+  ModuleSource m_source;
+  std::shared_ptr<CodeModuleImpl> m_module;
+  std::shared_ptr<FormImpl> m_form;
+  std::shared_ptr<WindowImpl> m_designerWindow;
+  quint64 m_savedChangeCount = 0;
+  bool m_changed = false;  // header, form or name changed since the last save
+};
+
+// ---------------------------------------------------------------------------------------------------
+// Projects
+
+class ProjectImpl final : public ide::VBProject,
+                          public ide::VBComponents,
+                          public std::enable_shared_from_this<ProjectImpl> {
+ public:
+  explicit ProjectImpl(const std::shared_ptr<VbeImpl>& vbe);
+  ~ProjectImpl() override;
+
+  // ide::VBProject
+  QString Name() override { return m_name; }
+  void setName(const QString& name) override;
+  QString FileName() override { return m_fileName; }
+  ide::ProjectType Type() override { return m_type; }
+  QString Description() override;
+  ide::Ref<ide::VBComponents> VBComponents() override;
+  ide::Ref<ide::References> References() override;
+  ide::Ref<ide::VBProjects> Collection() override;
+  bool Saved() override;
+  void SaveAs(const QString& fileName) override;
+
+  // ide::VBComponents
+  int Count() override { return static_cast<int>(m_components.size()); }
+  ide::Ref<ide::VBComponent> Item(int index) override;
+  ide::Ref<ide::VBComponent> Item(const QString& name) override;
+  ide::Ref<ide::VBProject> Parent() override { return shared_from_this(); }
+  ide::Ref<ide::VBComponent> Add(ide::ComponentType type) override;
+  ide::Ref<ide::VBComponent> AddFile(const QString& fileName) override;
+  void Remove(const ide::Ref<ide::VBComponent>& component) override;
+
+  /// Reads a project file and every file it lists; throws ide::Error naming the file and line.
+  void load(const QString& fileName);
+  /// Sets up a new, unsaved project.
+  void create(ide::ProjectType type, const QString& name);
+  /// Writes every changed component and the project file (when changed) to their paths.
+  void save();
+  const std::vector<std::shared_ptr<ComponentImpl>>& components() const { return m_components; }
+  std::shared_ptr<ComponentImpl> component(const QString& name) const;
+  std::shared_ptr<VbeImpl> vbe() const { return m_vbe.lock(); }
+  /// The project's directory (for a never-saved project, empty).
+  QString directory() const;
+  /// A free name "<prefix>N" among the components.
+  QString freeComponentName(const QString& prefix) const;
+  /// Checks a new component name: error 35011 for an invalid one, 35010 for one in use.
+  void checkComponentName(const QString& name, const ComponentImpl* except) const;
+  /// The project file entry of a component changed (its name or path).
+  void componentEntryChanged(ComponentImpl& component, const QString& oldName);
+  /// Adds an existing module file; `announce` fires the component's addition (not while opening).
+  std::shared_ptr<ComponentImpl> addExistingFile(const QString& path, bool announce);
+  /// Left the IDE (closed): its operations that need the IDE fail from now on.
+  void detach();
+
+  // Event sources of this project (the IDE-wide ones are fired alongside by the VBE).
+  std::shared_ptr<ide::ComponentsEventSource> componentEvents;
+  std::shared_ptr<ide::ReferencesEventSource> referenceEvents;
+  std::shared_ptr<ide::FileControlEventSource> fileEvents;
+  std::shared_ptr<ide::ControlsEventSource> controlEvents;
+  std::shared_ptr<ide::SelectedControlsEventSource> selectedControlEvents;
+
+ private:
+  QString componentEntryPath(const ComponentImpl& component) const;
+  void addComponentEntry(ComponentImpl& component);
+  int indexOf(const ComponentImpl& component) const;
+  /// Gives new components a file in `dir`, named after them.
+  void assignFilePaths(const QString& dir);
+
+  std::weak_ptr<VbeImpl> m_vbe;
+  QString m_fileName;
+  QString m_name;
+  ide::ProjectType m_type = ide::ProjectType::StandardExe;
+  std::optional<ProjectFile> m_file;
+  std::vector<std::shared_ptr<ComponentImpl>> m_components;
+  bool m_changed = false;
+  bool m_detached = false;
+};
+
+}  // namespace host
