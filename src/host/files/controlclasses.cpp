@@ -67,6 +67,7 @@ constexpr std::array<EnumValue, 2> kOleDropModeNoneManual = {{{0, "None"}, {1, "
 constexpr std::array<EnumValue, 3> kOleDropModeWithAutomatic = {
     {{0, "None"}, {1, "Manual"}, {2, "Automatic"}}};
 constexpr std::array<EnumValue, 2> kFormLinkMode = {{{0, "None"}, {1, "Source"}}};
+// The documented names; saved files with these values were not found to confirm them.
 constexpr std::array<EnumValue, 4> kControlLinkMode = {
     {{0, "None"}, {1, "Automatic"}, {2, "Manual"}, {3, "Notify"}}};
 constexpr std::array<EnumValue, 3> kTextAlignment = {

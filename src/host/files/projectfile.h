@@ -13,6 +13,7 @@
 #include <QStringView>
 
 #include <cstddef>
+#include <initializer_list>
 #include <optional>
 #include <vector>
 
