@@ -3,6 +3,8 @@
 #include "host/code/codetext.h"
 #include "ide/error.h"
 
+#include "printers.h"
+
 #include <gtest/gtest.h>
 
 #include <QStringList>

@@ -1,0 +1,35 @@
+// SPDX-License-Identifier: MIT
+// Shared helpers of the IDE model's tests: a private copy of the example group, file snapshots and error
+// expectations.
+#pragma once
+
+#include <QByteArray>
+#include <QMap>
+#include <QString>
+#include <QTemporaryDir>
+
+#include <functional>
+#include <memory>
+
+namespace host::test {
+
+/// A temporary directory holding a copy of examples/demo (the group file is <dir>/Demo.vbg).
+class ExampleCopy {
+ public:
+  ExampleCopy();
+  QString path(const QString& relative) const { return m_dir.filePath(relative); }
+  QString groupFile() const { return path(QStringLiteral("Demo.vbg")); }
+  /// Every file below the directory with its bytes, by relative path.
+  QMap<QString, QByteArray> snapshot() const;
+
+ private:
+  QTemporaryDir m_dir;
+};
+
+QByteArray readBytes(const QString& path);
+void writeBytes(const QString& path, const QByteArray& bytes);
+
+/// The number of the ide::Error the action throws (0 when it throws none), and its description.
+long errorNumberOf(const std::function<void()>& action, QString* description = nullptr);
+
+}  // namespace host::test
