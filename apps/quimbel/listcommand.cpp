@@ -1,0 +1,158 @@
+// SPDX-License-Identifier: MIT
+// `quimbel list`: how the tool reads a project: its components, their members and the extents of every
+// procedure, as the IDE's object model answers them.
+#include "cli.h"
+#include "host/model/vbe.h"
+
+#include <QDir>
+#include <QFileInfo>
+
+namespace cli {
+namespace {
+
+QString typeName(ide::ComponentType type) {
+  switch (type) {
+    case ide::ComponentType::StdModule:
+      return QStringLiteral("Module");
+    case ide::ComponentType::ClassModule:
+      return QStringLiteral("Class");
+    case ide::ComponentType::VBForm:
+      return QStringLiteral("Form");
+    case ide::ComponentType::VBMDIForm:
+      return QStringLiteral("MDIForm");
+    case ide::ComponentType::UserControl:
+      return QStringLiteral("UserControl");
+    case ide::ComponentType::PropPage:
+      return QStringLiteral("PropertyPage");
+    case ide::ComponentType::DocObject:
+      return QStringLiteral("UserDocument");
+    case ide::ComponentType::ActiveXDesigner:
+    case ide::ComponentType::MSForm:
+      return QStringLiteral("Designer");
+    case ide::ComponentType::ResFile:
+      return QStringLiteral("ResFile");
+    case ide::ComponentType::RelatedDocument:
+      return QStringLiteral("RelatedDocument");
+  }
+  return QStringLiteral("Component");
+}
+
+QString projectTypeName(ide::ProjectType type) {
+  switch (type) {
+    case ide::ProjectType::ActiveXExe:
+      return QStringLiteral("ActiveX EXE");
+    case ide::ProjectType::ActiveXDll:
+      return QStringLiteral("ActiveX DLL");
+    case ide::ProjectType::ActiveXControl:
+      return QStringLiteral("ActiveX Control");
+    default:
+      return QStringLiteral("Standard EXE");
+  }
+}
+
+QString memberTypeName(ide::MemberType type) {
+  switch (type) {
+    case ide::MemberType::Method:
+      return QStringLiteral("Method");
+    case ide::MemberType::Property:
+      return QStringLiteral("Property");
+    case ide::MemberType::Variable:
+      return QStringLiteral("Variable");
+    case ide::MemberType::Event:
+      return QStringLiteral("Event");
+    case ide::MemberType::Const:
+      return QStringLiteral("Const");
+  }
+  return {};
+}
+
+QString scopeName(ide::Scope scope) {
+  switch (scope) {
+    case ide::Scope::Private:
+      return QStringLiteral("Private");
+    case ide::Scope::Public:
+      return QStringLiteral("Public");
+    case ide::Scope::Friend:
+      return QStringLiteral("Friend");
+  }
+  return {};
+}
+
+QString procedureKeyword(const host::ProcInfo& proc) {
+  switch (proc.kind) {
+    case ide::ProcKind::Get:
+      return QStringLiteral("Property Get");
+    case ide::ProcKind::Let:
+      return QStringLiteral("Property Let");
+    case ide::ProcKind::Set:
+      return QStringLiteral("Property Set");
+    default:
+      return proc.isFunction ? QStringLiteral("Function") : QStringLiteral("Sub");
+  }
+}
+
+}  // namespace
+
+int runList(const ListOptions& options) {
+  auto vbe = host::VbeImpl::create();
+  // Module files are listed under the path the user gave; the rest under their path from here.
+  QHash<QString, QString> givenPaths;
+  for (const QString& file : options.files) {
+    for (const auto& project : vbe->open(file)) {
+      if (project->FileName().isEmpty())
+        for (const auto& component : project->components())
+          givenPaths.insert(component->filePath(), file);
+    }
+  }
+  const QDir here = QDir::current();
+  auto shownPath = [&](const QString& path) { return givenPaths.value(path, here.relativeFilePath(path)); };
+
+  for (const auto& project : vbe->projects()) {
+    if (!options.tsv) {
+      const QString file =
+          project->FileName().isEmpty() ? QString() : QStringLiteral("  ") + shownPath(project->FileName());
+      printLine(
+          QStringLiteral("Project %1 (%2)%3").arg(project->Name(), projectTypeName(project->Type()), file));
+    }
+    for (const auto& component : project->components()) {
+      const QString path = shownPath(component->filePath());
+      auto module = component->codeModule();
+      if (options.tsv) {
+        if (!module) continue;
+        auto& text = module->text();
+        printLine(
+            QStringLiteral("%1\t(declarations)\t0\t0\t0\t%2").arg(path).arg(text.countOfDeclarationLines()));
+        for (const host::ProcInfo& proc : text.procedures()) {
+          printLine(QStringLiteral("%1\t%2\t%3\t%4\t%5\t%6")
+                        .arg(path, proc.name)
+                        .arg(static_cast<int>(proc.kind))
+                        .arg(text.procStartLine(proc.name, proc.kind))
+                        .arg(proc.bodyLine)
+                        .arg(text.procCountLines(proc.name, proc.kind)));
+        }
+        continue;
+      }
+      printLine(QStringLiteral("  %1 %2  %3").arg(typeName(component->Type()), component->Name(), path));
+      if (!module) continue;
+      auto& text = module->text();
+      printLine(QStringLiteral("    %1 lines, declarations 1-%2")
+                    .arg(text.countOfLines())
+                    .arg(text.countOfDeclarationLines()));
+      for (const host::MemberInfo& member : text.members()) {
+        printLine(QStringLiteral("    %1 %2 %3")
+                      .arg(scopeName(member.scope), memberTypeName(member.type), member.name));
+        for (const host::ProcInfo& proc : text.procedures()) {
+          if (proc.name.compare(member.name, Qt::CaseInsensitive) != 0) continue;
+          printLine(QStringLiteral("      %1: start %2, body %3, lines %4")
+                        .arg(procedureKeyword(proc))
+                        .arg(text.procStartLine(proc.name, proc.kind))
+                        .arg(proc.bodyLine)
+                        .arg(text.procCountLines(proc.name, proc.kind)));
+        }
+      }
+    }
+  }
+  return kSuccess;
+}
+
+}  // namespace cli

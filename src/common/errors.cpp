@@ -1,0 +1,64 @@
+// SPDX-License-Identifier: MIT
+#include "common/errors.h"
+
+#include "common/strings.h"
+
+#include <QDateTime>
+#include <QDir>
+#include <QFile>
+#include <QStandardPaths>
+
+namespace common {
+
+LastError& lastError() {
+  static LastError record;
+  return record;
+}
+
+QString locationText(const QString& module, const QString& procedure, int line) {
+  return QStringLiteral("em %1_%2, linha: %3").arg(module, procedure).arg(line);
+}
+
+ide::Error recordError(const std::exception& failure, const QString& module, const QString& procedure,
+                       int line) {
+  LastError& record = lastError();
+  const auto* error = dynamic_cast<const ide::Error*>(&failure);
+  record.number = error ? error->number() : 5;  // a failure that is not the IDE's counts as an invalid call
+  record.description = error ? error->description() : QString::fromLocal8Bit(failure.what());
+  const QString source = error ? error->source() : QString();
+  record.location =
+      source.startsWith(QLatin1StringView("em ")) ? source : locationText(module, procedure, line);
+  return ide::Error(record.number, record.description, record.location);
+}
+
+QString errorLogPath() {
+  const QString overridden = qEnvironmentVariable("QUIMBEL_DATA_DIR");
+  const QString dir =
+      !overridden.isEmpty()
+          ? overridden
+          : QStandardPaths::writableLocation(QStandardPaths::GenericDataLocation) + u'/' + title();
+  return QDir(dir).filePath(QStringLiteral("errors.log"));
+}
+
+namespace {
+void appendToLog(const LastError& record) {
+  const QString path = errorLogPath();
+  QDir().mkpath(QFileInfo(path).path());
+  QFile log(path);
+  if (!log.open(QIODevice::Append | QIODevice::Text)) return;  // the report itself must not fail
+  log.write(QStringLiteral("%1\t%2\t%3\t%4\n")
+                .arg(QDateTime::currentDateTime().toString(Qt::ISODate))
+                .arg(record.number)
+                .arg(record.description, record.location)
+                .toUtf8());
+}
+}  // namespace
+
+void ShowErrorReport(ide::UserInterface& ui) {
+  const LastError& record = lastError();
+  if (record.number == kCancelled || record.number == kCommonDialogCancelled) return;
+  appendToLog(record);
+  ui.MsgBox(QStringLiteral("%1 %2").arg(record.number).arg(record.description), ide::mb::OKOnly, title());
+}
+
+}  // namespace common

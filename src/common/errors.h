@@ -1,0 +1,45 @@
+// SPDX-License-Identifier: MIT
+// The add-in's error convention. A procedure that fails records the error in the process-wide last-error
+// record with a location text "em <module>_<procedure>, linha: <n>" (kept when the error already carries
+// one from a nested procedure) and raises it again with that location as its source; the outermost
+// handler shows it with ShowErrorReport. Every reported location is also appended to a log file in the
+// user's data directory, for bug reports.
+#pragma once
+
+#include "ide/error.h"
+#include "ide/platform.h"
+
+#include <QString>
+
+#include <exception>
+
+namespace common {
+
+/// The add-in's own cancel code, and the common dialogs' one: both end silently.
+inline constexpr long kCancelled = 9999;
+inline constexpr long kCommonDialogCancelled = 32755;
+
+struct LastError {
+  long number = 0;
+  QString description;
+  QString location;
+};
+
+/// The process-wide last-error record.
+LastError& lastError();
+
+/// "em " + module + "_" + procedure + ", linha: " + line.
+QString locationText(const QString& module, const QString& procedure, int line);
+
+/// Records a failure caught in module_procedure at `line` and returns the error to raise again: same
+/// number and description, the innermost location as source.
+ide::Error recordError(const std::exception& failure, const QString& module, const QString& procedure,
+                       int line);
+
+/// Shows the last error ("<number> <description>", OK only) unless it is a cancel code.
+void ShowErrorReport(ide::UserInterface& ui);
+
+/// Where reported locations are logged ($QUIMBEL_DATA_DIR or the user's data directory, file errors.log).
+QString errorLogPath();
+
+}  // namespace common

@@ -1,0 +1,90 @@
+// SPDX-License-Identifier: MIT
+// Texts are Brazilian Portuguese and must stay exactly as they are: users and documentation know them.
+#include "common/strings.h"
+
+#include <QHash>
+
+namespace common {
+namespace {
+
+struct Entry {
+  int id;
+  const char16_t* text;
+};
+
+// clang-format off
+constexpr Entry kStrings[] = {
+    // Commands (menu items, toolbar tooltips).
+    {1, u"Voltar"},
+    {2, u"Avançar"},
+    {3, u"Favoritos"},
+    {4, u"Definir Macros de Teclado"},
+    {5, u"Memórias Adicionais Para Cópias"},
+    {6, u"Numerar Linhas"},
+    {7, u"Indentar Código"},
+    {8, u"Fechar Janelas"},
+    {9, u"Localizar Estendido"},
+    {10, u"Lista de Tarefas"},
+    {11, u"Novo Procedimento"},
+    {12, u"Opções"},
+    {14, u"Ajuda"},
+    {20, u"Adicionar aos Favoritos"},
+    {201, u"Não há menu de Add-Ins."},
+
+    // Indentation dialog.
+    {5016, u"In&dentar"},
+    {5017, u"&Usar"},
+    {5018, u"&Projeto"},
+    {5019, u"&Módulo"},
+    {5020, u"Pr&ocedimento"},
+    {5021, u"&Tabs"},
+    {5022, u"E&spaços"},
+    {5024, u"&Cancelar"},
+    {5025, u"&Fechar"},
+    {5026, u"&Indentar"},
+
+    // Line numbering dialog.
+    {5027, u"A&dicionar ou remover números de linha para:"},
+    {5028, u"&Projeto"},
+    {5029, u"&Módulo"},
+    {5030, u"Pr&ocedimento"},
+    {5031, u"&Número Inicial:"},
+    {5032, u"Inter&valo:"},
+    {5033, u"&Adicionar"},
+    {5034, u"&Remover"},
+    {5035, u"&Cancelar"},
+    {5036, u"Numerar Linhas"},
+    {5119, u"Erro: valor não numérico informado para o número inicial."},
+    {5120, u"Erro: valor não numérico informado para o intervalo."},
+    {5121, u"Erro na numeração de linhas."},
+    {5122, u"Erro na numeração de linhas de módulo."},
+    {5123, u"Erro na numeração de linhas de procedimento."},
+    {5124, u"Informação inválida para o número de espaços."},
+    {5125, u"Informe o número de espaços a ser usado."},
+    {5126, u"Erro na indentação de código."},
+    {5127, u"Erro na carga do formulário do indentador."},
+    {5128, u"Erro na indentação de procedimento."},
+    {5129, u"Erro na indentação de módulo."},
+    {5130, u"Erro na indentação do projeto."},
+    {5135, u"Indentar Código"},
+    {5161, u"&Fechar"},
+};
+// clang-format on
+
+const QHash<int, QString>& table() {
+  static const QHash<int, QString> strings = [] {
+    QHash<int, QString> map;
+    for (const Entry& entry : kStrings)
+      map.insert(entry.id, QString::fromUtf16(entry.text));
+    return map;
+  }();
+  return strings;
+}
+
+}  // namespace
+
+QString LoadResString(int id) {
+  return table().value(id);
+}
+
+}  // namespace common
