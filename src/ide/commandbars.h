@@ -61,7 +61,8 @@ class CommandBarControls {
   /// Adds a control before position `before` (0 or Count + 1 appends); a temporary control disappears when
   /// the IDE closes.
   virtual Ref<CommandBarControl> Add(ControlType type = ControlType::Button, int id = 1,
-                                     const QVariant& parameter = {}, int before = 0, bool temporary = false) = 0;
+                                     const QVariant& parameter = {}, int before = 0,
+                                     bool temporary = false) = 0;
   virtual Ref<ide::CommandBar> Parent() = 0;
 };
 
@@ -87,8 +88,8 @@ class CommandBars {
   virtual Ref<CommandBar> Item(int index) = 0;
   /// By name ("Menu Bar", "Standard", "Code Window", "Add-Ins" ...); error 5 when there is none.
   virtual Ref<CommandBar> Item(const QString& name) = 0;
-  virtual Ref<CommandBar> Add(const QString& name, BarPosition position = BarPosition::Top, bool menuBar = false,
-                              bool temporary = false) = 0;
+  virtual Ref<CommandBar> Add(const QString& name, BarPosition position = BarPosition::Top,
+                              bool menuBar = false, bool temporary = false) = 0;
 };
 
 }  // namespace ide

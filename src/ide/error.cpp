@@ -14,22 +14,38 @@ Error::~Error() = default;
 
 QString standardDescription(long number) {
   switch (number) {
-    case err::InvalidProcedureCall: return QStringLiteral("Invalid procedure call or argument");
-    case err::SubscriptOutOfRange: return QStringLiteral("Subscript out of range");
-    case err::SubOrFunctionNotDefined: return QStringLiteral("Sub or Function not defined");
-    case err::BadFileNameOrNumber: return QStringLiteral("Bad file name or number");
-    case err::FileNotFound: return QStringLiteral("File not found");
-    case err::PermissionDenied: return QStringLiteral("Permission denied");
-    case err::PathFileAccessError: return QStringLiteral("Path/File access error");
-    case err::PathNotFound: return QStringLiteral("Path not found");
-    case err::ObjectVariableNotSet: return QStringLiteral("Object variable or With block variable not set");
-    case err::InvalidFileFormat: return QStringLiteral("Invalid file format");
-    case err::ObjectRequired: return QStringLiteral("Object required");
-    case err::NameConflict: return QStringLiteral("Name conflicts with existing module, project, or object library");
-    case err::InvalidName: return QStringLiteral("Invalid name");
-    case err::LineTooLong: return QStringLiteral("Line too long");
-    case err::CannotEdit: return QStringLiteral("Module cannot be edited");
-    default: return {};
+    case err::InvalidProcedureCall:
+      return QStringLiteral("Invalid procedure call or argument");
+    case err::SubscriptOutOfRange:
+      return QStringLiteral("Subscript out of range");
+    case err::SubOrFunctionNotDefined:
+      return QStringLiteral("Sub or Function not defined");
+    case err::BadFileNameOrNumber:
+      return QStringLiteral("Bad file name or number");
+    case err::FileNotFound:
+      return QStringLiteral("File not found");
+    case err::PermissionDenied:
+      return QStringLiteral("Permission denied");
+    case err::PathFileAccessError:
+      return QStringLiteral("Path/File access error");
+    case err::PathNotFound:
+      return QStringLiteral("Path not found");
+    case err::ObjectVariableNotSet:
+      return QStringLiteral("Object variable or With block variable not set");
+    case err::InvalidFileFormat:
+      return QStringLiteral("Invalid file format");
+    case err::ObjectRequired:
+      return QStringLiteral("Object required");
+    case err::NameConflict:
+      return QStringLiteral("Name conflicts with existing module, project, or object library");
+    case err::InvalidName:
+      return QStringLiteral("Invalid name");
+    case err::LineTooLong:
+      return QStringLiteral("Line too long");
+    case err::CannotEdit:
+      return QStringLiteral("Module cannot be edited");
+    default:
+      return {};
   }
 }
 

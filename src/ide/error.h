@@ -12,21 +12,21 @@ namespace ide {
 
 /// Error numbers the object model raises. Where the IDE has a number, it is the IDE's.
 namespace err {
-inline constexpr long InvalidProcedureCall = 5;       // bad argument
-inline constexpr long SubscriptOutOfRange = 9;        // item or line index outside the collection
-inline constexpr long SubOrFunctionNotDefined = 35;   // procedure name or kind not in the module
+inline constexpr long InvalidProcedureCall = 5;      // bad argument
+inline constexpr long SubscriptOutOfRange = 9;       // item or line index outside the collection
+inline constexpr long SubOrFunctionNotDefined = 35;  // procedure name or kind not in the module
 inline constexpr long FileNotFound = 53;
 inline constexpr long BadFileNameOrNumber = 52;
 inline constexpr long PermissionDenied = 70;
 inline constexpr long PathFileAccessError = 75;
 inline constexpr long PathNotFound = 76;
-inline constexpr long ObjectVariableNotSet = 91;      // call on an object that left the IDE (removed)
+inline constexpr long ObjectVariableNotSet = 91;  // call on an object that left the IDE (removed)
 inline constexpr long InvalidFileFormat = 321;
 inline constexpr long ObjectRequired = 424;
-inline constexpr long NameConflict = 35010;           // a project or component name already in use
-inline constexpr long InvalidName = 35011;            // not a valid identifier
-inline constexpr long LineTooLong = 35020;            // a physical line over the IDE's 1023 characters
-inline constexpr long CannotEdit = 40198;             // the module cannot be edited
+inline constexpr long NameConflict = 35010;  // a project or component name already in use
+inline constexpr long InvalidName = 35011;   // not a valid identifier
+inline constexpr long LineTooLong = 35020;   // a physical line over the IDE's 1023 characters
+inline constexpr long CannotEdit = 40198;    // the module cannot be edited
 }  // namespace err
 
 /// Thrown by every object-model operation that fails.

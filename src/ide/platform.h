@@ -75,7 +75,8 @@ class WindowSystem {
   virtual QString GetWindowText(HWnd window) = 0;
   /// Children of `parent` (0: top-level windows) after `childAfter`, matched by class and caption; an empty
   /// text matches any.
-  virtual HWnd FindWindowEx(HWnd parent, HWnd childAfter, const QString& className, const QString& caption) = 0;
+  virtual HWnd FindWindowEx(HWnd parent, HWnd childAfter, const QString& className,
+                            const QString& caption) = 0;
 
   virtual WndProcRef GetWindowProc(HWnd window) = 0;
   /// Installs `proc` and returns the procedure it replaced; nullptr (and nothing changed) on failure.
@@ -127,8 +128,12 @@ inline constexpr int Ignore = 5;
 inline constexpr int Yes = 6;
 inline constexpr int No = 7;
 
-inline constexpr int buttonsOf(int style) { return style & 0x0F; }
-inline constexpr int iconOf(int style) { return style & 0xF0; }
+inline constexpr int buttonsOf(int style) {
+  return style & 0x0F;
+}
+inline constexpr int iconOf(int style) {
+  return style & 0xF0;
+}
 }  // namespace mb
 
 enum class Cursor : int { Default = 0, Hourglass = 11, ArrowHourglass = 13 };

@@ -85,6 +85,14 @@ enum class DisconnectMode : int { HostShutdown = 0, UserClosed = 1 };
 /// Command-bar control types (only those the IDE's bars use).
 enum class ControlType : int { Custom = 0, Button = 1, Edit = 2, Dropdown = 3, ComboBox = 4, Popup = 10 };
 enum class ButtonStyle : int { Automatic = 0, Icon = 1, Caption = 2, IconAndCaption = 3 };
-enum class BarPosition : int { Left = 0, Top = 1, Right = 2, Bottom = 3, Floating = 4, Popup = 5, MenuBar = 6 };
+enum class BarPosition : int {
+  Left = 0,
+  Top = 1,
+  Right = 2,
+  Bottom = 3,
+  Floating = 4,
+  Popup = 5,
+  MenuBar = 6
+};
 
 }  // namespace ide

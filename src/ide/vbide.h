@@ -57,7 +57,8 @@ class Collection {
     std::vector<Ref<T>> result;
     const int n = Count();
     result.reserve(static_cast<size_t>(n));
-    for (int i = 1; i <= n; ++i) result.push_back(Item(i));
+    for (int i = 1; i <= n; ++i)
+      result.push_back(Item(i));
     return result;
   }
 };
@@ -365,7 +366,8 @@ class Events {
   virtual Ref<ComponentsEventSource> VBComponentsEvents(const Ref<VBProject>& project) = 0;
   virtual Ref<ReferencesEventSource> ReferencesEvents(const Ref<VBProject>& project) = 0;
   virtual Ref<FileControlEventSource> FileControlEvents(const Ref<VBProject>& project) = 0;
-  virtual Ref<ControlsEventSource> VBControlsEvents(const Ref<VBProject>& project, const Ref<VBForm>& form) = 0;
+  virtual Ref<ControlsEventSource> VBControlsEvents(const Ref<VBProject>& project,
+                                                    const Ref<VBForm>& form) = 0;
   virtual Ref<SelectedControlsEventSource> SelectedVBControlsEvents(const Ref<VBProject>& project,
                                                                     const Ref<VBForm>& form) = 0;
   virtual Ref<CommandBarEventSource> CommandBarEvents(const Ref<CommandBarControl>& control) = 0;
