@@ -587,6 +587,58 @@ TEST(Designers, AddingRenamingAndRemovingControlsFireEventsAndReachTheFile) {
   EXPECT_EQ(errorNumberOf([&] { box->ClassName(); }), ide::err::ObjectVariableNotSet);
 }
 
+TEST(Designers, SelectionChangesAreAnnounced) {
+  ExampleCopy copy;
+  auto vbe = VbeImpl::create();
+  vbe->open(copy.groupFile());
+  auto component = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("frmCliente"));
+  auto form = component->form();
+  QStringList events;
+  auto source = vbe->Events()->SelectedVBControlsEvents(component->project(), form);
+  auto a = source->ItemAdded.connect([&](const ide::Ref<ide::VBControl>& c) { events << "+" + c->name(); });
+  auto r = source->ItemRemoved.connect([&](const ide::Ref<ide::VBControl>& c) { events << "-" + c->name(); });
+  auto nome = form->findControl(QStringLiteral("txtNome"));
+  auto email = form->findControl(QStringLiteral("txtEmail"));
+  form->setSelection({nome, email});
+  form->setSelection({email});
+  EXPECT_EQ(events, (QStringList{QStringLiteral("+txtNome"), QStringLiteral("+txtEmail"),
+                                 QStringLiteral("-txtNome")}));
+  EXPECT_EQ(form->SelectedVBControls()->Count(), 1);
+}
+
+TEST(Events, FilesWrittenAddedAndRemovedAreAnnounced) {
+  ExampleCopy copy;
+  auto vbe = VbeImpl::create();
+  auto project = vbe->openProject(copy.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
+  QStringList events;
+  auto files = vbe->Events()->FileControlEvents(project);
+  auto w = files->AfterWriteFile.connect(
+      [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& name, int result) {
+        events << QStringLiteral("write %1 %2 %3")
+                      .arg(static_cast<int>(type))
+                      .arg(QFileInfo(name).fileName())
+                      .arg(result);
+      });
+  auto add = files->AfterAddFile.connect(
+      [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& name) {
+        events << QStringLiteral("add %1 %2").arg(static_cast<int>(type)).arg(QFileInfo(name).fileName());
+      });
+  auto rem = files->AfterRemoveFile.connect(
+      [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& name) {
+        events << QStringLiteral("remove %1 %2").arg(static_cast<int>(type)).arg(QFileInfo(name).fileName());
+      });
+  project->component(QStringLiteral("modApi"))->codeModule()->InsertLines(1, QStringLiteral("' x"));
+  vbe->saveAll();
+  auto added = project->VBComponents()->AddFile(copy.path(QStringLiteral("Loja/modConstantes.bas")));
+  project->VBComponents()->Remove(added);
+  EXPECT_EQ(events,
+            (QStringList{QStringLiteral("write 1 modApi.bas 0"), QStringLiteral("add 1 modConstantes.bas"),
+                         QStringLiteral("remove 1 modConstantes.bas")}));
+  events.clear();
+  vbe->saveAll();  // the project file changed (a component came and went)
+  EXPECT_EQ(events, QStringList{QStringLiteral("write 3 Utilitarios.vbp 0")});
+}
+
 // ---------------------------------------------------------------------------------------------------
 // Command bars and the IDE mode
 

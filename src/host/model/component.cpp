@@ -49,6 +49,8 @@ QString newComponentText(ide::ComponentType type, const QString& name) {
   }
 }
 
+}  // namespace
+
 ide::FileType fileTypeOf(ide::ComponentType type) {
   switch (type) {
     case ide::ComponentType::VBForm:
@@ -73,8 +75,6 @@ ide::FileType fileTypeOf(ide::ComponentType type) {
       return ide::FileType::Module;
   }
 }
-
-}  // namespace
 
 ComponentImpl::ComponentImpl(const std::shared_ptr<ProjectImpl>& project, ide::ComponentType type,
                              QString filePath)
@@ -128,9 +128,17 @@ void ComponentImpl::save(bool force) {
     }
   } parts{m_source};
   m_module->text().store(m_source.code, m_source.memberAttributes);
-  writeFileAtomically(m_filePath, writeModule(m_source, m_filePath));
+  auto project = m_project.lock();
+  auto vbe = project ? project->vbe() : nullptr;
+  try {
+    writeFileAtomically(m_filePath, writeModule(m_source, m_filePath));
+  } catch (...) {
+    if (vbe) vbe->fireFileWritten(project, fileTypeOf(m_type), m_filePath, 2);
+    throw;
+  }
   m_savedChangeCount = m_module->text().changeCount();
   m_changed = false;
+  if (vbe) vbe->fireFileWritten(project, fileTypeOf(m_type), m_filePath, 0);
 }
 
 bool ComponentImpl::IsDirty() {

@@ -403,7 +403,22 @@ void FormImpl::removeControl(const std::shared_ptr<ControlImpl>& control) {
 }
 
 void FormImpl::setSelection(const std::vector<std::shared_ptr<ControlImpl>>& controls) {
+  std::vector<std::shared_ptr<ControlImpl>> before;
+  for (const auto& weak : m_selection)
+    if (auto control = weak.lock(); control && control->node()) before.push_back(control);
   m_selection.assign(controls.begin(), controls.end());
+  auto component = m_component.lock();
+  auto vbe = component && component->project() ? component->project()->vbe() : nullptr;
+  if (vbe) {
+    auto contains = [](const std::vector<std::shared_ptr<ControlImpl>>& list,
+                       const std::shared_ptr<ControlImpl>& c) {
+      return std::find(list.begin(), list.end(), c) != list.end();
+    };
+    for (const auto& control : before)
+      if (!contains(controls, control)) vbe->fireSelectedControl(control, false);
+    for (const auto& control : controls)
+      if (!contains(before, control)) vbe->fireSelectedControl(control, true);
+  }
   controlChanged.fire(nullptr);
 }
 

@@ -32,6 +32,9 @@ class ControlImpl;
 // ---------------------------------------------------------------------------------------------------
 // Windows and panes
 
+/// The kind of file a component is kept in, as file events report it.
+ide::FileType fileTypeOf(ide::ComponentType type);
+
 class WindowImpl final : public ide::Window, public std::enable_shared_from_this<WindowImpl> {
  public:
   WindowImpl(const std::shared_ptr<VbeImpl>& vbe, ide::WindowType type, std::function<QString()> caption,
@@ -284,6 +287,7 @@ class ProjectImpl final : public ide::VBProject,
   int indexOf(const ComponentImpl& component) const;
   /// Gives new components a file in `dir`, named after them.
   void assignFilePaths(const QString& dir);
+  void writeProjectFile();
 
   std::weak_ptr<VbeImpl> m_vbe;
   QString m_fileName;

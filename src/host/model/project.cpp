@@ -354,11 +354,16 @@ void ProjectImpl::componentEntryChanged(ComponentImpl& component, const QString&
   const int index = indexOf(component);
   if (index < 0) return;
   const ProjectComponent entry = m_file->components()[static_cast<size_t>(index)];
-  if (entry.kind == ComponentKind::Module || entry.kind == ComponentKind::Class)
-    if (entry.name != component.Name()) m_file->setComponentName(index, component.Name());
+  if ((entry.kind == ComponentKind::Module || entry.kind == ComponentKind::Class) &&
+      entry.name != component.Name()) {
+    m_file->setComponentName(index, component.Name());
+    m_changed = true;
+  }
   const QString path = componentEntryPath(component);
-  if (!path.isEmpty() && entry.path != path) m_file->setComponentPath(index, path);
-  m_changed = true;
+  if (!path.isEmpty() && entry.path != path) {
+    m_file->setComponentPath(index, path);
+    m_changed = true;
+  }
 }
 
 void ProjectImpl::addComponentEntry(ComponentImpl& component) {
@@ -409,8 +414,12 @@ std::shared_ptr<ComponentImpl> ProjectImpl::addExistingFile(const QString& path,
                QStringLiteral("%1: %2 is the name of another component").arg(path, component->Name()));
   m_components.push_back(component);
   addComponentEntry(*component);
-  if (announce)
-    if (auto vbe = m_vbe.lock()) vbe->fireComponentAdded(component);
+  if (announce) {
+    if (auto vbe = m_vbe.lock()) {
+      vbe->fireFileAdded(shared_from_this(), fileTypeOf(component->Type()), path);
+      vbe->fireComponentAdded(component);
+    }
+  }
   return component;
 }
 
@@ -427,6 +436,9 @@ void ProjectImpl::Remove(const ide::Ref<ide::VBComponent>& component) {
   m_components.erase(m_components.begin() + now);
   impl->detach();
   m_changed = true;
+  if (!impl->filePath().isEmpty())
+    if (auto vbe = m_vbe.lock())
+      vbe->fireFileRemoved(shared_from_this(), fileTypeOf(impl->Type()), impl->filePath());
 }
 
 void ProjectImpl::assignFilePaths(const QString& dir) {
@@ -455,10 +467,7 @@ void ProjectImpl::save() {
     component->save();
     componentEntryChanged(*component, component->Name());
   }
-  if (m_changed) {
-    writeFileAtomically(m_fileName, m_file->toBytes(m_fileName));
-    m_changed = false;
-  }
+  if (m_changed) writeProjectFile();
 }
 
 void ProjectImpl::SaveAs(const QString& fileName) {
@@ -474,8 +483,7 @@ void ProjectImpl::SaveAs(const QString& fileName) {
       component->save();
       componentEntryChanged(*component, component->Name());
     }
-    writeFileAtomically(m_fileName, m_file->toBytes(m_fileName));
-    m_changed = false;
+    writeProjectFile();
   } catch (...) {
     m_fileName = oldName;
     *m_file = oldFile;
@@ -484,6 +492,18 @@ void ProjectImpl::SaveAs(const QString& fileName) {
   if (oldName != target)
     if (auto vbe = m_vbe.lock())
       vbe->fireFileNameChanged(shared_from_this(), ide::FileType::Project, target, oldName);
+}
+
+void ProjectImpl::writeProjectFile() {
+  auto vbe = m_vbe.lock();
+  try {
+    writeFileAtomically(m_fileName, m_file->toBytes(m_fileName));
+  } catch (...) {
+    if (vbe) vbe->fireFileWritten(shared_from_this(), ide::FileType::Project, m_fileName, 2);
+    throw;
+  }
+  m_changed = false;
+  if (vbe) vbe->fireFileWritten(shared_from_this(), ide::FileType::Project, m_fileName, 0);
 }
 
 void ProjectImpl::detach() {

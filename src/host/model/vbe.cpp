@@ -518,11 +518,14 @@ void VbeImpl::removeProject(const std::shared_ptr<ProjectImpl>& project) {
   if (std::find(m_projects.begin(), m_projects.end(), project) == m_projects.end())
     ide::raise(ide::err::InvalidProcedureCall);
   fireProjectRemoved(project);
+  const bool wasDirty = !project->Saved();
   for (const auto& component : project->components())
     component->closeWindows();
   std::erase(m_projects, project);
   if (auto selected = m_selectedComponent.lock(); selected && selected->project() == project)
     m_selectedComponent.reset();
+  if (!project->FileName().isEmpty())
+    fireFileClosed(project, ide::FileType::Project, project->FileName(), wasDirty);
   project->detach();
   if (m_activeProject.lock() == project || m_activeProject.expired()) {
     m_activeProject.reset();
@@ -607,6 +610,44 @@ void VbeImpl::fireFileNameChanged(const std::shared_ptr<ProjectImpl>& project, i
                                   const QString& newName, const QString& oldName) {
   m_events->files->AfterChangeFileName.fire(project, type, newName, oldName);
   project->fileEvents->AfterChangeFileName.fire(project, type, newName, oldName);
+}
+
+void VbeImpl::fireSelectedControl(const std::shared_ptr<ControlImpl>& control, bool added) {
+  auto form = control->form();
+  auto project = form && form->component() ? form->component()->project() : nullptr;
+  auto fire = [&](ide::SelectedControlsEventSource& source) {
+    if (added)
+      source.ItemAdded.fire(control);
+    else
+      source.ItemRemoved.fire(control);
+  };
+  fire(*m_events->selectedControls);
+  if (project) fire(*project->selectedControlEvents);
+  if (form) fire(*m_events->formSelectedControlEvents(form.get()));
+}
+
+void VbeImpl::fireFileAdded(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                            const QString& fileName) {
+  m_events->files->AfterAddFile.fire(project, type, fileName);
+  project->fileEvents->AfterAddFile.fire(project, type, fileName);
+}
+
+void VbeImpl::fireFileRemoved(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                              const QString& fileName) {
+  m_events->files->AfterRemoveFile.fire(project, type, fileName);
+  project->fileEvents->AfterRemoveFile.fire(project, type, fileName);
+}
+
+void VbeImpl::fireFileClosed(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                             const QString& fileName, bool wasDirty) {
+  m_events->files->AfterCloseFile.fire(project, type, fileName, wasDirty);
+  project->fileEvents->AfterCloseFile.fire(project, type, fileName, wasDirty);
+}
+
+void VbeImpl::fireFileWritten(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                              const QString& fileName, int result) {
+  m_events->files->AfterWriteFile.fire(project, type, fileName, result);
+  project->fileEvents->AfterWriteFile.fire(project, type, fileName, result);
 }
 
 void VbeImpl::fireControlAdded(const std::shared_ptr<ControlImpl>& control) {

@@ -116,6 +116,16 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   void fireControlAdded(const std::shared_ptr<ControlImpl>& control);
   void fireControlRemoved(const std::shared_ptr<ControlImpl>& control);
   void fireControlRenamed(const std::shared_ptr<ControlImpl>& control, const QString& oldName, int oldIndex);
+  void fireSelectedControl(const std::shared_ptr<ControlImpl>& control, bool added);
+  void fireFileAdded(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                     const QString& fileName);
+  void fireFileRemoved(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                       const QString& fileName);
+  void fireFileClosed(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                      const QString& fileName, bool wasDirty);
+  /// result: 0 written, 2 failed.
+  void fireFileWritten(const std::shared_ptr<ProjectImpl>& project, ide::FileType type,
+                       const QString& fileName, int result);
 
  private:
   explicit VbeImpl(IdeOptions& options);
