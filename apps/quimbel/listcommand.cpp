@@ -10,33 +10,6 @@
 namespace cli {
 namespace {
 
-QString typeName(ide::ComponentType type) {
-  switch (type) {
-    case ide::ComponentType::StdModule:
-      return QStringLiteral("Module");
-    case ide::ComponentType::ClassModule:
-      return QStringLiteral("Class");
-    case ide::ComponentType::VBForm:
-      return QStringLiteral("Form");
-    case ide::ComponentType::VBMDIForm:
-      return QStringLiteral("MDIForm");
-    case ide::ComponentType::UserControl:
-      return QStringLiteral("UserControl");
-    case ide::ComponentType::PropPage:
-      return QStringLiteral("PropertyPage");
-    case ide::ComponentType::DocObject:
-      return QStringLiteral("UserDocument");
-    case ide::ComponentType::ActiveXDesigner:
-    case ide::ComponentType::MSForm:
-      return QStringLiteral("Designer");
-    case ide::ComponentType::ResFile:
-      return QStringLiteral("ResFile");
-    case ide::ComponentType::RelatedDocument:
-      return QStringLiteral("RelatedDocument");
-  }
-  return QStringLiteral("Component");
-}
-
 QString projectTypeName(ide::ProjectType type) {
   switch (type) {
     case ide::ProjectType::ActiveXExe:
@@ -132,7 +105,8 @@ int runList(const ListOptions& options) {
         }
         continue;
       }
-      printLine(QStringLiteral("  %1 %2  %3").arg(typeName(component->Type()), component->Name(), path));
+      printLine(QStringLiteral("  %1 %2  %3")
+                    .arg(host::componentTypeName(component->Type()), component->Name(), path));
       if (!module) continue;
       auto& text = module->text();
       printLine(QStringLiteral("    %1 lines, declarations 1-%2")

@@ -51,6 +51,33 @@ QString newComponentText(ide::ComponentType type, const QString& name) {
 
 }  // namespace
 
+QString componentTypeName(ide::ComponentType type) {
+  switch (type) {
+    case ide::ComponentType::StdModule:
+      return QStringLiteral("Module");
+    case ide::ComponentType::ClassModule:
+      return QStringLiteral("Class");
+    case ide::ComponentType::VBForm:
+      return QStringLiteral("Form");
+    case ide::ComponentType::VBMDIForm:
+      return QStringLiteral("MDIForm");
+    case ide::ComponentType::UserControl:
+      return QStringLiteral("UserControl");
+    case ide::ComponentType::PropPage:
+      return QStringLiteral("PropertyPage");
+    case ide::ComponentType::DocObject:
+      return QStringLiteral("UserDocument");
+    case ide::ComponentType::ActiveXDesigner:
+    case ide::ComponentType::MSForm:
+      return QStringLiteral("Designer");
+    case ide::ComponentType::ResFile:
+      return QStringLiteral("ResFile");
+    case ide::ComponentType::RelatedDocument:
+      return QStringLiteral("RelatedDocument");
+  }
+  return QStringLiteral("Component");
+}
+
 ide::FileType fileTypeOf(ide::ComponentType type) {
   switch (type) {
     case ide::ComponentType::VBForm:
@@ -228,22 +255,6 @@ std::shared_ptr<FormImpl> ComponentImpl::form() {
   return m_form;
 }
 
-QString ComponentImpl::designerKind() const {
-  switch (m_type) {
-    case ide::ComponentType::VBForm:
-    case ide::ComponentType::VBMDIForm:
-      return QStringLiteral("Form");
-    case ide::ComponentType::UserControl:
-      return QStringLiteral("UserControl");
-    case ide::ComponentType::PropPage:
-      return QStringLiteral("PropertyPage");
-    case ide::ComponentType::DocObject:
-      return QStringLiteral("UserDocument");
-    default:
-      return QStringLiteral("Designer");
-  }
-}
-
 std::shared_ptr<WindowImpl> ComponentImpl::designerWindow() {
   if (!m_form) return nullptr;
   if (!m_designerWindow) {
@@ -255,8 +266,9 @@ std::shared_ptr<WindowImpl> ComponentImpl::designerWindow() {
         [weak] {
           auto c = weak.lock();
           auto p = c ? c->project() : nullptr;
-          return c && p ? QStringLiteral("%1 - %2 (%3)").arg(p->Name(), c->Name(), c->designerKind())
-                        : QString();
+          return c && p
+                     ? QStringLiteral("%1 - %2 (%3)").arg(p->Name(), c->Name(), componentTypeName(c->Type()))
+                     : QString();
         },
         QStringLiteral("DesignerWindow"));
     m_designerWindow->setComponent(shared_from_this());

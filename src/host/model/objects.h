@@ -35,6 +35,10 @@ class ControlImpl;
 /// The kind of file a component is kept in, as file events report it.
 ide::FileType fileTypeOf(ide::ComponentType type);
 
+/// The IDE's name of a component type ("Module", "Class", "Form", "UserControl" ...): the prefix of new
+/// components' names, and what a designer window's caption ends with.
+QString componentTypeName(ide::ComponentType type);
+
 class WindowImpl final : public ide::Window, public std::enable_shared_from_this<WindowImpl> {
  public:
   WindowImpl(const std::shared_ptr<VbeImpl>& vbe, ide::WindowType type, std::function<QString()> caption,
@@ -199,8 +203,6 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   QString binaryFilePath() const;
   bool hasCode() const { return m_module != nullptr; }
   bool hasDesigner() const { return m_source.form.has_value(); }
-  /// The part of the caption after the name: "(Code)", "(Form)", "(UserControl)" ...
-  QString designerKind() const;
   void markChanged() { m_changed = true; }
   /// Left the IDE: removed from its project or its project closed.
   void detach();

@@ -94,25 +94,6 @@ QString fileSuffixOf(ide::ComponentType type) {
   }
 }
 
-QString namePrefixOf(ide::ComponentType type) {
-  switch (type) {
-    case ide::ComponentType::ClassModule:
-      return QStringLiteral("Class");
-    case ide::ComponentType::VBForm:
-      return QStringLiteral("Form");
-    case ide::ComponentType::VBMDIForm:
-      return QStringLiteral("MDIForm");
-    case ide::ComponentType::UserControl:
-      return QStringLiteral("UserControl");
-    case ide::ComponentType::PropPage:
-      return QStringLiteral("PropertyPage");
-    case ide::ComponentType::DocObject:
-      return QStringLiteral("UserDocument");
-    default:
-      return QStringLiteral("Module");
-  }
-}
-
 ide::ProjectType projectTypeOf(const QString& value) {
   if (value.compare(QLatin1StringView("OleDll"), Qt::CaseInsensitive) == 0)
     return ide::ProjectType::ActiveXDll;
@@ -389,7 +370,7 @@ ide::Ref<ide::VBComponent> ProjectImpl::Add(ide::ComponentType type) {
       ide::raise(ide::err::InvalidProcedureCall);
   }
   auto component = std::make_shared<ComponentImpl>(shared_from_this(), type, QString());
-  component->create(freeComponentName(namePrefixOf(type)));
+  component->create(freeComponentName(componentTypeName(type)));
   m_components.push_back(component);
   addComponentEntry(*component);
   if (auto vbe = m_vbe.lock()) vbe->fireComponentAdded(component);
