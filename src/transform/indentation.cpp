@@ -87,9 +87,7 @@ Action classifyBodyLine(QStringView t) {
   if (t.isEmpty()) return Action::Ordinary;
   switch (t.front().unicode()) {
     case u'E':
-      if (t.startsWith(u"End Sub") || t.startsWith(u"End Property") || t.startsWith(u"End Function")) {
-        return Action::ProcedureEnd;
-      }
+      if (isProcedureEnd(t)) return Action::ProcedureEnd;
       if (t.startsWith(u"End If") || t.startsWith(u"End With")) return Action::Close;
       if (t.startsWith(u"End Select")) return Action::EndSelect;
       if (t.startsWith(u"ElseIf ")) return Action::ElseIf;

@@ -66,6 +66,13 @@ inline bool isContinued(QStringView line) noexcept {
   return endsWithContinuation(trimmedView(line));
 }
 
+/// True when the trimmed line is a procedure's End line (End Sub, End Function, End Property), which
+/// no rule numbers or indents and where every procedure walk stops.
+inline bool isProcedureEnd(QStringView trimmed) noexcept {
+  return trimmed.startsWith(u"End Sub") || trimmed.startsWith(u"End Function") ||
+         trimmed.startsWith(u"End Property");
+}
+
 /// A plain decimal number, blanks around it ignored: an optional sign directly followed by digits with at
 /// most one decimal point and at least one digit ("10", " -5 ", "+1.5", ".5", "10."). Exponents, hexadecimal
 /// and octal forms, thousands separators, currency signs and parentheses are not numbers: the rules only need

@@ -59,10 +59,6 @@ bool isUnnumberedStatement(QStringView t) {
                      [t](QStringView p) { return t.startsWith(p); });
 }
 
-bool isProcedureEnd(QStringView t) {
-  return t.startsWith(u"End Sub") || t.startsWith(u"End Function") || t.startsWith(u"End Property");
-}
-
 qint32 nextNumber(qint32 runningNumber, qint32 interval) {
   const qint64 next = qint64(runningNumber) + interval;
   if (next > std::numeric_limits<qint32>::max() || next < std::numeric_limits<qint32>::min()) {

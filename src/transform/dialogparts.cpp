@@ -1,0 +1,81 @@
+// SPDX-License-Identifier: MIT
+#include "transform/dialogparts.h"
+
+#include "transform/linetext.h"
+
+#include <QFocusEvent>
+#include <QKeyEvent>
+#include <QProgressBar>
+#include <QRegularExpressionValidator>
+#include <QTimer>
+
+#include <cmath>
+#include <limits>
+
+namespace transform {
+
+NumberBox::NumberBox(QWidget* parent) : QLineEdit(parent) {
+  // The validator stops typed letters; pasting is refused as a whole below, as the IDE's boxes do.
+  setValidator(new QRegularExpressionValidator(QRegularExpression(QStringLiteral("[0-9]*")), this));
+  setContextMenuPolicy(Qt::NoContextMenu);
+  setAcceptDrops(false);
+  setDragEnabled(false);
+}
+
+void NumberBox::keyPressEvent(QKeyEvent* event) {
+  if (event->matches(QKeySequence::Paste) ||
+      (event->key() == Qt::Key_Insert && event->modifiers() == Qt::ShiftModifier) ||
+      (event->key() == Qt::Key_V && event->modifiers() == Qt::ControlModifier)) {
+    event->accept();
+    return;
+  }
+  QLineEdit::keyPressEvent(event);
+}
+
+void NumberBox::focusInEvent(QFocusEvent* event) {
+  QLineEdit::focusInEvent(event);
+  selectAll();
+  // A mouse click that gave the focus places the caret after this event; select again once it has.
+  if (event->reason() == Qt::MouseFocusReason) QTimer::singleShot(0, this, &QLineEdit::selectAll);
+}
+
+int ProgressBarSink::minimum() const {
+  return m_bar.minimum();
+}
+void ProgressBarSink::setMinimum(int minimum) {
+  m_bar.setMinimum(minimum);
+}
+int ProgressBarSink::maximum() const {
+  return m_bar.maximum();
+}
+void ProgressBarSink::setMaximum(int maximum) {
+  m_bar.setMaximum(maximum);
+}
+int ProgressBarSink::value() const {
+  // An empty QProgressBar reports minimum - 1; the walks count from the minimum.
+  return std::max(m_bar.value(), m_bar.minimum());
+}
+void ProgressBarSink::setValue(int value) {
+  m_bar.setValue(value);
+}
+bool ProgressBarSink::isVisible() const {
+  return !m_bar.isHidden();
+}
+void ProgressBarSink::setVisible(bool visible) {
+  m_bar.setVisible(visible);
+  m_bar.repaint();
+}
+
+std::optional<qint32> boxValue(const QString& text) {
+  const QString trimmed = text.trimmed();
+  if (!isNumeric(trimmed)) return std::nullopt;
+  bool ok = false;
+  const double value = trimmed.toDouble(&ok);
+  if (!ok) return std::nullopt;
+  const double whole = std::nearbyint(value);  // the default rounding mode takes halves to even
+  if (whole < std::numeric_limits<qint32>::min() || whole > std::numeric_limits<qint32>::max())
+    return std::nullopt;
+  return qint32(whole);
+}
+
+}  // namespace transform

@@ -1,0 +1,68 @@
+// SPDX-License-Identifier: MIT
+// Pieces the numbering and indentation dialogs share: the numbers-only edit box, the progress bar as a
+// progress sink, the busy cursor and the dialogs' reading of numbers.
+#pragma once
+
+#include "ide/platform.h"
+#include "transform/progress.h"
+
+#include <QLineEdit>
+
+#include <optional>
+
+class QProgressBar;
+
+namespace transform {
+
+/// An edit box that takes digits only: letters can be neither typed nor pasted (Ctrl+V, Shift+Insert,
+/// a context menu or a drop). Getting the focus selects the whole text, so a new value replaces the old.
+class NumberBox final : public QLineEdit {
+  Q_OBJECT
+
+ public:
+  explicit NumberBox(QWidget* parent = nullptr);
+
+ protected:
+  void keyPressEvent(QKeyEvent* event) override;
+  void focusInEvent(QFocusEvent* event) override;
+};
+
+/// A QProgressBar seen by the walks. Visibility is the bar's own (shown or hidden by the dialog's
+/// run), not whether the dialog is on screen.
+class ProgressBarSink final : public ProgressSink {
+ public:
+  explicit ProgressBarSink(QProgressBar& bar) : m_bar(bar) {}
+
+  int minimum() const override;
+  void setMinimum(int minimum) override;
+  int maximum() const override;
+  void setMaximum(int maximum) override;
+  int value() const override;
+  void setValue(int value) override;
+  bool isVisible() const override;
+  void setVisible(bool visible) override;
+
+ private:
+  QProgressBar& m_bar;
+};
+
+/// Shows the arrow-and-hourglass cursor while it lives.
+class BusyCursor {
+ public:
+  explicit BusyCursor(ide::UserInterface& ui)
+      : m_ui(ui), m_previous(ui.setCursor(ide::Cursor::ArrowHourglass)) {}
+  ~BusyCursor() { m_ui.setCursor(m_previous); }
+  BusyCursor(const BusyCursor&) = delete;
+  BusyCursor& operator=(const BusyCursor&) = delete;
+
+ private:
+  ide::UserInterface& m_ui;
+  ide::Cursor m_previous;
+};
+
+/// The 32-bit value of a box's text: a plain decimal number (blanks around it ignored) rounded to a
+/// whole number, halves to even. Nothing for an empty text, a text that is not a number or a value
+/// outside the 32-bit range.
+std::optional<qint32> boxValue(const QString& text);
+
+}  // namespace transform

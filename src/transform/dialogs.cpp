@@ -1,0 +1,38 @@
+// SPDX-License-Identifier: MIT
+#include "transform/dialogs.h"
+
+#include "common/strings.h"
+#include "transform/frmindenter.h"
+#include "transform/frmlinnumbers.h"
+
+#include <optional>
+
+namespace transform {
+
+namespace {
+
+// Without a parent of its own a dialog is shown over the IDE's window (none when the IDE runs headless).
+QWidget* ownerOf(ide::VBE& vbe, QWidget* parent) {
+  return parent ? parent : qobject_cast<QWidget*>(vbe.Platform().ui().dialogParent());
+}
+
+}  // namespace
+
+void showLineNumberingDialog(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings,
+                             QWidget* parent) {
+  frmLinNumbers dialog(vbe, settings, ownerOf(*vbe, parent));
+  dialog.exec();
+}
+
+void showIndentationDialog(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings, QWidget* parent) {
+  std::optional<frmIndenter> dialog;
+  try {
+    dialog.emplace(vbe, settings, ownerOf(*vbe, parent));
+  } catch (const std::exception&) {
+    vbe->Platform().ui().MsgBox(common::LoadResString(5127), ide::mb::Exclamation, common::title());
+    return;
+  }
+  dialog->exec();
+}
+
+}  // namespace transform

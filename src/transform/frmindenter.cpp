@@ -1,0 +1,226 @@
+// SPDX-License-Identifier: MIT
+// The indentation dialog.
+#include "transform/frmindenter.h"
+
+#include "common/strings.h"
+#include "transform/indentwalk.h"
+
+#include <QGroupBox>
+#include <QHBoxLayout>
+#include <QProgressBar>
+#include <QPushButton>
+#include <QRadioButton>
+#include <QVBoxLayout>
+
+namespace transform {
+
+namespace {
+
+// Message numbers of the dialog.
+constexpr int kInvalidSpaces = 5124;
+constexpr int kNoSpaces = 5125;
+constexpr int kRunFailed = 5126;
+
+// The numbering that number-and-indent applies when the indenter hands it the run.
+constexpr qint32 kOneCommandStart = 10000;
+constexpr qint32 kOneCommandInterval = 5;
+
+QString text(int id) {
+  return common::LoadResString(id);
+}
+
+}  // namespace
+
+frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, QWidget* parent)
+    : QDialog(parent),
+      m_vbe(std::move(vbe)),
+      m_settings(settings),
+      m_txtSpaces(new NumberBox(this)),
+      m_cmdIndent(new QPushButton(this)),
+      m_cmdCancel(new QPushButton(this)),
+      m_progBar(new QProgressBar(this)),
+      m_frIndent(new QGroupBox(this)),
+      m_frUse(new QGroupBox(this)),
+      m_bar(*m_progBar),
+      m_context(QStringLiteral("frmIndenter"), &m_vbe->Platform().loop(), &m_bar) {
+  setWindowTitle(common::title() + QStringLiteral(" - ") + text(5135));
+  m_txtSpaces->setObjectName(QStringLiteral("txtSpaces"));
+  m_cmdIndent->setObjectName(QStringLiteral("cmdIndent"));
+  m_cmdCancel->setObjectName(QStringLiteral("cmdCancel"));
+  m_progBar->setObjectName(QStringLiteral("ProgBar"));
+  m_frIndent->setObjectName(QStringLiteral("frIndent"));
+  m_frUse->setObjectName(QStringLiteral("frUse"));
+
+  m_cmdCancel->setText(text(5025));
+  m_cmdIndent->setText(text(5026));
+  m_frIndent->setTitle(text(5016));
+  m_frUse->setTitle(text(5017));
+  auto* scopes = new QVBoxLayout(m_frIndent);
+  for (int i = 0; i < 3; ++i) {
+    m_opIndent[size_t(i)] = new QRadioButton(text(5018 + i), m_frIndent);
+    m_opIndent[size_t(i)]->setObjectName(QStringLiteral("opIndent%1").arg(i));
+    scopes->addWidget(m_opIndent[size_t(i)]);
+  }
+  auto* use = new QVBoxLayout(m_frUse);
+  for (int i = 0; i < 2; ++i) {
+    m_opSpaces[size_t(i)] = new QRadioButton(text(5021 + i), m_frUse);
+    m_opSpaces[size_t(i)]->setObjectName(QStringLiteral("opSpaces%1").arg(i));
+    connect(m_opSpaces[size_t(i)], &QRadioButton::clicked, this, [this, i] { opSpaces_Click(i); });
+  }
+  use->addWidget(m_opSpaces[0]);
+  auto* spacesRow = new QHBoxLayout;
+  spacesRow->addWidget(m_opSpaces[1]);
+  spacesRow->addWidget(m_txtSpaces);
+  use->addLayout(spacesRow);
+  for (QPushButton* button : {m_cmdIndent, m_cmdCancel})
+    button->setAutoDefault(false);
+
+  auto* buttons = new QVBoxLayout;
+  buttons->addWidget(m_cmdIndent);
+  buttons->addWidget(m_cmdCancel);
+  buttons->addStretch();
+  auto* frames = new QHBoxLayout;
+  frames->addWidget(m_frIndent);
+  frames->addWidget(m_frUse);
+  auto* top = new QHBoxLayout;
+  top->addLayout(frames, 1);
+  top->addLayout(buttons);
+  auto* layout = new QVBoxLayout(this);
+  layout->addLayout(top);
+  layout->addWidget(m_progBar);
+  m_progBar->setTextVisible(false);
+  m_progBar->hide();
+
+  connect(m_cmdIndent, &QPushButton::clicked, this, &frmIndenter::cmdIndent_Click);
+  connect(m_cmdCancel, &QPushButton::clicked, this, &frmIndenter::cmdCancel_Click);
+
+  m_context.onFailure = [this](const WalkFailure& failure) {
+    m_vbe->Platform().ui().MsgBox(text(failure.messageId), ide::mb::Exclamation, common::title());
+  };
+
+  m_txtSpaces->setText(m_settings.value(common::setting::Indentation).trimmed());
+  const QString useOption = m_settings.value(common::setting::UseOption).trimmed();
+  const bool spaces = !useOption.isEmpty() && useOption != u"0";  // an empty value counts as tabs
+  m_opSpaces[spaces ? 1 : 0]->setChecked(true);
+  m_opIndent[2]->setChecked(true);
+}
+
+frmIndenter::~frmIndenter() = default;
+
+PROG_MODE frmIndenter::scope() const {
+  if (m_opIndent[0]->isChecked()) return PROG_PROJECT;
+  if (m_opIndent[1]->isChecked()) return PROG_MODULE;
+  return PROG_PROCEDURE;
+}
+
+bool frmIndenter::spaceMode() const {
+  return m_opSpaces[1]->isChecked();
+}
+
+void frmIndenter::opSpaces_Click(int index) {
+  if (index == 1 && isVisible()) m_txtSpaces->setFocus();
+}
+
+void frmIndenter::cmdIndent_Click() {
+  if (m_running) return;
+  ide::UserInterface& ui = m_vbe->Platform().ui();
+  qint32 unit = 1;
+  if (spaceMode()) {
+    const QString spaces = m_txtSpaces->text().trimmed();
+    const auto value = boxValue(spaces);
+    if (spaces.isEmpty() || !value || *value <= 0) {
+      ui.MsgBox(text(spaces.isEmpty() ? kNoSpaces : kInvalidSpaces), ide::mb::Information, common::title());
+      m_txtSpaces->setFocus();
+      return;
+    }
+    unit = *value;
+  }
+
+  BusyCursor cursor(ui);
+  m_context.reset();
+  m_cmdIndent->setEnabled(false);
+  m_cmdCancel->setText(text(5024));
+  m_cmdCancel->repaint();
+  m_running = true;
+  m_closeAfterRun = false;
+
+  bool completed = false;
+  try {
+    walk(scope(), unit);
+    completed = true;
+  } catch (const std::exception&) {
+    ui.MsgBox(text(kRunFailed), ide::mb::Information, common::title());
+  }
+  m_running = false;
+  m_numIndentError.disconnect();
+  m_numIndent.reset();
+  if (completed || m_closeAfterRun) {
+    close();
+    return;
+  }
+  // A run that failed as a whole leaves the dialog open, so that another scope can be chosen.
+  m_progBar->hide();
+  m_cmdIndent->setEnabled(true);
+  m_cmdCancel->setText(text(5025));
+}
+
+void frmIndenter::walk(PROG_MODE scope, qint32 unit) {
+  if (m_settings.flag(common::setting::OneCommandNumIndent)) {
+    m_numIndent = std::make_unique<CNumIndent>(m_vbe);
+    m_numIndentError = m_numIndent->Error.connect([this](const QString& strError) {
+      m_vbe->Platform().ui().MsgBox(strError, ide::mb::OKOnly, common::title());
+      m_context.Cancel();
+    });
+    m_numIndent->DoIt(scope, &m_bar, kOneCommandStart, kOneCommandInterval, spaceMode(), unit, true);
+    return;
+  }
+
+  CountUnits(m_context, *m_vbe, scope, ProgressUnit::Lines);
+  IndentationWalk indentation(m_context, spaceMode() ? IndentMode::Spaces : IndentMode::Tabs, unit);
+  switch (scope) {
+    case PROG_PROJECT:
+      indentation.IndentProject(activeProject(*m_vbe));
+      break;
+    case PROG_MODULE:
+      indentation.IndentModule(selectedComponent(*m_vbe)->CodeModule());
+      break;
+    default:
+      indentation.IndentCurrentProcedure(*m_vbe);
+      break;
+  }
+}
+
+void frmIndenter::cmdCancel_Click() {
+  if (m_numIndent) m_numIndent->Cancel();
+  if (m_running) {
+    m_context.Cancel();
+    m_cmdCancel->setText(text(5025));
+    return;
+  }
+  close();
+}
+
+void frmIndenter::done(int result) {
+  if (m_running) {
+    // Closing the window during a run cancels it; the dialog closes once the walk has ended.
+    if (m_numIndent) m_numIndent->Cancel();
+    m_context.Cancel();
+    m_closeAfterRun = true;
+    return;
+  }
+  Form_Unload();
+  QDialog::done(result);
+}
+
+void frmIndenter::Form_Unload() {
+  if (!spaceMode()) {
+    m_settings.setValue(common::setting::UseOption, QStringLiteral("0"));
+    return;
+  }
+  m_settings.setValue(common::setting::UseOption, QStringLiteral("1"));
+  if (const auto spaces = boxValue(m_txtSpaces->text())) {
+    m_settings.setValue(common::setting::Indentation, QString::number(*spaces));
+  }
+}
+
+}  // namespace transform

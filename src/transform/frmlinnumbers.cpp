@@ -1,0 +1,282 @@
+// SPDX-License-Identifier: MIT
+// The line-numbering dialog.
+#include "transform/frmlinnumbers.h"
+
+#include "common/strings.h"
+#include "transform/numberwalk.h"
+
+#include <QGridLayout>
+#include <QGroupBox>
+#include <QHBoxLayout>
+#include <QLabel>
+#include <QProgressBar>
+#include <QPushButton>
+#include <QRadioButton>
+#include <QVBoxLayout>
+
+namespace transform {
+
+namespace {
+
+// How long the finished run stays on screen before the dialog closes itself.
+constexpr int kCloseDelayMs = 1000;
+
+// Message numbers of the dialog.
+constexpr int kStartNotNumeric = 5119;
+constexpr int kIntervalNotNumeric = 5120;
+
+QString text(int id) {
+  return common::LoadResString(id);
+}
+
+// A setting's number, or the key's default where the stored text is not a 32-bit number.
+std::pair<QString, qint32> storedNumber(const common::SettingsStore& settings,
+                                        const common::setting::Key& key) {
+  const QString stored = settings.value(key).trimmed();
+  if (const auto value = boxValue(stored)) return {stored, *value};
+  const QString fallback = QString::fromLatin1(key.defaultValue);
+  return {fallback, *boxValue(fallback)};
+}
+
+}  // namespace
+
+frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, QWidget* parent)
+    : QDialog(parent),
+      m_vbe(std::move(vbe)),
+      m_settings(settings),
+      m_txtInitial(new NumberBox(this)),
+      m_txtInterval(new NumberBox(this)),
+      m_cmdAdd(new QPushButton(this)),
+      m_cmdRemove(new QPushButton(this)),
+      m_cmdCancel(new QPushButton(this)),
+      m_progBar(new QProgressBar(this)),
+      m_frOptions(new QGroupBox(this)),
+      m_lblStartNum(new QLabel(this)),
+      m_lblInterval(new QLabel(this)),
+      m_bar(*m_progBar),
+      m_context(QStringLiteral("frmLinNumbers"), &m_vbe->Platform().loop(), &m_bar) {
+  setWindowTitle(common::title() + QStringLiteral(" - ") + text(5036));
+  m_txtInitial->setObjectName(QStringLiteral("txtInitial"));
+  m_txtInterval->setObjectName(QStringLiteral("txtInterval"));
+  m_cmdAdd->setObjectName(QStringLiteral("cmdAdd"));
+  m_cmdRemove->setObjectName(QStringLiteral("cmdRemove"));
+  m_cmdCancel->setObjectName(QStringLiteral("cmdCancel"));
+  m_progBar->setObjectName(QStringLiteral("ProgBar"));
+  m_frOptions->setObjectName(QStringLiteral("frOptions"));
+  m_lblStartNum->setObjectName(QStringLiteral("lblStartNum"));
+  m_lblInterval->setObjectName(QStringLiteral("lblInterval"));
+
+  m_cmdAdd->setText(text(5033));
+  m_cmdCancel->setText(text(5161));
+  m_cmdRemove->setText(text(5034));
+  m_frOptions->setTitle(text(5027));
+  m_lblInterval->setText(text(5032));
+  m_lblStartNum->setText(text(5031));
+  m_lblStartNum->setBuddy(m_txtInitial);
+  m_lblInterval->setBuddy(m_txtInterval);
+  auto* options = new QVBoxLayout(m_frOptions);
+  for (int i = 0; i < 3; ++i) {
+    m_opNumbers[size_t(i)] = new QRadioButton(text(5028 + i), m_frOptions);
+    m_opNumbers[size_t(i)]->setObjectName(QStringLiteral("opNumbers%1").arg(i));
+    options->addWidget(m_opNumbers[size_t(i)]);
+  }
+  for (QPushButton* button : {m_cmdAdd, m_cmdRemove, m_cmdCancel})
+    button->setAutoDefault(false);
+
+  auto* boxes = new QGridLayout;
+  boxes->addWidget(m_lblStartNum, 0, 0);
+  boxes->addWidget(m_txtInitial, 0, 1);
+  boxes->addWidget(m_lblInterval, 1, 0);
+  boxes->addWidget(m_txtInterval, 1, 1);
+  auto* buttons = new QVBoxLayout;
+  buttons->addWidget(m_cmdAdd);
+  buttons->addWidget(m_cmdRemove);
+  buttons->addWidget(m_cmdCancel);
+  buttons->addStretch();
+  auto* left = new QVBoxLayout;
+  left->addWidget(m_frOptions);
+  left->addLayout(boxes);
+  auto* top = new QHBoxLayout;
+  top->addLayout(left, 1);
+  top->addLayout(buttons);
+  auto* layout = new QVBoxLayout(this);
+  layout->addLayout(top);
+  layout->addWidget(m_progBar);
+  m_progBar->setTextVisible(false);
+  m_progBar->hide();
+
+  connect(m_cmdAdd, &QPushButton::clicked, this, &frmLinNumbers::cmdAdd_Click);
+  connect(m_cmdRemove, &QPushButton::clicked, this, &frmLinNumbers::cmdRemove_Click);
+  connect(m_cmdCancel, &QPushButton::clicked, this, &frmLinNumbers::cmdCancel_Click);
+
+  // Walks report their failure with the message of the walk that caught it; lines they pass over are
+  // not reported.
+  m_context.onFailure = [this](const WalkFailure& failure) {
+    m_vbe->Platform().ui().MsgBox(text(failure.messageId), ide::mb::Exclamation, common::title());
+  };
+
+  const auto [startText, start] = storedNumber(m_settings, common::setting::InitialNumber);
+  const auto [intervalText, interval] = storedNumber(m_settings, common::setting::Interval);
+  m_txtInitial->setText(startText);
+  m_txtInterval->setText(intervalText);
+  m_startNumber = start;
+  m_interval = interval;
+  m_opNumbers[2]->setChecked(true);
+}
+
+frmLinNumbers::~frmLinNumbers() {
+  killCloseTimer();
+}
+
+PROG_MODE frmLinNumbers::scope() const {
+  if (m_opNumbers[0]->isChecked()) return PROG_PROJECT;
+  if (m_opNumbers[1]->isChecked()) return PROG_MODULE;
+  return PROG_PROCEDURE;
+}
+
+bool frmLinNumbers::readBox(QLineEdit* box, qint32& field, int messageId) {
+  if (box->text().trimmed().isEmpty()) return true;  // an empty box keeps the value last used
+  const auto value = boxValue(box->text());
+  if (!value) {
+    m_vbe->Platform().ui().MsgBox(text(messageId), ide::mb::Exclamation, common::title());
+    box->setFocus();
+    return false;
+  }
+  field = *value;
+  return true;
+}
+
+void frmLinNumbers::run(bool add) {
+  if (m_running || m_closeTimer) return;
+  if (!readBox(m_txtInitial, m_startNumber, kStartNotNumeric)) return;
+  if (!readBox(m_txtInterval, m_interval, kIntervalNotNumeric)) return;
+
+  ide::Platform& platform = m_vbe->Platform();
+  m_cursor.emplace(platform.ui());
+  m_cmdAdd->setEnabled(false);
+  m_cmdRemove->setEnabled(false);
+  m_cmdCancel->setText(text(5035));
+  m_cmdCancel->repaint();
+  m_running = true;
+  m_closeAfterRun = false;
+  m_context.reset();
+  platform.loop().DoEvents();
+
+  bool completed = false;
+  try {
+    walk(scope(), add);
+    completed = true;
+  } catch (const std::exception&) {
+    // What reaches the button (no active project, a related document chosen as the module) is not
+    // shown: the dialog simply goes back to idle.
+  }
+  m_running = false;
+  m_numIndentError.disconnect();
+  m_numIndent.reset();
+
+  if (!completed) {
+    backToIdle();
+    if (m_closeAfterRun) close();
+    return;
+  }
+  if (m_closeAfterRun || m_context.cancelled()) {
+    backToIdle();
+    close();
+    return;
+  }
+  // The full bar stays a moment before the dialog closes; the IDE's loop keeps running meanwhile.
+  m_closeTimer = platform.loop().SetTimer(kCloseDelayMs, [this] { closeAfterWait(); });
+  if (!m_closeTimer) closeAfterWait();
+}
+
+void frmLinNumbers::walk(PROG_MODE scope, bool add) {
+  if (m_settings.flag(common::setting::OneCommandNumIndent)) {
+    m_numIndent = std::make_unique<CNumIndent>(m_vbe);
+    m_numIndentError = m_numIndent->Error.connect([this](const QString& strError) {
+      m_vbe->Platform().ui().MsgBox(strError, ide::mb::OKOnly, common::title());
+      m_context.Cancel();
+    });
+    m_numIndent->DoIt(scope, &m_bar, m_startNumber, m_interval, false, 1, add);
+    return;
+  }
+
+  CountUnits(m_context, *m_vbe, scope, ProgressUnit::Members);
+  NumberingWalk numbering(m_context, m_startNumber, m_interval);
+  switch (scope) {
+    case PROG_PROJECT:
+      numbering.NumberProject(activeProject(*m_vbe), add);
+      break;
+    case PROG_MODULE: {
+      auto component = selectedComponent(*m_vbe);
+      // A related document has no code: the run stops without a change or a message.
+      if (component->Type() == ide::ComponentType::RelatedDocument) ide::raise(ide::err::CannotEdit);
+      numbering.NumberModule(component->CodeModule(), add);
+      break;
+    }
+    default:
+      numbering.NumberCurrentProcedure(*m_vbe, add);
+      break;
+  }
+}
+
+void frmLinNumbers::cmdCancel_Click() {
+  if (m_numIndent) m_numIndent->Cancel();
+  if (!m_progBar->isHidden()) {
+    // A run is going on, or its full bar is showing before the close: end it and close the dialog.
+    m_context.Cancel();
+    if (m_running) {
+      m_closeAfterRun = true;
+      return;
+    }
+  }
+  close();
+}
+
+void frmLinNumbers::closeAfterWait() {
+  killCloseTimer();
+  backToIdle();
+  close();
+}
+
+void frmLinNumbers::backToIdle() {
+  m_progBar->hide();
+  m_cmdRemove->setEnabled(true);
+  m_cmdAdd->setEnabled(true);
+  m_cmdCancel->setText(text(5161));
+  m_cmdCancel->repaint();
+  m_cursor.reset();
+}
+
+void frmLinNumbers::killCloseTimer() {
+  if (!m_closeTimer) return;
+  m_vbe->Platform().loop().KillTimer(m_closeTimer);
+  m_closeTimer = 0;
+}
+
+void frmLinNumbers::done(int result) {
+  if (m_running) {
+    // Closing the window during a run cancels it; the dialog closes once the walk has ended.
+    if (m_numIndent) m_numIndent->Cancel();
+    m_context.Cancel();
+    m_closeAfterRun = true;
+    return;
+  }
+  killCloseTimer();
+  if (m_cursor) backToIdle();
+  Form_Unload();
+  QDialog::done(result);
+}
+
+void frmLinNumbers::Form_Unload() {
+  // Whatever number a box holds at the close is kept for the next time, whether it was run or not; an
+  // empty box or one that is not a number leaves the setting alone.
+  const auto remember = [this](QLineEdit* box, const common::setting::Key& key) {
+    const QString value = box->text().trimmed();
+    const auto number = boxValue(value);
+    if (number && number != boxValue(m_settings.value(key))) m_settings.setValue(key, value);
+  };
+  remember(m_txtInitial, common::setting::InitialNumber);
+  remember(m_txtInterval, common::setting::Interval);
+}
+
+}  // namespace transform

@@ -1,0 +1,49 @@
+// SPDX-License-Identifier: MIT
+// The line-numbering walks over the object model: a project, a module, a member or the procedure at the
+// caret, each procedure numbered from the start number, line by line through the code module.
+#pragma once
+
+#include "transform/walk.h"
+
+namespace transform {
+
+/// Adds or removes line numbers. Walks report their failures through the context with their fixed
+/// messages (5121 for a project, 5122 for a module, 5123 for a member or the current procedure) and end;
+/// a line that cannot be rewritten is passed over. A line number past the 32-bit range stops the run.
+class NumberingWalk {
+ public:
+  /// Every procedure is numbered from `startNumber` in steps of `interval`.
+  NumberingWalk(WalkContext& context, qint32 startNumber, qint32 interval);
+
+  /// Every component of `project` with code, related documents passed over.
+  void NumberProject(const ide::Ref<ide::VBProject>& project, bool add);
+  /// Every member of `module`: methods and properties are numbered, every member advances the bar by one.
+  void NumberModule(const ide::Ref<ide::CodeModule>& module, bool add);
+  /// The procedures of one member (a property's Get, Let and Set; a method's procedure, where adding
+  /// passes over Declare statements); advances the bar by one.
+  void NumberMember(const ide::Ref<ide::CodeModule>& module, const ide::Ref<ide::Member>& member, bool add);
+  /// The procedure at the start of the active code pane's selection; advances the bar by one.
+  void NumberCurrentProcedure(ide::VBE& vbe, bool add);
+
+  /// Numbers the lines after the header and its continuation lines, up to the End line, restarting at the
+  /// start number. Quietly does nothing for a procedure the module does not have.
+  void NumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+  /// Removes the numbers of the lines between the header line and the End line; the header's
+  /// continuation lines and every continuation line of a statement are left alone.
+  void UnnumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+
+  /// One procedure, adding or removing.
+  void numberOrUnnumber(ide::CodeModule& module, const QString& name, ide::ProcKind kind, bool add) {
+    add ? NumberProcedure(module, name, kind) : UnnumberProcedure(module, name, kind);
+  }
+
+  qint32 startNumber() const { return m_startNumber; }
+  qint32 interval() const { return m_interval; }
+
+ private:
+  WalkContext& m_context;
+  qint32 m_startNumber;
+  qint32 m_interval;
+};
+
+}  // namespace transform

@@ -1,0 +1,141 @@
+// SPDX-License-Identifier: MIT
+// Number-and-indent: the walk and the command object.
+#include "transform/numindent.h"
+
+#include "common/errors.h"
+
+namespace transform {
+
+NumIndentWalk::NumIndentWalk(WalkContext& context, qint32 startNumber, qint32 interval, IndentMode mode,
+                             qint32 spaces, bool add)
+    : m_context(context),
+      m_numbering(context, startNumber, interval),
+      m_indentation(context, mode, spaces),
+      m_add(add) {}
+
+void NumIndentWalk::NumIndentProject(const ide::Ref<ide::VBProject>& project) {
+  m_context.guard(u"NumIndentProject", 0, nullptr, [&] {
+    if (!project) ide::raise(ide::err::ObjectVariableNotSet);
+    forEachCodeModule(m_context, *project,
+                      [&](const ide::Ref<ide::CodeModule>& module) { NumIndentModule(module); });
+  });
+}
+
+void NumIndentWalk::NumIndentModule(const ide::Ref<ide::CodeModule>& module) {
+  m_context.guard(u"NumIndentModule", 0, module.get(), [&] {
+    if (!module) ide::raise(ide::err::ObjectVariableNotSet);
+    auto members = module->Members();
+    const int count = members->Count();
+    for (int i = 1; i <= count; ++i) {
+      if (m_context.yieldAndCheck()) return;
+      // A failing member is reported and the walk goes on with the next one.
+      m_context.guard(u"NumIndentModule", 0, module.get(),
+                      [&] { memberProcedures(module, members->Item(i)); });
+    }
+    if (m_context.yieldAndCheck()) return;
+    m_indentation.IndentDeclarations(*module);
+  });
+}
+
+void NumIndentWalk::NumIndentMember(const ide::Ref<ide::CodeModule>& module,
+                                    const ide::Ref<ide::Member>& member) {
+  m_context.guard(u"NumIndentMember", 0, module.get(), [&] {
+    if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
+    memberProcedures(module, member);
+  });
+}
+
+void NumIndentWalk::NumIndentCurrentProcedure(ide::VBE& vbe, qint32 totalUnits) {
+  m_context.guard(u"NumIndentCurrentProcedure", 0, nullptr, [&] {
+    const ProcedureRef procedure = currentProcedure(vbe);
+    if (procedure.name.isEmpty()) {
+      m_context.AdvanceProgress(totalUnits);
+      return;
+    }
+    numIndentProcedure(*procedure.module, procedure.name, procedure.kind);
+  });
+}
+
+void NumIndentWalk::memberProcedures(const ide::Ref<ide::CodeModule>& module,
+                                     const ide::Ref<ide::Member>& member) {
+  const ide::MemberType type = member->Type();
+  if (type != ide::MemberType::Method && type != ide::MemberType::Property) return;
+  const QString name = member->Name().trimmed();
+  if (name.isEmpty()) return;
+  for (const ide::ProcKind kind : procedureKinds(*module, name, type, true))
+    numIndentProcedure(*module, name, kind);
+}
+
+void NumIndentWalk::numIndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
+  // Numbers first, so that the indenter lines the new numbers up in its number column.
+  m_numbering.numberOrUnnumber(module, name, kind, m_add);
+  m_indentation.IndentProcedure(module, name, kind);
+}
+
+// ---------------------------------------------------------------------------------------------------
+
+namespace {
+
+QString errorText(const ide::Error& error, const QString& where) {
+  return QStringLiteral("%1 %2\n%3").arg(error.number()).arg(error.description(), where);
+}
+
+}  // namespace
+
+CNumIndent::CNumIndent(ide::Ref<ide::VBE> vbe) : m_vbe(std::move(vbe)) {}
+
+CNumIndent::~CNumIndent() = default;
+
+void CNumIndent::Cancel() {
+  m_cancel = true;
+  if (m_context) m_context->Cancel();
+}
+
+void CNumIndent::DoIt(PROG_MODE Unit, ProgressSink* Progbar, qint32 StartNumber, qint32 lngInterval, bool Use,
+                      qint32 lngSpaces, bool add) {
+  m_cancel = false;
+  WalkContext context(QStringLiteral("CNumIndent"), &m_vbe->Platform().loop(), Progbar);
+  context.setYieldInterval(m_yieldInterval);
+  context.onFailure = [this](const WalkFailure& failure) {
+    Error.fire(errorText(failure.error, failure.error.source()));
+  };
+  context.onLineSkipped = [this](const WalkFailure& failure) {
+    // Numbering passes over the lines it cannot rewrite without a word; the indenter tells.
+    if (failure.operation == u"IndentLine")
+      Error.fire(errorText(failure.error, QStringLiteral("IndentLine %1").arg(failure.line)));
+    else if (failure.operation == u"IndentDeclarationLine")
+      Error.fire(errorText(failure.error,
+                           QStringLiteral("Source:  IndentDeclarationLine, line: %1").arg(failure.line)));
+  };
+  struct Running {
+    CNumIndent& command;
+    ~Running() { command.m_context = nullptr; }
+  } running{*this};
+  m_context = &context;
+
+  Begining.fire();
+  try {
+    const qint32 units = CountUnits(context, *m_vbe, Unit, ProgressUnit::Lines);
+    if (m_cancel) context.Cancel();  // cancelled while Begining was handled
+    NumIndentWalk walk(context, StartNumber, lngInterval, Use ? IndentMode::Spaces : IndentMode::Tabs,
+                       Use ? lngSpaces : 1, add);
+    switch (Unit) {
+      case PROG_PROJECT:
+        walk.NumIndentProject(activeProject(*m_vbe));
+        break;
+      case PROG_MODULE:
+        walk.NumIndentModule(selectedComponent(*m_vbe)->CodeModule());
+        break;
+      default:
+        walk.NumIndentCurrentProcedure(*m_vbe, units);
+        break;
+    }
+  } catch (const std::exception& failure) {
+    const ide::Error error =
+        common::recordError(failure, QStringLiteral("CNumIndent"), QStringLiteral("DoIt"), 0);
+    Error.fire(errorText(error, error.source()));
+  }
+  if (!m_cancel) Finished.fire();
+}
+
+}  // namespace transform

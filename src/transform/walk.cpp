@@ -1,0 +1,231 @@
+// SPDX-License-Identifier: MIT
+// The walk context and the helpers the numbering and indentation walks share.
+#include "transform/walk.h"
+
+#include "common/errors.h"
+#include "transform/linetext.h"
+#include "transform/numbering.h"
+
+namespace transform {
+
+WalkContext::WalkContext(QString owner, ide::EventLoop* loop, ProgressSink* bar)
+    : m_owner(std::move(owner)), m_loop(loop), m_bar(bar) {
+  if (m_bar) m_scale.emplace(*m_bar);
+}
+
+void WalkContext::yield() {
+  if (!m_loop) return;
+  if (Clock::now() - m_lastYield < m_yieldInterval) return;
+  m_loop->DoEvents();
+  // Measured after the loop ran, so that a slow repaint still leaves the walk its share of the time.
+  m_lastYield = Clock::now();
+}
+
+bool WalkContext::yieldAndCheck() {
+  yield();
+  if (m_cancel) {
+    hideProgress();
+    return true;
+  }
+  return m_stopped;
+}
+
+void WalkContext::reset() {
+  m_cancel = false;
+  m_stopped = false;
+  m_line = 0;
+}
+
+void WalkContext::SetProgressRange(qint32 units) {
+  if (m_scale) m_scale->SetProgressRange(units);
+}
+
+void WalkContext::AdvanceProgress(qint32 units) {
+  if (m_scale) m_scale->AdvanceProgress(units);
+}
+
+void WalkContext::showProgress() {
+  if (m_bar) m_bar->setVisible(true);
+}
+
+void WalkContext::hideProgress() {
+  if (m_bar && m_bar->isVisible()) m_bar->setVisible(false);
+}
+
+bool WalkContext::isOverflow(const std::exception& failure) {
+  return dynamic_cast<const LineNumberOverflow*>(&failure) != nullptr;
+}
+
+WalkFailure WalkContext::record(const std::exception& failure, QStringView operation, int messageId,
+                                ide::CodeModule* module, int line) {
+  QString moduleName;
+  if (module) {
+    try {
+      moduleName = module->Name();
+    } catch (const std::exception&) {
+      // A module that left the IDE has no name to report; the failure itself still counts.
+    }
+  }
+  const QString name = operation.toString();
+  return WalkFailure{name,
+                     messageId,
+                     moduleName,
+                     line,
+                     common::recordError(failure, m_owner, name, line),
+                     isOverflow(failure)};
+}
+
+void WalkContext::failed(const std::exception& failure, QStringView operation, int messageId,
+                         ide::CodeModule* module) {
+  const WalkFailure report = record(failure, operation, messageId, module, m_line);
+  if (report.stopsRun) m_stopped = true;
+  if (onFailure) onFailure(report);
+}
+
+void WalkContext::lineSkipped(const std::exception& failure, QStringView operation, ide::CodeModule& module,
+                              int line) {
+  if (isOverflow(failure)) throw;
+  if (onLineSkipped) onLineSkipped(record(failure, operation, 0, &module, line));
+}
+
+// ---------------------------------------------------------------------------------------------------
+
+namespace {
+
+bool isRelatedDocument(ide::VBComponent& component) {
+  return component.Type() == ide::ComponentType::RelatedDocument;
+}
+
+// The units of one module; a module that fails to answer counts nothing.
+qint32 moduleUnits(const ide::Ref<ide::CodeModule>& module, ProgressUnit unit) {
+  if (!module) return 0;
+  try {
+    if (unit == ProgressUnit::Members) return module->Members()->Count();
+    return module->CountOfLines() - module->CountOfDeclarationLines();
+  } catch (const std::exception&) {
+    return 0;
+  }
+}
+
+qint32 componentUnits(const ide::Ref<ide::VBComponent>& component, ProgressUnit unit) {
+  if (!component) return 0;
+  try {
+    if (isRelatedDocument(*component)) return 0;
+    return moduleUnits(component->CodeModule(), unit);
+  } catch (const std::exception&) {
+    return 0;
+  }
+}
+
+}  // namespace
+
+qint32 CountUnits(WalkContext& context, ide::VBE& vbe, PROG_MODE scope, ProgressUnit unit) {
+  context.reset();
+  qint64 units = 0;
+  switch (scope) {
+    case PROG_PROJECT:
+      if (auto project = vbe.ActiveVBProject()) {
+        try {
+          for (const auto& component : project->VBComponents()->items())
+            units += componentUnits(component, unit);
+        } catch (const std::exception&) {
+          // Counting only sizes the bar: a project that cannot be listed shows an empty one.
+        }
+      }
+      break;
+    case PROG_MODULE:
+      units = componentUnits(vbe.SelectedVBComponent(), unit);
+      break;
+    default:
+      units = 1;
+      break;
+  }
+  const qint32 total = qint32(std::min<qint64>(units, std::numeric_limits<qint32>::max()));
+  context.SetProgressRange(total);
+  context.showProgress();
+  context.yield();
+  return total;
+}
+
+ide::Ref<ide::VBProject> activeProject(ide::VBE& vbe) {
+  auto project = vbe.ActiveVBProject();
+  if (!project) ide::raise(ide::err::ObjectVariableNotSet);
+  return project;
+}
+
+ide::Ref<ide::VBComponent> selectedComponent(ide::VBE& vbe) {
+  auto component = vbe.SelectedVBComponent();
+  if (!component) ide::raise(ide::err::ObjectVariableNotSet);
+  return component;
+}
+
+ide::Ref<ide::CodePane> activeCodePane(ide::VBE& vbe) {
+  auto pane = vbe.ActiveCodePane();
+  if (!pane) ide::raise(ide::err::ObjectVariableNotSet);
+  return pane;
+}
+
+ProcedureRef currentProcedure(ide::VBE& vbe) {
+  auto pane = activeCodePane(vbe);
+  auto window = pane->Window();
+  if (window && window->WindowState() == ide::WindowState::Minimize)
+    window->setWindowState(ide::WindowState::Normal);
+  int startLine = 0, startColumn = 0, endLine = 0, endColumn = 0;
+  pane->GetSelection(startLine, startColumn, endLine, endColumn);
+  ProcedureRef procedure;
+  procedure.module = pane->CodeModule();
+  if (!procedure.module) ide::raise(ide::err::ObjectVariableNotSet);
+  procedure.name = procedure.module->ProcOfLine(startLine, procedure.kind).trimmed();
+  return procedure;
+}
+
+std::vector<ide::ProcKind> procedureKinds(ide::CodeModule& module, const QString& name, ide::MemberType type,
+                                          bool skipDeclares) {
+  switch (type) {
+    case ide::MemberType::Property:
+      return {ide::ProcKind::Get, ide::ProcKind::Let, ide::ProcKind::Set};
+    case ide::MemberType::Method:
+      if (skipDeclares && module.ProcStartLine(name, ide::ProcKind::Proc) <= module.CountOfDeclarationLines())
+        return {};
+      return {ide::ProcKind::Proc};
+    default:
+      return {};
+  }
+}
+
+void forEachCodeModule(WalkContext& context, ide::VBProject& project,
+                       const std::function<void(const ide::Ref<ide::CodeModule>&)>& visit) {
+  auto components = project.VBComponents();
+  const int count = components->Count();
+  for (int i = 1; i <= count; ++i) {
+    if (context.yieldAndCheck()) return;
+    ide::Ref<ide::CodeModule> module;
+    try {
+      auto component = components->Item(i);
+      if (isRelatedDocument(*component)) continue;
+      module = component->CodeModule();
+    } catch (const std::exception&) {
+      continue;  // a component that cannot be read is left as it is
+    }
+    if (module) visit(module);
+  }
+}
+
+ProcedureLines procedureLines(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
+  ProcedureLines lines;
+  lines.body = module.ProcBodyLine(name, kind);
+  const int start = module.ProcStartLine(name, kind);
+  lines.count = module.ProcCountLines(name, kind);
+  lines.last = start + lines.count - 1;
+  while (lines.last > lines.body && isBlankLine(module.Lines(lines.last, 1)))
+    --lines.last;
+  lines.first = lines.body;
+  bool continued = true;
+  while (continued && lines.first <= lines.last) {
+    continued = isContinued(module.Lines(lines.first, 1));
+    ++lines.first;
+  }
+  return lines;
+}
+
+}  // namespace transform

@@ -1,0 +1,181 @@
+// SPDX-License-Identifier: MIT
+// What the numbering and indentation walks over the object model share: yielding to the IDE's loop, the
+// cancel flag, the progress bar and the handing of caught failures to whoever runs the walk. The dialogs,
+// the number-and-indent command and the command-line tool run the same walks, each with its own context.
+#pragma once
+
+#include "ide/error.h"
+#include "ide/vbide.h"
+#include "transform/progmode.h"
+#include "transform/progress.h"
+
+#include <QString>
+#include <QStringView>
+
+#include <chrono>
+#include <functional>
+#include <optional>
+#include <vector>
+
+namespace transform {
+
+/// A failure that a walk caught. The walk that caught a failure ends (its caller goes on with the next
+/// unit); a line that cannot be rewritten is passed over and the walk goes on with the next line.
+struct WalkFailure {
+  /// The walk that caught it ("NumberModule", "IndentLine" ...) and its fixed message (5122 ...), 0 for
+  /// walks without one.
+  QString operation;
+  int messageId = 0;
+  /// The code module being walked (empty when the failure came before one was reached) and the line
+  /// being processed there (0 outside the lines of a procedure or declarations section).
+  QString module;
+  int line = 0;
+  /// The failure as the error convention recorded it: its location text is the error's source.
+  ide::Error error;
+  /// The walk stops here: the next line number would leave the 32-bit range.
+  bool stopsRun = false;
+};
+
+/// The state one run of a walk carries through all its levels.
+class WalkContext {
+ public:
+  using Clock = std::chrono::steady_clock;
+
+  /// `owner` names the walks in failure locations ("em <owner>_<operation>, linha: n"). The walk yields to
+  /// `loop` (none: never) and shows its progress on `bar` (none: nowhere); both must outlive the context.
+  WalkContext(QString owner, ide::EventLoop* loop, ProgressSink* bar);
+
+  // --- Yielding and cancelling
+
+  /// The least time between two runs of the loop. A yield inside it costs a clock read, so walks can yield
+  /// before every line. The first yield of a context always runs the loop.
+  void setYieldInterval(Clock::duration interval) { m_yieldInterval = interval; }
+  void yield();
+  /// Yields, then tells whether the walk must end: cancelled (the bar is hidden then) or stopped by a
+  /// failure.
+  bool yieldAndCheck();
+
+  /// Sets the cancel flag; every walk ends at its next yield. Called from work the loop runs.
+  void Cancel() { m_cancel = true; }
+  bool cancelled() const { return m_cancel; }
+  /// Clears the cancel flag and the stop of the previous run.
+  void reset();
+  /// True once a failure stopped the run.
+  bool stopped() const { return m_stopped; }
+
+  // --- Progress
+
+  bool hasProgress() const { return m_scale.has_value(); }
+  ProgressSink* bar() const { return m_bar; }
+  void SetProgressRange(qint32 units);
+  void AdvanceProgress(qint32 units);
+  void showProgress();
+  void hideProgress();
+
+  // --- Failures
+
+  /// Told about every failure that ends a walk, in the order they happen.
+  std::function<void(const WalkFailure&)> onFailure;
+  /// Told about every line passed over because it could not be rewritten (a line grown past the IDE's
+  /// length limit, a module that refuses edits).
+  std::function<void(const WalkFailure&)> onLineSkipped;
+
+  /// Runs `body` as the walk `operation` on `module` (may be null). A failure ends the body; it is
+  /// recorded under `operation` and reported with `messageId`. A line number overflow is not the failure
+  /// of one unit: it passes through the guards of nested walks to the outermost one, which reports it and
+  /// stops the run.
+  template <class Body>
+  void guard(QStringView operation, int messageId, ide::CodeModule* module, Body&& body) {
+    Nesting nesting(m_depth);
+    try {
+      body();
+    } catch (const std::exception& failure) {
+      if (isOverflow(failure) && m_depth > 1) throw;
+      failed(failure, operation, messageId, module);
+    }
+  }
+
+  /// Reports a line that could not be rewritten (rethrows a line number overflow, which is never passed
+  /// over).
+  void lineSkipped(const std::exception& failure, QStringView operation, ide::CodeModule& module, int line);
+
+  /// The line being processed, for failure locations.
+  void setLine(int line) { m_line = line; }
+
+ private:
+  struct Nesting {
+    explicit Nesting(int& depth) : m_depth(depth) { ++m_depth; }
+    ~Nesting() { --m_depth; }
+    int& m_depth;
+  };
+
+  static bool isOverflow(const std::exception& failure);
+  void failed(const std::exception& failure, QStringView operation, int messageId, ide::CodeModule* module);
+  WalkFailure record(const std::exception& failure, QStringView operation, int messageId,
+                     ide::CodeModule* module, int line);
+
+  QString m_owner;
+  ide::EventLoop* m_loop;
+  ProgressSink* m_bar;
+  std::optional<ProgressScale> m_scale;
+  Clock::duration m_yieldInterval = std::chrono::milliseconds(5);
+  Clock::time_point m_lastYield{};
+  bool m_cancel = false;
+  bool m_stopped = false;
+  int m_depth = 0;
+  int m_line = 0;
+};
+
+// --- Helpers the walks share
+
+/// What a unit of progress is: a member (the numbering dialog) or a line outside the declarations
+/// section (the indenter and the number-and-indent command).
+enum class ProgressUnit { Members, Lines };
+
+/// Counts the units of a run over `scope` (the active project, the selected component, or 1 for the
+/// current procedure; related documents and unreadable components count 0), then starts the run: clears
+/// the cancel flag, sets the bar's range, shows it and yields. Returns the units counted.
+qint32 CountUnits(WalkContext& context, ide::VBE& vbe, PROG_MODE scope, ProgressUnit unit);
+
+/// The IDE's active project, selected component and active code pane; error 91 when there is none.
+ide::Ref<ide::VBProject> activeProject(ide::VBE& vbe);
+ide::Ref<ide::VBComponent> selectedComponent(ide::VBE& vbe);
+ide::Ref<ide::CodePane> activeCodePane(ide::VBE& vbe);
+
+/// A procedure of a code module by name and kind.
+struct ProcedureRef {
+  ide::Ref<ide::CodeModule> module;
+  QString name;
+  ide::ProcKind kind = ide::ProcKind::Proc;
+};
+
+/// The procedure that holds the start of the active code pane's selection; an empty name when the
+/// selection is in the declarations. Restores a minimized code window first, as the user is about to see
+/// the procedure change.
+ProcedureRef currentProcedure(ide::VBE& vbe);
+
+/// The procedure kinds a walk visits for a member: a property's Get, Let and Set in this order (the
+/// procedure walks pass over the kinds it lacks), a method's one procedure. A method whose first line
+/// lies in the declarations is a Declare statement, not a procedure: with `skipDeclares` it gets none.
+/// Other members (variables, constants, events) get none.
+std::vector<ide::ProcKind> procedureKinds(ide::CodeModule& module, const QString& name, ide::MemberType type,
+                                          bool skipDeclares);
+
+/// Calls `visit` with the code module of every component of `project` that has one, yielding before
+/// each component and ending on cancel. Related documents are passed over, and so are components that
+/// fail to answer.
+void forEachCodeModule(WalkContext& context, ide::VBProject& project,
+                       const std::function<void(const ide::Ref<ide::CodeModule>&)>& visit);
+
+/// The first and last lines of a procedure's walk: `first` is the line after the header and its
+/// continuation lines, `last` the last line that is not blank (normally the End line, never walked).
+/// Throws ide::Error 35 for a procedure the module does not have.
+struct ProcedureLines {
+  int body = 0;
+  int first = 0;
+  int last = 0;
+  int count = 0;
+};
+ProcedureLines procedureLines(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+
+}  // namespace transform
