@@ -19,11 +19,22 @@ QString locationText(const QString& module, const QString& procedure, int line) 
   return QStringLiteral("em %1_%2, linha: %3").arg(module, procedure).arg(line);
 }
 
+namespace {
+long numberOf(const std::exception& failure) {
+  const auto* error = dynamic_cast<const ide::Error*>(&failure);
+  return error ? error->number() : ide::err::InvalidProcedureCall;  // not the IDE's: an invalid call
+}
+}  // namespace
+
+void recordErrorNumber(const std::exception& failure) {
+  lastError().number = numberOf(failure);
+}
+
 ide::Error recordError(const std::exception& failure, const QString& module, const QString& procedure,
                        int line) {
   LastError& record = lastError();
   const auto* error = dynamic_cast<const ide::Error*>(&failure);
-  record.number = error ? error->number() : 5;  // a failure that is not the IDE's counts as an invalid call
+  record.number = numberOf(failure);
   record.description = error ? error->description() : QString::fromLocal8Bit(failure.what());
   const QString source = error ? error->source() : QString();
   record.location =
@@ -53,6 +64,10 @@ void appendToLog(const LastError& record) {
                 .toUtf8());
 }
 }  // namespace
+
+void logLastError() {
+  appendToLog(lastError());
+}
 
 void ShowErrorReport(ide::UserInterface& ui) {
   const LastError& record = lastError();

@@ -36,8 +36,14 @@ QString locationText(const QString& module, const QString& procedure, int line);
 ide::Error recordError(const std::exception& failure, const QString& module, const QString& procedure,
                        int line);
 
-/// Shows the last error ("<number> <description>", OK only) unless it is a cancel code.
+/// Records only the number of a failure that is swallowed (the timer's), keeping the rest of the record.
+void recordErrorNumber(const std::exception& failure);
+
+/// Shows the last error ("<number> <description>", OK only) unless it is a cancel code, and logs it.
 void ShowErrorReport(ide::UserInterface& ui);
+
+/// Appends the last error with its location to the log, for handlers that show a fixed message instead.
+void logLastError();
 
 /// Where reported locations are logged ($QUIMBEL_DATA_DIR or the user's data directory, file errors.log).
 QString errorLogPath();
