@@ -1,0 +1,67 @@
+// SPDX-License-Identifier: MIT
+// The one place that says what each feature area does today. Numbering and indentation open their dialogs.
+// Every other area is not part of the add-in yet: its command and its events are connected and arrive
+// here, and do nothing until the area lands; no stand-in dialog pretends to be the feature meanwhile.
+#include "addin/features.h"
+
+#include "common/settings.h"
+#include "transform/dialogs.h"
+
+#include <QWidget>
+
+namespace addin {
+namespace {
+
+class AddInFeatures final : public Features {
+ public:
+  AddInFeatures(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings)
+      : m_vbe(std::move(vbe)), m_settings(settings) {}
+
+  void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
+  void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
+
+  // Not there yet: the favourites.
+  void showFavorites() override {}
+  void addFavorite(const FavoritePlace&) override {}
+  void componentRenamed(const ide::Ref<ide::VBComponent>&, const QString&) override {}
+  // Not there yet: the keyboard macros and the copy buffers (and so no hotkeys).
+  void showMacros() override {}
+  void showCopyBuffers() override {}
+  HotKeyClient* copyBuffers() override { return nullptr; }
+  HotKeyClient* macros() override { return nullptr; }
+  // Not there yet: the extended find.
+  void showExtendedFind() override {}
+  void findWindowProjectRemoved(const ide::Ref<ide::VBProject>&) override {}
+  void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>&) override {}
+  // Not there yet: the task list.
+  void showTaskList() override {}
+  // Not there yet: the new-procedure wizard.
+  void showNewProcedure() override {}
+  // Not there yet: the options dialog and the designer actions.
+  void showOptions() override {}
+  void componentAdded(const ide::Ref<ide::VBComponent>&) override {}
+  void controlAdded(const ide::Ref<ide::VBControl>&) override {}
+  void controlRenamed(const ide::Ref<ide::VBControl>&, const QString&, int) override {}
+  // Not there yet: the project identity and info files (which also hold the favourites).
+  void projectAdded(const ide::Ref<ide::VBProject>&) override {}
+  void projectRemoved(const ide::Ref<ide::VBProject>&) override {}
+  void projectRenamed(const ide::Ref<ide::VBProject>&, const QString&) override {}
+  void projectFileMoved(const ide::Ref<ide::VBProject>&, const QString&, const QString&) override {}
+  bool isIdentityModule(const ide::Ref<ide::VBComponent>&) override { return false; }
+  void allProjectsClosed() override {}
+  void componentRemoved(const ide::Ref<ide::VBComponent>&) override {}
+
+ private:
+  QWidget* dialogParent() const { return qobject_cast<QWidget*>(m_vbe->Platform().ui().dialogParent()); }
+
+  ide::Ref<ide::VBE> m_vbe;
+  common::SettingsStore& m_settings;
+};
+
+}  // namespace
+
+std::unique_ptr<Features> createFeatures(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings) {
+  return std::make_unique<AddInFeatures>(vbe, settings);
+}
+
+}  // namespace addin
