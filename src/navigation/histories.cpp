@@ -132,6 +132,11 @@ void CHistories::RemoveHistoriesOfComponent(const ide::Ref<ide::VBComponent>& co
     setBack(false);
     setForward(false);
   }
+  // With every place gone there is nothing to go back or forward to.
+  if (m_count == 0) {
+    setBack(false);
+    setForward(false);
+  }
 }
 
 bool CHistories::take(int index) {

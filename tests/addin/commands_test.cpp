@@ -1,0 +1,322 @@
+// SPDX-License-Identifier: MIT
+// Commands and IDE events through the linked add-in core with recording feature areas: the command-state
+// gate, menu items doing what their buttons do, the IDE-mode rule, the enabling rules, closing windows,
+// help and the idle notification after a project is added.
+#include "addin/texts.h"
+#include "addinfixture.h"
+#include "common/errors.h"
+#include "host/model/commandbars.h"
+#include "host/model/designer.h"
+#include "host/model/objects.h"
+
+#include <gtest/gtest.h>
+
+namespace addin::test {
+namespace {
+
+// Commands 3 to 12 and what the recording features note for each (close windows, 8, acts itself).
+const std::map<int, QString>& featureOfCommand() {
+  static const std::map<int, QString> map{
+      {3, u"favorites"_qs}, {4, u"macros"_qs},         {5, u"copy buffers"_qs},
+      {6, u"numbering"_qs}, {7, u"indentation"_qs},    {9, u"find"_qs},
+      {10, u"tasks"_qs},    {11, u"new procedure"_qs}, {12, u"options"_qs}};
+  return map;
+}
+
+/// Clicks every toolbar button from 3 to 12 and returns what reached the feature areas.
+QStringList clickAll(LinkedAddIn& addIn) {
+  addIn.takeFeatureLog();
+  for (const auto& [number, feature] : featureOfCommand())
+    addIn.clickToolBar(number);
+  return addIn.takeFeatureLog();
+}
+
+bool contextItemsEnabled(ide::VBE& vbe) {
+  bool enabled = true;
+  for (const char* name : {"Code Window", "Code Window (Break)"})
+    enabled = enabled && vbe.CommandBars()->Item(QLatin1StringView(name))->Controls()->Item(1)->Enabled();
+  return enabled;
+}
+
+TEST(CommandState, WithNoProjectOnlyBackForwardOptionsAndHelpCanRun) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  addIn.loop().advance(100);
+  EXPECT_EQ(clickAll(addIn), QStringList{u"options"_qs});
+  EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
+  auto& state = addIn.globals().CommandState();
+  for (int entry = 2; entry <= 10; ++entry)
+    EXPECT_FALSE(state[entry]) << entry;
+  EXPECT_TRUE(state[11]);
+  EXPECT_TRUE(state[13]);
+  // Back and forward with an empty history do nothing (and fail nothing).
+  addIn.clickToolBar(1);
+  addIn.clickToolBar(2);
+  EXPECT_TRUE(addIn.ui().messageBoxes().empty());
+}
+
+TEST(CommandState, AfterTheFirstProjectTheProjectCommandsWorkAtOnceAndNewProcedureWithACodeWindow) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  addIn.loop().advance(100);
+  auto project = addIn.vbe->newProject();
+  auto module = addModule(project, QStringLiteral("modUm"), 2, 10);
+  QStringList expected{u"favorites"_qs,   u"macros"_qs, u"copy buffers"_qs, u"numbering"_qs,
+                       u"indentation"_qs, u"find"_qs,   u"tasks"_qs,        u"options"_qs};
+  EXPECT_EQ(clickAll(addIn), expected) << "before any tick";
+  EXPECT_TRUE(contextItemsEnabled(*addIn.vbe));
+
+  addIn.loop().advance(100);
+  EXPECT_EQ(clickAll(addIn), expected) << "no code window: no new procedure";
+  EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
+
+  showAt(module, 1);
+  addIn.loop().advance(100);
+  expected.insert(7, u"new procedure"_qs);
+  EXPECT_EQ(clickAll(addIn), expected);
+  EXPECT_TRUE(contextItemsEnabled(*addIn.vbe));
+
+  // A minimised code window does not count.
+  addIn.vbe->ActiveWindow()->setWindowState(ide::WindowState::Minimize);
+  addIn.loop().advance(100);
+  EXPECT_FALSE(addIn.globals().CommandState()[10]);
+  addIn.vbe->ActiveWindow()->setWindowState(ide::WindowState::Normal);
+
+  // A tool window in front: no code window.
+  addIn.vbe->activateWindow(addIn.vbe->projectWindow());
+  addIn.loop().advance(100);
+  EXPECT_FALSE(addIn.globals().CommandState()[10]);
+  EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
+  EXPECT_EQ(addIn.globals().LastWindowType(), static_cast<int>(ide::WindowType::ProjectWindow));
+
+  // The last project closing disables the project commands again at the next tick.
+  addIn.vbe->removeProject(project);
+  addIn.loop().advance(100);
+  EXPECT_EQ(clickAll(addIn), QStringList{u"options"_qs});
+  EXPECT_EQ(addIn.globals().LastWindowType(), -1);
+}
+
+TEST(CommandState, AMenuItemDoesWhatItsToolBarButtonDoes) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto project = addIn.vbe->newProject();
+  showAt(addModule(project, QStringLiteral("modUm"), 1, 10), 1);
+  addIn.loop().advance(100);
+  addIn.takeFeatureLog();
+  for (const auto& [number, feature] : featureOfCommand()) {
+    addIn.clickMenu(number);
+    EXPECT_EQ(addIn.takeFeatureLog(), QStringList{feature}) << number;
+  }
+}
+
+TEST(CommandState, ClickingLeavesTheIdesClickFlagsAsTheyAre) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto button = addIn.vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2"))->Controls()->Item(12);
+  bool handled = false;
+  bool cancel = false;
+  auto source = addIn.vbe->Events()->CommandBarEvents(button);
+  source->Click.fire(button, handled, cancel);
+  EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"options"_qs});
+  EXPECT_FALSE(handled);
+  EXPECT_FALSE(cancel);
+}
+
+TEST(Commands, CloseWindowsClosesCodeAndDesignerWindowsAndLeavesToolWindows) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto project = addIn.vbe->newProject();
+  showAt(addModule(project, QStringLiteral("modUm"), 1, 10), 1);
+  showAt(addModule(project, QStringLiteral("modDois"), 1, 10), 1);
+  auto form = std::dynamic_pointer_cast<host::ComponentImpl>(
+      project->VBComponents()->Add(ide::ComponentType::VBForm));
+  form->designerWindow()->SetFocus();
+  auto countOf = [&](ide::WindowType type) {
+    int count = 0;
+    for (const auto& window : addIn.vbe->Windows()->items())
+      if (window->Type() == type) ++count;
+    return count;
+  };
+  ASSERT_EQ(countOf(ide::WindowType::CodeWindow), 2);
+  ASSERT_EQ(countOf(ide::WindowType::Designer), 1);
+  const int tools = addIn.vbe->Windows()->Count() - 3;
+  addIn.loop().advance(100);
+  addIn.clickToolBar(8);
+  EXPECT_EQ(countOf(ide::WindowType::CodeWindow), 0);
+  EXPECT_EQ(countOf(ide::WindowType::Designer), 0);
+  EXPECT_EQ(addIn.vbe->Windows()->Count(), tools);
+  EXPECT_EQ(countOf(ide::WindowType::ProjectWindow), 1);
+  EXPECT_EQ(countOf(ide::WindowType::PropertyWindow), 1);
+}
+
+TEST(Commands, HelpOpensTheContentsPageOrSaysItCannot) {
+  AddInEnvironment environment;
+  environment.writeMachineConfig(QStringLiteral("InstallationPath = ") + environment.installDir() + u'\n');
+  LinkedAddIn addIn;
+  addIn.ui().setCanOpenDocuments(true);
+  addIn.connect();
+  addIn.clickMenu(14);
+  ASSERT_EQ(addIn.ui().openedDocuments().size(), 1u);
+  EXPECT_EQ(addIn.ui().openedDocuments().front(),
+            environment.installDir() + QStringLiteral("/help/index.html"));
+  EXPECT_TRUE(addIn.ui().messageBoxes().empty());
+
+  QFile::remove(environment.installDir() + QStringLiteral("/help/index.html"));
+  addIn.clickMenu(14);
+  ASSERT_EQ(addIn.ui().messageBoxes().size(), 1u);
+  EXPECT_EQ(addIn.ui().messageBoxes().front().prompt,
+            QStringLiteral("Não foi possível localizar o arquivo de ajuda."));
+  EXPECT_EQ(ide::mb::iconOf(addIn.ui().messageBoxes().front().style), ide::mb::Information);
+  EXPECT_EQ(addIn.ui().openedDocuments().size(), 1u);
+}
+
+TEST(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto project = addIn.vbe->newProject();
+  auto module = addModule(project, QStringLiteral("modUm"), 2, 10);
+  module->CodeModule()->AddFromString(
+      QStringLiteral("Public Property Get Valor() As Long\r\n    Valor = m\r\nEnd Property\r\n"
+                     "Public Property Let Valor(ByVal v As Long)\r\n    m = v\r\nEnd Property"));
+  auto pane = showAt(module, 1);
+  auto favoriteAt = [&](int line) {
+    pane->SetSelection(line, 1, line, 1);
+    addIn.takeFeatureLog();
+    addIn.vbe->CommandBars()->Item(QStringLiteral("Code Window"))->Controls()->Item(1)->Execute();
+    return addIn.takeFeatureLog();
+  };
+  EXPECT_EQ(favoriteAt(1), QStringList{u"favorite modUm.General Declarations kind 0 line 1"_qs});
+  EXPECT_EQ(favoriteAt(15), QStringList{u"favorite modUm.Proc2 kind 0 line 15"_qs});
+  EXPECT_EQ(favoriteAt(24), QStringList{u"favorite modUm.Valor kind 3 line 24"_qs});
+  EXPECT_EQ(favoriteAt(26), QStringList{u"favorite modUm.Valor kind 1 line 26"_qs});
+  // The break-mode menu's item does the same.
+  pane->SetSelection(15, 1, 15, 1);
+  addIn.vbe->CommandBars()->Item(QStringLiteral("Code Window (Break)"))->Controls()->Item(1)->Execute();
+  EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"favorite modUm.Proc2 kind 0 line 15"_qs});
+}
+
+TEST(Commands, WithoutAnAddInsMenuTheConnectionFailsWithItsOwnNumber) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.vbe->CommandBars()->Item(QStringLiteral("Menu Bar"))->Controls()->Item(11)->Delete();
+  addIn.connect();
+  EXPECT_EQ(addIn.connection->globals(), nullptr);
+  EXPECT_EQ(addIn.addIn->requests, std::vector<bool>{false});
+  EXPECT_EQ(common::lastError().number, static_cast<qint32>(0x80040C81u));
+  EXPECT_EQ(common::lastError().description, QStringLiteral("Não há menu de Add-Ins."));
+}
+
+// ---------------------------------------------------------------------------------------------------
+// IDE events
+
+TEST(IdeEvents, WhileTheProgramRunsComponentsAndControlsAreLeftAloneExceptForRenames) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto project = addIn.vbe->newProject();
+  addIn.loop().DoEvents();
+  auto form = std::dynamic_pointer_cast<host::ComponentImpl>(
+      project->VBComponents()->Add(ide::ComponentType::VBForm));
+  form->designerWindow()->SetFocus();
+  addIn.takeFeatureLog();
+
+  addIn.vbe->setMode(ide::IdeMode::Run);
+  auto module = project->VBComponents()->Add(ide::ComponentType::StdModule);
+  module->setName(QStringLiteral("modNovo"));
+  auto label = form->Designer()->VBControls()->Add(QStringLiteral("VB.Label"));
+  label->Properties()->Item(QStringLiteral("Name"))->setValue(QStringLiteral("lblNome"));
+  project->VBComponents()->Remove(module);
+  EXPECT_EQ(addIn.takeFeatureLog(),
+            (QStringList{u"component renamed Module1 modNovo"_qs, u"control renamed Label1 lblNome"_qs}));
+
+  addIn.vbe->setMode(ide::IdeMode::Design);
+  auto second = project->VBComponents()->Add(ide::ComponentType::StdModule);
+  auto box = form->Designer()->VBControls()->Add(QStringLiteral("VB.TextBox"));
+  project->VBComponents()->Remove(second);
+  EXPECT_EQ(addIn.takeFeatureLog(), (QStringList{u"component added Module1"_qs, u"control added Text1"_qs,
+                                                 u"component removed Module1"_qs}));
+}
+
+TEST(IdeEvents, ProjectsAreAnnouncedAndTheComponentEventsFollowTheActiveProject) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto& windows = addIn.vbe->windowSystem();
+  const ide::HWnd main = addIn.vbe->MainWindow()->hWnd();
+  const ide::WndProcRef ownProc = windows.GetWindowProc(main);
+
+  auto first = addIn.vbe->newProject();
+  // The idle procedure waits on the main window until the IDE is idle, then takes itself off.
+  EXPECT_TRUE(windows.GetProp(main, QStringLiteral("OldWndProc")).has_value());
+  EXPECT_NE(windows.GetWindowProc(main), ownProc);
+  addIn.loop().DoEvents();
+  EXPECT_FALSE(windows.GetProp(main, QStringLiteral("OldWndProc")).has_value());
+  EXPECT_EQ(windows.GetWindowProc(main), ownProc);
+
+  auto second = addIn.vbe->newProject();
+  addIn.loop().DoEvents();
+  EXPECT_EQ(addIn.takeFeatureLog(),
+            (QStringList{u"project added Project1"_qs, u"project added Project2"_qs}));
+  second->VBComponents()->Add(ide::ComponentType::StdModule);
+  first->VBComponents()->Add(ide::ComponentType::StdModule);
+  EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"component added Module1"_qs})
+      << "only the active project's";
+
+  addIn.vbe->setActiveVBProject(first);
+  first->VBComponents()->Add(ide::ComponentType::StdModule);
+  EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"component added Module2"_qs});
+
+  second->setName(QStringLiteral("Biblioteca"));
+  addIn.vbe->removeProject(second);
+  EXPECT_EQ(addIn.takeFeatureLog(),
+            (QStringList{u"project renamed Project2 Biblioteca"_qs, u"project removed Biblioteca"_qs}));
+  EXPECT_TRUE(contextItemsEnabled(*addIn.vbe)) << "a project is left";
+  addIn.vbe->removeProject(first);
+  EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
+}
+
+TEST(IdeEvents, AFailingProjectHandlerShowsTheUndeterminedErrorMessage) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto project = addIn.vbe->newProject();
+  addIn.loop().DoEvents();
+  // The removal handler reads the IDE's mode; without "Continue" on the "Standard" bar that fails.
+  auto module = addModule(project, QStringLiteral("modUm"), 1, 5);
+  addIn.vbe->CommandBars()
+      ->Item(QStringLiteral("Standard"))
+      ->Controls()
+      ->Item(QStringLiteral("Continue"))
+      ->Delete();
+  addIn.ui().clearMessageBoxes();
+  project->VBComponents()->Remove(module);
+  ASSERT_EQ(addIn.ui().messageBoxes().size(), 1u);
+  EXPECT_EQ(addIn.ui().messageBoxes().front().prompt, QStringLiteral("Erro indeterminado."));
+  EXPECT_EQ(ide::mb::iconOf(addIn.ui().messageBoxes().front().style), ide::mb::Critical);
+  EXPECT_EQ(addIn.ui().messageBoxes().front().title, QStringLiteral("Quimbel"));
+}
+
+TEST(IdeEvents, AProjectFileMovingToAnotherDirectoryIsAnnounced) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto project = addIn.vbe->newProject();
+  addIn.loop().DoEvents();
+  addIn.takeFeatureLog();
+  addIn.vbe->fireFileNameChanged(project, ide::FileType::Project, environment.path(u"a/P.vbp"_qs),
+                                 environment.path(u"b/P.vbp"_qs));
+  addIn.vbe->fireFileNameChanged(project, ide::FileType::Project, environment.path(u"a/Q.vbp"_qs),
+                                 environment.path(u"a/P.vbp"_qs));
+  addIn.vbe->fireFileNameChanged(project, ide::FileType::Module, environment.path(u"c/M.bas"_qs),
+                                 environment.path(u"a/M.bas"_qs));
+  EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"project moved Project1"_qs});
+}
+
+}  // namespace
+}  // namespace addin::test

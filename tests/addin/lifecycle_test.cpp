@@ -1,0 +1,287 @@
+// SPDX-License-Identifier: MIT
+// The add-in as the IDE loads it: the real library, connected, started, failing and unloaded through the
+// headless IDE model.
+#include "addinfixture.h"
+#include "common/strings.h"
+#include "host/model/commandbars.h"
+
+#include <gtest/gtest.h>
+
+#include <QClipboard>
+#include <QFile>
+#include <QGuiApplication>
+#include <QImage>
+
+namespace addin::test {
+namespace {
+
+constexpr int kExclamation = ide::mb::Exclamation;
+
+QStringList boxTexts(const host::HeadlessUi& ui) {
+  QStringList texts;
+  for (const auto& box : ui.messageBoxes())
+    texts << box.prompt;
+  return texts;
+}
+
+struct RealAddIn {
+  AddInEnvironment environment;
+  std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
+  QString barsBefore = commandBarsSnapshot(*vbe->CommandBars());
+
+  host::AddInImpl& registerAddIn(bool loadAtStartup) { return registerRealAddIn(*vbe, loadAtStartup); }
+  host::HeadlessUi& ui() { return *vbe->headlessUi(); }
+  host::ManualEventLoop& loop() { return *vbe->manualLoop(); }
+  QString bars() { return commandBarsSnapshot(*vbe->CommandBars()); }
+};
+
+TEST(LifeCycle, StartUpPutsTheCommandsIntoTheIdeAndShutDownTakesThemAllAway) {
+  RealAddIn ide;
+  auto& addIn = ide.registerAddIn(true);
+  EXPECT_EQ(addIn.ProgId(), QStringLiteral("Quimbel.Connect"));
+  EXPECT_EQ(addIn.Description(), QStringLiteral("Quimbel 2.2 Add-In"));
+  ide.vbe->startup();
+  ASSERT_TRUE(addIn.Connect());
+  EXPECT_TRUE(ide.ui().messageBoxes().empty()) << boxTexts(ide.ui()).join(u'|').toStdString();
+
+  // The popup stands before the eleventh menu, which is then the Add-Ins menu at position 12.
+  auto menuBar = ide.vbe->CommandBars()->Item(QStringLiteral("Menu Bar"))->Controls();
+  auto popup = menuBar->Item(11);
+  EXPECT_EQ(popup->Caption(), QStringLiteral("Quimbel"));
+  EXPECT_EQ(popup->Type(), ide::ControlType::Popup);
+  EXPECT_TRUE(popup->Temporary());
+  EXPECT_EQ(menuBar->Item(12)->Caption(), QStringLiteral("&Add-Ins"));
+  const QStringList expectedItems{u"Voltar"_qs,
+                                  u"Avançar"_qs,
+                                  u"Favoritos"_qs,
+                                  u"Definir Macros de Teclado"_qs,
+                                  u"Memórias Adicionais Para Cópias"_qs,
+                                  u"Numerar Linhas"_qs,
+                                  u"Indentar Código"_qs,
+                                  u"Fechar Janelas"_qs,
+                                  u"Localizar Estendido"_qs,
+                                  u"Lista de Tarefas"_qs,
+                                  u"Novo Procedimento"_qs,
+                                  u"Opções"_qs,
+                                  u"Ajuda"_qs};
+  auto items = popup->CommandBar()->Controls();
+  ASSERT_EQ(items->Count(), 13);
+  for (int i = 1; i <= 13; ++i) {
+    auto item = items->Item(i);
+    EXPECT_EQ(item->Caption(), expectedItems[i - 1]);
+    EXPECT_EQ(item->Style(), ide::ButtonStyle::IconAndCaption);
+    EXPECT_TRUE(item->Temporary());
+    EXPECT_TRUE(item->Enabled());
+    EXPECT_FALSE(item->Face().isEmpty()) << i;
+  }
+
+  auto toolbar = ide.vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2"));
+  EXPECT_TRUE(toolbar->Visible());
+  EXPECT_EQ(toolbar->Position(), ide::BarPosition::Top);
+  const QStringList tags{u"MVBackward"_qs,    u"MVForward"_qs,      u"MVDirectAccess"_qs,
+                         u"MVMacros"_qs,      u"MVCopyBuffers"_qs,  u"MVLinesNumbering"_qs,
+                         u"MVIndentation"_qs, u"MVCloseWindows"_qs, u"MVExtendedFind"_qs,
+                         u"MVNotes"_qs,       u"MVNewProcedure"_qs, u"MVOptions"_qs};
+  auto buttons = toolbar->Controls();
+  ASSERT_EQ(buttons->Count(), 12);
+  for (int i = 1; i <= 12; ++i) {
+    auto button = buttons->Item(i);
+    EXPECT_EQ(button->Tag(), tags[i - 1]);
+    EXPECT_EQ(button->TooltipText(), expectedItems[i - 1]);
+    EXPECT_TRUE(button->Temporary());
+    EXPECT_TRUE(button->Visible());
+    // Each picture is a 16 by 16 image; the toolbar's picture of a command is its menu item's picture.
+    const QImage image = QImage::fromData(button->Face());
+    EXPECT_EQ(image.size(), QSize(16, 16)) << i;
+    EXPECT_EQ(button->Face(), items->Item(i)->Face());
+  }
+  EXPECT_FALSE(QImage::fromData(items->Item(13)->Face()).isNull());
+
+  for (const char* name : {"Code Window", "Code Window (Break)"}) {
+    auto first = ide.vbe->CommandBars()->Item(QLatin1StringView(name))->Controls()->Item(1);
+    EXPECT_EQ(first->Caption(), QStringLiteral("Adicionar aos Favoritos"));
+    EXPECT_EQ(first->Style(), ide::ButtonStyle::IconAndCaption);
+    EXPECT_EQ(first->Face(), items->Item(3)->Face()) << "the favourites picture";
+  }
+  EXPECT_EQ(ide.loop().activeTimers(), 1);
+
+  ide.vbe->shutdown();
+  EXPECT_EQ(ide.bars(), ide.barsBefore);
+  EXPECT_EQ(ide.loop().activeTimers(), 0);
+}
+
+TEST(LifeCycle, UnloadingAndLoadingAgainLeavesOnePopupOneToolBarAndOneTimer) {
+  RealAddIn ide;
+  auto& addIn = ide.registerAddIn(false);
+  addIn.setConnect(true);
+  ASSERT_TRUE(addIn.Connect());
+  const QString loaded = ide.bars();
+  addIn.setConnect(false);
+  ide.loop().DoEvents();
+  EXPECT_EQ(ide.bars(), ide.barsBefore);
+  EXPECT_EQ(ide.loop().activeTimers(), 0);
+
+  addIn.setConnect(true);
+  EXPECT_EQ(quimbelPopups(*ide.vbe), 1);
+  EXPECT_EQ(quimbelToolBars(*ide.vbe), 1);
+  EXPECT_EQ(ide.loop().activeTimers(), 1);
+  EXPECT_EQ(ide.bars(), loaded);
+  addIn.setConnect(false);
+  ide.loop().DoEvents();
+  EXPECT_EQ(ide.bars(), ide.barsBefore);
+  EXPECT_EQ(addIn.connectionCount(), 2);
+}
+
+TEST(LifeCycle, LoadedWithTheIdeItStartsOnlyWhenTheIdesStartUpIsComplete) {
+  RealAddIn ide;
+  auto& addIn = ide.registerAddIn(true);
+  addIn.connect(ide::ConnectMode::Startup);
+  EXPECT_EQ(quimbelPopups(*ide.vbe), 0);
+  EXPECT_EQ(ide.loop().activeTimers(), 0);
+  addIn.startupComplete();
+  EXPECT_EQ(quimbelPopups(*ide.vbe), 1);
+  EXPECT_EQ(ide.loop().activeTimers(), 1);
+  // A second notice of the same start-up builds nothing twice.
+  addIn.startupComplete();
+  ide.vbe->startup();
+  EXPECT_EQ(quimbelPopups(*ide.vbe), 1);
+  EXPECT_EQ(quimbelToolBars(*ide.vbe), 1);
+  EXPECT_EQ(ide.loop().activeTimers(), 1);
+  ide.vbe->shutdown();
+}
+
+TEST(LifeCycle, TheStartUpShowsTheSplashAndTheHourglassOnlyWhileItRuns) {
+  RealAddIn ide;
+  auto& addIn = ide.registerAddIn(false);
+  addIn.setConnect(true);
+  ASSERT_EQ(ide.ui().splashHistory().size(), 2u);
+  EXPECT_EQ(ide.ui().splashHistory().front(), QStringLiteral("Quimbel 2.2"));
+  EXPECT_TRUE(ide.ui().splashText().isEmpty());
+  EXPECT_EQ(ide.ui().cursor(), ide::Cursor::Default);
+  ide.vbe->shutdown();
+}
+
+TEST(LifeCycle, StartUpLeavesTheClipboardAlone) {
+  static int argc = 1;
+  static char name[] = "addin_test";
+  static char* argv[] = {name, nullptr};
+  if (!QGuiApplication::instance()) new QGuiApplication(argc, argv);  // kept: Qt is not set up twice
+  QGuiApplication::clipboard()->setText(QStringLiteral("texto do usuário"));
+  RealAddIn ide;
+  ide.registerAddIn(true);
+  ide.vbe->startup();
+  ASSERT_EQ(quimbelPopups(*ide.vbe), 1);
+  EXPECT_EQ(QGuiApplication::clipboard()->text(), QStringLiteral("texto do usuário"));
+  ide.vbe->shutdown();
+  EXPECT_EQ(QGuiApplication::clipboard()->text(), QStringLiteral("texto do usuário"));
+}
+
+TEST(LifeCycle, AToolBarLeftBehindByAnEarlierConnectionIsReplaced) {
+  RealAddIn ide;
+  ide.vbe->CommandBars()->Add(QStringLiteral("Quimbel 2.2"), ide::BarPosition::Top, false, false);
+  auto& addIn = ide.registerAddIn(false);
+  addIn.setConnect(true);
+  EXPECT_TRUE(addIn.Connect());
+  EXPECT_EQ(quimbelToolBars(*ide.vbe), 1);
+  EXPECT_EQ(ide.vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2"))->Controls()->Count(), 12);
+  ide.vbe->shutdown();
+  EXPECT_EQ(quimbelToolBars(*ide.vbe), 0);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Failures
+
+TEST(StartUpFailures, WithoutAnInstallationPathTheAddInSaysSoAndUnloadsItself) {
+  const QStringList configurations{QString(), QStringLiteral("# nothing\n"),
+                                   QStringLiteral("InstallationPath=   \n")};
+  for (const QString& configuration : configurations) {
+    RealAddIn ide;
+    if (configuration.isNull())
+      QFile::remove(ide.environment.machineConfigPath());
+    else
+      ide.environment.writeMachineConfig(configuration);
+    auto& addIn = ide.registerAddIn(true);
+    ide.vbe->startup();
+    ide.loop().DoEvents();
+    EXPECT_FALSE(addIn.Connect());
+    ASSERT_EQ(ide.ui().messageBoxes().size(), 1u) << configuration.toStdString();
+    const auto& box = ide.ui().messageBoxes().front();
+    EXPECT_EQ(box.prompt, QStringLiteral("Erro: não foi possível detectar o diretório de instalação."));
+    EXPECT_EQ(ide::mb::iconOf(box.style), kExclamation);
+    EXPECT_EQ(box.title, QStringLiteral("Quimbel"));
+    EXPECT_TRUE(ide.ui().splashHistory().empty());
+    EXPECT_EQ(ide.bars(), ide.barsBefore);
+    EXPECT_EQ(ide.loop().activeTimers(), 0);
+  }
+}
+
+TEST(StartUpFailures, AReadOnlyMachineConfigurationIsEnough) {
+  RealAddIn ide;
+  QFile::setPermissions(ide.environment.machineConfigPath(),
+                        QFile::ReadOwner | QFile::ReadGroup | QFile::ReadOther);
+  auto& addIn = ide.registerAddIn(false);
+  addIn.setConnect(true);
+  EXPECT_TRUE(addIn.Connect());
+  EXPECT_TRUE(ide.ui().messageBoxes().empty());
+  ide.vbe->shutdown();
+}
+
+TEST(StartUpFailures, WithoutAnAddInsMenuTheStartUpFailsAndTakesApartWhatItBuilt) {
+  RealAddIn ide;
+  // An IDE without the Add-Ins menu.
+  ide.vbe->CommandBars()
+      ->Item(QStringLiteral("Menu Bar"))
+      ->Controls()
+      ->Item(QStringLiteral("&Add-Ins"))
+      ->Delete();
+  const QString before = ide.bars();
+  auto& addIn = ide.registerAddIn(true);
+  ide.vbe->startup();
+  ide.loop().DoEvents();
+  EXPECT_FALSE(addIn.Connect());
+  ASSERT_EQ(boxTexts(ide.ui()), QStringList{QStringLiteral("Erro de inicialização.")});
+  EXPECT_EQ(ide::mb::iconOf(ide.ui().messageBoxes().front().style), kExclamation);
+  EXPECT_EQ(ide.bars(), before);
+  EXPECT_EQ(ide.loop().activeTimers(), 0);
+  EXPECT_TRUE(ide.ui().splashText().isEmpty());
+  EXPECT_EQ(ide.ui().cursor(), ide::Cursor::Default);
+  // The log names the number (0x80040C81 as a 32-bit number), the text and where it failed.
+  const QStringList log = ide.environment.errorLog();
+  ASSERT_EQ(log.size(), 1);
+  EXPECT_TRUE(log.front().contains(QStringLiteral("\t-2147218303\tNão há menu de Add-Ins.\t")))
+      << log.front().toStdString();
+  EXPECT_TRUE(log.front().contains(QStringLiteral("em CVBEvents_ConnectMenus, linha: ")))
+      << log.front().toStdString();
+}
+
+TEST(StartUpFailures, AFailureThreeCallsDeepShowsOneMessageNamingTheInnermostProcedure) {
+  RealAddIn ide;
+  auto& addIn = ide.registerAddIn(true);
+  ide.vbe->startup();
+  auto project = ide.vbe->newProject();
+  auto module = addModule(project, QStringLiteral("modUm"), 1, 5);
+  ide.loop().DoEvents();
+  ide.ui().clearMessageBoxes();
+  // Without the "Continue" button the IDE's mode cannot be read: selecting a component fails in the mode
+  // test (the handler asks CEnvUtils_IdeMode, which asks CEnvUtils_IsStandardControlEnabled).
+  ide.vbe->CommandBars()
+      ->Item(QStringLiteral("Standard"))
+      ->Controls()
+      ->Item(QStringLiteral("Continue"))
+      ->Delete();
+  ide.vbe->selectComponent(nullptr);
+  ide.vbe->selectComponent(module);
+  ASSERT_EQ(ide.ui().messageBoxes().size(), 1u) << boxTexts(ide.ui()).join(u'|').toStdString();
+  const auto& box = ide.ui().messageBoxes().front();
+  EXPECT_EQ(box.prompt, QStringLiteral("5 ") + ide::standardDescription(5));
+  EXPECT_EQ(ide::mb::buttonsOf(box.style), ide::mb::OKOnly);
+  const QStringList log = ide.environment.errorLog();
+  ASSERT_EQ(log.size(), 1);
+  EXPECT_TRUE(log.front().contains(QStringLiteral("em CEnvUtils_IsStandardControlEnabled, linha: ")))
+      << log.front().toStdString();
+  EXPECT_TRUE(addIn.Connect()) << "a failing handler does not unload the add-in";
+  ide.vbe->shutdown();
+}
+
+}  // namespace
+}  // namespace addin::test
