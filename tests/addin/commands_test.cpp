@@ -98,6 +98,21 @@ TEST(CommandState, AfterTheFirstProjectTheProjectCommandsWorkAtOnceAndNewProcedu
   EXPECT_EQ(addIn.globals().LastWindowType(), -1);
 }
 
+TEST(Globals, TheStartUpReadsTheNamesAndTheIdleMessage) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  Globals& globals = addIn.globals();
+  EXPECT_EQ(globals.ComputerName(), addIn.vbe->Platform().computerName().left(255));
+  EXPECT_EQ(globals.UserName(), addIn.vbe->Platform().userName().left(255));
+  EXPECT_FALSE(globals.UserName().isEmpty());
+  EXPECT_EQ(globals.IdleMessage(), addIn.vbe->windowSystem().RegisterWindowMessage(u"QM_ONIDLE_MSG"_qs));
+  EXPECT_EQ(globals.values().InstallDir, environment.installDir() + u'/');
+  EXPECT_EQ(globals.LastWindowType(), -1);
+  EXPECT_NE(globals.TimerId(), 0);
+  EXPECT_EQ(addIn.ui().messageBoxes().size(), 0u);
+}
+
 TEST(CommandState, AMenuItemDoesWhatItsToolBarButtonDoes) {
   AddInEnvironment environment;
   LinkedAddIn addIn;

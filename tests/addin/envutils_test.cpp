@@ -3,6 +3,7 @@
 #include "addin/envutils.h"
 #include "addin/pictures.h"
 #include "addinfixture.h"
+#include "common/uiutils.h"
 #include "host/model/objects.h"
 
 #include <gtest/gtest.h>
@@ -101,6 +102,39 @@ TEST(IdeMode, ReadFromTheStandardBarsContinueAndEnd) {
   again->setCaption(u"Continue"_qs);
   again->setEnabled(true);
   EXPECT_EQ(utils.IdeMode(), ide::IdeMode::Break);
+}
+
+TEST(UiHelpers, CursorsWindowLocksAndTheSplashAreRestoredWhenReleased) {
+  auto vbe = host::VbeImpl::create();
+  host::HeadlessUi& ui = *vbe->headlessUi();
+  {
+    common::CHourGlass hourglass(ui);
+    EXPECT_EQ(ui.cursor(), ide::Cursor::Hourglass);
+    {
+      common::CArrowHourglass arrow(ui);
+      EXPECT_EQ(ui.cursor(), ide::Cursor::ArrowHourglass);
+    }
+    EXPECT_EQ(ui.cursor(), ide::Cursor::Hourglass);
+  }
+  EXPECT_EQ(ui.cursor(), ide::Cursor::Default);
+
+  auto& windows = vbe->windowSystem();
+  const ide::HWnd main = vbe->MainWindow()->hWnd();
+  {
+    common::CLockWindowUpdate lock(windows);
+    EXPECT_TRUE(lock.LockWindow(main));
+    EXPECT_EQ(windows.lockedWindow(), main);
+    common::CLockWindowUpdate other(windows);
+    EXPECT_FALSE(other.LockWindow(vbe->projectWindow()->hWnd())) << "one window at a time";
+  }
+  EXPECT_EQ(windows.lockedWindow(), 0u);
+
+  {
+    common::SplashWindow splash(ui, *vbe->manualLoop(), u"Quimbel 2.2"_qs);
+    EXPECT_EQ(ui.splashText(), u"Quimbel 2.2"_qs);
+  }
+  EXPECT_TRUE(ui.splashText().isEmpty());
+  EXPECT_EQ(ui.splashHistory().size(), 2u);
 }
 
 }  // namespace
