@@ -15,7 +15,7 @@ WalkContext::WalkContext(QString owner, ide::EventLoop* loop, ProgressSink* bar)
 
 void WalkContext::yield() {
   if (!m_loop) return;
-  if (Clock::now() - m_lastYield < m_yieldInterval) return;
+  if (m_lastYield && Clock::now() - *m_lastYield < m_yieldInterval) return;
   m_loop->DoEvents();
   // Measured after the loop ran, so that a slow repaint still leaves the walk its share of the time.
   m_lastYield = Clock::now();
@@ -34,6 +34,7 @@ void WalkContext::reset() {
   m_cancel = false;
   m_stopped = false;
   m_line = 0;
+  m_lastYield.reset();
 }
 
 void WalkContext::SetProgressRange(qint32 units) {

@@ -119,7 +119,7 @@ class WalkContext {
   ProgressSink* m_bar;
   std::optional<ProgressScale> m_scale;
   Clock::duration m_yieldInterval = std::chrono::milliseconds(5);
-  Clock::time_point m_lastYield{};
+  std::optional<Clock::time_point> m_lastYield;  // none: the next yield runs the loop
   bool m_cancel = false;
   bool m_stopped = false;
   int m_depth = 0;

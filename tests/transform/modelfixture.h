@@ -1,0 +1,101 @@
+// SPDX-License-Identifier: MIT
+// Helpers of the walk, number-and-indent and dialog tests: a headless IDE holding modules written in the
+// test, a loop that counts its runs, a progress bar that records what it was told, and whole-module texts.
+#pragma once
+
+#include "host/model/vbe.h"
+#include "transform/progress.h"
+
+#include <QStringList>
+
+#include <functional>
+#include <memory>
+#include <vector>
+
+namespace transform::test {
+
+/// The lines of a code module.
+inline QStringList linesOf(ide::CodeModule& module) {
+  QStringList lines;
+  for (int i = 1; i <= module.CountOfLines(); ++i)
+    lines << module.Lines(i, 1);
+  return lines;
+}
+
+/// A headless IDE with one unsaved project; modules are added from lines.
+struct Ide {
+  std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
+  std::shared_ptr<host::ProjectImpl> project = vbe->newProject();
+
+  /// A new standard module (or class) holding exactly `lines`.
+  ide::Ref<ide::CodeModule> addModule(const QStringList& lines,
+                                      ide::ComponentType type = ide::ComponentType::StdModule) {
+    auto module = project->Add(type)->CodeModule();
+    if (module->CountOfLines() > 0) module->DeleteLines(1, module->CountOfLines());
+    module->AddFromString(lines.join(QStringLiteral("\r\n")));
+    return module;
+  }
+
+  /// Puts the caret of `module`'s code pane on `line` and makes the pane the active one.
+  static void placeCaret(const ide::Ref<ide::CodeModule>& module, int line) {
+    auto pane = module->CodePane();
+    pane->Show();
+    pane->SetSelection(line, 1, line, 1);
+  }
+
+  /// How many edits the module has had (each replaced line counts one).
+  static quint64 edits(const ide::Ref<ide::CodeModule>& module) {
+    return std::dynamic_pointer_cast<host::CodeModuleImpl>(module)->text().changeCount();
+  }
+};
+
+/// A loop that counts how often it runs and runs queued work in order.
+class CountingLoop final : public ide::EventLoop {
+ public:
+  int SetTimer(int, std::function<void()>) override { return 0; }
+  bool KillTimer(int) override { return false; }
+  void post(std::function<void()> work) override { m_posted.push_back(std::move(work)); }
+  void DoEvents() override {
+    ++runs;
+    auto posted = std::exchange(m_posted, {});
+    for (auto& work : posted)
+      work();
+    if (onRun) onRun(runs);
+  }
+  qint64 tickCount() override { return 0; }
+
+  int runs = 0;
+  /// Called after every run with the number of runs so far.
+  std::function<void(int)> onRun;
+
+ private:
+  std::vector<std::function<void()>> m_posted;
+};
+
+/// A progress bar that remembers its state and every value it was given.
+class RecordingBar final : public ProgressSink {
+ public:
+  int minimum() const override { return m_minimum; }
+  void setMinimum(int minimum) override { m_minimum = minimum; }
+  int maximum() const override { return m_maximum; }
+  void setMaximum(int maximum) override { m_maximum = maximum; }
+  int value() const override { return m_value; }
+  void setValue(int value) override {
+    m_value = value;
+    values.push_back(value);
+    if (onValue) onValue(value);
+  }
+  bool isVisible() const override { return m_visible; }
+  void setVisible(bool visible) override { m_visible = visible; }
+
+  std::vector<int> values;
+  std::function<void(int)> onValue;
+
+ private:
+  int m_minimum = 0;
+  int m_maximum = 100;
+  int m_value = 0;
+  bool m_visible = false;
+};
+
+}  // namespace transform::test

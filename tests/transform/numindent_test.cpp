@@ -1,0 +1,167 @@
+// SPDX-License-Identifier: MIT
+// The number-and-indent command: its scopes, its events and their texts, cancelling, and the progress bar
+// it is handed.
+#include "transform/numindent.h"
+#include "host/model/vbe.h"
+#include "host/platform/manualloop.h"
+#include "modelfixture.h"
+#include "testproject.h"
+
+#include "printers.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+namespace transform {
+namespace {
+
+using test::Ide;
+using test::linesOf;
+
+const QStringList kFirst = {
+    QStringLiteral("Option Explicit"), QStringLiteral("Sub Um()"), QStringLiteral("If x Then"),
+    QStringLiteral("y = 1"),           QStringLiteral("End If"),   QStringLiteral("End Sub"),
+};
+const QStringList kFirstDone = {
+    QStringLiteral("Option Explicit"), QStringLiteral("Sub Um()"),       QStringLiteral("10000 \tIf x Then"),
+    QStringLiteral("10005 \t\ty = 1"), QStringLiteral("10010 \tEnd If"), QStringLiteral("End Sub"),
+};
+const QStringList kSecond = {
+    QStringLiteral("Sub Dois()"),
+    QStringLiteral("z = 2"),
+    QStringLiteral("End Sub"),
+};
+
+// Records the events of one command in the order they come.
+struct Events {
+  std::vector<QString> seen;
+  std::vector<ide::Connection> connections;
+  explicit Events(CNumIndent& command) {
+    connections.push_back(command.Begining.connect([this] { seen.push_back(QStringLiteral("Begining")); }));
+    connections.push_back(command.Error.connect([this](const QString& text) { seen.push_back(text); }));
+    connections.push_back(command.Finished.connect([this] { seen.push_back(QStringLiteral("Finished")); }));
+  }
+};
+
+struct Scene {
+  Ide ide;
+  ide::Ref<ide::CodeModule> first = ide.addModule(kFirst);
+  ide::Ref<ide::CodeModule> second = ide.addModule(kSecond);
+  CNumIndent command{ide.vbe};
+  Events events{command};
+  test::RecordingBar bar;
+
+  Scene() { ide.vbe->setActiveVBProject(ide.project); }
+  void select(const ide::Ref<ide::CodeModule>& module) {
+    ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
+  }
+};
+
+TEST(CNumIndent, NumbersAndIndentsTheSelectedModuleBetweenBeginingAndFinished) {
+  Scene s;
+  s.select(s.first);
+  s.command.DoIt(PROG_MODULE, &s.bar, 10000, 5, false, 1, true);
+  EXPECT_EQ(linesOf(*s.first), kFirstDone);
+  EXPECT_EQ(linesOf(*s.second), kSecond);
+  EXPECT_EQ(s.events.seen, (std::vector<QString>{QStringLiteral("Begining"), QStringLiteral("Finished")}));
+  // Lines outside the declarations: five; the procedure advances by all of them.
+  EXPECT_EQ(s.bar.maximum(), 5);
+  EXPECT_EQ(s.bar.value(), 5);
+  EXPECT_TRUE(s.bar.isVisible());
+}
+
+TEST(CNumIndent, RemovesNumbersWithSpacesOverTheActiveProject) {
+  Scene s;
+  s.command.DoIt(PROG_PROJECT, &s.bar, 10000, 5, true, 1, true);
+  s.command.DoIt(PROG_PROJECT, &s.bar, 0, 0, true, 3, false);
+  EXPECT_EQ(linesOf(*s.first),
+            (QStringList{kFirst[0], kFirst[1], QStringLiteral("   If x Then"), QStringLiteral("      y = 1"),
+                         QStringLiteral("   End If"), kFirst[5]}));
+  EXPECT_EQ(linesOf(*s.second), (QStringList{kSecond[0], QStringLiteral("   z = 2"), kSecond[2]}));
+}
+
+TEST(CNumIndent, TheProcedureAtTheCaretAloneChanges) {
+  Scene s;
+  Ide::placeCaret(s.first, 4);
+  s.command.DoIt(PROG_PROCEDURE, &s.bar, 10000, 5, false, 1, true);
+  EXPECT_EQ(linesOf(*s.first), kFirstDone);
+  EXPECT_EQ(linesOf(*s.second), kSecond);
+}
+
+TEST(CNumIndent, ASelectionOutsideEveryProcedureFillsTheBarAndChangesNothing) {
+  Scene s;
+  Ide::placeCaret(s.first, 1);
+  s.command.DoIt(PROG_PROCEDURE, &s.bar, 10000, 5, false, 1, true);
+  EXPECT_EQ(linesOf(*s.first), kFirst);
+  EXPECT_EQ(s.bar.value(), s.bar.maximum());
+  EXPECT_EQ(s.events.seen.back(), QStringLiteral("Finished"));
+}
+
+TEST(CNumIndent, CancelDuringAProjectRunHidesTheBarAndRaisesNoFinished) {
+  Scene s;
+  s.command.setYieldInterval({});
+  // The first module's procedure moves the bar: the user cancels then, before the second module.
+  s.bar.onValue = [&](int value) {
+    if (value > 0) s.command.Cancel();
+  };
+  s.command.DoIt(PROG_PROJECT, &s.bar, 10000, 5, false, 1, true);
+  EXPECT_EQ(linesOf(*s.second), kSecond);
+  EXPECT_FALSE(s.bar.isVisible());
+  EXPECT_EQ(s.events.seen, std::vector<QString>{QStringLiteral("Begining")});
+}
+
+TEST(CNumIndent, ACancelFromWorkTheLoopRunsStopsTheWalkBeforeItChangesAnything) {
+  Scene s;
+  // The first yield of the run lets the IDE's loop run the click on Cancel.
+  s.ide.vbe->manualLoop()->post([&] { s.command.Cancel(); });
+  s.command.DoIt(PROG_PROJECT, &s.bar, 10000, 5, false, 1, true);
+  EXPECT_EQ(linesOf(*s.first), kFirst);
+  EXPECT_EQ(linesOf(*s.second), kSecond);
+  EXPECT_EQ(s.events.seen, std::vector<QString>{QStringLiteral("Begining")});
+}
+
+TEST(CNumIndent, AFailureOfTheRunItselfIsAnErrorEventNamingDoIt) {
+  Ide ide;
+  CNumIndent command(ide.vbe);
+  Events events(command);
+  command.DoIt(PROG_MODULE, nullptr, 10000, 5, false, 1, true);  // no component is selected
+  ASSERT_EQ(events.seen.size(), 3u);
+  EXPECT_EQ(events.seen[1], QStringLiteral("91 %1\nem CNumIndent_DoIt, linha: 0")
+                                .arg(ide::standardDescription(ide::err::ObjectVariableNotSet)));
+  EXPECT_EQ(events.seen[2], QStringLiteral("Finished"));
+}
+
+TEST(CNumIndent, ANumberPastTheLargestStopsTheRunWithOneErrorNamingTheScope) {
+  Scene s;
+  s.command.DoIt(PROG_PROJECT, &s.bar, std::numeric_limits<qint32>::max(), 1, false, 1, true);
+  ASSERT_EQ(s.events.seen.size(), 3u);
+  EXPECT_TRUE(s.events.seen[1].startsWith(QStringLiteral("6 ")));
+  EXPECT_TRUE(s.events.seen[1].endsWith(QStringLiteral("\nem CNumIndent_NumIndentProject, linha: 4")))
+      << s.events.seen[1].toStdString();
+  EXPECT_EQ(linesOf(*s.first)[2], QStringLiteral("2147483647 If x Then"));
+  EXPECT_EQ(linesOf(*s.second), kSecond);
+}
+
+TEST(CNumIndent, LinesTheIndenterCannotWriteAreErrorEventsAndTheWalkGoesOn) {
+  const QString longCode = QStringLiteral("s = \"%1\"").arg(QString(1012, u'a'));
+  Ide ide;
+  auto module = ide.addModule({QStringLiteral("Private Type T"),
+                               QStringLiteral("x As String * 10 ' ") + QString(1000, u'c'),
+                               QStringLiteral("End Type"), QStringLiteral("Sub Um()"), longCode,
+                               QStringLiteral("y = 1"), QStringLiteral("End Sub")});
+  ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
+  CNumIndent command(ide.vbe);
+  Events events(command);
+  command.DoIt(PROG_MODULE, nullptr, 10000, 5, true, 8, false);
+  ASSERT_EQ(events.seen.size(), 4u);
+  EXPECT_TRUE(events.seen[1].startsWith(QStringLiteral("35020 ")));
+  EXPECT_TRUE(events.seen[1].endsWith(QStringLiteral("\nIndentLine 5"))) << events.seen[1].toStdString();
+  EXPECT_TRUE(events.seen[2].endsWith(QStringLiteral("\nSource:  IndentDeclarationLine, line: 2")))
+      << events.seen[2].toStdString();
+  EXPECT_EQ(events.seen[3], QStringLiteral("Finished"));
+  EXPECT_EQ(module->Lines(6, 1), QStringLiteral("        y = 1"));
+}
+
+}  // namespace
+}  // namespace transform

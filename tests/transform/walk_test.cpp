@@ -1,0 +1,667 @@
+// SPDX-License-Identifier: MIT
+// The numbering and indentation walks over the IDE model: which lines they visit and change, yielding,
+// cancelling, progress, failures, and the round trips on the example group and on generated projects.
+#include "generator.h"
+#include "host/model/vbe.h"
+#include "modelfixture.h"
+#include "testproject.h"
+#include "transform/indentwalk.h"
+#include "transform/numberwalk.h"
+#include "transform/numindent.h"
+
+#include "printers.h"
+
+#include <gtest/gtest.h>
+
+#include <QMap>
+#include <QTemporaryDir>
+
+#include <chrono>
+#include <limits>
+
+namespace transform {
+namespace {
+
+using test::Ide;
+using test::linesOf;
+
+// A module with a continued header, blocks, a continued statement, a label, a comment, directives, a
+// blank line before End Sub and a comment after the last procedure. Indented carelessly, tabs included.
+const QStringList kModule = {
+    QStringLiteral("Option Explicit"),                      // 1
+    QStringLiteral("Private m As Long"),                    // 2
+    QString(),                                              // 3
+    QStringLiteral("Public Sub Alpha(ByVal a As Long, _"),  // 4
+    QStringLiteral("        ByVal b As Long, _"),           // 5
+    QStringLiteral("        ByVal c As Long)"),             // 6
+    QStringLiteral("Dim x As Long"),                        // 7
+    QStringLiteral("\tx = a + _"),                          // 8
+    QStringLiteral("b"),                                    // 9
+    QStringLiteral("  Select Case x"),                      // 10
+    QStringLiteral("Case 1"),                               // 11
+    QStringLiteral("x = 2"),                                // 12
+    QStringLiteral("End Select"),                           // 13
+    QStringLiteral("If x > 1 Then"),                        // 14
+    QStringLiteral("x = 3"),                                // 15
+    QStringLiteral("      Else"),                           // 16
+    QStringLiteral("x = 4"),                                // 17
+    QStringLiteral("End If"),                               // 18
+    QStringLiteral("Erro:"),                                // 19
+    QStringLiteral("' nota"),                               // 20
+    QStringLiteral("#If DEPURACAO Then"),                   // 21
+    QStringLiteral("Debug.Print x"),                        // 22
+    QStringLiteral("#End If"),                              // 23
+    QString(),                                              // 24
+    QStringLiteral("End Sub"),                              // 25
+    QString(),                                              // 26
+    QStringLiteral("Private Function Beta() As Long"),      // 27
+    QStringLiteral("    Beta = 1"),                         // 28
+    QStringLiteral("End Function"),                         // 29
+    QStringLiteral("' fim do módulo"),                      // 30
+};
+
+// kModule numbered from 10000 in steps of 5.
+QStringList numberedModule() {
+  QStringList lines = kModule;
+  lines[6] = QStringLiteral("10000 Dim x As Long");
+  lines[7] = QStringLiteral("10005 \tx = a + _");
+  lines[9] = QStringLiteral("10010   Select Case x");
+  lines[11] = QStringLiteral("10015 x = 2");
+  lines[12] = QStringLiteral("10020 End Select");
+  lines[13] = QStringLiteral("10025 If x > 1 Then");
+  lines[14] = QStringLiteral("10030 x = 3");
+  lines[15] = QStringLiteral("10035        Else");  // a one-word line takes two blanks
+  lines[16] = QStringLiteral("10040 x = 4");
+  lines[17] = QStringLiteral("10045 End If");
+  lines[21] = QStringLiteral("10050 Debug.Print x");
+  lines[27] = QStringLiteral("10000     Beta = 1");
+  return lines;
+}
+
+// kModule indented with two spaces.
+QStringList indentedModule() {
+  QStringList lines = kModule;
+  lines[4] = QStringLiteral("  ByVal b As Long, _");
+  lines[5] = QStringLiteral("  ByVal c As Long)");
+  lines[6] = QStringLiteral("  Dim x As Long");
+  lines[7] = QStringLiteral("  x = a + _");
+  lines[8] = QStringLiteral("    b");
+  lines[9] = QStringLiteral("  Select Case x");
+  lines[10] = QStringLiteral("    Case 1");
+  lines[11] = QStringLiteral("      x = 2");
+  lines[12] = QStringLiteral("  End Select");
+  lines[13] = QStringLiteral("  If x > 1 Then");
+  lines[14] = QStringLiteral("    x = 3");
+  lines[15] = QStringLiteral("  Else");
+  lines[16] = QStringLiteral("    x = 4");
+  lines[17] = QStringLiteral("  End If");
+  lines[18] = QStringLiteral("  Erro:");
+  lines[19] = QStringLiteral("  ' nota");
+  lines[20] = QStringLiteral("  #If DEPURACAO Then");
+  lines[21] = QStringLiteral("    Debug.Print x");
+  lines[22] = QStringLiteral("  #End If");
+  lines[27] = QStringLiteral("  Beta = 1");
+  return lines;
+}
+
+// kModule numbered from 10000 in steps of 5 and indented with tabs: the numbers in a six-character column.
+QStringList numIndentedModule() {
+  const QString column(6, u' ');
+  QStringList lines = kModule;
+  lines[4] = column + QStringLiteral("\tByVal b As Long, _");
+  lines[5] = column + QStringLiteral("\tByVal c As Long)");
+  lines[6] = QStringLiteral("10000 \tDim x As Long");
+  lines[7] = QStringLiteral("10005 \tx = a + _");
+  lines[8] = column + QStringLiteral("\t\tb");
+  lines[9] = QStringLiteral("10010 \tSelect Case x");
+  lines[10] = column + QStringLiteral("\t\tCase 1");
+  lines[11] = QStringLiteral("10015 \t\t\tx = 2");
+  lines[12] = QStringLiteral("10020 \tEnd Select");
+  lines[13] = QStringLiteral("10025 \tIf x > 1 Then");
+  lines[14] = QStringLiteral("10030 \t\tx = 3");
+  lines[15] = QStringLiteral("10035 \tElse");
+  lines[16] = QStringLiteral("10040 \t\tx = 4");
+  lines[17] = QStringLiteral("10045 \tEnd If");
+  lines[18] = column + QStringLiteral("\tErro:");
+  lines[19] = column + QStringLiteral("\t' nota");
+  lines[20] = column + QStringLiteral("\t#If DEPURACAO Then");
+  lines[21] = QStringLiteral("10050 \t\tDebug.Print x");
+  lines[22] = column + QStringLiteral("\t#End If");
+  lines[27] = QStringLiteral("10000 \tBeta = 1");
+  return lines;
+}
+
+struct Failures {
+  std::vector<WalkFailure> walks;
+  std::vector<WalkFailure> lines;
+  void attach(WalkContext& context) {
+    context.onFailure = [this](const WalkFailure& failure) { walks.push_back(failure); };
+    context.onLineSkipped = [this](const WalkFailure& failure) { lines.push_back(failure); };
+  }
+};
+
+// A context with a counting loop and a recording bar, failures collected.
+struct Walk {
+  test::CountingLoop loop;
+  test::RecordingBar bar;
+  WalkContext context{QStringLiteral("frmLinNumbers"), &loop, &bar};
+  Failures failures;
+  Walk() { failures.attach(context); }
+};
+
+// ---------------------------------------------------------------------------------------------------
+// Numbering
+
+TEST(NumberingWalk, NumbersAModuleProcedureByProcedureFromTheStartNumber) {
+  Ide ide;
+  auto module = ide.addModule(kModule);
+  ASSERT_EQ(linesOf(*module), kModule);
+  Walk run;
+  NumberingWalk(run.context, 10000, 5).NumberModule(module, true);
+  EXPECT_EQ(linesOf(*module), numberedModule());
+  EXPECT_TRUE(run.failures.walks.empty());
+}
+
+TEST(NumberingWalk, RemovingTheNumbersGivesTheModuleBackButForTheBlankOfOneWordLines) {
+  Ide ide;
+  auto module = ide.addModule(numberedModule());
+  Walk run;
+  NumberingWalk(run.context, 10000, 5).NumberModule(module, false);
+  QStringList expected = kModule;
+  expected[15] = QStringLiteral(" ") + kModule[15];
+  EXPECT_EQ(linesOf(*module), expected);
+}
+
+TEST(NumberingWalk, HeaderContinuationLinesAndContinuedStatementsKeepTheirLeadingNumbers) {
+  // "2 * b" continues a statement: its 2 is an operand. The header's continuation lines are parameters.
+  const QStringList lines = {
+      QStringLiteral("Function Soma(ByVal a As Long, _"),
+      QStringLiteral("10 ByVal b As Long) As Long"),
+      QStringLiteral("20 Soma = a + _"),
+      QStringLiteral("    2 * b"),
+      QStringLiteral("End Function"),
+  };
+  Ide ide;
+  auto module = ide.addModule(lines);
+  Walk run;
+  NumberingWalk(run.context, 10000, 5).NumberModule(module, false);
+  EXPECT_EQ(linesOf(*module),
+            (QStringList{lines[0], lines[1], QStringLiteral("Soma = a + _"), lines[3], lines[4]}));
+}
+
+TEST(NumberingWalk, RenumberingANumberedProcedureWidensTheColumnByOneBlankAndIndentingRestoresIt) {
+  const QStringList lines = {
+      QStringLiteral("Sub Gravar()"),    QStringLiteral("10        On Error GoTo Erro"),
+      QStringLiteral("20        x = 1"), QStringLiteral("Erro:"),
+      QStringLiteral("30        y = 2"), QStringLiteral("End Sub"),
+  };
+  Ide ide;
+  auto module = ide.addModule(lines);
+  Walk run;
+  NumberingWalk(run.context, 10, 10).NumberModule(module, true);
+  EXPECT_EQ(linesOf(*module), (QStringList{lines[0], QStringLiteral("10         On Error GoTo Erro"),
+                                           QStringLiteral("20         x = 1"), lines[3],
+                                           QStringLiteral("30         y = 2"), lines[5]}));
+  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
+  const QStringList indented = {lines[0],
+                                QStringLiteral("10     On Error GoTo Erro"),
+                                QStringLiteral("20     x = 1"),
+                                QStringLiteral("       Erro:"),
+                                QStringLiteral("30     y = 2"),
+                                lines[5]};
+  EXPECT_EQ(linesOf(*module), indented);
+
+  // The original, indented the same way, is the same text: renumbering left no trace.
+  auto original = ide.addModule(lines);
+  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(original);
+  EXPECT_EQ(linesOf(*original), indented);
+}
+
+TEST(NumberingWalk, ADeclareStatementListedAsAMethodIsNeverNumbered) {
+  const QStringList lines = {
+      QStringLiteral("Private Declare Function GetTickCount Lib \"kernel32\" _"),
+      QStringLiteral("    () As Long"),
+      QString(),
+      QStringLiteral("Sub Main()"),
+      QStringLiteral("    x = GetTickCount"),
+      QStringLiteral("End Sub"),
+  };
+  Ide ide;
+  auto module = ide.addModule(lines);
+  Walk run;
+  NumberingWalk walk(run.context, 100, 10);
+  walk.NumberModule(module, true);
+  QStringList expected = lines;
+  expected[4] = QStringLiteral("100     x = GetTickCount");
+  EXPECT_EQ(linesOf(*module), expected);
+  walk.NumberModule(module, false);
+  EXPECT_EQ(linesOf(*module), lines);
+}
+
+TEST(NumberingWalk, PropertiesAreNumberedKindByKind) {
+  const QStringList lines = {
+      QStringLiteral("Private mNome As String"),
+      QStringLiteral("Public Property Let Nome(ByVal Valor As String)"),
+      QStringLiteral("    mNome = Valor"),
+      QStringLiteral("End Property"),
+      QStringLiteral("Public Property Get Nome() As String"),
+      QStringLiteral("    Nome = mNome"),
+      QStringLiteral("End Property"),
+  };
+  Ide ide;
+  auto module = ide.addModule(lines, ide::ComponentType::ClassModule);
+  Walk run;
+  NumberingWalk(run.context, 1, 1).NumberModule(module, true);
+  QStringList expected = lines;
+  expected[2] = QStringLiteral("1     mNome = Valor");
+  expected[5] = QStringLiteral("1     Nome = mNome");
+  EXPECT_EQ(linesOf(*module), expected);
+}
+
+TEST(NumberingWalk, TheCurrentProcedureIsTheOneAtTheCaretAndNoOtherLineChanges) {
+  Ide ide;
+  auto module = ide.addModule(kModule);
+  ide.placeCaret(module, 28);  // in Beta
+  module->CodePane()->Window()->setWindowState(ide::WindowState::Minimize);
+  Walk run;
+  NumberingWalk(run.context, 10000, 5).NumberCurrentProcedure(*ide.vbe, true);
+  QStringList expected = kModule;
+  expected[27] = QStringLiteral("10000     Beta = 1");
+  EXPECT_EQ(linesOf(*module), expected);
+  // The user is about to see the procedure change.
+  EXPECT_EQ(module->CodePane()->Window()->WindowState(), ide::WindowState::Normal);
+
+  // In the declarations there is no procedure: nothing changes, the bar still moves.
+  ide.placeCaret(module, 1);
+  run.context.SetProgressRange(1);
+  NumberingWalk(run.context, 10000, 5).NumberCurrentProcedure(*ide.vbe, true);
+  EXPECT_EQ(linesOf(*module), expected);
+  EXPECT_EQ(run.bar.value(), 1);
+}
+
+TEST(NumberingWalk, WithoutACodeWindowTheCurrentProcedureFailsWithItsMessage) {
+  Ide ide;
+  Walk run;
+  NumberingWalk(run.context, 10000, 5).NumberCurrentProcedure(*ide.vbe, true);
+  ASSERT_EQ(run.failures.walks.size(), 1u);
+  EXPECT_EQ(run.failures.walks[0].messageId, 5123);
+  EXPECT_EQ(run.failures.walks[0].operation, QStringLiteral("NumberCurrentProcedure"));
+  EXPECT_EQ(run.failures.walks[0].error.number(), ide::err::ObjectVariableNotSet);
+}
+
+TEST(NumberingWalk, ANumberPastTheLargestStopsTheRunWithTheMessageOfItsScope) {
+  const QStringList procedure = {
+      QStringLiteral("Sub Um()"), QStringLiteral("a = 1"), QStringLiteral("b = 2"),
+      QStringLiteral("c = 3"),    QStringLiteral("d = 4"), QStringLiteral("End Sub"),
+  };
+  QStringList lines = procedure;
+  lines << QStringLiteral("Sub Dois()") << QStringLiteral("e = 5") << QStringLiteral("End Sub");
+  constexpr qint32 kMax = std::numeric_limits<qint32>::max();
+
+  // Module scope: 5122, once, and the second procedure is not reached.
+  Ide ide;
+  auto module = ide.addModule(lines);
+  Walk run;
+  NumberingWalk(run.context, kMax - 10, 5).NumberModule(module, true);
+  QStringList expected = lines;
+  expected[1] = QStringLiteral("2147483637 a = 1");
+  expected[2] = QStringLiteral("2147483642 b = 2");
+  expected[3] = QStringLiteral("2147483647 c = 3");
+  EXPECT_EQ(linesOf(*module), expected);
+  ASSERT_EQ(run.failures.walks.size(), 1u);
+  const WalkFailure& failure = run.failures.walks[0];
+  EXPECT_EQ(failure.messageId, 5122);
+  EXPECT_EQ(failure.operation, QStringLiteral("NumberModule"));
+  EXPECT_TRUE(failure.stopsRun);
+  EXPECT_EQ(failure.line, 5);
+  EXPECT_EQ(failure.error.number(), 6);
+  EXPECT_EQ(failure.error.source(), QStringLiteral("em frmLinNumbers_NumberModule, linha: 5"));
+  EXPECT_TRUE(run.context.stopped());
+
+  // Project scope: 5121, once, and the other module is left as it was.
+  Ide project;
+  auto first = project.addModule(procedure);
+  auto second = project.addModule(procedure);
+  Walk projectRun;
+  NumberingWalk(projectRun.context, kMax, 1).NumberProject(project.project, true);
+  ASSERT_EQ(projectRun.failures.walks.size(), 1u);
+  EXPECT_EQ(projectRun.failures.walks[0].messageId, 5121);
+  EXPECT_EQ(linesOf(*first)[1], QStringLiteral("2147483647 a = 1"));
+  EXPECT_EQ(linesOf(*first)[2], procedure[2]);
+  EXPECT_EQ(linesOf(*second), procedure);
+
+  // A member run on its own reports with the procedure message.
+  Ide single;
+  auto alone = single.addModule(procedure);
+  Walk memberRun;
+  NumberingWalk(memberRun.context, kMax, 1)
+      .NumberMember(alone, alone->Members()->Item(QStringLiteral("Um")), true);
+  ASSERT_EQ(memberRun.failures.walks.size(), 1u);
+  EXPECT_EQ(memberRun.failures.walks[0].messageId, 5123);
+}
+
+TEST(NumberingWalk, ALineThatWouldGrowTooLongIsPassedOverAndTheWalkGoesOn) {
+  const QString longLine = QStringLiteral("s = \"%1\"").arg(QString(1015, u'a'));
+  ASSERT_EQ(longLine.size(), 1021);
+  Ide ide;
+  auto module = ide.addModule(
+      {QStringLiteral("Sub Longo()"), longLine, QStringLiteral("t = 1"), QStringLiteral("End Sub")});
+  Walk run;
+  NumberingWalk(run.context, 10, 10).NumberModule(module, true);
+  const QStringList lines = linesOf(*module);
+  EXPECT_EQ(lines[1], longLine);
+  EXPECT_EQ(lines[2], QStringLiteral("20 t = 1"));
+  ASSERT_EQ(run.failures.lines.size(), 1u);
+  EXPECT_EQ(run.failures.lines[0].operation, QStringLiteral("NumberLine"));
+  EXPECT_EQ(run.failures.lines[0].line, 2);
+  EXPECT_EQ(run.failures.lines[0].error.number(), ide::err::LineTooLong);
+  EXPECT_TRUE(run.failures.walks.empty());
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Indentation
+
+TEST(IndentationWalk, IndentsProceduresAndLeavesDeclarationsAndTrailingCommentsAtTheMargin) {
+  Ide ide;
+  auto module = ide.addModule(kModule);
+  Walk run;
+  IndentationWalk(run.context, IndentMode::Spaces, 2).IndentModule(module);
+  EXPECT_EQ(linesOf(*module), indentedModule());
+  // The header's continuation lines were re-indented; the procedures are still where they were.
+  EXPECT_EQ(module->ProcBodyLine(QStringLiteral("Alpha"), ide::ProcKind::Proc), 4);
+  EXPECT_EQ(module->ProcCountLines(QStringLiteral("Alpha"), ide::ProcKind::Proc), 23);
+  EXPECT_EQ(module->Members()->Count(), 3);
+}
+
+TEST(IndentationWalk, IndentingTwiceChangesNothingTheSecondTime) {
+  for (const IndentMode mode : {IndentMode::Spaces, IndentMode::Tabs}) {
+    Ide ide;
+    auto module = ide.addModule(kModule);
+    Walk run;
+    IndentationWalk(run.context, mode, 3).IndentModule(module);
+    const QStringList once = linesOf(*module);
+    const quint64 edits = Ide::edits(module);
+    IndentationWalk(run.context, mode, 3).IndentModule(module);
+    EXPECT_EQ(linesOf(*module), once);
+    EXPECT_EQ(Ide::edits(module), edits) << "lines that did not change were replaced";
+  }
+}
+
+TEST(IndentationWalk, DeclarationsIndentTypesAndEnums) {
+  const QStringList lines = {
+      QStringLiteral("Private Type Ponto"), QStringLiteral("X As Long"),
+      QStringLiteral("      Y As Long"),    QStringLiteral("   End Type"),
+      QStringLiteral("\tPublic Enum Cor"),  QStringLiteral("Vermelho = 1"),
+      QStringLiteral("End Enum"),
+  };
+  Ide ide;
+  auto module = ide.addModule(lines);
+  Walk run;
+  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentDeclarations(*module);
+  EXPECT_EQ(linesOf(*module),
+            (QStringList{lines[0], QStringLiteral("    X As Long"), QStringLiteral("    Y As Long"),
+                         QStringLiteral("End Type"), QStringLiteral("Public Enum Cor"),
+                         QStringLiteral("    Vermelho = 1"), lines[6]}));
+}
+
+TEST(IndentationWalk, ALineThatWouldGrowTooLongIsPassedOver) {
+  const QString longLine = QStringLiteral("s = \"%1\"").arg(QString(1015, u'a'));
+  Ide ide;
+  auto module = ide.addModule(
+      {QStringLiteral("Sub Longo()"), longLine, QStringLiteral("t = 1"), QStringLiteral("End Sub")});
+  Walk run;
+  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
+  EXPECT_EQ(linesOf(*module)[1], longLine);
+  EXPECT_EQ(linesOf(*module)[2], QStringLiteral("    t = 1"));
+  ASSERT_EQ(run.failures.lines.size(), 1u);
+  EXPECT_EQ(run.failures.lines[0].operation, QStringLiteral("IndentLine"));
+}
+
+TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
+  Ide ide;
+  auto module = ide.addModule(kModule);
+  ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
+  Walk run;
+  EXPECT_EQ(CountUnits(run.context, *ide.vbe, PROG_MODULE, ProgressUnit::Lines), 28);
+  EXPECT_EQ(run.bar.maximum(), 28);
+  EXPECT_TRUE(run.bar.isVisible());
+  IndentationWalk(run.context, IndentMode::Tabs, 1).IndentModule(module);
+  // Alpha advances by its 23 lines, Beta by 5; the declarations would pass the end, which stops the bar.
+  EXPECT_EQ(run.bar.values, (std::vector<int>{0, 23, 28}));
+}
+
+// ---------------------------------------------------------------------------------------------------
+// What every walk shares
+
+TEST(Walks, YieldBeforeEveryComponentMemberAndLine) {
+  Ide ide;
+  auto module = ide.addModule(kModule);
+  Walk run;
+  run.context.setYieldInterval({});
+  NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
+  // One component; three members (m, Alpha, Beta); Alpha's 18 lines from Dim to the blank before
+  // End Sub; Beta's line and its End line, where the walk stops short of the comment after it.
+  ASSERT_EQ(ide.project->Count(), 1);
+  EXPECT_EQ(run.loop.runs, 1 + 3 + 18 + 2);
+}
+
+TEST(Walks, AYieldInsideTheIntervalDoesNotRunTheLoop) {
+  Ide ide;
+  ide.addModule(kModule);
+  Walk run;
+  run.context.setYieldInterval(std::chrono::hours(1));
+  NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
+  EXPECT_EQ(run.loop.runs, 1);  // the first yield of a run always lets the loop run
+}
+
+TEST(Walks, ACancelEndsTheWalkAtTheNextYieldAndHidesTheBar) {
+  Ide ide;
+  auto first = ide.addModule(kModule);
+  auto second = ide.addModule(kModule);
+  Walk run;
+  run.context.setYieldInterval({});
+  run.bar.setVisible(true);
+  // Cancelled from work the loop runs, as the Cancel button is: in the yield before Alpha's fifth line
+  // (one component, two members, five lines).
+  run.loop.onRun = [&](int runs) {
+    if (runs == 1 + 2 + 5) run.context.Cancel();
+  };
+  NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
+  QStringList expected = kModule;
+  const QStringList numbered = numberedModule();
+  for (int i = 6; i < 10; ++i)  // Dim, x = a + _, b, Select Case: four lines walked before the cancel
+    expected[i] = numbered[i];
+  EXPECT_EQ(linesOf(*first), expected);
+  EXPECT_EQ(linesOf(*second), kModule);
+  EXPECT_FALSE(run.bar.isVisible());
+  EXPECT_TRUE(run.context.cancelled());
+}
+
+TEST(Walks, RelatedDocumentsAreSkippedAndCountNothing) {
+  QTemporaryDir dir;
+  host::test::writeBytes(dir.filePath(QStringLiteral("Mod1.bas")),
+                         "Attribute VB_Name = \"Mod1\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n");
+  host::test::writeBytes(dir.filePath(QStringLiteral("Leia-me.txt")), "texto\r\n");
+  host::test::writeBytes(dir.filePath(QStringLiteral("P.vbp")),
+                         "Type=Exe\r\nModule=Mod1; Mod1.bas\r\nRelatedDoc=Leia-me.txt\r\nName=\"P\"\r\n");
+  auto vbe = host::VbeImpl::create();
+  auto project = vbe->open(dir.filePath(QStringLiteral("P.vbp"))).front();
+  ASSERT_EQ(project->Count(), 2);
+  auto document = project->components()[1];
+  ASSERT_EQ(document->Type(), ide::ComponentType::RelatedDocument);
+  vbe->setActiveVBProject(project);
+  Walk run;
+  EXPECT_EQ(CountUnits(run.context, *vbe, PROG_PROJECT, ProgressUnit::Members), 1);
+  vbe->selectComponent(document);
+  EXPECT_EQ(CountUnits(run.context, *vbe, PROG_MODULE, ProgressUnit::Lines), 0);
+  NumberingWalk(run.context, 10, 10).NumberProject(project, true);
+  EXPECT_EQ(project->components()[0]->CodeModule()->Lines(2, 1), QStringLiteral("10 x = 1"));
+  EXPECT_TRUE(run.failures.walks.empty());
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Number-and-indent
+
+TEST(NumIndentWalk, NumbersThenIndentsEachProcedureInANumberColumn) {
+  Ide ide;
+  auto module = ide.addModule(kModule);
+  Walk run;
+  NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
+  EXPECT_EQ(linesOf(*module), numIndentedModule());
+}
+
+TEST(NumIndentWalk, RemovingNumbersReindentsWithAnEmptyColumn) {
+  Ide ide;
+  auto module = ide.addModule(numIndentedModule());
+  Walk run;
+  NumIndentWalk(run.context, 10000, 5, IndentMode::Spaces, 2, false).NumIndentModule(module);
+  EXPECT_EQ(linesOf(*module), indentedModule());
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Whole projects: the example group and generated projects
+
+using Texts = QMap<QString, QStringList>;
+
+Texts textsOf(const host::VbeImpl& vbe) {
+  Texts texts;
+  for (const auto& project : vbe.projects())
+    for (const auto& component : project->components())
+      if (auto module = component->CodeModule())
+        texts.insert(project->Name() + u'.' + component->Name(), linesOf(*module));
+  return texts;
+}
+
+struct Opened {
+  std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
+  WalkContext context{QStringLiteral("test"), nullptr, nullptr};
+  Failures failures;
+  explicit Opened(const QString& file) {
+    vbe->open(file);
+    failures.attach(context);
+  }
+  void number(qint32 start = 10000, qint32 interval = 5, bool add = true) {
+    for (const auto& project : vbe->projects())
+      NumberingWalk(context, start, interval).NumberProject(project, add);
+  }
+  void indent(IndentMode mode = IndentMode::Spaces, qint32 spaces = 4) {
+    for (const auto& project : vbe->projects())
+      IndentationWalk(context, mode, spaces).IndentProject(project);
+  }
+  void numIndent(IndentMode mode = IndentMode::Spaces, qint32 spaces = 4, bool add = true) {
+    for (const auto& project : vbe->projects())
+      NumIndentWalk(context, 10000, 5, mode, spaces, add).NumIndentProject(project);
+  }
+  Texts texts() const { return textsOf(*vbe); }
+};
+
+// Runs every whole-project property on the group or project in `file`.
+void checkRoundTrips(const QString& file) {
+  SCOPED_TRACE(file.toStdString());
+  const Texts original = Opened(file).texts();
+
+  for (const IndentMode mode : {IndentMode::Spaces, IndentMode::Tabs}) {
+    Opened twice(file);
+    twice.indent(mode);
+    const Texts once = twice.texts();
+    EXPECT_NE(once, original);
+    twice.indent(mode);
+    EXPECT_EQ(twice.texts(), once) << "indenting twice";
+  }
+
+  Opened numIndented(file);
+  numIndented.numIndent();
+  const Texts numIndentedOnce = numIndented.texts();
+  numIndented.numIndent();
+  EXPECT_EQ(numIndented.texts(), numIndentedOnce) << "number-and-indent twice";
+
+  Opened stepwise(file);
+  stepwise.number();
+  stepwise.indent();
+  EXPECT_EQ(stepwise.texts(), numIndentedOnce) << "number-and-indent against numbering, then indenting";
+
+  // Removing the numbers of freshly numbered code gives it back, except for the blank that the two-blank
+  // rule leaves before a one-word line. Lines that carried numbers of their own lose them.
+  Opened unnumbered(file);
+  unnumbered.number();
+  unnumbered.number(0, 0, false);
+  const Texts back = unnumbered.texts();
+  int oneWordLines = 0;
+  for (auto it = original.cbegin(); it != original.cend(); ++it) {
+    const QStringList& before = it.value();
+    const QStringList after = back.value(it.key());
+    ASSERT_EQ(after.size(), before.size()) << it.key().toStdString();
+    for (qsizetype i = 0; i < before.size(); ++i) {
+      const QString trimmed = before[i].trimmed();
+      if (!trimmed.isEmpty() && trimmed.front().isDigit()) continue;  // a number of its own
+      if (after[i] == before[i]) continue;
+      EXPECT_EQ(after[i], u' ' + before[i]) << it.key().toStdString() << " line " << i + 1;
+      EXPECT_FALSE(trimmed.contains(u' ')) << "only one-word lines take the extra blank";
+      ++oneWordLines;
+    }
+  }
+  EXPECT_GT(oneWordLines, 0);
+
+  for (const Opened* run : {&numIndented, &stepwise, &unnumbered}) {
+    EXPECT_TRUE(run->failures.walks.empty());
+    EXPECT_TRUE(run->failures.lines.empty());
+  }
+}
+
+TEST(WholeProjects, TheExampleGroupRoundTrips) {
+  host::test::ExampleCopy copy;
+  checkRoundTrips(copy.groupFile());
+}
+
+TEST(WholeProjects, GeneratedProjectsRoundTrip) {
+  for (const quint32 seed : {3u, 11u}) {
+    QTemporaryDir dir;
+    gen::GeneratorOptions options;
+    options.codeLines = 12'000;
+    options.components = 12;
+    options.projects = 2;
+    options.seed = seed;
+    checkRoundTrips(gen::generateProjects(dir.path(), options).groupFile);
+  }
+}
+
+TEST(WholeProjects, LinesOutsideTheCurrentProcedureAreNeverTouched) {
+  host::test::ExampleCopy copy;
+  const auto walks = std::vector<std::function<void(ide::VBE&, WalkContext&)>>{
+      [](ide::VBE& vbe, WalkContext& c) { NumberingWalk(c, 10000, 5).NumberCurrentProcedure(vbe, true); },
+      [](ide::VBE& vbe, WalkContext& c) {
+        IndentationWalk(c, IndentMode::Tabs, 1).IndentCurrentProcedure(vbe);
+      },
+      [](ide::VBE& vbe, WalkContext& c) {
+        NumIndentWalk(c, 10000, 5, IndentMode::Spaces, 2, true).NumIndentCurrentProcedure(vbe, 1);
+      },
+  };
+  for (size_t w = 0; w < walks.size(); ++w) {
+    Opened opened(copy.groupFile());
+    const Texts before = opened.texts();
+    // AdicionarItem's header runs over three lines.
+    auto module =
+        opened.vbe->project(QStringLiteral("Loja"))->component(QStringLiteral("clsPedido"))->CodeModule();
+    const int body = module->ProcBodyLine(QStringLiteral("AdicionarItem"), ide::ProcKind::Proc);
+    const int start = module->ProcStartLine(QStringLiteral("AdicionarItem"), ide::ProcKind::Proc);
+    const int count = module->ProcCountLines(QStringLiteral("AdicionarItem"), ide::ProcKind::Proc);
+    Ide::placeCaret(module, body + 4);
+    walks[w](*opened.vbe, opened.context);
+    const Texts after = opened.texts();
+    int changed = 0;
+    for (auto it = before.cbegin(); it != before.cend(); ++it) {
+      const QStringList& lines = after.value(it.key());
+      for (qsizetype i = 0; i < it.value().size(); ++i) {
+        if (lines[i] == it.value()[i]) continue;
+        ++changed;
+        EXPECT_EQ(it.key(), QStringLiteral("Loja.clsPedido")) << "walk " << w;
+        EXPECT_GT(i + 1, body) << "walk " << w;  // 1-based line after the header line
+        EXPECT_LT(i + 1, start + count - 1) << "walk " << w;
+      }
+    }
+    EXPECT_GT(changed, 0) << "walk " << w;
+  }
+}
+
+}  // namespace
+}  // namespace transform
