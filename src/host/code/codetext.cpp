@@ -566,8 +566,10 @@ void CodeText::replaceLine(int line, QStringView text) {
     const LineClass cls = continuation ? LineClass::Continuation : classifyStatement(text);
     const bool continues = continuesOnNextLine(text);
     bool structural = isStructural(cls) || isStructural(target.cls) || continues != target.continues;
-    if (!structural && cls == LineClass::Continuation) {
-      // A header's continuation line carries part of the header (its name, or its own continuation).
+    if (!structural && cls == LineClass::Continuation &&
+        text.trimmed() != QStringView(target.text).trimmed()) {
+      // A header's continuation line carries part of the header (its name, or its own continuation);
+      // re-indenting it changes nothing the header declares.
       int start = line;
       while (start > 1 && m_lines[static_cast<size_t>(start - 1)].cls == LineClass::Continuation)
         --start;
