@@ -191,21 +191,23 @@ void frmIndenter::walk(PROG_MODE scope, qint32 unit) {
 }
 
 void frmIndenter::cmdCancel_Click() {
+  if (m_running)
+    cancelRun();
+  else
+    close();
+}
+
+void frmIndenter::cancelRun() {
+  // The walk ends at its next yield, and the run then closes the dialog.
   if (m_numIndent) m_numIndent->Cancel();
-  if (m_running) {
-    m_context.Cancel();
-    m_cmdCancel->setText(text(5025));
-    return;
-  }
-  close();
+  m_context.Cancel();
+  m_closeAfterRun = true;
+  m_cmdCancel->setText(text(5025));
 }
 
 void frmIndenter::done(int result) {
   if (m_running) {
-    // Closing the window during a run cancels it; the dialog closes once the walk has ended.
-    if (m_numIndent) m_numIndent->Cancel();
-    m_context.Cancel();
-    m_closeAfterRun = true;
+    cancelRun();  // closing the window during a run is a cancel
     return;
   }
   Form_Unload();

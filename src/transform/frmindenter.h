@@ -58,6 +58,7 @@ class frmIndenter final : public QDialog {
   void opSpaces_Click(int index);
   void cmdIndent_Click();
   void cmdCancel_Click();
+  void cancelRun();
   void walk(PROG_MODE scope, qint32 unit);
   PROG_MODE scope() const;
   void Form_Unload();

@@ -220,16 +220,17 @@ void frmLinNumbers::walk(PROG_MODE scope, bool add) {
 }
 
 void frmLinNumbers::cmdCancel_Click() {
+  if (m_running)
+    cancelRun();
+  else
+    close();  // idle, or the finished run's full bar showing before the close
+}
+
+void frmLinNumbers::cancelRun() {
+  // The walk ends at its next yield; the dialog closes once it has.
   if (m_numIndent) m_numIndent->Cancel();
-  if (!m_progBar->isHidden()) {
-    // A run is going on, or its full bar is showing before the close: end it and close the dialog.
-    m_context.Cancel();
-    if (m_running) {
-      m_closeAfterRun = true;
-      return;
-    }
-  }
-  close();
+  m_context.Cancel();
+  m_closeAfterRun = true;
 }
 
 void frmLinNumbers::closeAfterWait() {
@@ -255,10 +256,7 @@ void frmLinNumbers::killCloseTimer() {
 
 void frmLinNumbers::done(int result) {
   if (m_running) {
-    // Closing the window during a run cancels it; the dialog closes once the walk has ended.
-    if (m_numIndent) m_numIndent->Cancel();
-    m_context.Cancel();
-    m_closeAfterRun = true;
+    cancelRun();  // closing the window during a run is a cancel
     return;
   }
   killCloseTimer();

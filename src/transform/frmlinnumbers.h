@@ -65,6 +65,7 @@ class frmLinNumbers final : public QDialog {
   void cmdAdd_Click() { run(true); }
   void cmdRemove_Click() { run(false); }
   void cmdCancel_Click();
+  void cancelRun();
   void run(bool add);
   void walk(PROG_MODE scope, bool add);
   bool readBox(QLineEdit* box, qint32& field, int messageId);

@@ -115,8 +115,8 @@ void CNumIndent::DoIt(PROG_MODE Unit, ProgressSink* Progbar, qint32 StartNumber,
 
   Begining.fire();
   try {
-    const qint32 units = CountUnits(context, *m_vbe, Unit, ProgressUnit::Lines);
     if (m_cancel) context.Cancel();  // cancelled while Begining was handled
+    const qint32 units = CountUnits(context, *m_vbe, Unit, ProgressUnit::Lines);
     NumIndentWalk walk(context, StartNumber, lngInterval, Use ? IndentMode::Spaces : IndentMode::Tabs,
                        Use ? lngSpaces : 1, add);
     switch (Unit) {

@@ -121,7 +121,6 @@ qint32 componentUnits(const ide::Ref<ide::VBComponent>& component, ProgressUnit 
 }  // namespace
 
 qint32 CountUnits(WalkContext& context, ide::VBE& vbe, PROG_MODE scope, ProgressUnit unit) {
-  context.reset();
   qint64 units = 0;
   switch (scope) {
     case PROG_PROJECT:

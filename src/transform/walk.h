@@ -133,8 +133,9 @@ class WalkContext {
 enum class ProgressUnit { Members, Lines };
 
 /// Counts the units of a run over `scope` (the active project, the selected component, or 1 for the
-/// current procedure; related documents and unreadable components count 0), then starts the run: clears
-/// the cancel flag, sets the bar's range, shows it and yields. Returns the units counted.
+/// current procedure; related documents and unreadable components count 0), then sets the bar's range,
+/// shows it and yields. Returns the units counted. The cancel flag is left alone: a click on Cancel that
+/// the yield lets through must still end the run.
 qint32 CountUnits(WalkContext& context, ide::VBE& vbe, PROG_MODE scope, ProgressUnit unit);
 
 /// The IDE's active project, selected component and active code pane; error 91 when there is none.

@@ -1,0 +1,547 @@
+// SPDX-License-Identifier: MIT
+// The numbering and indentation dialogs on the offscreen platform over a headless IDE: captions,
+// settings, the numbers-only boxes, validation, runs by both routes, the wait before closing, cancelling
+// and the failure messages.
+#include "transform/dialogs.h"
+#include "common/settings.h"
+#include "common/strings.h"
+#include "host/platform/headlessui.h"
+#include "host/platform/manualloop.h"
+#include "modelfixture.h"
+#include "testproject.h"
+#include "transform/frmindenter.h"
+#include "transform/frmlinnumbers.h"
+
+#include "printers.h"
+
+#include <gtest/gtest.h>
+
+#include <QApplication>
+#include <QClipboard>
+#include <QGroupBox>
+#include <QLabel>
+#include <QProgressBar>
+#include <QPushButton>
+#include <QRadioButton>
+#include <QTemporaryDir>
+#include <QTest>
+#include <QTimer>
+
+namespace transform {
+namespace {
+
+using test::Ide;
+using test::linesOf;
+
+const QStringList kFirst = {
+    QStringLiteral("Option Explicit"), QStringLiteral("Sub Um()"), QStringLiteral("If x Then"),
+    QStringLiteral("y = 1"),           QStringLiteral("End If"),   QStringLiteral("End Sub"),
+};
+const QStringList kSecond = {QStringLiteral("Sub Dois()"), QStringLiteral("z = 2"),
+                             QStringLiteral("End Sub")};
+
+struct Box {
+  QString prompt;
+  int style = 0;
+  friend bool operator==(const Box&, const Box&) = default;
+  friend void PrintTo(const Box& box, std::ostream* os) {
+    *os << box.style << " ";
+    PrintTo(box.prompt, os);
+  }
+};
+
+// A headless IDE with two modules, the caret in the first one's procedure, and settings of its own.
+struct Scene {
+  QTemporaryDir dir;
+  common::SettingsStore settings{dir.filePath(QStringLiteral("Quimbel.ini"))};
+  Ide ide;
+  ide::Ref<ide::CodeModule> first = ide.addModule(kFirst);
+  ide::Ref<ide::CodeModule> second = ide.addModule(kSecond);
+
+  explicit Scene(bool oneCommand = false) {
+    settings.setFlag(common::setting::OneCommandNumIndent, oneCommand);
+    ide.vbe->setActiveVBProject(ide.project);
+    Ide::placeCaret(first, 4);
+  }
+  host::HeadlessUi& ui() { return *ide.vbe->headlessUi(); }
+  host::ManualEventLoop& loop() { return *ide.vbe->manualLoop(); }
+  std::vector<Box> boxes() {
+    std::vector<Box> shown;
+    for (const auto& box : ui().messageBoxes()) {
+      EXPECT_EQ(box.title, QStringLiteral("Quimbel"));
+      shown.push_back({box.prompt, box.style});
+    }
+    return shown;
+  }
+  void select(const ide::Ref<ide::CodeModule>& module) {
+    ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
+  }
+};
+
+QString text(int id) {
+  return common::LoadResString(id);
+}
+
+void showActive(QWidget& widget) {
+  widget.show();
+  QApplication::setActiveWindow(&widget);
+  ASSERT_TRUE(QTest::qWaitForWindowActive(&widget));
+}
+
+// A project whose second component is a related document, selected.
+struct RelatedDocumentScene {
+  QTemporaryDir dir;
+  common::SettingsStore settings{dir.filePath(QStringLiteral("Quimbel.ini"))};
+  std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
+  std::shared_ptr<host::ProjectImpl> project;
+
+  RelatedDocumentScene() {
+    host::test::writeBytes(dir.filePath(QStringLiteral("Mod1.bas")),
+                           "Attribute VB_Name = \"Mod1\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n");
+    host::test::writeBytes(dir.filePath(QStringLiteral("Leia-me.txt")), "texto\r\n");
+    host::test::writeBytes(dir.filePath(QStringLiteral("P.vbp")),
+                           "Type=Exe\r\nModule=Mod1; Mod1.bas\r\nRelatedDoc=Leia-me.txt\r\nName=\"P\"\r\n");
+    project = vbe->open(dir.filePath(QStringLiteral("P.vbp"))).front();
+    vbe->setActiveVBProject(project);
+    vbe->selectComponent(project->components()[1]);
+    settings.setFlag(common::setting::OneCommandNumIndent, false);
+  }
+  QString code() { return project->components()[0]->CodeModule()->Lines(2, 1); }
+};
+
+// ---------------------------------------------------------------------------------------------------
+// The numbering dialog
+
+TEST(LineNumberingDialog, OpensWithItsCaptionsTheStoredNumbersAndTheProcedureScope) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  EXPECT_EQ(dialog.windowTitle(), QStringLiteral("Quimbel - Numerar Linhas"));
+  EXPECT_EQ(dialog.cmdAdd()->text(), QStringLiteral("&Adicionar"));
+  EXPECT_EQ(dialog.cmdRemove()->text(), QStringLiteral("&Remover"));
+  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+  EXPECT_EQ(dialog.frOptions()->title(), QStringLiteral("A&dicionar ou remover números de linha para:"));
+  EXPECT_EQ(dialog.lblStartNum()->text(), QStringLiteral("&Número Inicial:"));
+  EXPECT_EQ(dialog.lblInterval()->text(), QStringLiteral("Inter&valo:"));
+  EXPECT_EQ(dialog.opNumbers(0)->text(), QStringLiteral("&Projeto"));
+  EXPECT_EQ(dialog.opNumbers(1)->text(), QStringLiteral("&Módulo"));
+  EXPECT_EQ(dialog.opNumbers(2)->text(), QStringLiteral("Pr&ocedimento"));
+  EXPECT_TRUE(dialog.opNumbers(2)->isChecked());
+  EXPECT_EQ(dialog.txtInitial()->text(), QStringLiteral("10000"));
+  EXPECT_EQ(dialog.txtInterval()->text(), QStringLiteral("5"));
+  EXPECT_EQ(dialog.startNumber(), 10000);
+  EXPECT_EQ(dialog.interval(), 5);
+  EXPECT_TRUE(dialog.ProgBar()->isHidden());
+
+  scene.settings.setValue(common::setting::InitialNumber, QStringLiteral(" 200 "));
+  scene.settings.setValue(common::setting::Interval, QStringLiteral("dez"));
+  frmLinNumbers stored(scene.ide.vbe, scene.settings);
+  EXPECT_EQ(stored.txtInitial()->text(), QStringLiteral("200"));
+  EXPECT_EQ(stored.startNumber(), 200);
+  EXPECT_EQ(stored.txtInterval()->text(), QStringLiteral("5"));  // not a number: the default
+}
+
+TEST(LineNumberingDialog, TheBoxesTakeDigitsOnly) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  showActive(dialog);
+  QLineEdit* box = dialog.txtInitial();
+  box->clear();
+  box->setFocus();
+  QTest::keyClicks(box, QStringLiteral("12ab-3"));
+  EXPECT_EQ(box->text(), QStringLiteral("123"));
+
+  QApplication::clipboard()->setText(QStringLiteral("45"));
+  if (QApplication::clipboard()->text() != QStringLiteral("45")) GTEST_SKIP() << "no clipboard here";
+  QTest::keyClick(box, Qt::Key_V, Qt::ControlModifier);
+  QTest::keyClick(box, Qt::Key_Insert, Qt::ShiftModifier);
+  EXPECT_EQ(box->text(), QStringLiteral("123"));
+  EXPECT_EQ(box->contextMenuPolicy(), Qt::NoContextMenu);
+  EXPECT_FALSE(box->acceptDrops());
+
+  // The same keys paste into an ordinary box, so they did reach ours.
+  QLineEdit plain;
+  showActive(plain);
+  plain.setFocus();
+  QTest::keyClick(&plain, Qt::Key_V, Qt::ControlModifier);
+  EXPECT_EQ(plain.text(), QStringLiteral("45"));
+}
+
+TEST(LineNumberingDialog, ABoxSelectsItsWholeTextWhenItGetsTheFocus) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  showActive(dialog);
+  dialog.txtInitial()->setFocus(Qt::OtherFocusReason);
+  EXPECT_EQ(dialog.txtInitial()->selectedText(), QStringLiteral("10000"));
+  QTest::mouseClick(dialog.txtInterval(), Qt::LeftButton);
+  QCoreApplication::processEvents();
+  EXPECT_TRUE(dialog.txtInterval()->hasFocus());
+  EXPECT_EQ(dialog.txtInterval()->selectedText(), QStringLiteral("5"));
+}
+
+TEST(LineNumberingDialog, ANonNumericBoxIsRefusedWithItsMessageAndGetsTheFocus) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  showActive(dialog);
+  dialog.txtInitial()->setText(QStringLiteral("12a"));
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5119), ide::mb::Exclamation}}));
+  EXPECT_EQ(QApplication::focusWidget(), dialog.txtInitial());
+
+  scene.ui().clearMessageBoxes();
+  dialog.txtInitial()->clear();  // an empty box keeps the value last used
+  dialog.txtInterval()->setText(QStringLiteral("x"));
+  dialog.cmdRemove()->click();
+  EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5120), ide::mb::Exclamation}}));
+  EXPECT_EQ(QApplication::focusWidget(), dialog.txtInterval());
+
+  EXPECT_EQ(linesOf(*scene.first), kFirst);
+  EXPECT_TRUE(dialog.isVisible());
+  EXPECT_TRUE(dialog.cmdAdd()->isEnabled());
+}
+
+TEST(LineNumberingDialog, NumbersTheCurrentProcedureThenClosesASecondLater) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  showActive(dialog);
+  dialog.txtInitial()->setText(QStringLiteral("100"));
+  dialog.txtInterval()->setText(QStringLiteral("10"));
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(linesOf(*scene.first),
+            (QStringList{kFirst[0], kFirst[1], QStringLiteral("100 If x Then"), QStringLiteral("110 y = 1"),
+                         QStringLiteral("120 End If"), kFirst[5]}));
+  EXPECT_EQ(linesOf(*scene.second), kSecond);
+
+  // The finished run shows its full bar while the IDE's loop goes on.
+  EXPECT_TRUE(dialog.isVisible());
+  EXPECT_FALSE(dialog.ProgBar()->isHidden());
+  EXPECT_EQ(dialog.ProgBar()->value(), dialog.ProgBar()->maximum());
+  EXPECT_FALSE(dialog.cmdAdd()->isEnabled());
+  EXPECT_FALSE(dialog.cmdRemove()->isEnabled());
+  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Cancelar"));
+  EXPECT_EQ(scene.ui().cursor(), ide::Cursor::ArrowHourglass);
+  scene.loop().advance(999);
+  EXPECT_TRUE(dialog.isVisible());
+  scene.loop().advance(1);
+  EXPECT_FALSE(dialog.isVisible());
+  EXPECT_TRUE(dialog.ProgBar()->isHidden());
+  EXPECT_TRUE(dialog.cmdAdd()->isEnabled());
+  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+  EXPECT_EQ(scene.ui().cursor(), ide::Cursor::Default);
+  EXPECT_TRUE(scene.boxes().empty());
+}
+
+TEST(LineNumberingDialog, RemovesTheNumbersOfTheSelectedModuleOrTheProject) {
+  Scene scene;
+  auto numbered = scene.ide.addModule(
+      {QStringLiteral("Sub Tres()"), QStringLiteral("10 a = 1"), QStringLiteral("End Sub")});
+  scene.select(numbered);
+  {
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    dialog.opNumbers(1)->setChecked(true);
+    dialog.cmdRemove()->click();
+    scene.loop().advance(1000);
+  }
+  EXPECT_EQ(linesOf(*numbered)[1], QStringLiteral("a = 1"));
+  EXPECT_EQ(linesOf(*scene.first), kFirst);
+
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  dialog.opNumbers(0)->setChecked(true);
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("10000 If x Then"));
+  EXPECT_EQ(linesOf(*scene.second)[1], QStringLiteral("10000 z = 2"));
+  EXPECT_EQ(linesOf(*numbered)[1], QStringLiteral("10000 a = 1"));
+}
+
+TEST(LineNumberingDialog, WithTheOneCommandOptionNumbersAndIndentsWithTabs) {
+  Scene scene(true);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  dialog.txtInitial()->setText(QStringLiteral("100"));
+  dialog.txtInterval()->setText(QStringLiteral("10"));
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(linesOf(*scene.first),
+            (QStringList{kFirst[0], kFirst[1], QStringLiteral("100 \tIf x Then"),
+                         QStringLiteral("110 \t\ty = 1"), QStringLiteral("120 \tEnd If"), kFirst[5]}));
+
+  // Removing re-indents too; the number column is empty then.
+  frmLinNumbers again(scene.ide.vbe, scene.settings);
+  again.cmdRemove()->click();
+  EXPECT_EQ(linesOf(*scene.first),
+            (QStringList{kFirst[0], kFirst[1], QStringLiteral("\tIf x Then"), QStringLiteral("\t\ty = 1"),
+                         QStringLiteral("\tEnd If"), kFirst[5]}));
+}
+
+TEST(LineNumberingDialog, AnErrorEventOfTheOneCommandRouteIsShownPlainAndEndsTheRun) {
+  Scene scene(true);
+  scene.first->CodePane()->Window()->Close();  // no code window: no current procedure
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(scene.boxes(),
+            (std::vector<Box>{{QStringLiteral("91 %1\nem CNumIndent_NumIndentCurrentProcedure, linha: 0")
+                                   .arg(ide::standardDescription(ide::err::ObjectVariableNotSet)),
+                               ide::mb::OKOnly}}));
+  EXPECT_TRUE(dialog.cancelled());
+  EXPECT_FALSE(dialog.isVisible());  // a cancelled run closes at once
+}
+
+TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScope) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  dialog.txtInitial()->setText(QStringLiteral("2147483647"));
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5123), ide::mb::Exclamation}}));
+  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("2147483647 If x Then"));
+  EXPECT_EQ(linesOf(*scene.first)[3], kFirst[3]);
+}
+
+TEST(LineNumberingDialog, ARelatedDocumentAsTheModuleChangesNothingAndLeavesTheDialogIdle) {
+  RelatedDocumentScene scene;
+  frmLinNumbers dialog(scene.vbe, scene.settings);
+  dialog.show();
+  dialog.opNumbers(1)->setChecked(true);
+  dialog.cmdAdd()->click();
+  EXPECT_TRUE(scene.vbe->headlessUi()->messageBoxes().empty());
+  EXPECT_EQ(scene.code(), QStringLiteral("x = 1"));
+  EXPECT_TRUE(dialog.isVisible());
+  EXPECT_TRUE(dialog.cmdAdd()->isEnabled());
+  EXPECT_TRUE(dialog.ProgBar()->isHidden());
+  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+
+  // The project scope passes over the document.
+  dialog.opNumbers(0)->setChecked(true);
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(scene.code(), QStringLiteral("10000 x = 1"));
+}
+
+TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.opNumbers(0)->setChecked(true);
+  // The user clicks Cancel when the bar first moves: the first module's only member is done.
+  QObject::connect(dialog.ProgBar(), &QProgressBar::valueChanged, &dialog, [&](int value) {
+    if (value == 1) dialog.cmdCancel()->click();
+  });
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("10000 If x Then"));
+  EXPECT_EQ(linesOf(*scene.second), kSecond);
+  EXPECT_FALSE(dialog.isVisible());
+  EXPECT_TRUE(dialog.ProgBar()->isHidden());
+  EXPECT_FALSE(scene.loop().activeTimers());
+}
+
+TEST(LineNumberingDialog, ClosingTheWindowDuringARunCancelsIt) {
+  Scene scene;
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.opNumbers(0)->setChecked(true);
+  scene.loop().post([&] { dialog.close(); });  // runs in the run's first yield
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(linesOf(*scene.first), kFirst);
+  EXPECT_EQ(linesOf(*scene.second), kSecond);
+  EXPECT_FALSE(dialog.isVisible());
+}
+
+TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
+  Scene scene;
+  {
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    dialog.show();
+    dialog.txtInitial()->setText(QStringLiteral("500"));
+    dialog.txtInterval()->setText(QStringLiteral("50"));
+    dialog.close();
+  }
+  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), QStringLiteral("500"));
+  EXPECT_EQ(scene.settings.value(common::setting::Interval), QStringLiteral("50"));
+  {
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    dialog.show();
+    dialog.txtInitial()->clear();
+    dialog.txtInterval()->setText(QStringLiteral("x"));
+    dialog.close();
+  }
+  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), QStringLiteral("500"));
+  EXPECT_EQ(scene.settings.value(common::setting::Interval), QStringLiteral("50"));
+  {
+    // The values a run used are kept too.
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    dialog.show();
+    dialog.txtInitial()->setText(QStringLiteral("700"));
+    dialog.cmdAdd()->click();
+    scene.loop().advance(1000);
+    EXPECT_FALSE(dialog.isVisible());
+  }
+  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), QStringLiteral("700"));
+}
+
+// ---------------------------------------------------------------------------------------------------
+// The indentation dialog
+
+TEST(IndentationDialog, OpensWithItsCaptionsAndTheStoredUnit) {
+  Scene scene;
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  EXPECT_EQ(dialog.windowTitle(), QStringLiteral("Quimbel - Indentar Código"));
+  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+  EXPECT_EQ(dialog.cmdIndent()->text(), QStringLiteral("&Indentar"));
+  EXPECT_EQ(dialog.frIndent()->title(), QStringLiteral("In&dentar"));
+  EXPECT_EQ(dialog.frUse()->title(), QStringLiteral("&Usar"));
+  EXPECT_EQ(dialog.opIndent(0)->text(), QStringLiteral("&Projeto"));
+  EXPECT_EQ(dialog.opIndent(1)->text(), QStringLiteral("&Módulo"));
+  EXPECT_EQ(dialog.opIndent(2)->text(), QStringLiteral("Pr&ocedimento"));
+  EXPECT_EQ(dialog.opSpaces(0)->text(), QStringLiteral("&Tabs"));
+  EXPECT_EQ(dialog.opSpaces(1)->text(), QStringLiteral("E&spaços"));
+  EXPECT_TRUE(dialog.opIndent(2)->isChecked());
+  EXPECT_TRUE(dialog.opSpaces(0)->isChecked());
+  EXPECT_EQ(dialog.txtSpaces()->text(), QStringLiteral("3"));
+  EXPECT_EQ(dialog.txtSpaces()->contextMenuPolicy(), Qt::NoContextMenu);
+
+  for (const auto& [use, spaces] : {std::pair{"1", true}, std::pair{"", false}, std::pair{"0", false}}) {
+    scene.settings.setValue(common::setting::UseOption, QString::fromLatin1(use));
+    frmIndenter stored(scene.ide.vbe, scene.settings);
+    EXPECT_EQ(stored.spaceMode(), spaces) << use;
+    EXPECT_EQ(stored.opSpaces(1)->isChecked(), spaces) << use;
+  }
+}
+
+TEST(IndentationDialog, ChoosingSpacesMovesTheFocusIntoTheSpacesBox) {
+  Scene scene;
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  showActive(dialog);
+  dialog.opIndent(0)->setFocus();
+  QTest::mouseClick(dialog.opSpaces(1), Qt::LeftButton);
+  EXPECT_TRUE(dialog.spaceMode());
+  EXPECT_EQ(QApplication::focusWidget(), dialog.txtSpaces());
+}
+
+TEST(IndentationDialog, AMissingOrInvalidSpaceCountIsRefused) {
+  Scene scene;
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  showActive(dialog);
+  dialog.opSpaces(1)->setChecked(true);
+  const std::pair<const char*, int> cases[] = {{" ", 5125}, {"0", 5124}, {"x", 5124}, {"99999999999", 5124}};
+  for (const auto& [spaces, message] : cases) {
+    scene.ui().clearMessageBoxes();
+    dialog.opIndent(0)->setFocus();
+    dialog.txtSpaces()->setText(QString::fromLatin1(spaces));
+    dialog.cmdIndent()->click();
+    EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(message), ide::mb::Information}})) << spaces;
+    EXPECT_EQ(QApplication::focusWidget(), dialog.txtSpaces());
+  }
+  EXPECT_EQ(linesOf(*scene.first), kFirst);
+  EXPECT_TRUE(dialog.isVisible());
+  // Tabs need no count.
+  dialog.opSpaces(0)->setChecked(true);
+  dialog.cmdIndent()->click();
+  EXPECT_EQ(linesOf(*scene.first)[3], QStringLiteral("\t\ty = 1"));
+}
+
+TEST(IndentationDialog, IndentsTheSelectedModuleWithSpacesClosesAndRemembersTheUnit) {
+  Scene scene;
+  scene.select(scene.second);
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.opIndent(1)->setChecked(true);
+  dialog.opSpaces(1)->setChecked(true);
+  dialog.txtSpaces()->setText(QStringLiteral("2"));
+  dialog.cmdIndent()->click();
+  EXPECT_EQ(linesOf(*scene.second), (QStringList{kSecond[0], QStringLiteral("  z = 2"), kSecond[2]}));
+  EXPECT_EQ(linesOf(*scene.first), kFirst);
+  EXPECT_FALSE(dialog.isVisible());
+  EXPECT_EQ(scene.settings.value(common::setting::UseOption), QStringLiteral("1"));
+  EXPECT_EQ(scene.settings.value(common::setting::Indentation), QStringLiteral("2"));
+  EXPECT_TRUE(scene.boxes().empty());
+}
+
+TEST(IndentationDialog, ClosingWithTabsRemembersTabsAndLeavesTheUnit) {
+  Scene scene;
+  scene.settings.setValue(common::setting::Indentation, QStringLiteral("4"));
+  scene.settings.setValue(common::setting::UseOption, QStringLiteral("1"));
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.opSpaces(0)->setChecked(true);
+  dialog.txtSpaces()->setText(QStringLiteral("8"));
+  dialog.cmdCancel()->click();
+  EXPECT_FALSE(dialog.isVisible());
+  EXPECT_EQ(scene.settings.value(common::setting::UseOption), QStringLiteral("0"));
+  EXPECT_EQ(scene.settings.value(common::setting::Indentation), QStringLiteral("4"));
+}
+
+TEST(IndentationDialog, WithTheOneCommandOptionNumbersFrom10000InStepsOf5) {
+  Scene scene(true);
+  scene.settings.setValue(common::setting::InitialNumber, QStringLiteral("1"));  // not the numbering's
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  dialog.opSpaces(1)->setChecked(true);
+  dialog.txtSpaces()->setText(QStringLiteral("3"));
+  dialog.cmdIndent()->click();
+  EXPECT_EQ(linesOf(*scene.first),
+            (QStringList{kFirst[0], kFirst[1], QStringLiteral("10000    If x Then"),
+                         QStringLiteral("10005       y = 1"), QStringLiteral("10010    End If"), kFirst[5]}));
+}
+
+TEST(IndentationDialog, CancelDuringARunEndsTheWalkAndTheDialog) {
+  Scene scene;
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.opIndent(0)->setChecked(true);
+  QString caption;
+  QObject::connect(dialog.ProgBar(), &QProgressBar::valueChanged, &dialog, [&](int value) {
+    if (value == 0 || !caption.isEmpty()) return;
+    dialog.cmdCancel()->click();
+    caption = dialog.cmdCancel()->text();
+  });
+  dialog.cmdIndent()->click();
+  EXPECT_EQ(caption, QStringLiteral("&Fechar"));
+  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("\tIf x Then"));
+  EXPECT_EQ(linesOf(*scene.second), kSecond);
+  EXPECT_FALSE(dialog.isVisible());
+}
+
+TEST(IndentationDialog, AFailedRunShowsItsMessageAndStaysOpen) {
+  Scene scene;
+  scene.ide.vbe->selectComponent(nullptr);
+  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.opIndent(1)->setChecked(true);
+  dialog.cmdIndent()->click();
+  EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5126), ide::mb::Information}}));
+  EXPECT_TRUE(dialog.isVisible());
+  EXPECT_TRUE(dialog.cmdIndent()->isEnabled());
+  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+}
+
+TEST(IndentationDialog, AModuleWalkFailureShowsTheModuleMessage) {
+  RelatedDocumentScene scene;
+  frmIndenter dialog(scene.vbe, scene.settings);
+  dialog.opIndent(1)->setChecked(true);
+  dialog.cmdIndent()->click();
+  ASSERT_EQ(scene.vbe->headlessUi()->messageBoxes().size(), 1u);
+  EXPECT_EQ(scene.vbe->headlessUi()->messageBoxes()[0].prompt, text(5129));
+  EXPECT_EQ(scene.vbe->headlessUi()->messageBoxes()[0].style, ide::mb::Exclamation);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// How the add-in opens them
+
+TEST(OpeningTheDialogs, EachOpensModallyAndReturnsWhenClosed) {
+  Scene scene;
+  QStringList titles;
+  const auto closeModal = [&] {
+    QTimer::singleShot(0, [&] {
+      QWidget* modal = QApplication::activeModalWidget();
+      ASSERT_TRUE(modal);
+      titles << modal->windowTitle();
+      modal->close();
+    });
+  };
+  closeModal();
+  showLineNumberingDialog(scene.ide.vbe, scene.settings, nullptr);
+  closeModal();
+  showIndentationDialog(scene.ide.vbe, scene.settings, nullptr);
+  EXPECT_EQ(titles, (QStringList{QStringLiteral("Quimbel - Numerar Linhas"),
+                                 QStringLiteral("Quimbel - Indentar Código")}));
+  // Closing wrote the indenter's choice.
+  EXPECT_EQ(scene.settings.value(common::setting::UseOption), QStringLiteral("0"));
+}
+
+}  // namespace
+}  // namespace transform
