@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
-// quimbel: the add-in's batch features from the command line.
+// quimbel: the add-in's batch features from the command line. One table names the commands and the
+// options each takes; every command lives in a file of its own.
 #include "cli.h"
 #include "ide/error.h"
 
@@ -8,6 +9,7 @@
 #include <QCoreApplication>
 
 #include <iostream>
+#include <limits>
 
 namespace cli {
 
@@ -32,6 +34,128 @@ QStringList toQStrings(const std::vector<std::string>& values) {
   return list;
 }
 
+// Everything any command can be given; each command reads the part it declared.
+struct CommandLine {
+  std::vector<std::string> files;
+  bool tsv = false;
+  std::string module;
+  std::string procedure;
+  qint32 start = 0;
+  qint32 interval = 0;
+  bool tabs = false;
+  qint32 spaces = 0;
+  bool remove = false;
+  bool check = false;
+  bool diff = false;
+  // Which of the numeric options the user gave.
+  bool startGiven = false;
+  bool intervalGiven = false;
+  bool spacesGiven = false;
+
+  void noteGiven(const CLI::App& command) {
+    const auto given = [&](const char* name) {
+      const CLI::Option* option = command.get_option_no_throw(name);
+      return option && option->count() > 0;
+    };
+    startGiven = given("--start");
+    intervalGiven = given("--interval");
+    spacesGiven = given("--spaces");
+  }
+
+  TransformOptions transformOptions() const {
+    TransformOptions options;
+    options.files = toQStrings(files);
+    options.module = QString::fromLocal8Bit(module);
+    options.procedure = QString::fromLocal8Bit(procedure);
+    if (startGiven) options.start = start;
+    if (intervalGiven) options.interval = interval;
+    options.tabs = tabs;
+    if (spacesGiven) options.spaces = spaces;
+    options.remove = remove;
+    options.check = check;
+    options.diff = diff;
+    return options;
+  }
+};
+
+// The option groups a command takes.
+enum Takes : unsigned {
+  kTsv = 1,
+  kScope = 2,        // --module, --procedure
+  kNumbering = 4,    // --start, --interval
+  kIndentation = 8,  // --tabs, --spaces
+  kRemove = 16,      // --remove
+  kOutput = 32,      // --check, --diff
+};
+
+struct Command {
+  const char* name;
+  const char* description;
+  unsigned takes;
+  int (*run)(const CommandLine&);
+};
+
+constexpr unsigned kTransform = kScope | kOutput;
+
+const Command kCommands[] = {
+    {"list",
+     "Show how the tool reads a group, project or module file: components, members and every "
+     "procedure's extent.",
+     kTsv,
+     [](const CommandLine& c) {
+       return runList({toQStrings(c.files), c.tsv});
+     }},
+    {"number", "Add line numbers to the executable lines of every procedure, restarting in each.",
+     kTransform | kNumbering, [](const CommandLine& c) { return runNumber(c.transformOptions()); }},
+    {"unnumber", "Remove the line numbers of every procedure.", kTransform,
+     [](const CommandLine& c) { return runUnnumber(c.transformOptions()); }},
+    {"indent", "Re-indent procedures and declarations with tabs or spaces.", kTransform | kIndentation,
+     [](const CommandLine& c) { return runIndent(c.transformOptions()); }},
+    {"numindent",
+     "Number (or with --remove unnumber) and re-indent in one pass, the numbers in a column of their "
+     "own.",
+     kTransform | kNumbering | kIndentation | kRemove,
+     [](const CommandLine& c) { return runNumIndent(c.transformOptions()); }},
+};
+
+void addOptions(CLI::App& app, unsigned takes, CommandLine& line) {
+  app.add_option("files", line.files, "Group (.vbg), project (.vbp) or module files")->required();
+  if (takes & kTsv)
+    app.add_flag("--tsv", line.tsv, "One tab-separated row per component and per procedure, for scripts");
+  if (takes & kScope) {
+    auto* module = app.add_option("--module", line.module, "Only the module (component) of this name");
+    auto* procedure = app.add_option("--procedure", line.procedure, "Only this procedure, as MODULE.NAME")
+                          ->type_name("MODULE.NAME");
+    module->excludes(procedure);
+  }
+  constexpr qint32 kLargest = std::numeric_limits<qint32>::max();
+  if (takes & kNumbering) {
+    app.add_option("--start", line.start,
+                   "The first number of each procedure (default: the "
+                   "numbering dialog's)")
+        ->check(CLI::Range(0, kLargest));
+    app.add_option("--interval", line.interval,
+                   "The step between numbers (default: the "
+                   "numbering dialog's)")
+        ->check(CLI::Range(1, kLargest));
+  }
+  if (takes & kIndentation) {
+    auto* tabs = app.add_flag("--tabs", line.tabs, "Indent with one tab per level");
+    auto* spaces = app.add_option("--spaces", line.spaces,
+                                  "Indent with N spaces per level (default: the "
+                                  "indentation dialog's choice)")
+                       ->type_name("N")
+                       ->check(CLI::Range(1, 1000));
+    tabs->excludes(spaces);
+  }
+  if (takes & kRemove)
+    app.add_flag("--remove", line.remove, "Remove the line numbers instead of adding them");
+  if (takes & kOutput) {
+    app.add_flag("--check", line.check, "Write nothing; exit 1 when a file would change");
+    app.add_flag("--diff", line.diff, "Write nothing; print a unified diff of what would change");
+  }
+}
+
 }  // namespace
 }  // namespace cli
 
@@ -39,17 +163,20 @@ int main(int argc, char** argv) {
   QCoreApplication app(argc, argv);
   CLI::App parser{
       "quimbel: the Quimbel add-in's batch features for VB6 projects.\n\n"
+      "Files are rewritten in place, and only where a line changed. Options left out take the values\n"
+      "last chosen in the numbering and indentation dialogs.\n\n"
       "Exit codes: 0 done, 1 --check found changes, 2 bad command line, 3 unreadable or invalid\n"
-      "input, 4 a file could not be written (what was on disk is kept)."};
+      "input, or code the command cannot rewrite (nothing is written then), 4 a file could not be\n"
+      "written (what was on disk is kept)."};
   parser.require_subcommand(1);
 
-  std::vector<std::string> listFiles;
-  bool tsv = false;
-  CLI::App* list = parser.add_subcommand("list",
-                                         "Show how the tool reads a group, project or module file: "
-                                         "components, members and every procedure's extent.");
-  list->add_option("files", listFiles, "Group (.vbg), project (.vbp) or module files")->required();
-  list->add_flag("--tsv", tsv, "One tab-separated row per component and per procedure, for scripts");
+  cli::CommandLine line;
+  std::vector<std::pair<CLI::App*, const cli::Command*>> subcommands;
+  for (const cli::Command& command : cli::kCommands) {
+    CLI::App* sub = parser.add_subcommand(command.name, command.description);
+    cli::addOptions(*sub, command.takes, line);
+    subcommands.emplace_back(sub, &command);
+  }
 
   try {
     parser.parse(argc, argv);
@@ -63,10 +190,14 @@ int main(int argc, char** argv) {
   }
 
   try {
-    if (list->parsed()) return cli::runList({cli::toQStrings(listFiles), tsv});
+    for (const auto& [sub, command] : subcommands) {
+      if (!sub->parsed()) continue;
+      line.noteGiven(*sub);
+      return command->run(line);
+    }
   } catch (const ide::Error& error) {
     cli::printError(error.description());
-    return error.number() == 75 ? cli::kOutputError : cli::kInputError;
+    return error.number() == ide::err::PathFileAccessError ? cli::kOutputError : cli::kInputError;
   }
   return cli::kUsageError;
 }

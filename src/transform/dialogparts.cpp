@@ -1,16 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "transform/dialogparts.h"
 
-#include "transform/linetext.h"
-
 #include <QFocusEvent>
 #include <QKeyEvent>
 #include <QProgressBar>
 #include <QRegularExpressionValidator>
 #include <QTimer>
-
-#include <cmath>
-#include <limits>
 
 namespace transform {
 
@@ -64,18 +59,6 @@ bool ProgressBarSink::isVisible() const {
 void ProgressBarSink::setVisible(bool visible) {
   m_bar.setVisible(visible);
   m_bar.repaint();
-}
-
-std::optional<qint32> boxValue(const QString& text) {
-  const QString trimmed = text.trimmed();
-  if (!isNumeric(trimmed)) return std::nullopt;
-  bool ok = false;
-  const double value = trimmed.toDouble(&ok);
-  if (!ok) return std::nullopt;
-  const double whole = std::nearbyint(value);  // the default rounding mode takes halves to even
-  if (whole < std::numeric_limits<qint32>::min() || whole > std::numeric_limits<qint32>::max())
-    return std::nullopt;
-  return qint32(whole);
 }
 
 }  // namespace transform

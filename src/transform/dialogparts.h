@@ -8,8 +8,6 @@
 
 #include <QLineEdit>
 
-#include <optional>
-
 class QProgressBar;
 
 namespace transform {
@@ -59,10 +57,5 @@ class BusyCursor {
   ide::UserInterface& m_ui;
   ide::Cursor m_previous;
 };
-
-/// The 32-bit value of a box's text: a plain decimal number (blanks around it ignored) rounded to a
-/// whole number, halves to even. Nothing for an empty text, a text that is not a number or a value
-/// outside the 32-bit range.
-std::optional<qint32> boxValue(const QString& text);
 
 }  // namespace transform

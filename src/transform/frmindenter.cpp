@@ -4,6 +4,7 @@
 
 #include "common/strings.h"
 #include "transform/indentwalk.h"
+#include "transform/options.h"
 
 #include <QGroupBox>
 #include <QHBoxLayout>
@@ -127,7 +128,7 @@ void frmIndenter::cmdIndent_Click() {
   qint32 unit = 1;
   if (spaceMode()) {
     const QString spaces = m_txtSpaces->text().trimmed();
-    const auto value = boxValue(spaces);
+    const auto value = wholeNumber(spaces);
     if (spaces.isEmpty() || !value || *value <= 0) {
       ui.MsgBox(text(spaces.isEmpty() ? kNoSpaces : kInvalidSpaces), ide::mb::Information, common::title());
       m_txtSpaces->setFocus();
@@ -220,7 +221,7 @@ void frmIndenter::Form_Unload() {
     return;
   }
   m_settings.setValue(common::setting::UseOption, QStringLiteral("1"));
-  if (const auto spaces = boxValue(m_txtSpaces->text())) {
+  if (const auto spaces = wholeNumber(m_txtSpaces->text())) {
     m_settings.setValue(common::setting::Indentation, QString::number(*spaces));
   }
 }

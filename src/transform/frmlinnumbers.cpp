@@ -4,6 +4,7 @@
 
 #include "common/strings.h"
 #include "transform/numberwalk.h"
+#include "transform/options.h"
 
 #include <QGridLayout>
 #include <QGroupBox>
@@ -27,15 +28,6 @@ constexpr int kIntervalNotNumeric = 5120;
 
 QString text(int id) {
   return common::LoadResString(id);
-}
-
-// A setting's number, or the key's default where the stored text is not a 32-bit number.
-std::pair<QString, qint32> storedNumber(const common::SettingsStore& settings,
-                                        const common::setting::Key& key) {
-  const QString stored = settings.value(key).trimmed();
-  if (const auto value = boxValue(stored)) return {stored, *value};
-  const QString fallback = QString::fromLatin1(key.defaultValue);
-  return {fallback, *boxValue(fallback)};
 }
 
 }  // namespace
@@ -115,12 +107,11 @@ frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& sett
     m_vbe->Platform().ui().MsgBox(text(failure.messageId), ide::mb::Exclamation, common::title());
   };
 
-  const auto [startText, start] = storedNumber(m_settings, common::setting::InitialNumber);
-  const auto [intervalText, interval] = storedNumber(m_settings, common::setting::Interval);
-  m_txtInitial->setText(startText);
-  m_txtInterval->setText(intervalText);
-  m_startNumber = start;
-  m_interval = interval;
+  const NumberingOptions stored = storedNumbering(m_settings);
+  m_startNumber = stored.startNumber;
+  m_interval = stored.interval;
+  m_txtInitial->setText(QString::number(m_startNumber));
+  m_txtInterval->setText(QString::number(m_interval));
   m_opNumbers[2]->setChecked(true);
 }
 
@@ -136,7 +127,7 @@ PROG_MODE frmLinNumbers::scope() const {
 
 bool frmLinNumbers::readBox(QLineEdit* box, qint32& field, int messageId) {
   if (box->text().trimmed().isEmpty()) return true;  // an empty box keeps the value last used
-  const auto value = boxValue(box->text());
+  const auto value = wholeNumber(box->text());
   if (!value) {
     m_vbe->Platform().ui().MsgBox(text(messageId), ide::mb::Exclamation, common::title());
     box->setFocus();
@@ -270,8 +261,8 @@ void frmLinNumbers::Form_Unload() {
   // empty box or one that is not a number leaves the setting alone.
   const auto remember = [this](QLineEdit* box, const common::setting::Key& key) {
     const QString value = box->text().trimmed();
-    const auto number = boxValue(value);
-    if (number && number != boxValue(m_settings.value(key))) m_settings.setValue(key, value);
+    const auto number = wholeNumber(value);
+    if (number && number != wholeNumber(m_settings.value(key))) m_settings.setValue(key, value);
   };
   remember(m_txtInitial, common::setting::InitialNumber);
   remember(m_txtInterval, common::setting::Interval);

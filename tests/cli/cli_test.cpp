@@ -1,0 +1,445 @@
+// SPDX-License-Identifier: MIT
+// The command-line tool end to end: the built binary, run on copies of the example group and on small
+// modules, with settings of its own. Bytes on disk, standard output and error, and exit codes.
+#include "common/settings.h"
+#include "printers.h"
+#include "testproject.h"
+
+#include <gtest/gtest.h>
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QProcess>
+#include <QTemporaryDir>
+
+#include <unistd.h>
+
+namespace {
+
+using host::test::ExampleCopy;
+using host::test::readBytes;
+using host::test::writeBytes;
+
+struct Result {
+  int code = -1;
+  QString out;
+  QString err;
+};
+
+// The tool with a settings directory of its own.
+class Tool {
+ public:
+  Result run(const QStringList& arguments, const QString& directory = {}) {
+    QProcess process;
+    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+    environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), m_home.filePath(QStringLiteral("config")));
+    environment.insert(QStringLiteral("QUIMBEL_DATA_DIR"), m_home.filePath(QStringLiteral("data")));
+    environment.insert(QStringLiteral("LC_ALL"), QStringLiteral("C.UTF-8"));
+    process.setProcessEnvironment(environment);
+    if (!directory.isEmpty()) process.setWorkingDirectory(directory);
+    process.start(QStringLiteral(QUIMBEL_BINARY), arguments);
+    EXPECT_TRUE(process.waitForFinished(120000));
+    return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1,
+            QString::fromUtf8(process.readAllStandardOutput()),
+            QString::fromUtf8(process.readAllStandardError())};
+  }
+
+  /// The settings the dialogs would have left.
+  void setSetting(const common::setting::Key& key, const QString& value) {
+    common::SettingsStore(m_home.filePath(QStringLiteral("config/Quimbel.ini"))).setValue(key, value);
+  }
+
+ private:
+  QTemporaryDir m_home;
+};
+
+// A small module in Windows-1252 with CRLF line ends (the accents are written as their code-page bytes).
+const QByteArray kCalculo =
+    "Attribute VB_Name = \"Calculo\"\r\n"
+    "Option Explicit\r\n"
+    "' C\xE1lculo de pre\xE7os\r\n"
+    "Public Function Preco(ByVal x As Currency) As Currency\r\n"
+    "    If x > 0 Then\r\n"
+    "        Preco = x * 1.1 ' acr\xE9scimo\r\n"
+    "    Else\r\n"
+    "        Preco = 0\r\n"
+    "    End If\r\n"
+    "End Function\r\n";
+
+const QByteArray kCalculoNumbered =
+    "Attribute VB_Name = \"Calculo\"\r\n"
+    "Option Explicit\r\n"
+    "' C\xE1lculo de pre\xE7os\r\n"
+    "Public Function Preco(ByVal x As Currency) As Currency\r\n"
+    "10     If x > 0 Then\r\n"
+    "20         Preco = x * 1.1 ' acr\xE9scimo\r\n"
+    "30      Else\r\n"
+    "40         Preco = 0\r\n"
+    "50     End If\r\n"
+    "End Function\r\n";
+
+// A directory holding Calculo.bas.
+struct Workspace {
+  QTemporaryDir dir;
+  QString file = dir.filePath(QStringLiteral("Calculo.bas"));
+  explicit Workspace(const QByteArray& bytes = kCalculo) { writeBytes(file, bytes); }
+  QByteArray bytes() const { return readBytes(file); }
+};
+
+// ---------------------------------------------------------------------------------------------------
+// The command line
+
+TEST(CommandLine, BadCommandLinesExitWithTwoAndSayWhy) {
+  Workspace work;
+  Tool tool;
+  const QList<QStringList> bad = {
+      {},
+      {QStringLiteral("renumber"), work.file},
+      {QStringLiteral("number")},
+      {QStringLiteral("number"), QStringLiteral("--bogus"), work.file},
+      {QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("dez"), work.file},
+      {QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("-5"), work.file},
+      {QStringLiteral("number"), QStringLiteral("--interval"), QStringLiteral("0"), work.file},
+      {QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("99999999999"), work.file},
+      {QStringLiteral("number"), QStringLiteral("--tabs"), work.file},
+      {QStringLiteral("indent"), QStringLiteral("--spaces"), QStringLiteral("0"), work.file},
+      {QStringLiteral("indent"), QStringLiteral("--tabs"), QStringLiteral("--spaces"), QStringLiteral("2"),
+       work.file},
+      {QStringLiteral("indent"), QStringLiteral("--remove"), work.file},
+      {QStringLiteral("unnumber"), QStringLiteral("--module"), QStringLiteral("Calculo"),
+       QStringLiteral("--procedure"), QStringLiteral("Calculo.Preco"), work.file},
+  };
+  for (const QStringList& arguments : bad) {
+    const Result result = tool.run(arguments);
+    EXPECT_EQ(result.code, 2) << arguments.join(u' ').toStdString();
+    EXPECT_TRUE(result.err.startsWith(QStringLiteral("quimbel: "))) << result.err.toStdString();
+  }
+  EXPECT_EQ(work.bytes(), kCalculo);
+}
+
+TEST(CommandLine, AScopeThatNamesNothingIsAUsageError) {
+  Workspace work;
+  Tool tool;
+  Result result =
+      tool.run({QStringLiteral("number"), QStringLiteral("--module"), QStringLiteral("Nada"), work.file});
+  EXPECT_EQ(result.code, 2);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("no module 'Nada'"))) << result.err.toStdString();
+  result = tool.run(
+      {QStringLiteral("number"), QStringLiteral("--procedure"), QStringLiteral("Calculo.Nada"), work.file});
+  EXPECT_EQ(result.code, 2);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("no procedure 'Calculo.Nada'"))) << result.err.toStdString();
+  result =
+      tool.run({QStringLiteral("number"), QStringLiteral("--procedure"), QStringLiteral("Preco"), work.file});
+  EXPECT_EQ(result.code, 2);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("MODULE.NAME"))) << result.err.toStdString();
+  EXPECT_EQ(work.bytes(), kCalculo);
+}
+
+TEST(CommandLine, HelpListsTheCommandsAndTheirOptions) {
+  Tool tool;
+  Result result = tool.run({QStringLiteral("--help")});
+  EXPECT_EQ(result.code, 0);
+  for (const char* command : {"list", "number", "unnumber", "indent", "numindent"})
+    EXPECT_TRUE(result.out.contains(QString::fromLatin1(command))) << command;
+  result = tool.run({QStringLiteral("numindent"), QStringLiteral("--help")});
+  EXPECT_EQ(result.code, 0);
+  for (const char* option : {"--module", "--procedure", "--start", "--interval", "--tabs", "--spaces",
+                             "--remove", "--check", "--diff"})
+    EXPECT_TRUE(result.out.contains(QString::fromLatin1(option))) << option;
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Input that cannot be read
+
+TEST(UnreadableInput, ExitsWithThreeNamingTheFileAndWritesNothing) {
+  Workspace work;
+  Tool tool;
+  Result result = tool.run({QStringLiteral("indent"), work.dir.filePath(QStringLiteral("Falta.bas"))});
+  EXPECT_EQ(result.code, 3);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Falta.bas"))) << result.err.toStdString();
+
+  // A good file given with a bad one is not written either.
+  const QString binary = work.dir.filePath(QStringLiteral("Binario.bas"));
+  writeBytes(binary, QByteArray("Attribute VB_Name = \"B\"\r\n\0\1\2", 28));
+  result = tool.run(
+      {QStringLiteral("indent"), QStringLiteral("--spaces"), QStringLiteral("2"), work.file, binary});
+  EXPECT_EQ(result.code, 3);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Binario.bas"))) << result.err.toStdString();
+  EXPECT_EQ(work.bytes(), kCalculo);
+}
+
+TEST(UnreadableInput, CodeTheCommandCannotRewriteStopsItAndNothingIsWritten) {
+  // Numbering would take this line past the IDE's 1023 characters.
+  const QByteArray longLine = "s = \"" + QByteArray(1015, 'a') + "\"";
+  Workspace work("Attribute VB_Name = \"Longo\"\r\nSub A()\r\nx = 1\r\n" + longLine + "\r\nEnd Sub\r\n");
+  const QByteArray before = work.bytes();
+  Tool tool;
+  const Result result = tool.run({QStringLiteral("number"), work.file});
+  EXPECT_EQ(result.code, 3);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Longo, line 3: Line too long")))
+      << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(QStringLiteral("nothing was written"))) << result.err.toStdString();
+  EXPECT_EQ(work.bytes(), before);
+}
+
+TEST(UnreadableInput, NumbersPastTheLargestStopTheRun) {
+  Workspace work;
+  Tool tool;
+  const Result result =
+      tool.run({QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("2147483647"),
+                QStringLiteral("--interval"), QStringLiteral("1"), work.file});
+  EXPECT_EQ(result.code, 3);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("line numbers would pass 2147483647")))
+      << result.err.toStdString();
+  EXPECT_EQ(work.bytes(), kCalculo);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Rewriting files
+
+TEST(Rewriting, NumbersAModuleKeepingItsCodePageAndLineEnds) {
+  Workspace work;
+  Tool tool;
+  const Result result = tool.run({QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("10"),
+                                  QStringLiteral("--interval"), QStringLiteral("10"), work.file});
+  EXPECT_EQ(result.code, 0) << result.err.toStdString();
+  EXPECT_TRUE(result.out.isEmpty());
+  EXPECT_EQ(work.bytes(), kCalculoNumbered);
+
+  // Removing them gives the module back, but for the blank left before the one-word Else.
+  EXPECT_EQ(tool.run({QStringLiteral("unnumber"), work.file}).code, 0);
+  QByteArray expected = kCalculo;
+  expected.replace("    Else\r\n", "     Else\r\n");
+  EXPECT_EQ(work.bytes(), expected);
+}
+
+TEST(Rewriting, LineFeedsAndAMissingLastLineEndStayAsTheyWere) {
+  Workspace work("Attribute VB_Name = \"Lf\"\nSub A()\nx = 1\nEnd Sub");
+  Tool tool;
+  EXPECT_EQ(tool.run({QStringLiteral("indent"), QStringLiteral("--tabs"), work.file}).code, 0);
+  EXPECT_EQ(work.bytes(), QByteArray("Attribute VB_Name = \"Lf\"\nSub A()\n\tx = 1\nEnd Sub"));
+}
+
+TEST(Rewriting, OnlyTheFilesOfTheScopeChangeAndOnlyInTheirCode) {
+  ExampleCopy copy;
+  const auto before = copy.snapshot();
+  Tool tool;
+  const Result result = tool.run({QStringLiteral("numindent"), QStringLiteral("--module"),
+                                  QStringLiteral("clsPedido"), copy.groupFile()});
+  EXPECT_EQ(result.code, 0) << result.err.toStdString();
+  const auto after = copy.snapshot();
+  for (auto it = before.cbegin(); it != before.cend(); ++it) {
+    if (it.key() == QStringLiteral("Loja/clsPedido.cls")) continue;
+    EXPECT_EQ(after.value(it.key()), it.value()) << it.key().toStdString();
+  }
+  const QList<QByteArray> oldLines = before.value(QStringLiteral("Loja/clsPedido.cls")).split('\n');
+  const QList<QByteArray> newLines = after.value(QStringLiteral("Loja/clsPedido.cls")).split('\n');
+  ASSERT_EQ(newLines.size(), oldLines.size());
+  int changed = 0;
+  for (qsizetype i = 0; i + 1 < newLines.size(); ++i) {
+    EXPECT_TRUE(newLines[i].endsWith('\r')) << "line " << i + 1;
+    if (newLines[i] == oldLines[i]) continue;
+    ++changed;
+    // The class header and its attributes are never touched.
+    EXPECT_FALSE(oldLines[i].startsWith("Attribute ")) << "line " << i + 1;
+    EXPECT_FALSE(oldLines[i].startsWith("VERSION ")) << "line " << i + 1;
+  }
+  EXPECT_GT(changed, 10);
+}
+
+TEST(Rewriting, AProcedureScopeTakesEveryKindOfAProperty) {
+  Workspace work(
+      "Attribute VB_Name = \"Prop\"\r\n"
+      "Private mValor As Long\r\n"
+      "Public Property Get Valor() As Long\r\n"
+      "Valor = mValor\r\n"
+      "End Property\r\n"
+      "Public Property Let Valor(ByVal v As Long)\r\n"
+      "mValor = v\r\n"
+      "End Property\r\n"
+      "Public Sub Outro()\r\n"
+      "x = 1\r\n"
+      "End Sub\r\n");
+  Tool tool;
+  const Result result = tool.run(
+      {QStringLiteral("number"), QStringLiteral("--procedure"), QStringLiteral("prop.valor"), work.file});
+  EXPECT_EQ(result.code, 0) << result.err.toStdString();
+  EXPECT_EQ(work.bytes(), QByteArray("Attribute VB_Name = \"Prop\"\r\n"
+                                     "Private mValor As Long\r\n"
+                                     "Public Property Get Valor() As Long\r\n"
+                                     "10000 Valor = mValor\r\n"
+                                     "End Property\r\n"
+                                     "Public Property Let Valor(ByVal v As Long)\r\n"
+                                     "10000 mValor = v\r\n"
+                                     "End Property\r\n"
+                                     "Public Sub Outro()\r\n"
+                                     "x = 1\r\n"
+                                     "End Sub\r\n"));
+}
+
+TEST(Rewriting, OptionsLeftOutComeFromTheDialogsSettings) {
+  Tool tool;
+  tool.setSetting(common::setting::InitialNumber, QStringLiteral("500"));
+  tool.setSetting(common::setting::Interval, QStringLiteral("50"));
+  tool.setSetting(common::setting::Indentation, QStringLiteral("2"));
+  tool.setSetting(common::setting::UseOption, QStringLiteral("1"));
+  const QByteArray module =
+      "Attribute VB_Name = \"M\"\r\nSub A()\r\nIf x Then\r\ny = 1\r\nEnd If\r\nEnd Sub\r\n";
+
+  Workspace numbered(module);
+  EXPECT_EQ(tool.run({QStringLiteral("number"), numbered.file}).code, 0);
+  EXPECT_EQ(
+      numbered.bytes(),
+      QByteArray(
+          "Attribute VB_Name = \"M\"\r\nSub A()\r\n500 If x Then\r\n550 y = 1\r\n600 End If\r\nEnd Sub\r\n"));
+
+  Workspace indented(module);
+  EXPECT_EQ(tool.run({QStringLiteral("indent"), indented.file}).code, 0);
+  EXPECT_EQ(
+      indented.bytes(),
+      QByteArray(
+          "Attribute VB_Name = \"M\"\r\nSub A()\r\n  If x Then\r\n    y = 1\r\n  End If\r\nEnd Sub\r\n"));
+
+  Workspace both(module);
+  EXPECT_EQ(tool.run({QStringLiteral("numindent"), both.file}).code, 0);
+  EXPECT_EQ(both.bytes(),
+            QByteArray("Attribute VB_Name = \"M\"\r\nSub A()\r\n500   If x Then\r\n550     y = 1\r\n"
+                       "600   End If\r\nEnd Sub\r\n"));
+
+  // Given options win.
+  Workspace given(module);
+  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--start"), QStringLiteral("1"),
+                      QStringLiteral("--tabs"), given.file})
+                .code,
+            0);
+  EXPECT_EQ(given.bytes(),
+            QByteArray("Attribute VB_Name = \"M\"\r\nSub A()\r\n1   \tIf x Then\r\n51  \t\ty = 1\r\n"
+                       "101 \tEnd If\r\nEnd Sub\r\n"));
+
+  // Removing with numindent re-indents with an empty number column.
+  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--remove"), given.file}).code, 0);
+  EXPECT_EQ(given.bytes(), indented.bytes());
+}
+
+TEST(Rewriting, NumberAndIndentTwiceChangesNothingTheSecondTime) {
+  ExampleCopy copy;
+  Tool tool;
+  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--spaces"), QStringLiteral("4"),
+                      copy.groupFile()})
+                .code,
+            0);
+  const auto once = copy.snapshot();
+  const Result again = tool.run({QStringLiteral("numindent"), QStringLiteral("--spaces"), QStringLiteral("4"),
+                                 QStringLiteral("--check"), copy.groupFile()});
+  EXPECT_EQ(again.code, 0) << again.out.toStdString();
+  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--spaces"), QStringLiteral("4"),
+                      copy.groupFile()})
+                .code,
+            0);
+  EXPECT_EQ(copy.snapshot(), once);
+}
+
+TEST(Rewriting, AFileThatCannotBeWrittenExitsWithFour) {
+  if (::geteuid() == 0) GTEST_SKIP() << "file permissions do not bind root";
+  Workspace work;
+  Tool tool;
+  QFile::setPermissions(work.dir.path(), QFile::ReadOwner | QFile::ExeOwner);
+  const Result result = tool.run({QStringLiteral("number"), work.file});
+  QFile::setPermissions(work.dir.path(), QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+  EXPECT_EQ(result.code, 4);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Calculo.bas"))) << result.err.toStdString();
+  EXPECT_EQ(work.bytes(), kCalculo);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Checking and diffs: nothing is written
+
+TEST(CheckAndDiff, CheckExitsWithOneWhenSomethingWouldChange) {
+  Workspace work;
+  Tool tool;
+  Result result = tool.run(
+      {QStringLiteral("number"), QStringLiteral("--check"), QStringLiteral("Calculo.bas")}, work.dir.path());
+  EXPECT_EQ(result.code, 1);
+  EXPECT_EQ(result.out, QStringLiteral("would change Calculo.bas\n"));
+  EXPECT_EQ(work.bytes(), kCalculo);
+  // Nothing to remove: nothing would change.
+  result = tool.run({QStringLiteral("unnumber"), QStringLiteral("--check"), work.file});
+  EXPECT_EQ(result.code, 0);
+  EXPECT_TRUE(result.out.isEmpty());
+}
+
+TEST(CheckAndDiff, DiffPrintsTheChangedLinesWithThreeLinesOfContext) {
+  Workspace work;
+  Tool tool;
+  const Result result = tool.run({QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("10"),
+                                  QStringLiteral("--interval"), QStringLiteral("10"),
+                                  QStringLiteral("--diff"), QStringLiteral("Calculo.bas")},
+                                 work.dir.path());
+  EXPECT_EQ(result.code, 0) << result.err.toStdString();
+  EXPECT_EQ(result.out, QStringLiteral("--- a/Calculo.bas\n"
+                                       "+++ b/Calculo.bas\n"
+                                       "@@ -2,9 +2,9 @@\n"
+                                       " Option Explicit\n"
+                                       " ' Cálculo de preços\n"
+                                       " Public Function Preco(ByVal x As Currency) As Currency\n"
+                                       "-    If x > 0 Then\n"
+                                       "-        Preco = x * 1.1 ' acréscimo\n"
+                                       "-    Else\n"
+                                       "-        Preco = 0\n"
+                                       "-    End If\n"
+                                       "+10     If x > 0 Then\n"
+                                       "+20         Preco = x * 1.1 ' acréscimo\n"
+                                       "+30      Else\n"
+                                       "+40         Preco = 0\n"
+                                       "+50     End If\n"
+                                       " End Function\n"));
+  EXPECT_EQ(work.bytes(), kCalculo);
+}
+
+TEST(CheckAndDiff, DistantChangesMakeSeparateHunks) {
+  QByteArray module = "Attribute VB_Name = \"Dois\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n";
+  for (int i = 1; i <= 8; ++i)
+    module += "' " + QByteArray::number(i) + "\r\n";
+  module += "Sub B()\r\n    y = 2\r\nz = 3\r\nEnd Sub";  // no line end after the last line
+  Workspace work(module);
+  Tool tool;
+  const Result result = tool.run({QStringLiteral("indent"), QStringLiteral("--spaces"), QStringLiteral("4"),
+                                  QStringLiteral("--diff"), QStringLiteral("Calculo.bas")},
+                                 work.dir.path());
+  EXPECT_EQ(result.code, 0) << result.err.toStdString();
+  EXPECT_EQ(result.out, QStringLiteral("--- a/Calculo.bas\n"
+                                       "+++ b/Calculo.bas\n"
+                                       "@@ -1,6 +1,6 @@\n"
+                                       " Attribute VB_Name = \"Dois\"\n"
+                                       " Sub A()\n"
+                                       "-x = 1\n"
+                                       "+    x = 1\n"
+                                       " End Sub\n"
+                                       " ' 1\n"
+                                       " ' 2\n"
+                                       "@@ -12,5 +12,5 @@\n"
+                                       " ' 8\n"
+                                       " Sub B()\n"
+                                       "     y = 2\n"
+                                       "-z = 3\n"
+                                       "+    z = 3\n"
+                                       " End Sub\n"
+                                       "\\ No newline at end of file\n"));
+  EXPECT_EQ(work.bytes(), module);
+}
+
+TEST(CheckAndDiff, GroupPathsAreShownFromTheCurrentDirectory) {
+  ExampleCopy copy;
+  Tool tool;
+  const Result result = tool.run(
+      {QStringLiteral("indent"), QStringLiteral("--tabs"), QStringLiteral("--diff"),
+       QStringLiteral("--procedure"), QStringLiteral("modApi.NomeDoUsuario"), QStringLiteral("Demo.vbg")},
+      copy.path(QString()));
+  EXPECT_EQ(result.code, 0) << result.err.toStdString();
+  EXPECT_TRUE(result.out.startsWith(
+      QStringLiteral("--- a/Utilitarios/modApi.bas\n+++ b/Utilitarios/modApi.bas\n@@ ")))
+      << result.out.toStdString();
+}
+
+}  // namespace
