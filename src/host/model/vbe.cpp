@@ -313,6 +313,7 @@ void VbeImpl::windowOpened(const std::shared_ptr<WindowImpl>& window) {
   if (!isChildWindow(*window)) return;
   if (std::find(m_childWindows.begin(), m_childWindows.end(), window) == m_childWindows.end())
     m_childWindows.push_back(window);
+  childWindowOpened.fire(window.get());
 }
 
 void VbeImpl::windowClosed(WindowImpl& window) {
@@ -350,6 +351,7 @@ void VbeImpl::activateWindow(const std::shared_ptr<WindowImpl>& window) {
     }
   }
   windowSystem().setFocus(window->hWnd());
+  windowActivated.fire(window.get());
 }
 
 void VbeImpl::selectComponent(const std::shared_ptr<ComponentImpl>& component) {

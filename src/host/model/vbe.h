@@ -82,6 +82,10 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   void windowOpened(const std::shared_ptr<WindowImpl>& window);
   void windowClosed(WindowImpl& window);
   std::vector<std::shared_ptr<WindowImpl>> openWindows() const;
+  /// A code or designer window opened; a window was activated (also when it was active already). The
+  /// desktop host shows the one and brings the other to the front.
+  ide::Signal<WindowImpl*> childWindowOpened;
+  ide::Signal<WindowImpl*> windowActivated;
   std::shared_ptr<WindowImpl> mainWindow() const { return m_mainWindow; }
   std::shared_ptr<WindowImpl> projectWindow() const { return m_projectWindow; }
   std::shared_ptr<WindowImpl> propertiesWindow() const { return m_propertiesWindow; }

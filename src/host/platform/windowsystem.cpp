@@ -73,6 +73,12 @@ int WindowSystemImpl::hotKeyCount(ide::HWnd window) const {
                                         [window](const HotKey& k) { return k.window == window; }));
 }
 
+bool WindowSystemImpl::hasHotKey(ide::HWnd window, unsigned modifiers, unsigned virtualKey) const {
+  return std::any_of(m_hotKeys.begin(), m_hotKeys.end(), [&](const HotKey& k) {
+    return k.window == window && k.modifiers == modifiers && k.virtualKey == virtualKey;
+  });
+}
+
 bool WindowSystemImpl::IsWindow(ide::HWnd window) {
   return find(window) != nullptr;
 }

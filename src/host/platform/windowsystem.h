@@ -35,6 +35,8 @@ class WindowSystemImpl final : public ide::WindowSystem {
   /// Called when something asks for a window to come to the front (SetForegroundWindow).
   void setActivateHandler(std::function<void(ide::HWnd)> handler) { m_activate = std::move(handler); }
   int hotKeyCount(ide::HWnd window) const;
+  /// Whether `window` holds a hotkey for the combination (an editor lets such keys pass its shortcuts).
+  bool hasHotKey(ide::HWnd window, unsigned modifiers, unsigned virtualKey) const;
 
   bool IsWindow(ide::HWnd window) override;
   ide::HWnd GetFocus() override { return m_focus; }
