@@ -1,0 +1,118 @@
+// SPDX-License-Identifier: MIT
+#include "codeeditor.h"
+
+#include "host/platform/windowsystem.h"
+#include "keys.h"
+#include "vbhighlighter.h"
+
+#include <QFontDatabase>
+#include <QKeyEvent>
+#include <QPainter>
+#include <QScrollBar>
+#include <QTextBlock>
+
+namespace desktop {
+
+/// The grey bar left of the code, where the IDE shows breakpoints and the current statement.
+class MarginBar final : public QWidget {
+ public:
+  explicit MarginBar(CodeEditor* editor) : QWidget(editor), m_editor(editor) {}
+  QSize sizeHint() const override { return QSize(m_editor->marginWidth(), 0); }
+
+ protected:
+  void paintEvent(QPaintEvent* event) override { m_editor->paintMargin(event); }
+
+ private:
+  CodeEditor* m_editor;
+};
+
+CodeEditor::CodeEditor(QWidget* parent) : QPlainTextEdit(parent) {
+  QFont font = QFontDatabase::systemFont(QFontDatabase::FixedFont);
+  font.setFamily(QStringLiteral("DejaVu Sans Mono"));
+  font.setStyleHint(QFont::Monospace);
+  font.setPointSize(10);
+  setFont(font);
+  setLineWrapMode(QPlainTextEdit::NoWrap);
+  setTabStopDistance(QFontMetricsF(font).horizontalAdvance(u' ') * 4);
+  setFrameShape(QFrame::NoFrame);
+  m_margin = new MarginBar(this);
+  setViewportMargins(kMarginWidth, 0, 0, 0);
+  m_highlighter = new VbHighlighter(this);
+  connect(verticalScrollBar(), &QScrollBar::valueChanged, this, [this] {
+    m_highlighter->colourVisible();
+    m_margin->update();
+  });
+}
+
+CodeEditor::~CodeEditor() = default;
+
+void CodeEditor::setHotKeyTarget(host::WindowSystemImpl* windows, std::function<ide::HWnd()> window) {
+  m_windows = windows;
+  m_window = std::move(window);
+}
+
+bool CodeEditor::isRegisteredHotKey(QKeyEvent* event) const {
+  if (!m_windows || !m_window) return false;
+  const VirtualKey key = virtualKeyOf(event->key(), event->modifiers());
+  return key.key != 0 && m_windows->hasHotKey(m_window(), key.modifiers, key.key);
+}
+
+bool CodeEditor::event(QEvent* event) {
+  if (event->type() == QEvent::ShortcutOverride) {
+    if (m_beforeInput) m_beforeInput();
+    // A registered hotkey goes to the window's procedures before any menu shortcut can take it.
+    if (isRegisteredHotKey(static_cast<QKeyEvent*>(event))) {
+      event->accept();
+      return true;
+    }
+  }
+  return QPlainTextEdit::event(event);
+}
+
+void CodeEditor::keyPressEvent(QKeyEvent* event) {
+  if (m_beforeInput) m_beforeInput();
+  if (m_windows && m_window) {
+    const VirtualKey key = virtualKeyOf(event->key(), event->modifiers());
+    if (key.key != 0 && m_windows->deliverHotKey(m_window(), key.modifiers, key.key)) {
+      event->accept();
+      return;
+    }
+  }
+  QPlainTextEdit::keyPressEvent(event);
+}
+
+void CodeEditor::mousePressEvent(QMouseEvent* event) {
+  if (m_beforeInput) m_beforeInput();
+  QPlainTextEdit::mousePressEvent(event);
+}
+
+void CodeEditor::inputMethodEvent(QInputMethodEvent* event) {
+  if (m_beforeInput) m_beforeInput();
+  QPlainTextEdit::inputMethodEvent(event);
+}
+
+void CodeEditor::insertFromMimeData(const QMimeData* source) {
+  if (m_beforeInput) m_beforeInput();
+  QPlainTextEdit::insertFromMimeData(source);
+}
+
+void CodeEditor::contextMenuEvent(QContextMenuEvent* event) {
+  Q_EMIT contextMenuWanted(event->globalPos());
+  event->accept();
+}
+
+void CodeEditor::resizeEvent(QResizeEvent* event) {
+  QPlainTextEdit::resizeEvent(event);
+  const QRect area = contentsRect();
+  m_margin->setGeometry(QRect(area.left(), area.top(), kMarginWidth, area.height()));
+  m_highlighter->colourVisible();
+}
+
+void CodeEditor::paintMargin(QPaintEvent* event) {
+  QPainter painter(m_margin);
+  painter.fillRect(event->rect(), QColor(0xe6, 0xe6, 0xe6));
+  painter.setPen(QColor(0xb4, 0xb4, 0xb4));
+  painter.drawLine(kMarginWidth - 1, event->rect().top(), kMarginWidth - 1, event->rect().bottom());
+}
+
+}  // namespace desktop

@@ -1,0 +1,142 @@
+// SPDX-License-Identifier: MIT
+// quimbel-ide: the desktop IDE. Opens the files named on the command line, loads the Quimbel add-in (from
+// beside the program, --addin or QUIMBEL_ADDIN), and with --script runs a script instead of waiting for a
+// person.
+#include "host/model/addins.h"
+#include "host/model/vbe.h"
+#include "idecommands.h"
+#include "mainwindow.h"
+#include "qtplatform.h"
+#include "scriptrunner.h"
+
+#include <QApplication>
+#include <QCommandLineParser>
+#include <QDir>
+#include <QFileInfo>
+#include <QSettings>
+#include <QStandardPaths>
+
+#include <cstdio>
+
+namespace {
+
+QString configDirectory() {
+  const QString overridden = qEnvironmentVariable("QUIMBEL_CONFIG_DIR");
+  if (!overridden.isEmpty()) return overridden;
+  return QStandardPaths::writableLocation(QStandardPaths::GenericConfigLocation) + QStringLiteral("/Quimbel");
+}
+
+QString defaultAddInPath() {
+  const QString fromEnvironment = qEnvironmentVariable("QUIMBEL_ADDIN");
+  if (!fromEnvironment.isEmpty()) return fromEnvironment;
+  // The build tree keeps it in lib/, an installation in lib/quimbel/.
+  const QDir programs(QCoreApplication::applicationDirPath());
+  const QString installed = programs.absoluteFilePath(QStringLiteral("../lib/quimbel/libquimbel-addin.so"));
+  const QString built = programs.absoluteFilePath(QStringLiteral("../lib/libquimbel-addin.so"));
+  return QFileInfo::exists(built) || !QFileInfo::exists(installed) ? QDir::cleanPath(built)
+                                                                   : QDir::cleanPath(installed);
+}
+
+/// A build tree has no machine-wide configuration installed; the add-in finds the build's own through the
+/// variable it reads, unless the user set it.
+void useBuildTreeConfiguration() {
+  if (qEnvironmentVariableIsSet("QUIMBEL_MACHINE_CONFIG")) return;
+  const QString config = QDir(QCoreApplication::applicationDirPath())
+                             .absoluteFilePath(QStringLiteral("../etc/quimbel/quimbel.conf"));
+  if (QFileInfo::exists(config)) qputenv("QUIMBEL_MACHINE_CONFIG", QDir::cleanPath(config).toLocal8Bit());
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  QApplication app(argc, argv);
+  QApplication::setApplicationName(QStringLiteral("Quimbel IDE"));
+  QApplication::setOrganizationName(QStringLiteral("Quimbel"));
+  QApplication::setApplicationVersion(QStringLiteral(QUIMBEL_VERSION));
+  QApplication::setStyle(QStringLiteral("Fusion"));
+
+  QCommandLineParser parser;
+  parser.setApplicationDescription(QStringLiteral("The Quimbel desktop IDE for VB6 projects."));
+  parser.addHelpOption();
+  parser.addVersionOption();
+  const QCommandLineOption script(QStringLiteral("script"), QStringLiteral("Run the session from a script."),
+                                  QStringLiteral("file"));
+  const QCommandLineOption addIn(QStringLiteral("addin"), QStringLiteral("The add-in library to load."),
+                                 QStringLiteral("path"));
+  const QCommandLineOption noAddIn(QStringLiteral("no-addin"), QStringLiteral("Start without the add-in."));
+  parser.addOptions({script, addIn, noAddIn});
+  parser.addPositionalArgument(QStringLiteral("files"),
+                               QStringLiteral("Groups, projects or modules to open."),
+                               QStringLiteral("[files...]"));
+  parser.process(app);
+  const bool scripted = parser.isSet(script);
+
+  auto ownedUi = std::make_unique<desktop::QtUserInterface>();
+  desktop::QtUserInterface& ui = *ownedUi;
+  ui.setOpenDocuments(!scripted);
+  host::IdeOptions options;
+  options.loop = std::make_unique<desktop::QtEventLoop>();
+  options.ui = std::move(ownedUi);
+  auto vbe = host::VbeImpl::create(std::move(options));
+
+  int exitCode = 0;
+  {
+    desktop::MainWindowOptions windowOptions;
+    // A script's session starts the same every time: it neither reads nor leaves remembered settings.
+    if (!scripted) {
+      QDir().mkpath(configDirectory());
+      windowOptions.settingsPath = configDirectory() + QStringLiteral("/quimbel-ide.ini");
+    } else {
+      windowOptions.fitToScreen = false;
+    }
+    desktop::MainWindow window(vbe, ui, windowOptions);
+
+    desktop::ScriptRunner runner(window, ui);
+    if (scripted) {
+      QString error;
+      if (!runner.load(parser.value(script), &error)) {
+        std::fprintf(stderr, "%s\n", qPrintable(error));
+        return 2;
+      }
+    }
+
+    useBuildTreeConfiguration();
+    if (!parser.isSet(noAddIn)) {
+      const QString path = parser.isSet(addIn) ? parser.value(addIn) : defaultAddInPath();
+      if (!QFileInfo::exists(path)) {
+        window.showStatus(QStringLiteral("The Quimbel add-in was not found at %1; the IDE runs without it.")
+                              .arg(QDir::toNativeSeparators(QDir::cleanPath(path))));
+      } else {
+        try {
+          auto registered = vbe->addIns().registerLibrary(path, true);
+          if (QSettings* settings = window.settings())
+            registered->setLoadOnStartup(
+                settings->value(QStringLiteral("AddIns/") + registered->ProgId(), true).toBool());
+        } catch (const ide::Error& error) {
+          window.showStatus(QStringLiteral("The add-in was not loaded: %1").arg(error.description()));
+        }
+      }
+    }
+
+    for (const QString& file : parser.positionalArguments())
+      window.commands().open(QFileInfo(file).absoluteFilePath(), false);
+
+    window.show();
+    window.activateWindow();
+    window.raise();
+    vbe->startup();
+    window.restoreLayout();
+
+    if (scripted) {
+      QObject::connect(&runner, &desktop::ScriptRunner::finished, &app,
+                       [&exitCode](int code) { exitCode = code; });
+      runner.start();
+      app.exec();
+      window.closeWithoutPrompt();
+    } else {
+      exitCode = app.exec();
+    }
+  }
+  vbe.reset();
+  return exitCode;
+}

@@ -1,0 +1,255 @@
+// SPDX-License-Identifier: MIT
+#include "mainwindow.h"
+
+#include "codewindow.h"
+#include "commandbarview.h"
+#include "designerview.h"
+#include "host/model/events.h"
+#include "icons.h"
+#include "idecommands.h"
+#include "projectexplorer.h"
+#include "propertiesview.h"
+#include "qtplatform.h"
+#include "toolbox.h"
+#include "windowmanager.h"
+
+#include <QApplication>
+#include <QCloseEvent>
+#include <QDockWidget>
+#include <QLabel>
+#include <QMdiArea>
+#include <QMenu>
+#include <QScreen>
+#include <QSettings>
+#include <QStatusBar>
+#include <QTimer>
+
+namespace desktop {
+
+MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, MainWindowOptions options)
+    : m_vbe(std::move(vbe)), m_ui(ui) {
+  setObjectName(QStringLiteral("mainWindow"));
+  setWindowIcon(icon(Glyph::Project));
+  if (!options.settingsPath.isEmpty())
+    m_settings = std::make_unique<QSettings>(options.settingsPath, QSettings::IniFormat);
+  m_ui.setDialogParent(this);
+
+  m_mdi = new QMdiArea(this);
+  m_mdi->setObjectName(QStringLiteral("mdiArea"));
+  m_mdi->setBackground(QColor(0x80, 0x80, 0x80));
+  m_mdi->setHorizontalScrollBarPolicy(Qt::ScrollBarAsNeeded);
+  m_mdi->setVerticalScrollBarPolicy(Qt::ScrollBarAsNeeded);
+  setCentralWidget(m_mdi);
+  m_mdi->setProperty(kWindowHandleProperty, QVariant::fromValue<quintptr>(m_vbe->MainWindow()->hWnd()));
+
+  m_bars = new CommandBarView(m_vbe->commandBars(), this);
+  m_bars->setErrorReporter([this](const QString& message) { reportError(message); });
+  m_windows = new WindowManager(m_vbe, m_mdi);
+  m_windows->setErrorReporter([this](const QString& message) { reportError(message); });
+  m_commands = new IdeCommands(*this);
+  buildDocks();
+
+  m_position = new QLabel(this);
+  m_position->setObjectName(QStringLiteral("caretPosition"));
+  m_position->setMinimumWidth(130);
+  m_mode = new QLabel(this);
+  m_mode->setObjectName(QStringLiteral("ideMode"));
+  m_mode->setMinimumWidth(70);
+  statusBar()->addPermanentWidget(m_position);
+  statusBar()->addPermanentWidget(m_mode);
+
+  m_vbe->setCommandHandler(
+      [this](int command) { m_commands->run(static_cast<host::BuiltinCommand>(command)); });
+  connect(m_windows, &WindowManager::caretMoved, this, [this](int line, int column) {
+    m_position->setText(QStringLiteral("Ln %1, Col %2").arg(line).arg(column));
+  });
+  connect(m_windows, &WindowManager::activeViewChanged, this, [this] {
+    if (!m_windows->activeCodeWindow()) m_position->clear();
+    updateProperties();
+  });
+  connect(m_windows, &WindowManager::statusMessage, this,
+          [this](const QString& message) { showStatus(message, 8000); });
+  connect(m_windows, &WindowManager::codeContextMenuWanted, this,
+          [this](CodeWindow*, const QPoint& position) { showCodeMenu(position); });
+  connect(m_windows, &WindowManager::designerSelectionChanged, this, [this] { updateProperties(); });
+  connect(m_windows, &WindowManager::codeOfDesignerWanted, this, [this](DesignerWindow* designer) {
+    if (auto component = designer->window()->component()) m_commands->show(component, true);
+  });
+  connect(m_explorer, &ProjectExplorer::openWanted, this,
+          [this](const std::shared_ptr<host::ComponentImpl>& component, bool code) {
+            m_commands->show(component, code);
+          });
+  connect(m_explorer, &ProjectExplorer::contextMenuWanted, this, &MainWindow::showProjectMenu);
+  connect(m_toolbox, &Toolbox::controlWanted, this, &MainWindow::addControl);
+  connect(qApp, &QApplication::focusChanged, this, [this](QWidget*, QWidget* now) { focusChanged(now); });
+
+  auto& events = m_vbe->events();
+  auto titleLater = [this](auto&&...) { QTimer::singleShot(0, this, [this] { updateTitle(); }); };
+  m_connections.push_back(events.projects->ItemActivated.connect(titleLater));
+  m_connections.push_back(events.projects->ItemRenamed.connect(titleLater));
+  m_connections.push_back(events.projects->ItemRemoved.connect(titleLater));
+  m_connections.push_back(
+      events.projects->ItemRenamed.connect([this](auto&&...) { m_windows->refreshCaptions(); }));
+  m_connections.push_back(events.components->ItemRenamed.connect([this](auto&&...) {
+    m_windows->refreshCaptions();
+    updateProperties();
+  }));
+  m_connections.push_back(events.components->ItemSelected.connect([this](auto&&...) { updateProperties(); }));
+  m_connections.push_back(m_vbe->mainWindow()->changed.connect([this](host::WindowImpl*) { updateTitle(); }));
+
+  resize(options.size);
+  if (QScreen* screen = options.fitToScreen ? QGuiApplication::primaryScreen() : nullptr) {
+    const QRect available = screen->availableGeometry();
+    if (available.width() > 200 && available.height() > 200)
+      resize(size().boundedTo(available.size() * 0.95));
+  }
+  updateTitle();
+  updateProperties();
+}
+
+MainWindow::~MainWindow() {
+  if (!m_shutDown) {
+    m_shutDown = true;
+    m_vbe->shutdown();
+  }
+  m_vbe->setCommandHandler({});
+  m_ui.setDialogParent(nullptr);
+}
+
+void MainWindow::buildDocks() {
+  setDockOptions(QMainWindow::AnimatedDocks | QMainWindow::AllowNestedDocks);
+  m_explorer = new ProjectExplorer(m_vbe, this);
+  m_explorer->setProperty(kWindowHandleProperty,
+                          QVariant::fromValue<quintptr>(m_vbe->projectWindow()->hWnd()));
+  m_explorerDock = new QDockWidget(QStringLiteral("Project"), this);
+  m_explorerDock->setObjectName(QStringLiteral("projectDock"));
+  m_explorerDock->setWidget(m_explorer);
+  addDockWidget(Qt::RightDockWidgetArea, m_explorerDock);
+
+  m_properties = new PropertiesView(this);
+  m_properties->setProperty(kWindowHandleProperty,
+                            QVariant::fromValue<quintptr>(m_vbe->propertiesWindow()->hWnd()));
+  m_properties->setErrorReporter([this](const QString& message) { reportError(message); });
+  m_propertiesDock = new QDockWidget(QStringLiteral("Properties"), this);
+  m_propertiesDock->setObjectName(QStringLiteral("propertiesDock"));
+  m_propertiesDock->setWidget(m_properties);
+  addDockWidget(Qt::RightDockWidgetArea, m_propertiesDock);
+  splitDockWidget(m_explorerDock, m_propertiesDock, Qt::Vertical);
+
+  m_toolbox = new Toolbox(this);
+  m_toolboxDock = new QDockWidget(QStringLiteral("General"), this);
+  m_toolboxDock->setObjectName(QStringLiteral("toolboxDock"));
+  m_toolboxDock->setWidget(m_toolbox);
+  addDockWidget(Qt::LeftDockWidgetArea, m_toolboxDock);
+  resizeDocks({m_explorerDock, m_toolboxDock}, {300, 64}, Qt::Horizontal);
+}
+
+void MainWindow::updateTitle() {
+  setWindowTitle(m_vbe->MainWindow()->Caption());
+  static const char* const kModes[] = {"design", "run", "break"};
+  m_mode->setText(QStringLiteral("[%1]").arg(QLatin1StringView(kModes[static_cast<int>(m_vbe->mode())])));
+}
+
+void MainWindow::updateProperties() {
+  if (DesignerWindow* designer = m_windows->activeDesigner()) {
+    auto control = designer->selectedControl();
+    m_properties->showControl(
+        control ? control : std::static_pointer_cast<host::ControlImpl>(designer->form()->Root()));
+    return;
+  }
+  auto component = std::dynamic_pointer_cast<host::ComponentImpl>(m_vbe->SelectedVBComponent());
+  if (!component)
+    if (CodeWindow* code = m_windows->activeCodeWindow()) component = code->window()->component();
+  if (component && component->attached())
+    m_properties->showComponent(component);
+  else
+    m_properties->clear();
+}
+
+void MainWindow::focusChanged(QWidget* now) {
+  ide::HWnd hwnd = 0;
+  if (now && now->window() == this) {
+    hwnd = m_vbe->mainWindow()->hWnd();
+    for (QWidget* widget = now; widget; widget = widget->parentWidget()) {
+      const QVariant handle = widget->property(kWindowHandleProperty);
+      if (handle.isValid()) {
+        hwnd = handle.value<quintptr>();
+        break;
+      }
+    }
+  }
+  // Focus in a dialog or another application is in no IDE window.
+  m_vbe->windowSystem().setFocus(hwnd);
+}
+
+QString MainWindow::codeWindowMenuName() const {
+  return m_vbe->mode() == ide::IdeMode::Break ? QStringLiteral("Code Window (Break)")
+                                              : QStringLiteral("Code Window");
+}
+
+void MainWindow::showCodeMenu(const QPoint& position) {
+  auto bar = m_vbe->commandBars()->bar(codeWindowMenuName());
+  if (!bar) return;
+  QMenu menu(this);
+  m_bars->fillMenu(&menu, bar);
+  menu.exec(position);
+}
+
+void MainWindow::showProjectMenu(const QPoint& position) {
+  auto bar = m_vbe->commandBars()->bar(QStringLiteral("Project Window"));
+  if (!bar) return;
+  QMenu menu(this);
+  m_bars->fillMenu(&menu, bar);
+  menu.exec(position);
+}
+
+void MainWindow::addControl(const QString& className) {
+  DesignerWindow* designer = m_windows->activeDesigner();
+  if (!designer) {
+    showStatus(QStringLiteral("Open a form designer to add a %1.").arg(className), 5000);
+    return;
+  }
+  try {
+    designer->addControl(className);
+    designer->setFocus();
+  } catch (const ide::Error& error) {
+    reportError(error.description());
+  }
+}
+
+void MainWindow::showStatus(const QString& message, int timeoutMs) {
+  statusBar()->showMessage(message, timeoutMs);
+}
+
+void MainWindow::reportError(const QString& message) {
+  m_ui.MsgBox(message, ide::mb::OKOnly | ide::mb::Exclamation, QStringLiteral("Quimbel IDE"));
+}
+
+void MainWindow::closeWithoutPrompt() {
+  m_promptOnClose = false;
+  close();
+}
+
+void MainWindow::restoreLayout() {
+  if (!m_settings) return;
+  restoreGeometry(m_settings->value(QStringLiteral("MainWindow/geometry")).toByteArray());
+  restoreState(m_settings->value(QStringLiteral("MainWindow/state")).toByteArray());
+}
+
+void MainWindow::closeEvent(QCloseEvent* event) {
+  if (m_promptOnClose && !m_commands->confirmClose(m_vbe->projects())) {
+    event->ignore();
+    return;
+  }
+  if (m_settings) {
+    m_settings->setValue(QStringLiteral("MainWindow/geometry"), saveGeometry());
+    m_settings->setValue(QStringLiteral("MainWindow/state"), saveState());
+  }
+  if (!m_shutDown) {
+    m_shutDown = true;
+    m_vbe->shutdown();
+  }
+  event->accept();
+}
+
+}  // namespace desktop

@@ -1,0 +1,698 @@
+// SPDX-License-Identifier: MIT
+#include "scriptrunner.h"
+
+#include "codebinding.h"
+#include "codeeditor.h"
+#include "codewindow.h"
+#include "commandbarview.h"
+#include "designerview.h"
+#include "idecommands.h"
+#include "mainwindow.h"
+#include "projectexplorer.h"
+#include "propertiesview.h"
+#include "qtplatform.h"
+#include "toolbox.h"
+#include "windowmanager.h"
+
+#include <QAbstractButton>
+#include <QAbstractItemView>
+#include <QAbstractSpinBox>
+#include <QApplication>
+#include <QCheckBox>
+#include <QComboBox>
+#include <QDateTime>
+#include <QDialog>
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QKeySequence>
+#include <QLineEdit>
+#include <QListWidget>
+#include <QMenu>
+#include <QMessageBox>
+#include <QPlainTextEdit>
+#include <QProcessEnvironment>
+#include <QRadioButton>
+#include <QSlider>
+#include <QSpinBox>
+#include <QTabWidget>
+#include <QTest>
+#include <QTextEdit>
+#include <QTreeWidget>
+
+#include <cstdio>
+
+namespace desktop {
+namespace {
+
+/// A step that cannot run yet (its dialog or widget has not appeared): it is tried again on the next tick.
+struct NotReady {
+  QString what;
+};
+
+struct StepError {
+  QString message;
+};
+
+[[noreturn]] void fail(const QString& message) {
+  throw StepError{message};
+}
+
+struct CommandShape {
+  const char* name;
+  int minimum;
+  int maximum;  // -1: any number
+};
+
+constexpr CommandShape kCommands[] = {
+    {"open", 1, 1},      {"select", 1, 1},   {"code", 1, 1},       {"designer", 1, 1}, {"caret", 2, 2},
+    {"selection", 4, 4}, {"type", 1, 1},     {"key", 1, -1},       {"click", 2, -1},   {"tool", 1, 1},
+    {"control", 1, 1},   {"property", 2, 2}, {"set", 2, 2},        {"press", 1, 1},    {"answer", 1, 1},
+    {"save", 0, 0},      {"saveas", 1, 1},   {"screenshot", 1, 2}, {"wait", 1, 1},     {"expect", 2, -1},
+    {"echo", 1, -1},     {"quit", 0, 0},
+};
+
+const CommandShape* shapeOf(const QString& command) {
+  for (const CommandShape& shape : kCommands)
+    if (command == QLatin1StringView(shape.name)) return &shape;
+  return nullptr;
+}
+
+int answerCode(const QString& text) {
+  static const std::pair<const char*, int> kAnswers[] = {
+      {"ok", ide::mb::OK},       {"cancel", ide::mb::Cancel}, {"abort", ide::mb::Abort},
+      {"retry", ide::mb::Retry}, {"ignore", ide::mb::Ignore}, {"yes", ide::mb::Yes},
+      {"no", ide::mb::No}};
+  for (const auto& [name, code] : kAnswers)
+    if (text.compare(QLatin1StringView(name), Qt::CaseInsensitive) == 0) return code;
+  return 0;
+}
+
+QMessageBox::StandardButton buttonOfAnswer(int answer) {
+  switch (answer) {
+    case ide::mb::OK:
+      return QMessageBox::Ok;
+    case ide::mb::Cancel:
+      return QMessageBox::Cancel;
+    case ide::mb::Abort:
+      return QMessageBox::Abort;
+    case ide::mb::Retry:
+      return QMessageBox::Retry;
+    case ide::mb::Ignore:
+      return QMessageBox::Ignore;
+    case ide::mb::Yes:
+      return QMessageBox::Yes;
+    case ide::mb::No:
+      return QMessageBox::No;
+    default:
+      return QMessageBox::NoButton;
+  }
+}
+
+QString plain(QString text) {
+  text.remove(u'&');
+  return text.trimmed();
+}
+
+int toNumber(const QString& text, const char* what) {
+  bool ok = false;
+  const int value = text.toInt(&ok);
+  if (!ok) fail(QStringLiteral("%1 must be a number, not \"%2\"").arg(QLatin1StringView(what), text));
+  return value;
+}
+
+bool toBool(const QString& text) {
+  const QString t = text.trimmed().toLower();
+  if (t == QLatin1StringView("true") || t == QLatin1StringView("1") || t == QLatin1StringView("yes") ||
+      t == QLatin1StringView("on") || t == QLatin1StringView("checked"))
+    return true;
+  if (t == QLatin1StringView("false") || t == QLatin1StringView("0") || t == QLatin1StringView("no") ||
+      t == QLatin1StringView("off") || t == QLatin1StringView("unchecked"))
+    return false;
+  fail(QStringLiteral("\"%1\" is not true or false").arg(text));
+}
+
+/// Splits a line into words: blanks separate, double quotes group (with \" \\ \n \t inside), # outside
+/// quotes starts a comment. ${NAME} is replaced from the environment (SCRIPT_DIR is the script's folder).
+bool splitWords(const QString& line, const QProcessEnvironment& environment, QStringList* words,
+                QString* error) {
+  QString word;
+  bool inWord = false;
+  bool quoted = false;
+  auto expand = [&](qsizetype& i) {
+    const qsizetype close = line.indexOf(u'}', i + 2);
+    if (close < 0) {
+      *error = QStringLiteral("unclosed ${ in \"%1\"").arg(line.mid(i));
+      return false;
+    }
+    const QString name = line.mid(i + 2, close - i - 2);
+    if (!environment.contains(name)) {
+      *error = QStringLiteral("unknown variable ${%1}").arg(name);
+      return false;
+    }
+    word += environment.value(name);
+    i = close;
+    return true;
+  };
+  for (qsizetype i = 0; i < line.size(); ++i) {
+    const QChar c = line.at(i);
+    if (quoted) {
+      if (c == u'"') {
+        quoted = false;
+      } else if (c == u'\\' && i + 1 < line.size()) {
+        const QChar next = line.at(++i);
+        word += next == u'n' ? QChar(u'\n') : next == u't' ? QChar(u'\t') : next;
+      } else if (c == u'$' && i + 1 < line.size() && line.at(i + 1) == u'{') {
+        if (!expand(i)) return false;
+      } else {
+        word += c;
+      }
+      continue;
+    }
+    if (c.isSpace()) {
+      if (inWord) *words << word;
+      word.clear();
+      inWord = false;
+      continue;
+    }
+    if (c == u'#' && !inWord) break;
+    inWord = true;
+    if (c == u'"') {
+      quoted = true;
+    } else if (c == u'$' && i + 1 < line.size() && line.at(i + 1) == u'{') {
+      if (!expand(i)) return false;
+    } else {
+      word += c;
+    }
+  }
+  if (quoted) {
+    *error = QStringLiteral("unclosed quote");
+    return false;
+  }
+  if (inWord) *words << word;
+  return true;
+}
+
+/// Types a text as key presses, so that it goes the way the user's typing goes.
+void typeText(QWidget* target, const QString& text) {
+  for (const QChar c : text) {
+    if (c == u'\n') {
+      QTest::keyClick(target, Qt::Key_Return);
+    } else if (c == u'\t') {
+      QTest::keyClick(target, Qt::Key_Tab);
+    } else {
+      const Qt::Key key = c.unicode() < 0x7F ? static_cast<Qt::Key>(c.toUpper().unicode()) : Qt::Key_unknown;
+      QTest::sendKeyEvent(QTest::Click, target, key, QString(c), Qt::NoModifier);
+    }
+  }
+}
+
+/// Whether a command-bar control answers to a name: its caption, tooltip or tag.
+bool controlMatches(host::CommandBarControlImpl& control, const QString& name) {
+  return host::sameCaption(control.Caption(), name) || host::sameCaption(control.TooltipText(), name) ||
+         (!control.Tag().isEmpty() && control.Tag().compare(name, Qt::CaseInsensitive) == 0);
+}
+
+}  // namespace
+
+ScriptRunner::ScriptRunner(MainWindow& window, QtUserInterface& ui)
+    : QObject(&window), m_window(window), m_ui(ui) {
+  m_previousObserver = m_ui.messageObserver();
+  m_ui.setMessageObserver([this](const QString& title, const QString& text) {
+    noteMessage(title, text);
+    if (m_previousObserver) m_previousObserver(title, text);
+  });
+  qApp->installEventFilter(this);
+  m_closer.setInterval(100);
+}
+
+ScriptRunner::~ScriptRunner() {
+  qApp->removeEventFilter(this);
+  m_ui.setMessageObserver(m_previousObserver);
+}
+
+bool ScriptRunner::load(const QString& path, QString* error) {
+  QFile file(path);
+  if (!file.open(QIODevice::ReadOnly | QIODevice::Text)) {
+    *error = QStringLiteral("%1: cannot read the script: %2").arg(path, file.errorString());
+    return false;
+  }
+  m_directory = QFileInfo(path).absolutePath();
+  return parse(QString::fromUtf8(file.readAll()), path, error);
+}
+
+bool ScriptRunner::parse(const QString& text, const QString& name, QString* error) {
+  m_name = name;
+  m_steps.clear();
+  QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+  environment.insert(QStringLiteral("SCRIPT_DIR"), m_directory.isEmpty() ? QDir::currentPath() : m_directory);
+  const QStringList lines = text.split(u'\n');
+  for (int i = 0; i < lines.size(); ++i) {
+    QStringList words;
+    QString problem;
+    const auto mistake = [&](const QString& what) {
+      *error = QStringLiteral("%1:%2: %3").arg(name).arg(i + 1).arg(what);
+      return false;
+    };
+    if (!splitWords(lines[i], environment, &words, &problem)) return mistake(problem);
+    if (words.isEmpty()) continue;
+    ScriptStep step{i + 1, words.takeFirst().toLower(), words};
+    const CommandShape* shape = shapeOf(step.command);
+    if (!shape) return mistake(QStringLiteral("unknown command \"%1\"").arg(step.command));
+    const int count = static_cast<int>(step.arguments.size());
+    if (count < shape->minimum || (shape->maximum >= 0 && count > shape->maximum))
+      return mistake(QStringLiteral("\"%1\" takes %2 argument%3, not %4")
+                         .arg(step.command)
+                         .arg(shape->maximum == shape->minimum ? QString::number(shape->minimum)
+                              : shape->maximum < 0
+                                  ? QStringLiteral("%1 or more").arg(shape->minimum)
+                                  : QStringLiteral("%1 to %2").arg(shape->minimum).arg(shape->maximum))
+                         .arg(shape->maximum == 1 && shape->minimum == 1 ? QString() : QStringLiteral("s"))
+                         .arg(count));
+    if (step.command == QLatin1StringView("answer") && !answerCode(step.arguments[0]))
+      return mistake(QStringLiteral("\"%1\" is not an answer (OK, Cancel, Yes, No, Abort, Retry, Ignore)")
+                         .arg(step.arguments[0]));
+    m_steps.push_back(std::move(step));
+  }
+  return true;
+}
+
+void ScriptRunner::start() {
+  // Keys and shortcuts go to the active window: the steps wait (a while) for the main window to be it.
+  const qint64 startedAt = QDateTime::currentMSecsSinceEpoch();
+  auto waitForActivation = std::make_shared<std::function<void()>>();
+  *waitForActivation = [this, startedAt, waitForActivation] {
+    if (!m_window.isActiveWindow() && QDateTime::currentMSecsSinceEpoch() - startedAt < 5000) {
+      m_window.activateWindow();
+      QTimer::singleShot(50, this, *waitForActivation);
+      return;
+    }
+    tick();
+  };
+  QTimer::singleShot(20, this, *waitForActivation);
+}
+
+void ScriptRunner::schedule(int delayMs) {
+  // A fresh single-shot timer each time: a step blocked in a dialog's loop must not hold back the next one.
+  QTimer::singleShot(delayMs, this, [this] { tick(); });
+}
+
+bool ScriptRunner::answerOpenMessageBox() {
+  auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
+  if (!box || !m_ui.hasQueuedAnswer()) return false;
+  const int answer = m_ui.takeQueuedAnswer();
+  if (QAbstractButton* button = box->button(buttonOfAnswer(answer))) {
+    button->click();
+  } else {
+    box->reject();
+  }
+  return true;
+}
+
+void ScriptRunner::tick() {
+  if (m_finished) return;
+  if (answerOpenMessageBox()) return schedule(10);
+  if (m_next >= m_steps.size()) return finish(0);
+  const size_t index = m_next++;
+  const ScriptStep& step = m_steps[index];
+  try {
+    // The next step is due whatever this one does; if it opens a dialog, the next one runs in its loop.
+    // A wait only puts the next step off, while the IDE (and its add-in's timers) runs on.
+    bool timed = false;
+    const int waitMs = step.command == QLatin1StringView("wait") ? step.arguments[0].toInt(&timed) : 0;
+    schedule(timed ? std::max(0, waitMs) : 10);
+    execute(step);
+    m_waitingSince = -1;
+  } catch (const NotReady& notReady) {
+    const qint64 now = QDateTime::currentMSecsSinceEpoch();
+    if (m_waitingSince < 0) m_waitingSince = now;
+    if (now - m_waitingSince > m_patienceMs) {
+      return finish(1, QStringLiteral("%1:%2: %3").arg(m_name).arg(step.line).arg(notReady.what));
+    }
+    m_next = index;  // again on the next tick
+  } catch (const StepError& error) {
+    return finish(1, QStringLiteral("%1:%2: %3").arg(m_name).arg(step.line).arg(error.message));
+  } catch (const ide::Error& error) {
+    return finish(1, QStringLiteral("%1:%2: %3").arg(m_name).arg(step.line).arg(error.description()));
+  }
+}
+
+void ScriptRunner::finish(int exitCode, const QString& error) {
+  if (m_finished) return;
+  if (exitCode == 0) {
+    if (QWidget* open = QApplication::activeModalWidget()) {
+      exitCode = 1;
+      const QString title = open->windowTitle().isEmpty() ? open->objectName() : open->windowTitle();
+      m_error = QStringLiteral("%1: the script ended while the dialog \"%2\" is open").arg(m_name, title);
+      std::fprintf(stderr, "%s\n", qPrintable(m_error));
+    }
+  }
+  m_finished = true;
+  if (!error.isEmpty()) m_error = error;
+  if (!error.isEmpty()) std::fprintf(stderr, "%s\n", qPrintable(error));
+  std::fflush(stdout);
+  std::fflush(stderr);
+  Q_EMIT finished(exitCode);
+  // Dialogs still open are closed so that every loop can end; whatever opens another is closed too.
+  const auto closeAll = [exitCode, exit = m_exitOnFinish] {
+    while (QWidget* modal = QApplication::activeModalWidget()) {
+      if (auto* dialog = qobject_cast<QDialog*>(modal))
+        dialog->reject();
+      else
+        modal->close();
+      if (QApplication::activeModalWidget() == modal) break;
+    }
+    if (exit) QCoreApplication::exit(exitCode);
+  };
+  closeAll();
+  if (m_exitOnFinish) {
+    connect(&m_closer, &QTimer::timeout, this, closeAll);
+    m_closer.start();
+  }
+}
+
+void ScriptRunner::noteMessage(const QString& title, const QString& text) {
+  m_lastMessage = text;
+  QString shown = text;
+  shown.replace(u'\n', QStringLiteral("\\n"));
+  std::printf("msgbox: %s: %s\n", qPrintable(title), qPrintable(shown));
+  std::fflush(stdout);
+}
+
+bool ScriptRunner::eventFilter(QObject* watched, QEvent* event) {
+  // Message boxes shown by others than the IDE's user interface (an add-in's own) are printed as well.
+  if (event->type() == QEvent::Show)
+    if (auto* box = qobject_cast<QMessageBox*>(watched);
+        box && !box->property(QtUserInterface::kOwnBoxProperty).toBool())
+      noteMessage(box->windowTitle(), box->text());
+  return QObject::eventFilter(watched, event);
+}
+
+std::vector<QWidget*> ScriptRunner::dialogs() const {
+  std::vector<QWidget*> result;
+  if (QWidget* modal = QApplication::activeModalWidget()) result.push_back(modal);
+  for (QWidget* top : QApplication::topLevelWidgets())
+    if (top->isVisible() && top != &m_window &&
+        std::find(result.begin(), result.end(), top) == result.end() &&
+        !(top->windowFlags() & Qt::SplashScreen) && !qobject_cast<QMenu*>(top))
+      result.push_back(top);
+  return result;
+}
+
+QWidget* ScriptRunner::findWidget(const QString& name) const {
+  std::vector<QWidget*> tops = dialogs();
+  tops.push_back(&m_window);
+  for (QWidget* top : tops) {
+    if (top->objectName() == name) return top;
+    for (QWidget* child : top->findChildren<QWidget*>(name))
+      if (child->isVisible()) return child;
+  }
+  return nullptr;
+}
+
+void ScriptRunner::execute(const ScriptStep& step) {
+  const QString& command = step.command;
+  const QStringList& args = step.arguments;
+  auto& vbe = *m_window.vbe();
+  auto component = [&](const QString& name) {
+    const qsizetype dot = name.indexOf(u'.');
+    for (const auto& project : vbe.projects()) {
+      if (dot >= 0 && project->Name().compare(name.left(dot), Qt::CaseInsensitive) != 0) continue;
+      if (auto found = project->component(dot >= 0 ? name.mid(dot + 1) : name)) return found;
+    }
+    fail(QStringLiteral("no component \"%1\" is open").arg(name));
+  };
+  auto activeCode = [&]() -> CodeWindow* {
+    CodeWindow* window = m_window.windows().activeCodeWindow();
+    if (!window) {
+      if (auto pane = std::dynamic_pointer_cast<host::CodePaneImpl>(vbe.ActiveCodePane()))
+        window = m_window.windows().codeWindowOf(pane->window().get());
+    }
+    if (!window) fail(QStringLiteral("no code window is active"));
+    return window;
+  };
+
+  if (command == QLatin1StringView("open")) {
+    const QString path =
+        QFileInfo(args[0]).isAbsolute() ? args[0] : QDir::current().absoluteFilePath(args[0]);
+    m_window.commands().open(path, false);
+  } else if (command == QLatin1StringView("select")) {
+    m_window.explorer().selectComponent(component(args[0]));
+  } else if (command == QLatin1StringView("code") || command == QLatin1StringView("designer")) {
+    auto found = component(args[0]);
+    const bool code = command == QLatin1StringView("code");
+    if (!code && !found->hasDesigner()) fail(QStringLiteral("%1 has no designer").arg(args[0]));
+    m_window.commands().show(found, code);
+  } else if (command == QLatin1StringView("caret") || command == QLatin1StringView("selection")) {
+    CodeWindow* window = activeCode();
+    const int l1 = toNumber(args[0], "the line"), c1 = toNumber(args[1], "the column");
+    const int l2 = args.size() > 2 ? toNumber(args[2], "the end line") : l1;
+    const int c2 = args.size() > 2 ? toNumber(args[3], "the end column") : c1;
+    window->pane()->SetSelection(l1, c1, l2, c2);
+    window->editor()->setFocus();
+  } else if (command == QLatin1StringView("type")) {
+    QWidget* target = QApplication::focusWidget();
+    if (!target) fail(QStringLiteral("nothing has the keyboard focus"));
+    typeText(target, args[0]);
+  } else if (command == QLatin1StringView("key")) {
+    for (const QString& combination : args) {
+      const QKeySequence sequence = QKeySequence::fromString(combination, QKeySequence::PortableText);
+      if (sequence.isEmpty() || sequence[0].key() == Qt::Key_unknown)
+        fail(QStringLiteral("\"%1\" is not a key combination").arg(combination));
+      for (int i = 0; i < sequence.count(); ++i) {
+        QWidget* target = QApplication::focusWidget();
+        if (!target)
+          target = QApplication::activeModalWidget() ? QApplication::activeModalWidget() : &m_window;
+        QTest::keyClick(target, sequence[i].key(), sequence[i].keyboardModifiers());
+      }
+    }
+  } else if (command == QLatin1StringView("click")) {
+    m_window.commandBars().syncNow();
+    auto bar = vbe.commandBars()->bar(args[0]);
+    if (!bar) fail(QStringLiteral("no command bar \"%1\"").arg(args[0]));
+    std::shared_ptr<host::CommandBarControlImpl> control;
+    for (int i = 1; i < args.size(); ++i) {
+      control.reset();
+      QStringList known;
+      for (const auto& candidate : bar->controls()) {
+        known << plain(candidate->Caption().isEmpty() ? candidate->TooltipText() : candidate->Caption());
+        if (controlMatches(*candidate, args[i])) {
+          control = candidate;
+          break;
+        }
+      }
+      if (!control)
+        fail(QStringLiteral("no control \"%1\" on \"%2\" (it has: %3)")
+                 .arg(args[i], bar->Name().isEmpty() ? args[i - 1] : bar->Name(),
+                      known.join(QStringLiteral(", "))));
+      if (i + 1 < args.size()) {
+        bar = control->popupBar();
+        if (!bar) fail(QStringLiteral("\"%1\" is not a menu").arg(args[i]));
+      }
+    }
+    if (!control->Visible()) fail(QStringLiteral("\"%1\" is not visible").arg(args.last()));
+    if (!control->Enabled()) fail(QStringLiteral("\"%1\" is disabled").arg(args.last()));
+    m_window.commandBars().click(control);
+  } else if (command == QLatin1StringView("tool")) {
+    if (!m_window.toolbox().click(args[0])) fail(QStringLiteral("the toolbox has no \"%1\"").arg(args[0]));
+  } else if (command == QLatin1StringView("control")) {
+    DesignerWindow* designer = m_window.windows().activeDesigner();
+    if (!designer) fail(QStringLiteral("no form designer is active"));
+    auto control = designer->form()->findControl(args[0]);
+    if (!control) fail(QStringLiteral("the form has no control \"%1\"").arg(args[0]));
+    designer->selectControl(control);
+  } else if (command == QLatin1StringView("property")) {
+    if (!m_window.properties().applyEdit(args[0], args[1]))
+      fail(QStringLiteral("the property %1 did not take \"%2\"").arg(args[0], args[1]));
+  } else if (command == QLatin1StringView("set")) {
+    QWidget* widget = findWidget(args[0]);
+    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[0])};
+    const QString& value = args[1];
+    if (auto* line = qobject_cast<QLineEdit*>(widget)) {
+      line->selectAll();
+      line->insert(value);
+    } else if (auto* plainEdit = qobject_cast<QPlainTextEdit*>(widget)) {
+      plainEdit->setPlainText(value);
+    } else if (auto* textEdit = qobject_cast<QTextEdit*>(widget)) {
+      textEdit->setPlainText(value);
+    } else if (auto* spin = qobject_cast<QSpinBox*>(widget)) {
+      spin->setValue(toNumber(value, "the value"));
+    } else if (auto* check = qobject_cast<QCheckBox*>(widget)) {
+      if (check->isChecked() != toBool(value)) check->click();
+    } else if (auto* radio = qobject_cast<QRadioButton*>(widget)) {
+      if (toBool(value) && !radio->isChecked()) radio->click();
+    } else if (auto* combo = qobject_cast<QComboBox*>(widget)) {
+      int index = combo->findText(value);
+      if (index < 0) index = combo->findText(value, Qt::MatchFixedString);
+      if (index >= 0) {
+        combo->setCurrentIndex(index);
+        Q_EMIT combo->activated(index);
+      } else if (combo->isEditable()) {
+        combo->setEditText(value);
+      } else {
+        fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
+      }
+    } else if (auto* slider = qobject_cast<QAbstractSlider*>(widget)) {
+      slider->setValue(toNumber(value, "the value"));
+    } else if (auto* tabs = qobject_cast<QTabWidget*>(widget)) {
+      int index = -1;
+      for (int i = 0; i < tabs->count(); ++i)
+        if (plain(tabs->tabText(i)).compare(value, Qt::CaseInsensitive) == 0) index = i;
+      if (index < 0) fail(QStringLiteral("\"%1\" has no tab \"%2\"").arg(args[0], value));
+      tabs->setCurrentIndex(index);
+    } else if (auto* view = qobject_cast<QAbstractItemView*>(widget)) {
+      const QModelIndexList found = view->model()->match(view->model()->index(0, 0), Qt::DisplayRole, value,
+                                                         1, Qt::MatchFixedString | Qt::MatchRecursive);
+      if (found.isEmpty()) fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
+      view->setCurrentIndex(found.front());
+      view->scrollTo(found.front());
+    } else {
+      fail(QStringLiteral("cannot set a value on \"%1\" (%2)")
+               .arg(args[0], QLatin1StringView(widget->metaObject()->className())));
+    }
+  } else if (command == QLatin1StringView("press")) {
+    QAbstractButton* found = nullptr;
+    std::vector<QWidget*> tops = dialogs();
+    tops.push_back(&m_window);
+    for (QWidget* top : tops) {
+      for (QAbstractButton* button : top->findChildren<QAbstractButton*>()) {
+        if (!button->isVisible()) continue;
+        if (button->objectName() == args[0] ||
+            plain(button->text()).compare(plain(args[0]), Qt::CaseInsensitive) == 0) {
+          found = button;
+          break;
+        }
+      }
+      if (found) break;
+    }
+    if (!found) throw NotReady{QStringLiteral("no button \"%1\" is open").arg(args[0])};
+    if (!found->isEnabled()) fail(QStringLiteral("the button \"%1\" is disabled").arg(args[0]));
+    found->click();
+  } else if (command == QLatin1StringView("answer")) {
+    m_ui.queueAnswer(answerCode(args[0]));
+  } else if (command == QLatin1StringView("save")) {
+    if (!m_window.commands().saveAll()) fail(QStringLiteral("saving failed"));
+  } else if (command == QLatin1StringView("saveas")) {
+    auto project = m_window.commands().currentProject();
+    if (!project) fail(QStringLiteral("no project is open"));
+    const QString path =
+        QFileInfo(args[0]).isAbsolute() ? args[0] : QDir::current().absoluteFilePath(args[0]);
+    if (!m_window.commands().saveProjectAs(project, path)) fail(QStringLiteral("saving %1 failed").arg(path));
+  } else if (command == QLatin1StringView("screenshot")) {
+    const QString which = args.size() == 2 ? args[0].toLower() : QString();
+    const QString file = args.last();
+    QWidget* target = nullptr;
+    if (which == QLatin1StringView("main")) {
+      target = &m_window;
+    } else if (which == QLatin1StringView("dialog")) {
+      const auto open = dialogs();
+      if (open.empty()) throw NotReady{QStringLiteral("no dialog is open")};
+      target = open.front();
+    } else if (!which.isEmpty()) {
+      fail(QStringLiteral("screenshot takes main or dialog, not \"%1\"").arg(args[0]));
+    } else {
+      const auto open = dialogs();
+      target = open.empty() ? &m_window : open.front();
+    }
+    m_window.commandBars().syncNow();
+    for (CodeWindow* window : m_window.windows().codeWindows())
+      window->binding()->flush();
+    QCoreApplication::processEvents();
+    const QString path = QFileInfo(file).isAbsolute() ? file : QDir::current().absoluteFilePath(file);
+    QDir().mkpath(QFileInfo(path).absolutePath());
+    if (!target->grab().save(path)) fail(QStringLiteral("cannot write %1").arg(path));
+  } else if (command == QLatin1StringView("wait")) {
+    // A time has put the next step off already (tick()); a condition holds the script until it is met.
+    const QString what = args[0].toLower();
+    if (what == QLatin1StringView("dialog")) {
+      if (dialogs().empty()) throw NotReady{QStringLiteral("no dialog opened")};
+    } else if (what == QLatin1StringView("closed")) {
+      if (QWidget* open = QApplication::activeModalWidget())
+        throw NotReady{QStringLiteral("the dialog \"%1\" stayed open").arg(open->windowTitle())};
+    } else {
+      toNumber(args[0], "the time");
+    }
+  } else if (command == QLatin1StringView("expect")) {
+    const QString what = args[0].toLower();
+    if (what == QLatin1StringView("line")) {
+      if (args.size() != 3) fail(QStringLiteral("expect line takes a line number and a text"));
+      CodeWindow* window = activeCode();
+      window->binding()->flush();
+      auto module = window->binding()->module();
+      const int n = toNumber(args[1], "the line");
+      if (n < 1 || n > module->CountOfLines())
+        fail(QStringLiteral("line %1 is past the end of %2 (%3 lines)")
+                 .arg(n)
+                 .arg(module->Name())
+                 .arg(module->CountOfLines()));
+      const QString actual = module->Lines(n, 1);
+      if (actual != args[2])
+        fail(QStringLiteral("line %1 is \"%2\", not \"%3\"").arg(n).arg(actual, args[2]));
+    } else if (what == QLatin1StringView("message")) {
+      if (!m_lastMessage.contains(args[1]))
+        fail(QStringLiteral("the last message was \"%1\", which does not contain \"%2\"")
+                 .arg(m_lastMessage, args[1]));
+    } else if (what == QLatin1StringView("projects")) {
+      const int n = toNumber(args[1], "the count");
+      if (static_cast<int>(vbe.projects().size()) != n)
+        fail(QStringLiteral("%1 projects are open, not %2").arg(vbe.projects().size()).arg(n));
+    } else if (what == QLatin1StringView("title")) {
+      if (!m_window.windowTitle().contains(args[1]))
+        fail(QStringLiteral("the title is \"%1\"").arg(m_window.windowTitle()));
+    } else if (what == QLatin1StringView("control") || what == QLatin1StringView("no-control")) {
+      if (args.size() < 3) fail(QStringLiteral("expect %1 takes a bar and a caption").arg(what));
+      m_window.commandBars().syncNow();
+      bool present = false;
+      if (auto bar = vbe.commandBars()->bar(args[1])) {
+        for (int i = 2; bar && i < args.size(); ++i) {
+          std::shared_ptr<host::CommandBarControlImpl> control;
+          for (const auto& candidate : bar->controls())
+            if (controlMatches(*candidate, args[i])) control = candidate;
+          if (!control || !control->Visible()) break;
+          if (i + 1 == args.size()) present = true;
+          bar = control->popupBar();
+        }
+      }
+      const bool wanted = what == QLatin1StringView("control");
+      if (present != wanted)
+        fail(QStringLiteral("\"%1\" is %2 on \"%3\"")
+                 .arg(args.mid(2).join(QStringLiteral(" > ")),
+                      present ? QStringLiteral("there") : QStringLiteral("not there"), args[1]));
+    } else if (what == QLatin1StringView("value")) {
+      if (args.size() != 3) fail(QStringLiteral("expect value takes a widget name and a text"));
+      QWidget* widget = findWidget(args[1]);
+      if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[1])};
+      QString actual;
+      if (auto* line = qobject_cast<QLineEdit*>(widget))
+        actual = line->text();
+      else if (auto* edit = qobject_cast<QPlainTextEdit*>(widget))
+        actual = edit->toPlainText();
+      else if (auto* check = qobject_cast<QAbstractButton*>(widget))
+        actual = check->isChecked() ? QStringLiteral("true") : QStringLiteral("false");
+      else if (auto* combo = qobject_cast<QComboBox*>(widget))
+        actual = combo->currentText();
+      else if (auto* spin = qobject_cast<QAbstractSpinBox*>(widget))
+        actual = spin->text();
+      else
+        actual = widget->property("text").toString();
+      if (actual != args[2])
+        fail(QStringLiteral("\"%1\" holds \"%2\", not \"%3\"").arg(args[1], actual, args[2]));
+    } else if (what == QLatin1StringView("property")) {
+      if (args.size() != 3) fail(QStringLiteral("expect property takes a property name and a text"));
+      const QString actual = m_window.properties().shownValue(args[1]);
+      if (actual != args[2])
+        fail(QStringLiteral("%1 shows \"%2\", not \"%3\"").arg(args[1], actual, args[2]));
+    } else {
+      fail(QStringLiteral(
+               "cannot expect \"%1\" (line, message, projects, title, control, no-control, value, property)")
+               .arg(args[0]));
+    }
+  } else if (command == QLatin1StringView("echo")) {
+    std::printf("%s\n", qPrintable(args.join(u' ')));
+    std::fflush(stdout);
+  } else if (command == QLatin1StringView("quit")) {
+    m_next = m_steps.size();
+  }
+}
+
+}  // namespace desktop
