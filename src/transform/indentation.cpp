@@ -20,6 +20,7 @@ struct NumberPrefix {
 };
 
 NumberPrefix splitNumberPrefix(QStringView t) {
+  if (!mayBeginNumber(t)) return {{}, false, t};
   const qsizetype colon = t.indexOf(u':');
   if (colon > 0 && isUsableNumber(t.first(colon)))
     return {t.first(colon + 1), false, trimmedView(t.sliced(colon + 1))};

@@ -60,42 +60,41 @@ void IndentationWalk::IndentCurrentProcedure(ide::VBE& vbe) {
   });
 }
 
+bool IndentationWalk::beginProcedure(const ProcedureText& text) {
+  const qsizetype bodyLines = std::max<qsizetype>(0, text.stop - text.first);
+  const auto body = std::span<const QString>(text.lines)
+                        .subspan(size_t(std::min(text.first, text.stop)), size_t(bodyLines));
+  m_indenter.beginProcedure(NumberColumnWidth(body));
+  return isContinued(text.lines.front());
+}
+
 void IndentationWalk::IndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  ProcedureLines bounds;
-  QString header;
-  std::vector<QString> lines;  // the lines after the header line, up to the End line
+  ProcedureText text;
   try {
-    bounds = procedureLines(module, name, kind);
-    header = module.Lines(bounds.body, 1);
-    bool continuation = isContinued(header);
-    lines.reserve(size_t(std::max(0, bounds.last - bounds.body - 1)));
-    for (int i = bounds.body + 1; i < bounds.last; ++i) {
-      QString text = module.Lines(i, 1);
-      const QStringView trimmed = trimmedView(text);
-      // The last procedure also owns the comments after its End line: they are not its code.
-      if (!continuation && isProcedureEnd(trimmed)) break;
-      if (!trimmed.isEmpty()) continuation = endsWithContinuation(trimmed);
-      lines.push_back(std::move(text));
-    }
+    text = readProcedure(module, name, kind);
   } catch (const std::exception&) {
     return;  // a kind the property lacks, or a procedure that is gone
   }
-
-  const qsizetype headerLines = bounds.first - bounds.body - 1;
-  const auto body = std::span<const QString>(lines).subspan(std::min<size_t>(headerLines, lines.size()));
-  m_indenter.beginProcedure(NumberColumnWidth(body));
-  bool continued = isContinued(header);
-  for (size_t k = 0; k < lines.size(); ++k) {
+  // Header continuation lines are indented like the body, one unit in.
+  bool continued = beginProcedure(text);
+  for (qsizetype i = 1; i < text.stop; ++i) {
     if (m_context.yieldAndCheck()) return;
-    const int i = bounds.body + 1 + int(k);
-    m_context.setLine(i);
+    const int line = text.moduleLine(i);
+    m_context.setLine(line);
     try {
-      if (m_indenter.IndentLine(lines[k], continued)) module.ReplaceLine(i, lines[k]);
+      QString& code = text.lines[size_t(i)];
+      if (m_indenter.IndentLine(code, continued)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
-      m_context.lineSkipped(failure, u"IndentLine", module, i);
+      m_context.lineSkipped(failure, u"IndentLine", module, line);
     }
   }
-  m_context.AdvanceProgress(bounds.count);
+  m_context.AdvanceProgress(text.count);
+}
+
+void IndentationWalk::indentText(ProcedureText& text) {
+  bool continued = beginProcedure(text);
+  for (qsizetype i = 1; i < text.stop; ++i)
+    m_indenter.IndentLine(text.lines[size_t(i)], continued);
 }
 
 void IndentationWalk::IndentDeclarations(ide::CodeModule& module) {

@@ -29,12 +29,18 @@ class IndentationWalk {
   /// unit in, the body by its blocks, line numbers in a column as wide as the widest. The header and the
   /// End line are left as they are. Quietly does nothing for a procedure the module does not have.
   void IndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+  /// Indents a procedure's lines in memory, as IndentProcedure does in the module.
+  void indentText(ProcedureText& text);
+
   /// Indents the declarations section: Type, Enum and #If blocks one unit in, the rest at the margin.
   void IndentDeclarations(ide::CodeModule& module);
 
   const Indenter& indenter() const { return m_indenter; }
 
  private:
+  /// Sets the indenter up for a procedure; returns whether its header goes on on the next line.
+  bool beginProcedure(const ProcedureText& text);
+
   WalkContext& m_context;
   Indenter m_indenter;
 };

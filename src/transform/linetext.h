@@ -69,6 +69,7 @@ inline bool isContinued(QStringView line) noexcept {
 /// True when the trimmed line is a procedure's End line (End Sub, End Function, End Property), which
 /// no rule numbers or indents and where every procedure walk stops.
 inline bool isProcedureEnd(QStringView trimmed) noexcept {
+  if (trimmed.size() < 7 || trimmed.front() != u'E') return false;  // most lines, without a call
   return trimmed.startsWith(u"End Sub") || trimmed.startsWith(u"End Function") ||
          trimmed.startsWith(u"End Property");
 }
@@ -78,6 +79,14 @@ inline bool isProcedureEnd(QStringView trimmed) noexcept {
 /// and octal forms, thousands separators, currency signs and parentheses are not numbers: the rules only need
 /// to recognise the line numbers and numeric labels that programmers and this tool write.
 bool isNumeric(QStringView text) noexcept;
+
+/// False when `text` cannot begin a number (its first character is no digit, sign or point): the rules
+/// look for a number prefix only on lines that pass, which spares the search for ":" and "'" on the rest.
+constexpr bool mayBeginNumber(QStringView text) noexcept {
+  if (text.isEmpty()) return false;
+  const QChar c = text.front();
+  return (c >= u'0' && c <= u'9') || c == u'+' || c == u'-' || c == u'.';
+}
 
 /// A number the rules may take for a line number: numeric, and its last character is neither "." nor ","
 /// (so "10." is an unfinished expression, not a number).

@@ -56,7 +56,7 @@ bool isUnnumberedStatement(QStringView t) {
       u"Private ", u"Public ", u"Friend ", u"Case ", u"Event ", u"Sub ", u"Function ", u"Property ", u"#",
   };
   return std::any_of(std::begin(kPrefixes), std::end(kPrefixes),
-                     [t](QStringView p) { return t.startsWith(p); });
+                     [t](QStringView p) { return t.front() == p.front() && t.startsWith(p); });
 }
 
 qint32 nextNumber(qint32 runningNumber, qint32 interval) {
@@ -111,8 +111,10 @@ bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32
 
   qint32 number = runningNumber;
   QString result;
-  const qsizetype colon = t.indexOf(u':');
-  const qsizetype quote = t.indexOf(u'\'');
+  // Old numbers and labels are looked for only where the line begins like a number.
+  const bool numeric = mayBeginNumber(t);
+  const qsizetype colon = numeric ? t.indexOf(u':') : -1;
+  const qsizetype quote = numeric ? t.indexOf(u'\'') : -1;
   if (colon > 0 && isUsableNumber(t.first(colon))) {
     // An old numeric label "10: x" becomes a line number.
     number = nextNumber(runningNumber, interval);
@@ -127,7 +129,7 @@ bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32
     if (blank < 0) {
       // One word (Else, Loop, Next): two spaces keep it clear of the number.
       result = numbered(number, u"  ", {}, whole);
-    } else if (isUsableNumber(t.first(blank))) {
+    } else if (numeric && isUsableNumber(t.first(blank))) {
       // The line already carries a number: replace it, keep what followed it.
       result = numbered(number, u" ", indent, t.sliced(blank));
     } else {
@@ -146,7 +148,7 @@ bool UnnumberLine(QString& line) {
   const QStringView whole(line);
   const QStringView indent = leadingBlanks(whole);
   const QStringView t = whole.sliced(indent.size());
-  if (isBlankLine(t)) return false;
+  if (!mayBeginNumber(t)) return false;  // blank lines too
 
   qsizetype cut = 0;
   const qsizetype colon = t.indexOf(u": ");

@@ -66,55 +66,70 @@ void NumberingWalk::NumberCurrentProcedure(ide::VBE& vbe, bool add) {
   });
 }
 
-void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  ProcedureLines lines;
-  try {
-    lines = procedureLines(module, name, kind);
-  } catch (const std::exception&) {
-    return;  // a kind the property lacks, or a procedure that is gone
-  }
+qint32 NumberingWalk::numberBeforeFirst() const {
   const qint64 before = qint64(m_startNumber) - m_interval;
   if (before < std::numeric_limits<qint32>::min() || before > std::numeric_limits<qint32>::max())
     throw LineNumberOverflow();
-  qint32 number = qint32(before);
+  return qint32(before);
+}
+
+void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
+  ProcedureText text;
+  try {
+    text = readProcedure(module, name, kind);
+  } catch (const std::exception&) {
+    return;  // a kind the property lacks, or a procedure that is gone
+  }
+  qint32 number = numberBeforeFirst();
   bool continuation = false;
-  for (int i = lines.first; i < lines.last; ++i) {
+  for (qsizetype i = text.first; i < text.stop; ++i) {
     if (m_context.yieldAndCheck()) return;
-    m_context.setLine(i);
+    const int line = text.moduleLine(i);
+    m_context.setLine(line);
     try {
-      QString text = module.Lines(i, 1);
-      // The last procedure also owns the comments after its End line: they are not its code.
-      if (!continuation && isProcedureEnd(trimmedView(text))) break;
-      if (NumberLine(text, number, continuation, m_interval)) module.ReplaceLine(i, text);
+      QString& code = text.lines[size_t(i)];
+      if (NumberLine(code, number, continuation, m_interval)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
-      m_context.lineSkipped(failure, u"NumberLine", module, i);
+      m_context.lineSkipped(failure, u"NumberLine", module, line);
     }
   }
 }
 
 void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  int body = 0;
-  int end = 0;
-  bool continuation = false;
+  ProcedureText text;
   try {
-    body = module.ProcBodyLine(name, kind);
-    end = module.ProcStartLine(name, kind) + module.ProcCountLines(name, kind) - 1;
-    // The header's continuation lines hold parameters, never line numbers.
-    continuation = isContinued(module.Lines(body, 1));
+    text = readProcedure(module, name, kind);
   } catch (const std::exception&) {
     return;
   }
-  for (int i = body + 1; i < end; ++i) {
+  // The header's continuation lines hold parameters, never line numbers.
+  bool continuation = isContinued(text.lines.front());
+  for (qsizetype i = 1; i < text.unnumberStop; ++i) {
     if (m_context.yieldAndCheck()) return;
-    m_context.setLine(i);
+    const int line = text.moduleLine(i);
+    m_context.setLine(line);
     try {
-      QString text = module.Lines(i, 1);
-      if (!continuation && isProcedureEnd(trimmedView(text))) break;
-      if (UnnumberLine(text, continuation)) module.ReplaceLine(i, text);
+      QString& code = text.lines[size_t(i)];
+      if (UnnumberLine(code, continuation)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
-      m_context.lineSkipped(failure, u"UnnumberLine", module, i);
+      m_context.lineSkipped(failure, u"UnnumberLine", module, line);
     }
   }
+}
+
+void NumberingWalk::numberText(ProcedureText& text, bool add) const {
+  if (add) {
+    qint32 number = numberBeforeFirst();
+    bool continuation = false;
+    for (qsizetype i = text.first; i < text.stop; ++i) {
+      m_context.setLine(text.moduleLine(i));  // where an overflow is reported
+      NumberLine(text.lines[size_t(i)], number, continuation, m_interval);
+    }
+    return;
+  }
+  bool continuation = isContinued(text.lines.front());
+  for (qsizetype i = 1; i < text.unnumberStop; ++i)
+    UnnumberLine(text.lines[size_t(i)], continuation);
 }
 
 }  // namespace transform

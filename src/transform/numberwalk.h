@@ -32,6 +32,10 @@ class NumberingWalk {
   /// continuation lines and every continuation line of a statement are left alone.
   void UnnumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
 
+  /// Numbers (`add`) or unnumbers a procedure's lines in memory, as the two walks above do in the module:
+  /// number-and-indent writes each line once, numbered and indented.
+  void numberText(ProcedureText& text, bool add) const;
+
   /// One procedure, adding or removing.
   void numberOrUnnumber(ide::CodeModule& module, const QString& name, ide::ProcKind kind, bool add) {
     add ? NumberProcedure(module, name, kind) : UnnumberProcedure(module, name, kind);
@@ -41,6 +45,9 @@ class NumberingWalk {
   qint32 interval() const { return m_interval; }
 
  private:
+  /// The running number a procedure starts from; a line number overflow when it leaves the 32-bit range.
+  qint32 numberBeforeFirst() const;
+
   WalkContext& m_context;
   qint32 m_startNumber;
   qint32 m_interval;

@@ -67,9 +67,32 @@ void NumIndentWalk::memberProcedures(const ide::Ref<ide::CodeModule>& module,
 }
 
 void NumIndentWalk::numIndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  // Numbers first, so that the indenter lines the new numbers up in its number column.
-  m_numbering.numberOrUnnumber(module, name, kind, m_add);
-  m_indentation.IndentProcedure(module, name, kind);
+  ProcedureText text;
+  try {
+    text = readProcedure(module, name, kind);
+  } catch (const std::exception&) {
+    return;  // a kind the property lacks, or a procedure that is gone
+  }
+  // Numbered first, so that the indenter lines the new numbers up in its number column; both in memory,
+  // so that each line is written once, and not at all when numbering and indenting give it back as it
+  // was (renumbering widens a number's blank, which re-indenting takes away again).
+  const std::vector<QString> before = text.lines;
+  m_numbering.numberText(text, m_add);
+  m_indentation.indentText(text);
+  const qsizetype end = std::max(text.stop, text.unnumberStop);
+  for (qsizetype i = 1; i < end; ++i) {
+    if (m_context.yieldAndCheck()) return;
+    const QString& code = text.lines[size_t(i)];
+    if (code == before[size_t(i)]) continue;
+    const int line = text.moduleLine(i);
+    m_context.setLine(line);
+    try {
+      module.ReplaceLine(line, code);
+    } catch (const std::exception& failure) {
+      m_context.lineSkipped(failure, u"IndentLine", module, line);
+    }
+  }
+  m_context.AdvanceProgress(text.count);
 }
 
 // ---------------------------------------------------------------------------------------------------

@@ -211,21 +211,34 @@ void forEachCodeModule(WalkContext& context, ide::VBProject& project,
   }
 }
 
-ProcedureLines procedureLines(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  ProcedureLines lines;
-  lines.body = module.ProcBodyLine(name, kind);
-  const int start = module.ProcStartLine(name, kind);
-  lines.count = module.ProcCountLines(name, kind);
-  lines.last = start + lines.count - 1;
-  while (lines.last > lines.body && isBlankLine(module.Lines(lines.last, 1)))
-    --lines.last;
-  lines.first = lines.body;
-  bool continued = true;
-  while (continued && lines.first <= lines.last) {
-    continued = isContinued(module.Lines(lines.first, 1));
-    ++lines.first;
+ProcedureText readProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
+  ProcedureText text;
+  text.body = module.ProcBodyLine(name, kind);
+  text.count = module.ProcCountLines(name, kind);
+  const int extentEnd = module.ProcStartLine(name, kind) + text.count - 1;
+  text.lines.reserve(size_t(std::max(1, extentEnd - text.body + 1)));
+  for (int i = text.body; i <= std::max(text.body, extentEnd); ++i)
+    text.lines.push_back(module.Lines(i, 1));
+  const auto size = qsizetype(text.lines.size());
+
+  text.first = 1;
+  while (text.first < size && isContinued(text.lines[size_t(text.first - 1)]))
+    ++text.first;
+  qsizetype last = size - 1;
+  while (last > 0 && isBlankLine(text.lines[size_t(last)]))
+    --last;
+  // The End line is the first line that is no continuation and ends the procedure: the last procedure
+  // owns the comments after it, which are not its code.
+  qsizetype endLine = -1;
+  bool continued = isContinued(text.lines.front());
+  for (qsizetype i = 1; i < size && endLine < 0; ++i) {
+    const QStringView trimmed = trimmedView(text.lines[size_t(i)]);
+    if (!continued && isProcedureEnd(trimmed)) endLine = i;
+    continued = endsWithContinuation(trimmed);
   }
-  return lines;
+  text.stop = endLine >= 0 ? endLine : last;
+  text.unnumberStop = endLine >= 0 ? endLine : size - 1;
+  return text;
 }
 
 }  // namespace transform

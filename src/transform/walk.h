@@ -168,15 +168,23 @@ std::vector<ide::ProcKind> procedureKinds(ide::CodeModule& module, const QString
 void forEachCodeModule(WalkContext& context, ide::VBProject& project,
                        const std::function<void(const ide::Ref<ide::CodeModule>&)>& visit);
 
-/// The first and last lines of a procedure's walk: `first` is the line after the header and its
-/// continuation lines, `last` the last line that is not blank (normally the End line, never walked).
-/// Throws ide::Error 35 for a procedure the module does not have.
-struct ProcedureLines {
-  int body = 0;
-  int first = 0;
-  int last = 0;
-  int count = 0;
+/// The lines of one procedure, read once: from its header line to the end of its extent (the last
+/// procedure's extent runs to the end of the module, comments after its End line included).
+struct ProcedureText {
+  int body = 0;   // the module line of the header, lines[0]
+  int count = 0;  // the procedure's line count, for the progress bar
+  /// Indexes into `lines`: the first line after the header and its continuation lines; where numbering
+  /// and indentation stop (the End line, or without one the last line that is not blank); where removal
+  /// of numbers stops (the End line, or without one the extent's last line). Each is never walked.
+  qsizetype first = 0;
+  qsizetype stop = 0;
+  qsizetype unnumberStop = 0;
+  std::vector<QString> lines;
+
+  int moduleLine(qsizetype index) const { return body + int(index); }
 };
-ProcedureLines procedureLines(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+
+/// Reads a procedure; throws ide::Error 35 for a procedure the module does not have.
+ProcedureText readProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
 
 }  // namespace transform

@@ -440,9 +440,9 @@ TEST(Walks, YieldBeforeEveryComponentMemberAndLine) {
   run.context.setYieldInterval({});
   NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
   // One component; three members (m, Alpha, Beta); Alpha's 18 lines from Dim to the blank before
-  // End Sub; Beta's line and its End line, where the walk stops short of the comment after it.
+  // End Sub; Beta's one line (the walk stops at the End line, short of the comment after it).
   ASSERT_EQ(ide.project->Count(), 1);
-  EXPECT_EQ(run.loop.runs, 1 + 3 + 18 + 2);
+  EXPECT_EQ(run.loop.runs, 1 + 3 + 18 + 1);
 }
 
 TEST(Walks, AYieldInsideTheIntervalDoesNotRunTheLoop) {
@@ -508,6 +508,12 @@ TEST(NumIndentWalk, NumbersThenIndentsEachProcedureInANumberColumn) {
   Walk run;
   NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
   EXPECT_EQ(linesOf(*module), numIndentedModule());
+
+  // Renumbering widens each number's blank and re-indenting takes it away: no line is replaced at all.
+  const quint64 edits = Ide::edits(module);
+  NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
+  EXPECT_EQ(linesOf(*module), numIndentedModule());
+  EXPECT_EQ(Ide::edits(module), edits);
 }
 
 TEST(NumIndentWalk, RemovingNumbersReindentsWithAnEmptyColumn) {

@@ -1,0 +1,56 @@
+#!/usr/bin/env bash
+# SPDX-License-Identifier: MIT
+# `quimbel numindent` end to end (load, number and indent, save) on a generated project of 1,000,000 code
+# lines in 200 components, against sed prefixing every line of the same files: the least any tool that
+# rewrites every line must spend. Targets: numindent under 3 s, and within 3 times sed's time.
+#
+# Usage: bench/transform/numindent_vs_sed.sh [BUILD_DIR]   (default: build; build it in Release first)
+set -euo pipefail
+
+build=${1:-build}
+quimbel="$build/bin/quimbel"
+generator="$build/bin/quimbel-gen"
+for tool in "$quimbel" "$generator"; do
+  [ -x "$tool" ] || { echo "numindent_vs_sed: $tool is missing; build the quimbel and quimbel-gen targets" >&2; exit 2; }
+done
+
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+# The settings' defaults (start 10000, interval 5, tabs), not the user's.
+export QUIMBEL_CONFIG_DIR="$work/config"
+
+"$generator" --lines 1000000 --components 200 --seed 7 "$work/source" > /dev/null
+project=Projeto1/Projeto1.vbp
+
+now() { date +%s.%N; }
+best() { printf '%s\n' "$@" | sort -g | head -n 1; }
+
+tool_times=()
+sed_times=()
+for run in 1 2 3; do
+  rm -rf "$work/tool" "$work/sed"
+  cp -r "$work/source" "$work/tool"
+  cp -r "$work/source" "$work/sed"
+  mapfile -t files < <(find "$work/sed" -type f \( -name '*.bas' -o -name '*.cls' -o -name '*.frm' \))
+  cat "${files[@]}" "$work/tool"/*/* > /dev/null  # both start from a warm page cache
+
+  start=$(now)
+  "$quimbel" numindent "$work/tool/$project"
+  tool_times+=("$(awk -v a="$start" -v b="$(now)" 'BEGIN { print b - a }')")
+
+  start=$(now)
+  sed -i 's/^/10000 /' "${files[@]}"
+  sed_times+=("$(awk -v a="$start" -v b="$(now)" 'BEGIN { print b - a }')")
+done
+
+tool_time=$(best "${tool_times[@]}")
+sed_time=$(best "${sed_times[@]}")
+lines=$(cat "${files[@]}" | wc -l)
+awk -v tool="$tool_time" -v sed="$sed_time" -v lines="$lines" 'BEGIN {
+  ratio = tool / sed
+  printf "files: %d lines in 200 modules (best of 3 runs)\n", lines
+  printf "quimbel numindent  %6.3f s   (target < 3 s: %s)\n", tool, tool < 3 ? "met" : "MISSED"
+  printf "sed prefix         %6.3f s\n", sed
+  printf "ratio              %6.2f x   (target <= 3x: %s)\n", ratio, ratio <= 3 ? "met" : "MISSED"
+  exit (tool < 3 && ratio <= 3) ? 0 : 1
+}'
