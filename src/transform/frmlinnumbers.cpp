@@ -182,6 +182,7 @@ void frmLinNumbers::run(bool add) {
 
 void frmLinNumbers::walk(PROG_MODE scope, bool add) {
   if (m_settings.flag(common::setting::OneCommandNumIndent)) {
+    if (m_context.cancelled()) return;  // Cancel was clicked before the command existed
     m_numIndent = std::make_unique<CNumIndent>(m_vbe);
     m_numIndentError = m_numIndent->Error.connect([this](const QString& strError) {
       m_vbe->Platform().ui().MsgBox(strError, ide::mb::OKOnly, common::title());

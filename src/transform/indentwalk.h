@@ -35,8 +35,6 @@ class IndentationWalk {
   /// Indents the declarations section: Type, Enum and #If blocks one unit in, the rest at the margin.
   void IndentDeclarations(ide::CodeModule& module);
 
-  const Indenter& indenter() const { return m_indenter; }
-
  private:
   /// Sets the indenter up for a procedure; returns whether its header goes on on the next line.
   bool beginProcedure(const ProcedureText& text);

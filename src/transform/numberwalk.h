@@ -41,9 +41,6 @@ class NumberingWalk {
     add ? NumberProcedure(module, name, kind) : UnnumberProcedure(module, name, kind);
   }
 
-  qint32 startNumber() const { return m_startNumber; }
-  qint32 interval() const { return m_interval; }
-
  private:
   /// The running number a procedure starts from; a line number overflow when it leaves the 32-bit range.
   qint32 numberBeforeFirst() const;

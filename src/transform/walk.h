@@ -48,7 +48,7 @@ class WalkContext {
   // --- Yielding and cancelling
 
   /// The least time between two runs of the loop. A yield inside it costs a clock read, so walks can yield
-  /// before every line. The first yield of a context always runs the loop.
+  /// before every line. The first yield of a context, and the first after reset(), always runs the loop.
   void setYieldInterval(Clock::duration interval) { m_yieldInterval = interval; }
   void yield();
   /// Yields, then tells whether the walk must end: cancelled (the bar is hidden then) or stopped by a
@@ -65,8 +65,6 @@ class WalkContext {
 
   // --- Progress
 
-  bool hasProgress() const { return m_scale.has_value(); }
-  ProgressSink* bar() const { return m_bar; }
   void SetProgressRange(qint32 units);
   void AdvanceProgress(qint32 units);
   void showProgress();

@@ -330,6 +330,18 @@ TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
   EXPECT_FALSE(scene.loop().activeTimers());
 }
 
+TEST(LineNumberingDialog, ACancelClickedAsTheRunStartsStopsTheOneCommandRouteToo) {
+  Scene scene(true);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  dialog.show();
+  dialog.opNumbers(0)->setChecked(true);
+  scene.loop().post([&] { dialog.cmdCancel()->click(); });  // runs in the yield before the walk
+  dialog.cmdAdd()->click();
+  EXPECT_EQ(linesOf(*scene.first), kFirst);
+  EXPECT_EQ(linesOf(*scene.second), kSecond);
+  EXPECT_FALSE(dialog.isVisible());
+}
+
 TEST(LineNumberingDialog, ClosingTheWindowDuringARunCancelsIt) {
   Scene scene;
   frmLinNumbers dialog(scene.ide.vbe, scene.settings);
