@@ -101,7 +101,9 @@ CodeText::Line CodeText::makeLine(QStringView text, bool isContinuation, LineEnd
 void CodeText::load(std::vector<SourceLine> code, std::vector<MemberAttributeLine> attributes) {
   const int removed = countOfLines();
   m_lines.clear();
-  m_lines.reserve(code.size());
+  // Room for the lines an editing session adds: growing a large module's line vector on its first new line
+  // would move every line at once, a pause the user feels on that keystroke.
+  m_lines.reserve(code.size() + code.size() / 4 + 16);
   m_markers.clear();
   m_orphanAttributes.clear();
   bool continuation = false;
