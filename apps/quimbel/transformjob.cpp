@@ -165,6 +165,8 @@ int printDiff(const Snapshot& changed) {
 
 int runTransform(const TransformOptions& options,
                  const std::function<Walks(transform::WalkContext&)>& makeWalks) {
+  // Made first: whether the run is long enough for a bar counts from the start, loading included.
+  TerminalProgress bar;
   std::vector<Input> inputs(size_t(options.files.size()));
   for (qsizetype i = 0; i < options.files.size(); ++i) {
     Input& input = inputs[size_t(i)];
@@ -189,11 +191,12 @@ int runTransform(const TransformOptions& options,
 
   int failures = 0;
   {
-    TerminalProgress bar;
     transform::WalkContext context(QStringLiteral("quimbel"), nullptr, &bar);
     const Input* current = nullptr;
     const auto report = [&](const transform::WalkFailure& failure) {
+      bar.setVisible(false);  // the message gets a line of its own
       printError(QStringLiteral("%1: %2").arg(current->file, failureText(failure)));
+      bar.setVisible(true);
       ++failures;
     };
     context.onFailure = report;

@@ -2,6 +2,7 @@
 // The command-line tool end to end: the built binary, run on copies of the example group and on small
 // modules, with settings of its own. Bytes on disk, standard output and error, and exit codes.
 #include "common/settings.h"
+#include "generator.h"
 #include "printers.h"
 #include "testproject.h"
 
@@ -11,6 +12,7 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QProcess>
+#include <QStandardPaths>
 #include <QTemporaryDir>
 
 #include <unistd.h>
@@ -31,6 +33,11 @@ struct Result {
 class Tool {
  public:
   Result run(const QStringList& arguments, const QString& directory = {}) {
+    return runProgram(QStringLiteral(QUIMBEL_BINARY), arguments, directory);
+  }
+
+  /// Runs another program with the tool's environment.
+  Result runProgram(const QString& program, const QStringList& arguments, const QString& directory = {}) {
     QProcess process;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), m_home.filePath(QStringLiteral("config")));
@@ -38,7 +45,7 @@ class Tool {
     environment.insert(QStringLiteral("LC_ALL"), QStringLiteral("C.UTF-8"));
     process.setProcessEnvironment(environment);
     if (!directory.isEmpty()) process.setWorkingDirectory(directory);
-    process.start(QStringLiteral(QUIMBEL_BINARY), arguments);
+    process.start(program, arguments);
     EXPECT_TRUE(process.waitForFinished(120000));
     return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1,
             QString::fromUtf8(process.readAllStandardOutput()),
@@ -440,6 +447,33 @@ TEST(CheckAndDiff, GroupPathsAreShownFromTheCurrentDirectory) {
   EXPECT_TRUE(result.out.startsWith(
       QStringLiteral("--- a/Utilitarios/modApi.bas\n+++ b/Utilitarios/modApi.bas\n@@ ")))
       << result.out.toStdString();
+}
+
+// ---------------------------------------------------------------------------------------------------
+// The progress bar
+
+TEST(ProgressBar, ALongRunOnATerminalShowsABarOnStandardErrorAndClearsIt) {
+  const QString script = QStandardPaths::findExecutable(QStringLiteral("script"));
+  if (script.isEmpty()) GTEST_SKIP() << "no script(1) to give the tool a terminal";
+  QTemporaryDir dir;
+  gen::GeneratorOptions options;
+  options.codeLines = 1'000'000;  // long enough for the bar to show
+  const QString project = gen::generateProjects(dir.path(), options).projectFiles.front();
+  Tool tool;
+
+  // Without a terminal there is no bar.
+  Result result = tool.run({QStringLiteral("indent"), QStringLiteral("--check"), project});
+  EXPECT_EQ(result.code, 1);
+  EXPECT_TRUE(result.err.isEmpty()) << result.err.toStdString();
+
+  const QString command =
+      QStringLiteral("'%1' indent --check '%2' > /dev/null").arg(QStringLiteral(QUIMBEL_BINARY), project);
+  result = tool.runProgram(script, {QStringLiteral("-qec"), command, QStringLiteral("/dev/null")});
+  EXPECT_EQ(result.code, 1);
+  EXPECT_TRUE(result.out.contains(QStringLiteral("\rquimbel: ["))) << result.out.toStdString();
+  EXPECT_TRUE(result.out.contains(QStringLiteral("%"))) << result.out.toStdString();
+  // The last thing written takes the bar off the line again.
+  EXPECT_TRUE(result.out.endsWith(u'\r')) << result.out.toStdString();
 }
 
 }  // namespace
