@@ -2,7 +2,6 @@
 #include "transformjob.h"
 
 #include "diff.h"
-#include "host/files/ansi.h"
 #include "host/files/modulefile.h"
 #include "host/files/sourcelines.h"
 #include "host/model/vbe.h"
@@ -10,7 +9,6 @@
 
 #include <QDir>
 #include <QFile>
-#include <QFileInfo>
 
 #include <memory>
 #include <vector>
