@@ -6,6 +6,7 @@
 #include <QTextBlock>
 #include <QTextCursor>
 #include <QTextDocument>
+#include <QTimer>
 
 namespace desktop {
 namespace {
@@ -37,9 +38,6 @@ CodeBinding::CodeBinding(std::shared_ptr<host::CodeModuleImpl> module, QPlainTex
   m_revision = document->revision();
   text.addListener(this);
 
-  m_flushTimer.setSingleShot(true);
-  m_flushTimer.setInterval(0);
-  connect(&m_flushTimer, &QTimer::timeout, this, &CodeBinding::flush);
   connect(document, &QTextDocument::contentsChange, this, &CodeBinding::documentChanged);
   connect(editor, &QPlainTextEdit::cursorPositionChanged, this, &CodeBinding::reportSelection);
   connect(editor, &QPlainTextEdit::selectionChanged, this, &CodeBinding::reportSelection);
@@ -73,14 +71,45 @@ void CodeBinding::linesChanged(int firstLine, int removed, int inserted) {
     const int editorEnd = std::max(p.first + p.oldCount, editEnd - (p.newCount - p.oldCount));
     p = Pending{first, editorEnd - first, end + inserted - removed - first};
   }
-  if (!m_flushTimer.isActive()) m_flushTimer.start();
+  scheduleFlush();
+}
+
+void CodeBinding::scheduleFlush() {
+  if (m_flushPosted) return;
+  m_flushPosted = true;
+  // A posted call rather than a zero timer: posted work runs on every pass of the loop (a walk's every
+  // yield), while timers wait for an idle moment that a busy walk seldom leaves.
+  QMetaObject::invokeMethod(
+      this,
+      [this] {
+        m_flushPosted = false;
+        flushSome();
+      },
+      Qt::QueuedConnection);
+}
+
+void CodeBinding::flushSome() {
+  if (!m_pending || !m_editor) return;
+  // A walk over a large module changes lines faster than the editor takes them in: a bounded part per pass
+  // of the loop keeps the IDE answering. Lines replaced pair by pair leave the rest of the region in step.
+  Pending& p = *m_pending;
+  if (std::min(p.oldCount, p.newCount) > kLinesPerPass) {
+    replaceEditorLines(p.first, kLinesPerPass, kLinesPerPass);
+    p.first += kLinesPerPass;
+    p.oldCount -= kLinesPerPass;
+    p.newCount -= kLinesPerPass;
+    // The rest comes with the module's next change, or from a timer once the loop has let everything
+    // else run: work posted from posted work would run in this same pass.
+    QTimer::singleShot(1, this, [this] { scheduleFlush(); });
+    return;
+  }
+  flush();
 }
 
 void CodeBinding::flush() {
   if (!m_pending || !m_editor) return;
   const Pending p = *m_pending;
   m_pending.reset();
-  m_flushTimer.stop();
   replaceEditorLines(p.first, p.oldCount, p.newCount);
   // The pane moved its selection with the edit; the editor follows it.
   followViewRequest();
@@ -231,7 +260,9 @@ void CodeBinding::documentChanged(int position, int /*charsRemoved*/, int charsA
 }
 
 void CodeBinding::reportSelection() {
-  if (m_toEditor || !m_editor) return;
+  // While the module's own edits are still on their way to the editor, the editor's positions are not the
+  // module's: the pane keeps the selection it moved with those edits, and the editor takes it afterwards.
+  if (m_toEditor || !m_editor || m_pending) return;
   const QTextCursor cursor = m_editor->textCursor();
   QTextDocument* document = m_editor->document();
   auto lineColumn = [&](int position) {
@@ -246,7 +277,7 @@ void CodeBinding::reportSelection() {
 }
 
 void CodeBinding::reportScroll(int value) {
-  if (m_toEditor) return;
+  if (m_toEditor || m_pending) return;
   m_pane->viewScrolled(value + 1);
 }
 

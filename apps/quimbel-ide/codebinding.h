@@ -16,7 +16,6 @@
 
 #include <QObject>
 #include <QPointer>
-#include <QTimer>
 
 #include <memory>
 #include <optional>
@@ -57,8 +56,13 @@ class CodeBinding final : public QObject, private host::CodeText::Listener {
     int newCount = 0;  // lines the module holds there now
   };
 
+  /// Lines the editor takes in per pass of the event loop while the module is changed faster than that.
+  static constexpr int kLinesPerPass = 1500;
+
   // host::CodeText::Listener: the module changed.
   void linesChanged(int firstLine, int removed, int inserted) override;
+  void scheduleFlush();
+  void flushSome();
   void documentChanged(int position, int charsRemoved, int charsAdded);
   /// Replaces the editor's lines [first, first + oldCount) by the module's [first, first + newCount).
   void replaceEditorLines(int first, int oldCount, int newCount);
@@ -76,7 +80,7 @@ class CodeBinding final : public QObject, private host::CodeText::Listener {
   /// The document revision last seen, so that changes of formats alone are not taken for edits.
   int m_revision = 0;
   std::optional<Pending> m_pending;
-  QTimer m_flushTimer;
+  bool m_flushPosted = false;
   bool m_toModel = false;
   bool m_toEditor = false;
   int m_lastVisibleLines = -1;

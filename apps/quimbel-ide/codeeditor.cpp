@@ -57,9 +57,34 @@ bool CodeEditor::isRegisteredHotKey(QKeyEvent* event) const {
   return key.key != 0 && m_windows->hasHotKey(m_window(), key.modifiers, key.key);
 }
 
+namespace {
+
+/// Keys that only move the caret or do nothing to the text; every other key may change or copy text.
+bool onlyMoves(const QKeyEvent* event) {
+  switch (event->key()) {
+    case Qt::Key_Left:
+    case Qt::Key_Right:
+    case Qt::Key_Up:
+    case Qt::Key_Down:
+    case Qt::Key_Home:
+    case Qt::Key_End:
+    case Qt::Key_PageUp:
+    case Qt::Key_PageDown:
+    case Qt::Key_Shift:
+    case Qt::Key_Control:
+    case Qt::Key_Alt:
+    case Qt::Key_Meta:
+    case Qt::Key_Escape:
+      return true;
+    default:
+      return event->key() >= Qt::Key_F1 && event->key() <= Qt::Key_F35;
+  }
+}
+
+}  // namespace
+
 bool CodeEditor::event(QEvent* event) {
   if (event->type() == QEvent::ShortcutOverride) {
-    if (m_beforeInput) m_beforeInput();
     // A registered hotkey goes to the window's procedures before any menu shortcut can take it.
     if (isRegisteredHotKey(static_cast<QKeyEvent*>(event))) {
       event->accept();
@@ -70,7 +95,9 @@ bool CodeEditor::event(QEvent* event) {
 }
 
 void CodeEditor::keyPressEvent(QKeyEvent* event) {
-  if (m_beforeInput) m_beforeInput();
+  // A key that edits works on the module's latest text; one that only moves the caret need not wait for
+  // a long run of the module's edits to be shown.
+  if (m_beforeInput && !onlyMoves(event)) m_beforeInput();
   if (m_windows && m_window) {
     const VirtualKey key = virtualKeyOf(event->key(), event->modifiers());
     if (key.key != 0 && m_windows->deliverHotKey(m_window(), key.modifiers, key.key)) {
@@ -79,11 +106,6 @@ void CodeEditor::keyPressEvent(QKeyEvent* event) {
     }
   }
   QPlainTextEdit::keyPressEvent(event);
-}
-
-void CodeEditor::mousePressEvent(QMouseEvent* event) {
-  if (m_beforeInput) m_beforeInput();
-  QPlainTextEdit::mousePressEvent(event);
 }
 
 void CodeEditor::inputMethodEvent(QInputMethodEvent* event) {
