@@ -1,0 +1,242 @@
+// SPDX-License-Identifier: MIT
+// The command bars drawn live: the menu bar and the toolbars follow every change of the model, clicks go
+// to Execute(), faces become icons, and an add-in's menus and toolbar appear when it connects and vanish
+// when it disconnects.
+#include "commandbarview.h"
+#include "host/model/addins.h"
+#include "icons.h"
+#include "idefixture.h"
+
+#include <gtest/gtest.h>
+
+#include <QAction>
+#include <QDir>
+#include <QFile>
+#include <QLibrary>
+#include <QMenu>
+#include <QMenuBar>
+#include <QTemporaryDir>
+#include <QToolBar>
+
+namespace desktop {
+namespace {
+
+using test::settle;
+using test::waitFor;
+
+class CommandBarsTest : public test::IdeTest {
+ protected:
+  host::CommandBarsImpl& bars() { return *m_ide.vbe->commandBars(); }
+  QStringList menuTitles() const {
+    QStringList titles;
+    for (QAction* action : m_window->menuBar()->actions())
+      titles << action->text();
+    return titles;
+  }
+  QStringList toolBarTexts(const QString& name) {
+    QStringList texts;
+    if (QToolBar* bar = m_window->commandBars().toolBarOf(name))
+      for (QAction* action : bar->actions())
+        if (!action->isSeparator()) texts << action->text();
+    return texts;
+  }
+};
+
+TEST_F(CommandBarsTest, TheMenuBarShowsTheMenusOfTheModel) {
+  EXPECT_EQ(menuTitles(),
+            (QStringList{QStringLiteral("&File"), QStringLiteral("&Edit"), QStringLiteral("&View"),
+                         QStringLiteral("&Project"), QStringLiteral("F&ormat"), QStringLiteral("&Debug"),
+                         QStringLiteral("&Run"), QStringLiteral("&Query"), QStringLiteral("D&iagram"),
+                         QStringLiteral("&Tools"), QStringLiteral("&Add-Ins"), QStringLiteral("&Window"),
+                         QStringLiteral("&Help")}));
+  QMenu* run = m_window->menuBar()->actions().at(6)->menu();
+  ASSERT_NE(run, nullptr);
+  QStringList items;
+  for (QAction* action : run->actions())
+    items << action->text() + (action->isEnabled() ? QString() : QStringLiteral(" (off)"));
+  EXPECT_EQ(items, (QStringList{QStringLiteral("&Start"), QStringLiteral("&Continue (off)"),
+                                QStringLiteral("Brea&k (off)"), QStringLiteral("&End (off)")}));
+}
+
+TEST_F(CommandBarsTest, TheStandardToolbarHasTheVisibleButtonsWithPictures) {
+  const QStringList texts = toolBarTexts(QStringLiteral("Standard"));
+  EXPECT_EQ(texts.size(), 16) << "Continue stays hidden in design mode";
+  EXPECT_FALSE(texts.contains(QStringLiteral("Continue")));
+  EXPECT_EQ(texts.first(), QStringLiteral("Add Project"));
+  for (QAction* action : m_window->commandBars().toolBarOf(QStringLiteral("Standard"))->actions()) {
+    if (action->isSeparator()) continue;
+    EXPECT_FALSE(action->icon().isNull()) << action->text().toStdString();
+  }
+  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Edit")), nullptr)
+      << "an invisible bar is not drawn";
+}
+
+TEST_F(CommandBarsTest, ControlsFollowTheirChanges) {
+  auto standard = bars().bar(QStringLiteral("Standard"));
+  auto control = std::static_pointer_cast<host::CommandBarControlImpl>(
+      standard->Add(ide::ControlType::Button, 1, {}, 1, true));
+  control->setCaption(QStringLiteral("First"));
+  settle();
+  EXPECT_EQ(toolBarTexts(QStringLiteral("Standard")).first(), QStringLiteral("First"));
+  QAction* action = m_window->commandBars().actionOf(control.get());
+  ASSERT_NE(action, nullptr);
+  EXPECT_TRUE(action->isEnabled());
+
+  control->setEnabled(false);
+  control->setCaption(QStringLiteral("Renamed"));
+  settle();
+  EXPECT_EQ(m_window->commandBars().actionOf(control.get()), action) << "the action is kept, not rebuilt";
+  EXPECT_FALSE(action->isEnabled());
+  EXPECT_EQ(action->text(), QStringLiteral("Renamed"));
+
+  control->setVisible(false);
+  settle();
+  EXPECT_FALSE(toolBarTexts(QStringLiteral("Standard")).contains(QStringLiteral("Renamed")));
+  control->setVisible(true);
+  control->Delete();
+  settle();
+  EXPECT_EQ(m_window->commandBars().actionOf(control.get()), nullptr);
+  EXPECT_EQ(toolBarTexts(QStringLiteral("Standard")).size(), 16);
+}
+
+TEST_F(CommandBarsTest, AFaceBecomesTheIcon) {
+  auto standard = bars().bar(QStringLiteral("Standard"));
+  auto pictured = std::static_pointer_cast<host::CommandBarControlImpl>(
+      standard->Add(ide::ControlType::Button, 1, {}, 0, true));
+  pictured->setTooltipText(QStringLiteral("Pictured"));
+  pictured->setFace(glyphPng(Glyph::Find));
+  auto broken = std::static_pointer_cast<host::CommandBarControlImpl>(
+      standard->Add(ide::ControlType::Button, 1, {}, 0, true));
+  broken->setTooltipText(QStringLiteral("Broken"));
+  broken->setFace(QByteArray("not a picture"));
+  settle();
+  QAction* withFace = m_window->commandBars().actionOf(pictured.get());
+  QAction* withoutFace = m_window->commandBars().actionOf(broken.get());
+  ASSERT_TRUE(withFace && withoutFace);
+  EXPECT_FALSE(withFace->icon().isNull());
+  EXPECT_TRUE(withoutFace->icon().isNull());
+  EXPECT_EQ(withFace->text(), QStringLiteral("Pictured"))
+      << "a button without caption is named by its tooltip";
+}
+
+TEST_F(CommandBarsTest, AClickExecutesTheControl) {
+  auto addIns = bars().bar(QStringLiteral("Add-Ins"));
+  auto control = std::static_pointer_cast<host::CommandBarControlImpl>(
+      addIns->Add(ide::ControlType::Button, 1, {}, 0, true));
+  control->setCaption(QStringLiteral("Count"));
+  int clicks = 0;
+  auto sink = m_ide.vbe->Events()->CommandBarEvents(control)->Click.connect(
+      [&](const ide::Ref<ide::CommandBarControl>&, bool&, bool&) { ++clicks; });
+  settle();
+  QAction* action = m_window->commandBars().actionOf(control.get());
+  ASSERT_NE(action, nullptr);
+  action->trigger();
+  EXPECT_EQ(clicks, 1);
+  control->setEnabled(false);
+  settle();
+  action->trigger();
+  EXPECT_EQ(clicks, 1) << "a disabled control is not clicked";
+}
+
+TEST_F(CommandBarsTest, ANewBarIsAToolbarUntilItIsDeleted) {
+  auto bar = bars().Add(QStringLiteral("Mine"), ide::BarPosition::Top, false, true);
+  bar->Controls()->Add(ide::ControlType::Button, 1, {}, 0, true)->setCaption(QStringLiteral("One"));
+  settle();
+  ASSERT_NE(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
+  EXPECT_EQ(toolBarTexts(QStringLiteral("Mine")), QStringList{QStringLiteral("One")});
+  bar->setVisible(false);
+  settle();
+  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
+  bar->setVisible(true);
+  settle();
+  EXPECT_NE(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
+  bar->Delete();
+  settle();
+  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Add-ins
+
+QString takeTestAddInLog() {
+  QLibrary library(QStringLiteral(QUIMBEL_TEST_ADDIN));
+  auto take = reinterpret_cast<const char* (*)()>(library.resolve("testAddInTakeLog"));
+  return take ? QString::fromUtf8(take()) : QString();
+}
+
+TEST_F(CommandBarsTest, AnAddInsMenuItemAppearsWhileTheAddInIsConnected) {
+  auto addIn = m_ide.vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_TEST_ADDIN), false);
+  takeTestAddInLog();
+  auto itemOf = [&]() -> QAction* {
+    QMenu* menu = m_window->menuBar()->actions().at(10)->menu();
+    for (QAction* action : menu->actions())
+      if (action->text() == QLatin1StringView("Test Add-In")) return action;
+    return nullptr;
+  };
+  addIn->setConnect(true);
+  settle();
+  QAction* item = itemOf();
+  ASSERT_NE(item, nullptr);
+  item->trigger();
+  EXPECT_TRUE(takeTestAddInLog().contains(QStringLiteral("click")));
+  addIn->setConnect(false);
+  ASSERT_TRUE(waitFor([&] { return !addIn->Connect() && itemOf() == nullptr; }));
+}
+
+#ifdef QUIMBEL_ADDIN_LIBRARY
+/// What the real add-in needs around it: an installation directory and private settings and data.
+class AddInEnvironment {
+ public:
+  AddInEnvironment() {
+    QDir(m_dir.path()).mkpath(QStringLiteral("install/help"));
+    QFile config(m_dir.filePath(QStringLiteral("quimbel.conf")));
+    config.open(QIODevice::WriteOnly);
+    config.write("InstallationPath=" + m_dir.filePath(QStringLiteral("install")).toUtf8() + "\n");
+    config.close();
+    qputenv("QUIMBEL_MACHINE_CONFIG", m_dir.filePath(QStringLiteral("quimbel.conf")).toLocal8Bit());
+    qputenv("QUIMBEL_CONFIG_DIR", m_dir.filePath(QStringLiteral("config")).toLocal8Bit());
+    qputenv("QUIMBEL_DATA_DIR", m_dir.filePath(QStringLiteral("data")).toLocal8Bit());
+  }
+  ~AddInEnvironment() {
+    qunsetenv("QUIMBEL_MACHINE_CONFIG");
+    qunsetenv("QUIMBEL_CONFIG_DIR");
+    qunsetenv("QUIMBEL_DATA_DIR");
+  }
+
+ private:
+  QTemporaryDir m_dir;
+};
+
+TEST_F(CommandBarsTest, TheQuimbelAddInsMenusAndToolbarComeAndGoWithIt) {
+  AddInEnvironment environment;
+  auto addIn = m_ide.vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_ADDIN_LIBRARY), false);
+  m_ide.ui->queueAnswer(ide::mb::OK);  // a start-up failure would show one box; it must not block the test
+  addIn->setConnect(true);
+  settle();
+  ASSERT_TRUE(addIn->Connect()) << m_messages.join(u'\n').toStdString();
+
+  QToolBar* toolBar = m_window->commandBars().toolBarOf(QStringLiteral("Quimbel 2.2"));
+  ASSERT_NE(toolBar, nullptr);
+  int buttons = 0;
+  for (QAction* action : toolBar->actions()) {
+    if (action->isSeparator()) continue;
+    ++buttons;
+    EXPECT_FALSE(action->icon().isNull()) << action->text().toStdString();
+  }
+  EXPECT_EQ(buttons, 12);
+  EXPECT_EQ(menuTitles().at(10), QStringLiteral("Quimbel")) << "the popup stands before the Add-Ins menu";
+  QMenu context;
+  m_window->commandBars().fillMenu(&context, bars().bar(QStringLiteral("Code Window")));
+  EXPECT_EQ(context.actions().first()->text(), QStringLiteral("Adicionar aos Favoritos"));
+
+  addIn->setConnect(false);
+  ASSERT_TRUE(waitFor([&] { return !addIn->Connect(); }));
+  settle();
+  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Quimbel 2.2")), nullptr);
+  EXPECT_FALSE(menuTitles().contains(QStringLiteral("Quimbel")));
+  EXPECT_EQ(menuTitles().size(), 13);
+}
+#endif
+
+}  // namespace
+}  // namespace desktop

@@ -1,0 +1,161 @@
+// SPDX-License-Identifier: MIT
+// Form designers and the properties window: controls drawn at their twips positions, added from the toolbox,
+// moved with the mouse, removed with Delete, renamed and made array elements in the grid; every change goes
+// through the form and fires the control events.
+#include "designerview.h"
+#include "host/model/events.h"
+#include "idefixture.h"
+#include "propertiesview.h"
+#include "toolbox.h"
+#include "windowmanager.h"
+
+#include <gtest/gtest.h>
+
+#include <QMdiArea>
+#include <QMdiSubWindow>
+#include <QTableWidget>
+#include <QTest>
+
+namespace desktop {
+namespace {
+
+using test::settle;
+
+class DesignerTest : public test::IdeTest {
+ protected:
+  void SetUp() override {
+    IdeTest::SetUp();
+    m_form = component(QStringLiteral("Loja"), QStringLiteral("frmPrincipal"));
+    ASSERT_TRUE(m_form);
+    m_ide.vbe->activateWindow(m_form->designerWindow());
+    settle();
+    m_designer = m_window->windows().activeDesigner();
+    ASSERT_NE(m_designer, nullptr);
+    m_events.push_back(m_ide.vbe->events().controls->ItemAdded.connect(
+        [this](const ide::Ref<ide::VBControl>& c) { m_log << QStringLiteral("added ") + c->name(); }));
+    m_events.push_back(m_ide.vbe->events().controls->ItemRemoved.connect(
+        [this](const ide::Ref<ide::VBControl>& c) { m_log << QStringLiteral("removed ") + c->name(); }));
+    m_events.push_back(m_ide.vbe->events().controls->ItemRenamed.connect(
+        [this](const ide::Ref<ide::VBControl>& c, const QString& oldName, int oldIndex) {
+          m_log << QStringLiteral("renamed %1 from %2 (%3)").arg(c->name(), oldName).arg(oldIndex);
+        }));
+  }
+  std::shared_ptr<host::ControlImpl> control(const QString& name) const {
+    return m_designer->form()->findControl(name);
+  }
+
+  std::shared_ptr<host::ComponentImpl> m_form;
+  DesignerWindow* m_designer = nullptr;
+  std::vector<ide::Connection> m_events;
+  QStringList m_log;
+};
+
+TEST_F(DesignerTest, ControlsAreDrawnAtTheirPlacesInPixels) {
+  FormCanvas* canvas = m_designer->canvas();
+  const QPoint origin = canvas->clientOrigin();
+  // cmdNovoPedido: Left 6240, Top 1440, Width 1455, Height 375 twips.
+  EXPECT_EQ(canvas->rectOf(control(QStringLiteral("cmdNovoPedido"))),
+            QRect(origin + QPoint(416, 96), QSize(97, 25)));
+  // txtPesquisa: Left 120, Top 480, Width 5895, Height 315 twips.
+  EXPECT_EQ(canvas->rectOf(control(QStringLiteral("txtPesquisa"))),
+            QRect(origin + QPoint(8, 32), QSize(393, 21)));
+  EXPECT_TRUE(canvas->rectOf(control(QStringLiteral("mnuArquivo"))).isEmpty())
+      << "menus are not controls on the form";
+  // The client area is ClientWidth 7800 by ClientHeight 5430 twips.
+  EXPECT_GE(canvas->sizeHint().width(), origin.x() + 520);
+  EXPECT_GE(canvas->sizeHint().height(), origin.y() + 362);
+}
+
+TEST_F(DesignerTest, TheDesignerWindowIsTheActiveWindow) {
+  EXPECT_EQ(m_ide.vbe->ActiveWindow(), m_form->designerWindow());
+  EXPECT_EQ(m_window->mdiArea()->activeSubWindow()->windowTitle(),
+            QStringLiteral("Loja - frmPrincipal (Form)"));
+}
+
+TEST_F(DesignerTest, TheToolboxAddsAControlAndTheEventFires) {
+  ASSERT_TRUE(m_window->toolbox().click(QStringLiteral("TextBox")));
+  ASSERT_TRUE(control(QStringLiteral("Text1")));
+  EXPECT_EQ(m_log, QStringList{QStringLiteral("added Text1")});
+  EXPECT_EQ(m_designer->selectedControl(), control(QStringLiteral("Text1")));
+  EXPECT_EQ(m_window->properties().shownValue(QStringLiteral("Name")), QStringLiteral("Text1"));
+  EXPECT_TRUE(m_form->IsDirty());
+}
+
+TEST_F(DesignerTest, EveryIntrinsicControlCanBeAdded) {
+  for (const QString& className : Toolbox::controlClasses())
+    ASSERT_TRUE(m_window->toolbox().click(className)) << className.toStdString();
+  EXPECT_EQ(m_log.size(), Toolbox::controlClasses().size());
+  EXPECT_TRUE(control(QStringLiteral("Command1")));
+  EXPECT_TRUE(control(QStringLiteral("Timer1")));
+  EXPECT_TRUE(control(QStringLiteral("Image1")));
+}
+
+TEST_F(DesignerTest, ChangingNameInTheGridRenamesTheControl) {
+  m_designer->selectControl(control(QStringLiteral("cmdEditar")));
+  settle();
+  ASSERT_TRUE(m_window->properties().applyEdit(QStringLiteral("Name"), QStringLiteral("cmdAlterar")));
+  EXPECT_TRUE(control(QStringLiteral("cmdAlterar")));
+  EXPECT_FALSE(control(QStringLiteral("cmdEditar")));
+  EXPECT_EQ(m_log, QStringList{QStringLiteral("renamed cmdAlterar from cmdEditar (-1)")});
+}
+
+TEST_F(DesignerTest, ChangingIndexInTheGridMakesAnArrayElement) {
+  m_designer->selectControl(control(QStringLiteral("cmdEditar")));
+  ASSERT_TRUE(m_window->properties().applyEdit(QStringLiteral("Index"), QStringLiteral("0")));
+  EXPECT_EQ(control(QStringLiteral("cmdEditar"))->property(QStringLiteral("Index")).toInt(), 0);
+  EXPECT_EQ(m_log, QStringList{QStringLiteral("renamed cmdEditar from cmdEditar (-1)")});
+}
+
+TEST_F(DesignerTest, ARefusedValueIsReportedAndTheGridShowsTheValueAgain) {
+  m_designer->selectControl(control(QStringLiteral("cmdEditar")));
+  m_ide.ui->queueAnswer(ide::mb::OK);
+  EXPECT_FALSE(m_window->properties().applyEdit(QStringLiteral("Name"), QStringLiteral("cmdNovoPedido")));
+  ASSERT_EQ(m_messages.size(), 1);
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Name"))) << m_messages.front().toStdString();
+  EXPECT_EQ(m_window->properties().shownValue(QStringLiteral("Name")), QStringLiteral("cmdEditar"));
+}
+
+TEST_F(DesignerTest, TheGridShowsValueNamesAndChangesProperties) {
+  m_designer->selectControl(nullptr);
+  settle();
+  EXPECT_EQ(m_window->properties().shownValue(QStringLiteral("StartUpPosition")),
+            QStringLiteral("2 - CenterScreen"));
+  EXPECT_EQ(m_window->properties().shownValue(QStringLiteral("BackColor")), QStringLiteral("&H8000000F&"));
+  ASSERT_TRUE(m_window->properties().applyEdit(QStringLiteral("Caption"), QStringLiteral("Loja")));
+  EXPECT_EQ(std::static_pointer_cast<host::ControlImpl>(m_form->form()->Root())
+                ->property(QStringLiteral("Caption"))
+                .toString(),
+            QStringLiteral("Loja"));
+  ASSERT_TRUE(
+      m_window->properties().applyEdit(QStringLiteral("StartUpPosition"), QStringLiteral("1 - CenterOwner")));
+  EXPECT_EQ(m_window->properties().shownValue(QStringLiteral("StartUpPosition")),
+            QStringLiteral("1 - CenterOwner"));
+}
+
+TEST_F(DesignerTest, DraggingMovesTheControlOnTheGrid) {
+  m_window->show();
+  FormCanvas* canvas = m_designer->canvas();
+  auto button = control(QStringLiteral("cmdEditar"));  // Left 6240, Top 960
+  const QPoint start = canvas->rectOf(button).center();
+  QTest::mousePress(canvas, Qt::LeftButton, {}, start);
+  QTest::mouseMove(canvas, start + QPoint(-21, 19));
+  QTest::mouseRelease(canvas, Qt::LeftButton, {}, start + QPoint(-21, 19));
+  // Whole grid steps of 8 pixels (120 twips): -16 and +16 pixels.
+  EXPECT_EQ(button->property(QStringLiteral("Left")).toInt(), 6240 - 240);
+  EXPECT_EQ(button->property(QStringLiteral("Top")).toInt(), 960 + 240);
+}
+
+TEST_F(DesignerTest, DeleteRemovesTheSelectedControlAndTheEventFires) {
+  m_window->show();
+  FormCanvas* canvas = m_designer->canvas();
+  auto button = control(QStringLiteral("cmdEditar"));
+  QTest::mouseClick(canvas, Qt::LeftButton, {}, canvas->rectOf(button).center());
+  ASSERT_EQ(m_designer->selectedControl(), button);
+  QTest::keyClick(canvas, Qt::Key_Delete);
+  EXPECT_FALSE(control(QStringLiteral("cmdEditar")));
+  EXPECT_EQ(m_log, QStringList{QStringLiteral("removed cmdEditar")});
+  EXPECT_EQ(m_designer->selectedControl(), nullptr);
+}
+
+}  // namespace
+}  // namespace desktop

@@ -1,0 +1,188 @@
+// SPDX-License-Identifier: MIT
+// The program itself in script mode, as a user would run it: under Xvfb when it is installed (else on the
+// offscreen platform), on a copy of the example group. The session opens the group, is refused a broken
+// project, adds and types a module, uses the add-in's toolbar and popup menu when the add-in is built, and
+// saves; the test then reads the files.
+#include "testproject.h"
+
+#include <gtest/gtest.h>
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QImage>
+#include <QProcess>
+#include <QRegularExpression>
+#include <QStandardPaths>
+#include <QTemporaryDir>
+
+namespace {
+
+using host::test::ExampleCopy;
+using host::test::readBytes;
+using host::test::writeBytes;
+
+struct Session {
+  int exitCode = -1;
+  QString out;
+  QString err;
+  QString platform;
+};
+
+/// Runs quimbel-ide on a script with the given environment additions.
+Session runIde(const QString& script, const QProcessEnvironment& extra, const QStringList& options) {
+  QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+  for (const QString& key : extra.keys())
+    environment.insert(key, extra.value(key));
+  QString program = QStringLiteral(QUIMBEL_IDE_PROGRAM);
+  QStringList arguments = options;
+  arguments << QStringLiteral("--script") << script;
+  Session session;
+  const QString xvfb = QStandardPaths::findExecutable(QStringLiteral("xvfb-run"));
+  if (!xvfb.isEmpty() && qEnvironmentVariable("QUIMBEL_E2E_PLATFORM") != QLatin1StringView("offscreen")) {
+    arguments.prepend(program);
+    arguments.prepend(QStringLiteral("-a"));
+    program = xvfb;
+    environment.insert(QStringLiteral("QT_QPA_PLATFORM"), QStringLiteral("xcb"));
+    session.platform = QStringLiteral("xcb (Xvfb)");
+  } else {
+    environment.insert(QStringLiteral("QT_QPA_PLATFORM"), QStringLiteral("offscreen"));
+    session.platform = QStringLiteral("offscreen");
+  }
+  QProcess process;
+  process.setProcessEnvironment(environment);
+  process.start(program, arguments);
+  if (!process.waitForFinished(180000)) {
+    process.kill();
+    process.waitForFinished();
+  }
+  session.exitCode = process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1;
+  session.out = QString::fromUtf8(process.readAllStandardOutput());
+  session.err = QString::fromUtf8(process.readAllStandardError());
+  return session;
+}
+
+bool hasAddIn() {
+#ifdef QUIMBEL_ADDIN_LIBRARY
+  return QFileInfo::exists(QStringLiteral(QUIMBEL_ADDIN_LIBRARY));
+#else
+  return false;
+#endif
+}
+
+TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
+  ExampleCopy copy;
+  QTemporaryDir work;
+  const auto before = copy.snapshot();
+  writeBytes(copy.path(QStringLiteral("Broken.vbp")), "Type=Exe\r\nName=\"Broken\"\r\nForm=Falta.frm\r\n");
+
+  QString script = QStringLiteral(
+      "# The example group, a broken project, a new module typed in, saved.\n"
+      "open \"${DEMO}/Demo.vbg\"\n"
+      "expect projects 2\n"
+      "answer OK\n"
+      "open \"${DEMO}/Broken.vbp\"\n"
+      "expect message \"line 3\"\n"
+      "expect projects 2\n"
+      "select Loja.modPrincipal\n"
+      "click \"Menu Bar\" Project \"Add Module\"\n"
+      "type \"Public Function Dobro(ByVal n As Long) As Long\\n    Dobro = n * 2\\nEnd Function\"\n"
+      "expect line 3 \"End Function\"\n"
+      "screenshot \"${OUT}/typed.png\"\n");
+  if (hasAddIn())
+    script += QStringLiteral(
+        "# The add-in's toolbar numbers the module, its popup menu indents it.\n"
+        "code Loja.modPrincipal\n"
+        "click \"Quimbel 2.2\" \"Numerar Linhas\"\n"
+        "wait dialog\n"
+        "set opNumbers1 true\n"
+        "set txtInitial 100\n"
+        "set txtInterval 10\n"
+        "screenshot dialog \"${OUT}/numbering.png\"\n"
+        "press cmdAdd\n"
+        "wait closed\n"
+        "click \"Menu Bar\" Quimbel \"Indentar Código\"\n"
+        "wait dialog\n"
+        "set opIndent1 true\n"
+        "press cmdIndent\n"
+        "wait closed\n");
+  else
+    script += QStringLiteral("expect no-control \"Menu Bar\" Quimbel\n");
+  script += QStringLiteral(
+      "save\n"
+      "screenshot main \"${OUT}/saved.png\"\n");
+  const QString scriptPath = work.filePath(QStringLiteral("session.qis"));
+  writeBytes(scriptPath, script.toUtf8());
+
+  QProcessEnvironment environment;
+  environment.insert(QStringLiteral("DEMO"), QDir(copy.path(QStringLiteral("."))).absolutePath());
+  environment.insert(QStringLiteral("OUT"), work.filePath(QStringLiteral("shots")));
+  environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), work.filePath(QStringLiteral("config")));
+  environment.insert(QStringLiteral("QUIMBEL_DATA_DIR"), work.filePath(QStringLiteral("data")));
+  QStringList options;
+  if (hasAddIn()) {
+#ifdef QUIMBEL_ADDIN_LIBRARY
+    QDir(work.path()).mkpath(QStringLiteral("install/help"));
+    writeBytes(work.filePath(QStringLiteral("quimbel.conf")),
+               "InstallationPath=" + work.filePath(QStringLiteral("install")).toUtf8() + "\n");
+    environment.insert(QStringLiteral("QUIMBEL_MACHINE_CONFIG"),
+                       work.filePath(QStringLiteral("quimbel.conf")));
+    options << QStringLiteral("--addin") << QStringLiteral(QUIMBEL_ADDIN_LIBRARY);
+#endif
+  } else {
+    options << QStringLiteral("--no-addin");
+  }
+  const Session session = runIde(scriptPath, environment, options);
+  ASSERT_EQ(session.exitCode, 0) << "platform " << session.platform.toStdString() << "\nstdout:\n"
+                                 << session.out.toStdString() << "\nstderr:\n"
+                                 << session.err.toStdString();
+
+  // The refused project was told once, with its file and line, and nothing else was.
+  const QStringList boxes = session.out.split(u'\n').filter(QStringLiteral("msgbox: "));
+  ASSERT_EQ(boxes.size(), 1) << session.out.toStdString();
+  EXPECT_TRUE(boxes.front().contains(QStringLiteral("Broken.vbp"))) << boxes.front().toStdString();
+  EXPECT_TRUE(boxes.front().contains(QStringLiteral("line 3"))) << boxes.front().toStdString();
+
+  // The new module and its entry in the project.
+  EXPECT_EQ(
+      readBytes(copy.path(QStringLiteral("Loja/Module1.bas"))),
+      QByteArray("Attribute VB_Name = \"Module1\"\r\n"
+                 "Public Function Dobro(ByVal n As Long) As Long\r\n    Dobro = n * 2\r\nEnd Function\r\n"));
+  EXPECT_TRUE(
+      readBytes(copy.path(QStringLiteral("Loja/Loja.vbp"))).contains("Module=Module1; Module1.bas\r\n"));
+
+  const auto after = copy.snapshot();
+  QStringList changed;
+  for (auto it = before.cbegin(); it != before.cend(); ++it)
+    if (after.value(it.key()) != it.value()) changed << it.key();
+  if (hasAddIn()) {
+    EXPECT_EQ(changed,
+              (QStringList{QStringLiteral("Loja/Loja.vbp"), QStringLiteral("Loja/modPrincipal.bas")}));
+    const QStringList lines = QString::fromLatin1(after.value(QStringLiteral("Loja/modPrincipal.bas")))
+                                  .split(QStringLiteral("\r\n"));
+    // Indenting renumbers too (numbering and indenting run as one command by default), from 10000 in steps
+    // of 5, and indents with tabs.
+    EXPECT_FALSE(lines.filter(QRegularExpression(QStringLiteral("^10000 \\t\\S"))).isEmpty());
+    EXPECT_FALSE(lines.filter(QRegularExpression(QStringLiteral("^10005 \\t\\S"))).isEmpty());
+    EXPECT_TRUE(QFileInfo::exists(work.filePath(QStringLiteral("shots/numbering.png"))));
+  } else {
+    EXPECT_EQ(changed, QStringList{QStringLiteral("Loja/Loja.vbp")});
+  }
+  for (const char* shot : {"shots/typed.png", "shots/saved.png"}) {
+    const QImage image(work.filePath(QLatin1StringView(shot)));
+    EXPECT_GE(image.width(), 1000) << shot;
+    EXPECT_GE(image.height(), 600) << shot;
+  }
+}
+
+TEST(EndToEnd, AScriptMistakeIsReportedWithItsLineBeforeAnythingRuns) {
+  QTemporaryDir work;
+  const QString scriptPath = work.filePath(QStringLiteral("bad.qis"));
+  writeBytes(scriptPath, "open x.vbp\npress\n");
+  const Session session = runIde(scriptPath, {}, {QStringLiteral("--no-addin")});
+  EXPECT_EQ(session.exitCode, 2);
+  EXPECT_TRUE(session.err.contains(scriptPath + QStringLiteral(":2: \"press\" takes 1 argument, not 0")))
+      << session.err.toStdString();
+}
+
+}  // namespace

@@ -1,0 +1,250 @@
+// SPDX-License-Identifier: MIT
+// File and project commands: new, add, remove, save, save as, close with the questions about unsaved
+// changes; broken or unreadable input opens nothing and names what failed; a failed save keeps what is on
+// disk and says what failed; the Add-In Manager loads and unloads add-ins.
+#include "addinmanager.h"
+#include "codebinding.h"
+#include "codeeditor.h"
+#include "codewindow.h"
+#include "host/model/addins.h"
+#include "host/model/events.h"
+#include "idecommands.h"
+#include "idefixture.h"
+#include "projectexplorer.h"
+#include "windowmanager.h"
+
+#include <gtest/gtest.h>
+
+#include <QCheckBox>
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QMdiArea>
+#include <QProcess>
+#include <QTemporaryDir>
+#include <QTextCursor>
+
+namespace desktop {
+namespace {
+
+using host::test::readBytes;
+using host::test::writeBytes;
+using test::settle;
+using test::waitFor;
+
+class FilesTest : public test::IdeTest {
+ protected:
+  IdeCommands& commands() { return m_window->commands(); }
+  void selectLoja() {
+    m_window->explorer().selectComponent(component(QStringLiteral("Loja"), QStringLiteral("modPrincipal")));
+  }
+};
+
+TEST_F(FilesTest, AddModuleAddsToTheCurrentProjectAndOpensItsCode) {
+  selectLoja();
+  QStringList added;
+  auto sink = m_ide.vbe->events().components->ItemAdded.connect(
+      [&](const ide::Ref<ide::VBComponent>& c) { added << c->Name(); });
+  commands().run(host::BuiltinCommand::AddModule);
+  settle();
+  EXPECT_EQ(added, QStringList{QStringLiteral("Module1")});
+  auto module = component(QStringLiteral("Loja"), QStringLiteral("Module1"));
+  ASSERT_TRUE(module);
+  EXPECT_EQ(m_ide.vbe->ActiveCodePane(), module->codeModule()->pane());
+  commands().run(host::BuiltinCommand::AddForm);
+  settle();
+  auto form = component(QStringLiteral("Loja"), QStringLiteral("Form1"));
+  ASSERT_TRUE(form);
+  EXPECT_EQ(m_ide.vbe->ActiveWindow(), form->designerWindow());
+}
+
+TEST_F(FilesTest, SaveWritesWhatWasTyped) {
+  auto principal = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  principal->codeModule()->pane()->SetSelection(1, 1, 1, 1);
+  auto* code = m_window->windows().activeCodeWindow();
+  ASSERT_NE(code, nullptr);
+  QTextCursor cursor = code->editor()->textCursor();
+  cursor.insertText(QStringLiteral("' gravado pela IDE\n"));
+  const auto before = m_copy.snapshot();
+  ASSERT_TRUE(commands().saveAll());
+  const auto after = m_copy.snapshot();
+  for (auto it = before.cbegin(); it != before.cend(); ++it) {
+    if (it.key() == QLatin1StringView("Loja/modPrincipal.bas")) continue;
+    EXPECT_EQ(after.value(it.key()), it.value()) << it.key().toStdString();
+  }
+  EXPECT_TRUE(
+      after.value(QStringLiteral("Loja/modPrincipal.bas"))
+          .contains("Attribute VB_Name = \"modPrincipal\"\r\n' gravado pela IDE\r\nOption Explicit\r\n"));
+  EXPECT_FALSE(principal->IsDirty());
+}
+
+TEST_F(FilesTest, SaveAsMovesTheProjectFileAndFiresTheEvent) {
+  QStringList changes;
+  auto sink = m_ide.vbe->events().files->AfterChangeFileName.connect(
+      [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& newName, const QString&) {
+        changes << QStringLiteral("%1 %2").arg(static_cast<int>(type)).arg(QFileInfo(newName).fileName());
+      });
+  auto project = m_ide.vbe->project(QStringLiteral("Loja"));
+  const QString target = m_copy.path(QStringLiteral("Loja/LojaNova.vbp"));
+  ASSERT_TRUE(commands().saveProjectAs(project, target));
+  EXPECT_EQ(changes, QStringList{QStringLiteral("3 LojaNova.vbp")});
+  EXPECT_TRUE(QFileInfo::exists(target));
+  EXPECT_EQ(project->FileName(), target);
+}
+
+TEST_F(FilesTest, RemovingAChangedComponentAsksFirst) {
+  auto clientes = component(QStringLiteral("Loja"), QStringLiteral("clsClientes"));
+  clientes->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  m_window->explorer().selectComponent(clientes);
+  m_ide.ui->queueAnswer(ide::mb::Cancel);
+  commands().run(host::BuiltinCommand::RemoveComponent);
+  EXPECT_TRUE(component(QStringLiteral("Loja"), QStringLiteral("clsClientes")));
+  ASSERT_EQ(m_messages.size(), 1);
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("clsClientes")));
+  m_ide.ui->queueAnswer(ide::mb::No);
+  commands().run(host::BuiltinCommand::RemoveComponent);
+  EXPECT_FALSE(component(QStringLiteral("Loja"), QStringLiteral("clsClientes")));
+}
+
+TEST_F(FilesTest, ClosingAProjectWithChangesAsksAndCancelKeepsIt) {
+  auto project = m_ide.vbe->project(QStringLiteral("Utilitarios"));
+  project->component(QStringLiteral("modApi"))->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  m_ide.ui->queueAnswer(ide::mb::Cancel);
+  EXPECT_FALSE(commands().closeProject(project));
+  EXPECT_EQ(m_ide.vbe->projects().size(), 2u);
+  ASSERT_EQ(m_messages.size(), 1);
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("modApi.bas"))) << m_messages.front().toStdString();
+  const QByteArray onDisk = readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas")));
+  m_ide.ui->queueAnswer(ide::mb::No);
+  EXPECT_TRUE(commands().closeProject(project));
+  EXPECT_EQ(m_ide.vbe->projects().size(), 1u);
+  EXPECT_EQ(readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas"))), onDisk)
+      << "No discards the change";
+}
+
+TEST_F(FilesTest, AnAnswerOfYesSavesBeforeClosing) {
+  auto project = m_ide.vbe->project(QStringLiteral("Utilitarios"));
+  project->component(QStringLiteral("modApi"))->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  m_ide.ui->queueAnswer(ide::mb::Yes);
+  EXPECT_TRUE(commands().closeProject(project));
+  EXPECT_TRUE(readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas"))).contains("' mudado\r\n"));
+}
+
+TEST_F(FilesTest, NewProjectReplacesTheProjectsWithAFreshOneAndItsForm) {
+  m_ide.ui->queueAnswer(ide::mb::No);
+  commands().run(host::BuiltinCommand::NewProject);
+  settle();
+  ASSERT_EQ(m_ide.vbe->projects().size(), 1u);
+  auto project = m_ide.vbe->projects().front();
+  EXPECT_EQ(project->Name(), QStringLiteral("Project1"));
+  ASSERT_EQ(project->components().size(), 1u);
+  EXPECT_EQ(project->components().front()->Name(), QStringLiteral("Form1"));
+  EXPECT_EQ(m_ide.vbe->ActiveWindow(), project->components().front()->designerWindow());
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Bad input
+
+TEST_F(FilesTest, ABrokenProjectIsNamedWithItsLineAndNothingOpens) {
+  QTemporaryDir dir;
+  writeBytes(dir.filePath(QStringLiteral("Broken.vbp")),
+             "Type=Exe\r\nModule=modA; modA.bas\r\nForm=Falta.frm\r\nName=\"Broken\"\r\n");
+  writeBytes(dir.filePath(QStringLiteral("modA.bas")), "Attribute VB_Name = \"modA\"\r\nOption Explicit\r\n");
+  m_ide.ui->queueAnswer(ide::mb::OK);
+  EXPECT_FALSE(commands().open(dir.filePath(QStringLiteral("Broken.vbp")), false));
+  EXPECT_EQ(m_ide.vbe->projects().size(), 2u);
+  ASSERT_EQ(m_messages.size(), 1);
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Broken.vbp"))) << m_messages.front().toStdString();
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("line 3"))) << m_messages.front().toStdString();
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Falta.frm"))) << m_messages.front().toStdString();
+}
+
+TEST_F(FilesTest, AnUnreadableFileIsNamed) {
+  QTemporaryDir dir;
+  QDir(dir.path()).mkdir(QStringLiteral("Pasta.vbp"));
+  m_ide.ui->queueAnswer(ide::mb::OK);
+  EXPECT_FALSE(commands().open(dir.filePath(QStringLiteral("Pasta.vbp")), false));
+  ASSERT_EQ(m_messages.size(), 1);
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Pasta.vbp")));
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("directory")));
+  EXPECT_EQ(m_ide.vbe->projects().size(), 2u);
+}
+
+TEST_F(FilesTest, AFailedSaveKeepsTheFilesOnDiskAndSaysWhatFailed) {
+  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  // The file's folder is a plain file: nobody, not even root, can write there.
+  writeBytes(m_copy.path(QStringLiteral("bloqueio")), "x");
+  api->setFilePath(m_copy.path(QStringLiteral("bloqueio/modApi.bas")));
+  const auto before = m_copy.snapshot();
+  m_ide.ui->queueAnswer(ide::mb::OK);
+  EXPECT_FALSE(commands().saveAll());
+  ASSERT_FALSE(m_messages.isEmpty());
+  EXPECT_TRUE(m_messages.last().contains(QStringLiteral("bloqueio/modApi.bas")))
+      << m_messages.last().toStdString();
+  EXPECT_EQ(m_copy.snapshot(), before);
+  EXPECT_TRUE(api->IsDirty());
+}
+
+/// A small file system of its own, for a disk that is full; needs the right to mount (root in CI).
+class SmallDisk {
+ public:
+  SmallDisk() {
+    m_mounted = QProcess::execute(QStringLiteral("mount"),
+                                  {QStringLiteral("-t"), QStringLiteral("tmpfs"), QStringLiteral("-o"),
+                                   QStringLiteral("size=64k"), QStringLiteral("tmpfs"), m_dir.path()}) == 0;
+  }
+  ~SmallDisk() {
+    if (m_mounted) QProcess::execute(QStringLiteral("umount"), {m_dir.path()});
+  }
+  bool mounted() const { return m_mounted; }
+  QString path(const QString& name) const { return m_dir.filePath(name); }
+
+ private:
+  QTemporaryDir m_dir;
+  bool m_mounted = false;
+};
+
+TEST_F(FilesTest, AWriteToAFullDiskKeepsTheOldFile) {
+  SmallDisk disk;
+  if (!disk.mounted()) GTEST_SKIP() << "cannot mount a small file system here";
+  const QByteArray original = readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas")));
+  writeBytes(disk.path(QStringLiteral("modApi.bas")), original);
+  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  api->setFilePath(disk.path(QStringLiteral("modApi.bas")));
+  QStringList lines;
+  for (int i = 0; i < 2000; ++i)
+    lines << QStringLiteral("' linha de enchimento número %1 para encher o disco").arg(i);
+  api->codeModule()->InsertLines(1, lines.join(QStringLiteral("\r\n")));
+  m_ide.ui->queueAnswer(ide::mb::OK);
+  EXPECT_FALSE(commands().saveComponent(api, false));
+  ASSERT_FALSE(m_messages.isEmpty());
+  EXPECT_TRUE(m_messages.last().contains(QStringLiteral("modApi"))) << m_messages.last().toStdString();
+  EXPECT_EQ(readBytes(disk.path(QStringLiteral("modApi.bas"))), original);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Add-In Manager
+
+TEST_F(FilesTest, TheAddInManagerLoadsAndUnloadsAnAddIn) {
+  auto addIn = m_ide.vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_TEST_ADDIN), false);
+  {
+    AddInManagerDialog dialog(m_ide.vbe->addIns(), m_window.get());
+    dialog.findChild<QCheckBox*>(QStringLiteral("loadedCheck"))->setChecked(true);
+    dialog.findChild<QCheckBox*>(QStringLiteral("startupCheck"))->setChecked(true);
+    dialog.apply({});
+  }
+  EXPECT_TRUE(addIn->Connect());
+  EXPECT_TRUE(addIn->loadOnStartup());
+  {
+    AddInManagerDialog dialog(m_ide.vbe->addIns(), m_window.get());
+    EXPECT_TRUE(dialog.findChild<QCheckBox*>(QStringLiteral("loadedCheck"))->isChecked());
+    dialog.findChild<QCheckBox*>(QStringLiteral("loadedCheck"))->setChecked(false);
+    dialog.apply({});
+  }
+  EXPECT_TRUE(waitFor([&] { return !addIn->Connect(); }));
+}
+
+}  // namespace
+}  // namespace desktop

@@ -1,0 +1,289 @@
+// SPDX-License-Identifier: MIT
+// The main window over the model: the project explorer and the selected component, code windows in the MDI
+// area following the model's active window and window state, the keyboard focus, hotkeys delivered to the
+// code window's procedures before the editor, the IDE mode and the code window's context menu.
+#include "codebinding.h"
+#include "codeeditor.h"
+#include "codewindow.h"
+#include "commandbarview.h"
+#include "host/model/events.h"
+#include "idefixture.h"
+#include "projectexplorer.h"
+#include "windowmanager.h"
+
+#include <gtest/gtest.h>
+
+#include <QMdiArea>
+#include <QMdiSubWindow>
+#include <QMenu>
+#include <QTest>
+#include <QTreeWidgetItem>
+
+namespace desktop {
+namespace {
+
+using test::settle;
+using test::waitFor;
+
+class MainWindowTest : public test::IdeTest {};
+
+// ---------------------------------------------------------------------------------------------------
+// Explorer and selection
+
+TEST_F(MainWindowTest, TheExplorerListsProjectsAndComponentsByType) {
+  ProjectExplorer& explorer = m_window->explorer();
+  explorer.refresh();
+  ASSERT_EQ(explorer.topLevelItemCount(), 2);
+  QTreeWidgetItem* loja = explorer.topLevelItem(0);
+  EXPECT_EQ(loja->text(0), QStringLiteral("Loja (Loja.vbp)"));
+  QStringList folders;
+  for (int i = 0; i < loja->childCount(); ++i)
+    folders << loja->child(i)->text(0);
+  EXPECT_EQ(folders, (QStringList{QStringLiteral("Forms"), QStringLiteral("Modules"),
+                                  QStringLiteral("Class Modules")}));
+  QTreeWidgetItem* forms = loja->child(0);
+  ASSERT_EQ(forms->childCount(), 3);
+  EXPECT_EQ(forms->child(0)->text(0), QStringLiteral("frmPrincipal (frmPrincipal.frm)"));
+}
+
+TEST_F(MainWindowTest, SelectingAComponentSelectsItInTheIdeAndFiresTheEvent) {
+  QStringList selected;
+  auto connection = m_ide.vbe->events().components->ItemSelected.connect(
+      [&](const ide::Ref<ide::VBComponent>& c) { selected << c->Name(); });
+  auto clientes = component(QStringLiteral("Loja"), QStringLiteral("clsClientes"));
+  m_window->explorer().refresh();
+  m_window->explorer().setCurrentItem(m_window->explorer().itemOf(clientes.get()));
+  EXPECT_EQ(m_ide.vbe->SelectedVBComponent(), clientes);
+  EXPECT_EQ(selected, QStringList{QStringLiteral("clsClientes")});
+}
+
+TEST_F(MainWindowTest, TheExplorerFollowsTheSelectionOfTheModel) {
+  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  m_ide.vbe->selectComponent(api);
+  settle();
+  EXPECT_EQ(m_window->explorer().componentOf(m_window->explorer().currentItem()), api);
+}
+
+TEST_F(MainWindowTest, AddedAndRemovedComponentsAppearAndVanish) {
+  auto project = m_ide.vbe->project(QStringLiteral("Utilitarios"));
+  auto added = std::static_pointer_cast<host::ComponentImpl>(project->Add(ide::ComponentType::ClassModule));
+  settle();
+  ASSERT_NE(m_window->explorer().itemOf(added.get()), nullptr);
+  EXPECT_EQ(m_window->explorer().itemOf(added.get())->text(0), QStringLiteral("Class1"));
+  project->Remove(added);
+  settle();
+  EXPECT_EQ(m_window->explorer().itemOf(added.get()), nullptr);
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Windows
+
+TEST_F(MainWindowTest, DoubleClickingAModuleOpensItsCodeWindow) {
+  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  ASSERT_NE(sub, nullptr);
+  EXPECT_EQ(sub->windowTitle(), QStringLiteral("Loja - modPrincipal (Code)"));
+  auto pane = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane();
+  EXPECT_EQ(m_ide.vbe->ActiveCodePane(), pane);
+  EXPECT_EQ(m_ide.vbe->ActiveWindow(), pane->window());
+  EXPECT_EQ(m_window->mdiArea()->activeSubWindow(), sub);
+}
+
+TEST_F(MainWindowTest, ActivationFollowsBothWays) {
+  QMdiSubWindow* principal = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  QMdiSubWindow* api = openCode(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  ASSERT_TRUE(principal && api);
+  auto principalPane =
+      component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane();
+  auto apiPane = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"))->codeModule()->pane();
+  EXPECT_EQ(m_ide.vbe->ActiveCodePane(), apiPane);
+  m_window->mdiArea()->setActiveSubWindow(principal);
+  EXPECT_EQ(m_ide.vbe->ActiveCodePane(), principalPane);
+  EXPECT_EQ(m_ide.vbe->ActiveVBProject()->Name(), QStringLiteral("Loja"));
+  apiPane->Show();
+  EXPECT_EQ(m_window->mdiArea()->activeSubWindow(), api);
+}
+
+TEST_F(MainWindowTest, MinimisedStateFollowsBothWays) {
+  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  ASSERT_NE(sub, nullptr);
+  auto window =
+      component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane()->window();
+  window->setWindowState(ide::WindowState::Minimize);
+  EXPECT_TRUE(sub->isMinimized());
+  window->setWindowState(ide::WindowState::Normal);
+  EXPECT_FALSE(sub->isMinimized());
+  sub->showMinimized();
+  EXPECT_EQ(window->WindowState(), ide::WindowState::Minimize);
+  sub->showNormal();
+  EXPECT_EQ(window->WindowState(), ide::WindowState::Normal);
+}
+
+TEST_F(MainWindowTest, ClosingWorksFromEitherSide) {
+  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  ASSERT_NE(sub, nullptr);
+  auto window =
+      component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane()->window();
+  QPointer<QMdiSubWindow> guard = sub;
+  window->Close();
+  settle();
+  EXPECT_TRUE(guard.isNull());
+  EXPECT_TRUE(m_window->mdiArea()->subWindowList().isEmpty());
+
+  sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  ASSERT_NE(sub, nullptr);
+  EXPECT_TRUE(window->isOpen());
+  sub->close();
+  settle();
+  EXPECT_FALSE(window->isOpen());
+  EXPECT_EQ(m_ide.vbe->ActiveCodePane(), nullptr);
+}
+
+TEST_F(MainWindowTest, TheKeyboardFocusIsTheWindowOfTheFocusedWidget) {
+  activate();
+  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  ASSERT_NE(sub, nullptr);
+  auto* code = qobject_cast<CodeWindow*>(sub->widget());
+  auto window = code->window();
+  code->editor()->setFocus();
+  ASSERT_TRUE(waitFor([&] { return code->editor()->hasFocus(); }));
+  EXPECT_EQ(m_ide.vbe->windowSystem().GetFocus(), window->hWnd());
+  m_window->explorer().setFocus();
+  ASSERT_TRUE(waitFor([&] { return m_window->explorer().hasFocus(); }));
+  EXPECT_EQ(m_ide.vbe->windowSystem().GetFocus(), m_ide.vbe->projectWindow()->hWnd());
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Hotkeys
+
+/// A window procedure put in front of the code window's own, as an add-in does: it takes the hotkeys it
+/// is told to and passes everything else on.
+struct HotKeyHook {
+  HotKeyHook(host::WindowSystemImpl& windows, ide::HWnd window, bool take)
+      : windows(windows), window(window) {
+    old = windows.GetWindowProc(window);
+    windows.SetWindowProc(window,
+                          std::make_shared<const ide::WndProc>(
+                              [this, take](ide::HWnd h, unsigned message, quintptr wParam, qintptr lParam) {
+                                if (message == ide::msg::HotKey) {
+                                  received.push_back(static_cast<int>(wParam));
+                                  if (take) return qintptr(0);
+                                }
+                                return this->windows.CallWindowProc(old, h, message, wParam, lParam);
+                              }));
+  }
+  ~HotKeyHook() { windows.SetWindowProc(window, old); }
+  host::WindowSystemImpl& windows;
+  ide::HWnd window;
+  ide::WndProcRef old;
+  std::vector<int> received;
+};
+
+class HotKeys : public test::IdeTest {
+ protected:
+  void SetUp() override {
+    IdeTest::SetUp();
+    activate();
+    QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+    ASSERT_NE(sub, nullptr);
+    m_code = qobject_cast<CodeWindow*>(sub->widget());
+    m_code->editor()->setFocus();
+    ASSERT_TRUE(waitFor([&] { return m_code->editor()->hasFocus(); }));
+    m_hwnd = m_code->window()->hWnd();
+  }
+  host::WindowSystemImpl& windows() { return m_ide.vbe->windowSystem(); }
+  bool allSelected() const { return m_code->editor()->textCursor().selectedText().size() > 100; }
+
+  CodeWindow* m_code = nullptr;
+  ide::HWnd m_hwnd = 0;
+};
+
+TEST_F(HotKeys, ARegisteredHotKeyReachesTheProcedureAndNotTheEditor) {
+  HotKeyHook hook(windows(), m_hwnd, true);
+  ASSERT_TRUE(windows().RegisterHotKey(m_hwnd, 0xC101, ide::mod::Control | ide::mod::Alt, 'A'));
+  const QString before = m_code->editor()->toPlainText();
+  QTest::keyClick(m_code->editor(), Qt::Key_A, Qt::ControlModifier | Qt::AltModifier);
+  EXPECT_EQ(hook.received, std::vector<int>{0xC101});
+  EXPECT_EQ(m_code->editor()->toPlainText(), before);
+}
+
+TEST_F(HotKeys, AHotKeyTheChainPassesOnReachesTheEditor) {
+  HotKeyHook hook(windows(), m_hwnd, false);
+  ASSERT_TRUE(windows().RegisterHotKey(m_hwnd, 0xC102, ide::mod::Control, 'A'));
+  QTest::keyClick(m_code->editor(), Qt::Key_A, Qt::ControlModifier);
+  EXPECT_EQ(hook.received, std::vector<int>{0xC102});
+  EXPECT_TRUE(allSelected()) << "Ctrl+A went on to the editor, which selected everything";
+}
+
+TEST_F(HotKeys, AnUnregisteredCombinationReachesTheEditorUnchanged) {
+  HotKeyHook hook(windows(), m_hwnd, true);
+  QTest::keyClick(m_code->editor(), Qt::Key_A, Qt::ControlModifier);
+  EXPECT_TRUE(hook.received.empty());
+  EXPECT_TRUE(allSelected());
+}
+
+TEST_F(HotKeys, AShiftedDigitIsDeliveredOnItsKey) {
+  HotKeyHook hook(windows(), m_hwnd, true);
+  ASSERT_TRUE(windows().RegisterHotKey(m_hwnd, 0xC103, ide::mod::Control | ide::mod::Shift, '1'));
+  QTest::keyClick(m_code->editor(), Qt::Key_Exclam, Qt::ControlModifier | Qt::ShiftModifier);
+  EXPECT_EQ(hook.received, std::vector<int>{0xC103});
+}
+
+TEST_F(HotKeys, ARegisteredHotKeyGoesBeforeAMenuShortcut) {
+  // Ctrl+R is the menu's Project Explorer shortcut, which moves the focus to the explorer.
+  {
+    HotKeyHook hook(windows(), m_hwnd, true);
+    ASSERT_TRUE(windows().RegisterHotKey(m_hwnd, 0xC104, ide::mod::Control, 'R'));
+    QTest::keyClick(m_code->editor(), Qt::Key_R, Qt::ControlModifier);
+    settle();
+    EXPECT_EQ(hook.received, std::vector<int>{0xC104});
+    EXPECT_TRUE(m_code->editor()->hasFocus());
+    windows().UnregisterHotKey(m_hwnd, 0xC104);
+  }
+  QTest::keyClick(m_code->editor(), Qt::Key_R, Qt::ControlModifier);
+  ASSERT_TRUE(waitFor([&] { return m_window->explorer().hasFocus(); }));
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Mode and context menus
+
+TEST_F(MainWindowTest, RunCommandsSwitchTheModeAndTheTitle) {
+  auto run = [&](const QString& caption) {
+    m_window->commandBars().syncNow();
+    auto control = m_ide.vbe->commandBars()->bar(QStringLiteral("Run"))->findControl(caption);
+    ASSERT_TRUE(control);
+    m_window->commandBars().click(control);
+    settle();
+  };
+  EXPECT_TRUE(m_window->windowTitle().endsWith(QStringLiteral("[design]")));
+  run(QStringLiteral("Start"));
+  EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Run);
+  EXPECT_TRUE(m_window->windowTitle().endsWith(QStringLiteral("[run]")));
+  run(QStringLiteral("Break"));
+  EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Break);
+  EXPECT_EQ(m_window->codeWindowMenuName(), QStringLiteral("Code Window (Break)"));
+  run(QStringLiteral("End"));
+  EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Design);
+  EXPECT_EQ(m_window->codeWindowMenuName(), QStringLiteral("Code Window"));
+}
+
+TEST_F(MainWindowTest, TheTitleNamesTheActiveProject) {
+  EXPECT_EQ(m_window->windowTitle(), QStringLiteral("Utilitarios - Quimbel IDE [design]"));
+  m_ide.vbe->setActiveVBProject(m_ide.vbe->project(QStringLiteral("Loja")));
+  settle();
+  EXPECT_EQ(m_window->windowTitle(), QStringLiteral("Loja - Quimbel IDE [design]"));
+}
+
+TEST_F(MainWindowTest, AContextMenuHoldsTheControlsOfItsBar) {
+  auto bar = m_ide.vbe->commandBars()->bar(QStringLiteral("Code Window (Break)"));
+  QMenu menu;
+  m_window->commandBars().fillMenu(&menu, bar);
+  QStringList captions;
+  for (QAction* action : menu.actions())
+    if (!action->isSeparator()) captions << action->text();
+  EXPECT_EQ(captions, (QStringList{QStringLiteral("Cu&t"), QStringLiteral("&Copy"), QStringLiteral("&Paste"),
+                                   QStringLiteral("Add &Watch...")}));
+  EXPECT_FALSE(menu.actions().last()->isEnabled());
+}
+
+}  // namespace
+}  // namespace desktop

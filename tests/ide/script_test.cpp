@@ -1,0 +1,140 @@
+// SPDX-License-Identifier: MIT
+// Script mode inside the test process: the language is checked before anything runs (with the script line
+// in every error), and a running script drives the IDE, dialogs included.
+#include "codebinding.h"
+#include "codewindow.h"
+#include "host/model/addins.h"
+#include "idefixture.h"
+#include "scriptrunner.h"
+#include "windowmanager.h"
+
+#include <gtest/gtest.h>
+
+#include <QFileInfo>
+#include <QImage>
+#include <QTemporaryDir>
+
+namespace desktop {
+namespace {
+
+using test::waitFor;
+
+class ScriptTest : public test::IdeTest {
+ protected:
+  /// Runs a script to its end; returns its exit code (-1 when it did not end).
+  int run(const QString& text) {
+    activate();
+    ScriptRunner runner(*m_window, *m_ide.ui);
+    runner.setExitOnFinish(false);
+    runner.setPatience(3000);
+    QString error;
+    if (!runner.parse(text, QStringLiteral("test.qis"), &error)) {
+      m_error = error;
+      return 2;
+    }
+    int code = -1;
+    QObject::connect(&runner, &ScriptRunner::finished, [&](int exitCode) { code = exitCode; });
+    runner.start();
+    if (!waitFor([&] { return code >= 0; }, 20000)) return -1;
+    m_error = runner.error();
+    return code;
+  }
+  QString parseError(const QString& text) {
+    ScriptRunner runner(*m_window, *m_ide.ui);
+    QString error;
+    runner.parse(text, QStringLiteral("s.qis"), &error);
+    return error;
+  }
+  QString m_error;
+};
+
+TEST_F(ScriptTest, MistakesAreFoundBeforeRunningAndNameTheLine) {
+  EXPECT_EQ(parseError(QStringLiteral("# comment\n\nclik Standard Save\n")),
+            QStringLiteral("s.qis:3: unknown command \"clik\""));
+  EXPECT_EQ(parseError(QStringLiteral("caret 1\n")),
+            QStringLiteral("s.qis:1: \"caret\" takes 2 arguments, not 1"));
+  EXPECT_EQ(parseError(QStringLiteral("save\ntype \"abc\n")), QStringLiteral("s.qis:2: unclosed quote"));
+  EXPECT_EQ(parseError(QStringLiteral("open ${NO_SUCH_VARIABLE_HERE}/x.vbp\n")),
+            QStringLiteral("s.qis:1: unknown variable ${NO_SUCH_VARIABLE_HERE}"));
+  EXPECT_EQ(
+      parseError(QStringLiteral("answer Maybe\n")),
+      QStringLiteral("s.qis:1: \"Maybe\" is not an answer (OK, Cancel, Yes, No, Abort, Retry, Ignore)"));
+}
+
+TEST_F(ScriptTest, WordsAreSplitWithQuotesEscapesAndVariables) {
+  qputenv("QUIMBEL_SCRIPT_TEST_DIR", "/tmp/x y");
+  ScriptRunner runner(*m_window, *m_ide.ui);
+  QString error;
+  ASSERT_TRUE(runner.parse(
+      QStringLiteral("type \"a \\\"b\\\"\\nc\" # comment\nopen ${QUIMBEL_SCRIPT_TEST_DIR}/p.vbp\n"
+                     "click \"Menu Bar\" \"&File\" Save#1\n"),
+      QStringLiteral("s"), &error))
+      << error.toStdString();
+  qunsetenv("QUIMBEL_SCRIPT_TEST_DIR");
+  ASSERT_EQ(runner.steps().size(), 3u);
+  EXPECT_EQ(runner.steps()[0].arguments, QStringList{QStringLiteral("a \"b\"\nc")});
+  EXPECT_EQ(runner.steps()[1].arguments, QStringList{QStringLiteral("/tmp/x y/p.vbp")});
+  EXPECT_EQ(runner.steps()[2].arguments,
+            (QStringList{QStringLiteral("Menu Bar"), QStringLiteral("&File"), QStringLiteral("Save#1")}));
+  EXPECT_EQ(runner.steps()[2].line, 3);
+}
+
+TEST_F(ScriptTest, AScriptEditsCodeThroughTheEditor) {
+  const int code =
+      run(QStringLiteral("code Loja.modPrincipal\n"
+                         "caret 1 1\n"
+                         "type \"' primeira\\n\"\n"
+                         "expect line 1 \"' primeira\"\n"
+                         "expect line 2 \"Option Explicit\"\n"
+                         "key Ctrl+Z\n"
+                         "expect line 1 \"' primeiraOption Explicit\"\n"
+                         "key Ctrl+Z\n"
+                         "expect line 1 \"Option Explicit\"\n"
+                         "expect line 2 \"\"\n"));
+  EXPECT_EQ(code, 0) << m_error.toStdString();
+}
+
+TEST_F(ScriptTest, AFailingStepEndsTheScriptWithItsLine) {
+  EXPECT_EQ(run(QStringLiteral("echo one\nselect Loja.naoExiste\necho never\n")), 1);
+  EXPECT_EQ(m_error, QStringLiteral("test.qis:2: no component \"Loja.naoExiste\" is open"));
+  EXPECT_EQ(run(QStringLiteral("code Loja.modPrincipal\nexpect line 1 \"Outra coisa\"\n")), 1);
+  EXPECT_EQ(m_error, QStringLiteral("test.qis:2: line 1 is \"Option Explicit\", not \"Outra coisa\""));
+}
+
+TEST_F(ScriptTest, AModalDialogIsDrivenWhileItIsOpen) {
+  auto addIn = m_ide.vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_TEST_ADDIN), false);
+  QTemporaryDir dir;
+  const QString shot = dir.filePath(QStringLiteral("manager.png"));
+  const int code = run(QStringLiteral("click \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n"
+                                      "set addInList \"Add-in of the IDE model's tests\"\n"
+                                      "set loadedCheck true\n"
+                                      "screenshot dialog \"%1\"\n"
+                                      "press OK\n"
+                                      "expect control \"Add-Ins\" \"Test Add-In\"\n")
+                           .arg(shot));
+  EXPECT_EQ(code, 0) << m_error.toStdString();
+  EXPECT_TRUE(addIn->Connect());
+  QImage image(shot);
+  EXPECT_FALSE(image.isNull());
+  EXPECT_GT(image.width(), 300);
+  addIn->setConnect(false);
+  waitFor([&] { return !addIn->Connect(); });
+}
+
+TEST_F(ScriptTest, MessageBoxesAreAnsweredAndRemembered) {
+  const int code =
+      run(QStringLiteral("answer OK\n"
+                         "click \"Menu Bar\" Help \"About Quimbel IDE...\"\n"
+                         "expect message \"Quimbel IDE\"\n"));
+  EXPECT_EQ(code, 0) << m_error.toStdString();
+  ASSERT_EQ(m_messages.size(), 1);
+  EXPECT_TRUE(m_messages.front().startsWith(QStringLiteral("About Quimbel IDE: Quimbel IDE ")));
+}
+
+TEST_F(ScriptTest, AScriptThatLeavesADialogOpenFails) {
+  EXPECT_EQ(run(QStringLiteral("click \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n")), 1);
+  EXPECT_TRUE(m_error.contains(QStringLiteral("Add-In Manager"))) << m_error.toStdString();
+}
+
+}  // namespace
+}  // namespace desktop
