@@ -56,7 +56,14 @@ CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget*
   connect(m_editor, &CodeEditor::contextMenuWanted, this, &CodeWindow::contextMenuWanted);
   connect(m_binding, &CodeBinding::editRejected, this, &CodeWindow::editRejected);
   connect(m_binding, &CodeBinding::caretMoved, this, &CodeWindow::caretMoved);
-  connect(m_binding, &CodeBinding::caretMoved, this, [this] { m_caretTimer.start(); });
+  // Moving the caret shows its procedure at once; while the text changes, the module's structure is
+  // only looked up when the typing pauses.
+  connect(m_binding, &CodeBinding::caretMoved, this, [this] {
+    if (m_editor->document()->revision() == m_shownRevision)
+      showProcedureOfCaret();
+    else
+      m_caretTimer.start();
+  });
   connect(m_procedures, &QComboBox::activated, this, &CodeWindow::jumpToProcedure);
   m_caretTimer.setSingleShot(true);
   m_caretTimer.setInterval(150);
@@ -85,6 +92,7 @@ void CodeWindow::fillProcedures() {
 }
 
 void CodeWindow::showProcedureOfCaret() {
+  m_shownRevision = m_editor->document()->revision();
   auto pane = m_binding->pane();
   auto& text = m_binding->module()->text();
   const int line = pane->selection().startLine;

@@ -45,6 +45,7 @@ class CodeWindow final : public QWidget {
   CodeBinding* m_binding;
   QTimer m_caretTimer;
   bool m_filling = false;
+  int m_shownRevision = -1;
 };
 
 }  // namespace desktop

@@ -374,7 +374,12 @@ void FormCanvas::paintControl(QPainter& painter, const std::shared_ptr<host::Con
     const int horizontal = alignment == 1   ? Qt::AlignRight
                            : alignment == 2 ? Qt::AlignHCenter
                                             : Qt::AlignLeft;
-    drawMnemonicText(r.adjusted(1, 1, -1, -1), horizontal | Qt::AlignTop | Qt::TextWordWrap, caption);
+    // An AutoSize label is as wide as its caption in the IDE's font; ours may be wider, so it is not cut
+    // or wrapped.
+    const bool autoSize = valueOf(c, QStringLiteral("AutoSize")).toBool();
+    const bool wrap = !autoSize;
+    drawMnemonicText(autoSize ? r.adjusted(1, 1, 200, -1) : r.adjusted(1, 1, -1, -1),
+                     horizontal | Qt::AlignTop | (wrap ? Qt::TextWordWrap : 0), caption);
   } else if (bare == QLatin1StringView("TextBox")) {
     sunkenBox(colorOf(c, QStringLiteral("BackColor"), Qt::white));
     painter.setPen(fore);

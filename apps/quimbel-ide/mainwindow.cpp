@@ -137,7 +137,10 @@ void MainWindow::buildDocks() {
   splitDockWidget(m_explorerDock, m_propertiesDock, Qt::Vertical);
 
   m_toolbox = new Toolbox(this);
+  m_toolbox->setMinimumWidth(84);
   m_toolboxDock = new QDockWidget(QStringLiteral("General"), this);
+  // Room for its title: the toolbox is narrow and its floating button is of little use.
+  m_toolboxDock->setFeatures(QDockWidget::DockWidgetClosable | QDockWidget::DockWidgetMovable);
   m_toolboxDock->setObjectName(QStringLiteral("toolboxDock"));
   m_toolboxDock->setWidget(m_toolbox);
   addDockWidget(Qt::LeftDockWidgetArea, m_toolboxDock);

@@ -95,6 +95,8 @@ PropertiesView::~PropertiesView() = default;
 
 QString PropertiesView::displayText(const QVariant& value, const QString& className,
                                     const QString& property) {
+  // A control that is no array element shows an empty Index, as the IDE shows it.
+  if (property.compare(QLatin1StringView("Index"), Qt::CaseInsensitive) == 0 && value.toInt() < 0) return {};
   const host::PropertyInfo info = host::propertyInfoOrUntyped(className, property);
   switch (info.type) {
     case host::PropertyType::Boolean:
@@ -208,7 +210,10 @@ bool PropertiesView::applyEdit(const QString& property, const QString& text) {
     } else if (m_control && m_control->node()) {
       const host::PropertyInfo info = host::propertyInfoOrUntyped(m_control->node()->className(), property);
       QVariant value = text;
-      if (info.type == host::PropertyType::Enumerated) {
+      if (property.compare(QLatin1StringView("Index"), Qt::CaseInsensitive) == 0 &&
+          text.trimmed().isEmpty()) {
+        value = -1;  // emptied: no longer an array element
+      } else if (info.type == host::PropertyType::Enumerated) {
         // "2 - CenterScreen" sets 2.
         bool ok = false;
         const int number = text.section(u'-', 0, 0).trimmed().toInt(&ok);

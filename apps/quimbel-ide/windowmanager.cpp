@@ -101,7 +101,8 @@ void WindowManager::windowOpened(host::WindowImpl* window) {
       return w ? w->hWnd() : ide::HWnd(0);
     });
     view = code;
-    size = QSize(720, 460);
+    const QSize area = m_area->viewport()->size();
+    size = QSize(std::clamp(area.width() * 3 / 4, 480, 1000), std::clamp(area.height() * 17 / 20, 320, 900));
   } else if (window->Type() == ide::WindowType::Designer && component->form()) {
     auto* designer = new DesignerWindow(shared);
     designer->canvas()->setErrorReporter([this](const QString& message) {
@@ -112,8 +113,10 @@ void WindowManager::windowOpened(host::WindowImpl* window) {
     connect(designer, &DesignerWindow::codeWanted, this,
             [this, designer] { Q_EMIT codeOfDesignerWanted(designer); });
     view = designer;
-    const QSize form = designer->canvas()->sizeHint();
-    size = QSize(std::min(form.width() + 24, 900), std::min(form.height() + 44, 640));
+    const QSize form = designer->canvas()->sizeHint() + QSize(28, 48);
+    const QSize area = m_area->viewport()->size() - QSize(40, 40);
+    size = QSize(std::clamp(form.width(), 240, std::max(240, area.width())),
+                 std::clamp(form.height(), 180, std::max(180, area.height())));
   } else {
     return;
   }
@@ -132,9 +135,12 @@ void WindowManager::windowOpened(host::WindowImpl* window) {
   entry.changed = window->changed.connect([this](host::WindowImpl* w) { windowChanged(w); });
   connect(sub, &QMdiSubWindow::windowStateChanged, this,
           [this, sub](Qt::WindowStates, Qt::WindowStates state) { subWindowStateChanged(sub, state); });
+  // New windows cascade from the top left corner, as the IDE's do.
+  const int cascade = static_cast<int>(m_area->subWindowList().size() % 8) * 24;
   guarded(m_syncing, [&] {
     m_area->addSubWindow(sub);
     sub->resize(size);
+    sub->move(cascade, cascade);
     if (window->WindowState() == ide::WindowState::Minimize)
       sub->showMinimized();
     else if (window->WindowState() == ide::WindowState::Maximize)
