@@ -199,6 +199,10 @@ class SmallDisk {
     if (m_mounted) QProcess::execute(QStringLiteral("umount"), {m_dir.path()});
   }
   bool mounted() const { return m_mounted; }
+  bool makeReadOnly() {
+    return QProcess::execute(QStringLiteral("mount"),
+                             {QStringLiteral("-o"), QStringLiteral("remount,ro"), m_dir.path()}) == 0;
+  }
   QString path(const QString& name) const { return m_dir.filePath(name); }
 
  private:
@@ -222,6 +226,25 @@ TEST_F(FilesTest, AWriteToAFullDiskKeepsTheOldFile) {
   ASSERT_FALSE(m_messages.isEmpty());
   EXPECT_TRUE(m_messages.last().contains(QStringLiteral("modApi"))) << m_messages.last().toStdString();
   EXPECT_EQ(readBytes(disk.path(QStringLiteral("modApi.bas"))), original);
+}
+
+TEST_F(FilesTest, ASaveIntoAReadOnlyFolderKeepsTheOldFile) {
+  SmallDisk disk;
+  if (!disk.mounted()) GTEST_SKIP() << "cannot mount a small file system here";
+  const QByteArray original = readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas")));
+  writeBytes(disk.path(QStringLiteral("modApi.bas")), original);
+  // Root may write into any folder whose mode forbids it; a file system mounted read-only stops everyone.
+  ASSERT_TRUE(disk.makeReadOnly());
+  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  api->setFilePath(disk.path(QStringLiteral("modApi.bas")));
+  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  m_ide.ui->queueAnswer(ide::mb::OK);
+  EXPECT_FALSE(commands().saveComponent(api, false));
+  ASSERT_FALSE(m_messages.isEmpty());
+  EXPECT_TRUE(m_messages.last().contains(disk.path(QStringLiteral("modApi.bas"))))
+      << m_messages.last().toStdString();
+  EXPECT_EQ(readBytes(disk.path(QStringLiteral("modApi.bas"))), original);
+  EXPECT_TRUE(api->IsDirty());
 }
 
 // ---------------------------------------------------------------------------------------------------

@@ -16,6 +16,7 @@
 #include <QMdiArea>
 #include <QMdiSubWindow>
 #include <QMenu>
+#include <QTemporaryDir>
 #include <QTest>
 #include <QTreeWidgetItem>
 
@@ -241,6 +242,27 @@ TEST_F(HotKeys, ARegisteredHotKeyGoesBeforeAMenuShortcut) {
   }
   QTest::keyClick(m_code->editor(), Qt::Key_R, Qt::ControlModifier);
   ASSERT_TRUE(waitFor([&] { return m_window->explorer().hasFocus(); }));
+}
+
+TEST(MainWindowSettings, TheWindowRemembersItsGeometry) {
+  QTemporaryDir dir;
+  const QString settings = dir.filePath(QStringLiteral("quimbel-ide.ini"));
+  test::DesktopVbe first;
+  {
+    MainWindowOptions options;
+    options.settingsPath = settings;
+    MainWindow window(first.vbe, *first.ui, options);
+    window.show();
+    window.resize(900, 640);
+    settle();
+    window.close();
+  }
+  test::DesktopVbe second;
+  MainWindowOptions options;
+  options.settingsPath = settings;
+  MainWindow window(second.vbe, *second.ui, options);
+  window.restoreLayout();
+  EXPECT_EQ(window.size(), QSize(900, 640));
 }
 
 // ---------------------------------------------------------------------------------------------------
