@@ -237,14 +237,15 @@ int runTransform(const TransformOptions& options,
   if (options.check) return changed.empty() ? kSuccess : kWouldChange;
   if (options.diff) return kSuccess;
 
-  for (const Snapshot* snapshot : changed) {
-    try {
-      snapshot->component->save();
-    } catch (const ide::Error& error) {
-      printError(QStringLiteral("%1: %2").arg(snapshot->input->shownPath(*snapshot->component),
-                                              error.description()));
-      return kOutputError;
-    }
+  // All files are replaced together, once every one of them is written: a failure changes none.
+  host::SaveBatch batch;
+  try {
+    for (const Snapshot* snapshot : changed)
+      snapshot->component->addToBatch(batch);
+    batch.commit();
+  } catch (const ide::Error& error) {
+    printError(error.description());
+    return kOutputError;
   }
   return kSuccess;
 }

@@ -79,7 +79,8 @@ void BM_ProcOfLineEveryLine(benchmark::State& state) {
     forEachModule(vbe, [&](host::ComponentImpl&, host::CodeModuleImpl& module) {
       ide::ProcKind kind;
       const int count = module.CountOfLines();
-      for (int line = 1; line <= count; ++line) owned += module.ProcOfLine(line, kind).size();
+      for (int line = 1; line <= count; ++line)
+        owned += module.ProcOfLine(line, kind).size();
     });
   }
   benchmark::DoNotOptimize(owned);
@@ -128,7 +129,12 @@ BENCHMARK(BM_FindWholeWordEveryModule)->Unit(benchmark::kMillisecond)->Iteration
 void BM_SaveEveryModule(benchmark::State& state) {
   auto vbe = loaded();
   for (auto _ : state) {
-    forEachModule(vbe, [&](host::ComponentImpl& component, host::CodeModuleImpl&) { component.save(true); });
+    // As saving the project does: every file written, flushed to disk together, then put in place.
+    host::SaveBatch batch;
+    forEachModule(vbe, [&](host::ComponentImpl& component, host::CodeModuleImpl&) {
+      component.addToBatch(batch, true);
+    });
+    batch.commit();
   }
 }
 BENCHMARK(BM_SaveEveryModule)->Unit(benchmark::kMillisecond)->Iterations(3);

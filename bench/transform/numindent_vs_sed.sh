@@ -33,6 +33,9 @@ for run in 1 2 3; do
   cp -r "$work/source" "$work/sed"
   mapfile -t files < <(find "$work/sed" -type f \( -name '*.bas' -o -name '*.cls' -o -name '*.frm' \))
   cat "${files[@]}" "$work/tool"/*/* > /dev/null  # both start from a warm page cache
+  # The copies must not be waiting to go to disk: quimbel flushes what it writes (so that a crash cannot
+  # leave a file half written) and would otherwise pay for the copies too.
+  sync
 
   start=$(now)
   "$quimbel" numindent "$work/tool/$project"

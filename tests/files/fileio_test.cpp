@@ -9,6 +9,7 @@
 
 #include <QDir>
 #include <QFile>
+#include <QFileInfo>
 #include <QTemporaryDir>
 
 namespace host {
@@ -133,6 +134,61 @@ TEST_F(FileIoTest, WriteIntoMissingDirectoryFails) {
   EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
   EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot write ") + target + QStringLiteral(": ")))
       << error.what();
+}
+
+TEST(FileWriteBatchTest, ReplacesEveryFileOnCommitAndLeavesNoTemporaries) {
+  QTemporaryDir dir;
+  const QString a = dir.filePath(QStringLiteral("a.bas"));
+  const QString b = dir.filePath(QStringLiteral("b.bas"));
+  writePlainFile(a, "old a");
+  QFile::setPermissions(a, QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ReadGroup);
+  {
+    FileWriteBatch batch;
+    batch.add(a, "new a");
+    batch.add(b, "new b");
+    EXPECT_EQ(readPlainFile(a), QByteArray("old a"));  // nothing is in place before the commit
+    EXPECT_FALSE(QFile::exists(b));
+    batch.commit();
+  }
+  EXPECT_EQ(readPlainFile(a), QByteArray("new a"));
+  EXPECT_EQ(readPlainFile(b), QByteArray("new b"));
+  EXPECT_EQ(QFile::permissions(a) & (QFileDevice::ReadOwner | QFileDevice::WriteOwner |
+                                     QFileDevice::ReadGroup | QFileDevice::ReadOther),
+            QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ReadGroup);
+  EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 2);
+}
+
+TEST(FileWriteBatchTest, ABatchThatIsNotCommittedOrFailsChangesNothing) {
+  QTemporaryDir dir;
+  const QString a = dir.filePath(QStringLiteral("a.bas"));
+  writePlainFile(a, "old a");
+  {
+    FileWriteBatch batch;
+    batch.add(a, "new a");
+  }  // abandoned
+  EXPECT_EQ(readPlainFile(a), QByteArray("old a"));
+  // A directory in the way of the second file: the first is not replaced either.
+  const QString blocked = dir.filePath(QStringLiteral("b.bas"));
+  ASSERT_TRUE(QDir().mkpath(blocked));
+  FileWriteBatch batch;
+  batch.add(a, "new a");
+  const ide::Error error = expectError([&] { batch.add(blocked, "new b"); });
+  EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
+  EXPECT_TRUE(error.description().contains(QStringLiteral("b.bas")));
+  EXPECT_TRUE(batch.empty());
+  EXPECT_EQ(readPlainFile(a), QByteArray("old a"));
+  EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 1);
+}
+
+TEST(FileWriteBatchTest, ALinkKeepsPointingAtTheFileThatGetsTheContent) {
+  QTemporaryDir dir;
+  const QString real = dir.filePath(QStringLiteral("real.bas"));
+  const QString link = dir.filePath(QStringLiteral("link.bas"));
+  writePlainFile(real, "old");
+  ASSERT_TRUE(QFile::link(real, link));
+  writeFileAtomically(link, "new");
+  EXPECT_TRUE(QFileInfo(link).isSymLink());
+  EXPECT_EQ(readPlainFile(real), QByteArray("new"));
 }
 
 }  // namespace

@@ -556,15 +556,30 @@ void CodeText::touch(int firstLine, int removed, int inserted, bool structural) 
 }
 
 void CodeText::replaceLine(int line, QStringView text) {
+  replaceLine(line, text, nullptr);
+}
+
+void CodeText::replaceLine(int line, const QString& text) {
+  replaceLine(line, text, &text);
+}
+
+void CodeText::replaceLine(int line, QStringView text, const QString* shared) {
   checkLineNumber(line, countOfLines());
-  const auto parts = splitLines(text);
-  for (const QStringView part : parts)
-    checkLength(part);
+  // Walks replace one line at a time: that case must not pay for splitting.
+  const bool severalLines =
+      std::any_of(text.begin(), text.end(), [](QChar c) { return c == u'\r' || c == u'\n'; });
+  const auto parts = severalLines ? splitLines(text) : std::vector<QStringView>();
+  if (severalLines) {
+    for (const QStringView part : parts)
+      checkLength(part);
+  } else {
+    checkLength(text);
+  }
   const size_t i = static_cast<size_t>(line - 1);
   Line& target = m_lines[i];
   const bool continuation = i > 0 && m_lines[i - 1].continues;
 
-  if (parts.size() == 1) {
+  if (!severalLines) {
     const LineClass cls = continuation ? LineClass::Continuation : classifyStatement(text);
     const bool continues = continuesOnNextLine(text);
     bool structural = isStructural(cls) || isStructural(target.cls) || continues != target.continues;
@@ -578,7 +593,7 @@ void CodeText::replaceLine(int line, QStringView text) {
       structural = m_lines[static_cast<size_t>(start - 1)].cls == LineClass::ProcHeader;
     }
     updateMarker(line, isStructural(target.cls), isStructural(cls));
-    target.text = text.toString();
+    target.text = shared ? *shared : text.toString();  // a QString is shared, not copied
     target.cls = cls;
     if (continues != target.continues) {
       target.continues = continues;

@@ -82,6 +82,8 @@ class CodeText {
   void insertLines(int line, QStringView text);
   void deleteLines(int startLine, int count);
   void replaceLine(int line, QStringView text);
+  /// The same; the line shares the string's data instead of copying it.
+  void replaceLine(int line, const QString& text);
   void addFromString(QStringView text);
 
   /// The procedure (name case-insensitive; Proc finds a Sub or Function); nullptr when there is none.
@@ -124,6 +126,7 @@ class CodeText {
   struct Index;
 
   Line makeLine(QStringView text, bool isContinuation, LineEnd end) const;
+  void replaceLine(int line, QStringView text, const QString* shared);
   void reclassifyFrom(size_t index);
   void insertMarkers(int firstLine, int count);
   void shiftMarkers(int fromLine, int delta);

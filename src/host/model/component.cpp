@@ -78,6 +78,21 @@ QString componentTypeName(ide::ComponentType type) {
   return QStringLiteral("Component");
 }
 
+SaveBatch::SaveBatch() : files(std::make_unique<FileWriteBatch>()) {}
+SaveBatch::~SaveBatch() = default;
+
+void SaveBatch::commit() {
+  try {
+    files->commit();
+  } catch (...) {
+    for (const auto& finish : done)
+      finish(false);
+    throw;
+  }
+  for (const auto& finish : done)
+    finish(true);
+}
+
 ide::FileType fileTypeOf(ide::ComponentType type) {
   switch (type) {
     case ide::ComponentType::VBForm:
@@ -144,6 +159,12 @@ void ComponentImpl::adopt(ModuleSource source) {
 }
 
 void ComponentImpl::save(bool force) {
+  SaveBatch batch;
+  addToBatch(batch, force);
+  batch.commit();
+}
+
+void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
   if (!m_module) return;  // binary documents are never written
   if (!force && !IsDirty()) return;
   if (m_filePath.isEmpty()) ide::raise(ide::err::BadFileNameOrNumber);
@@ -155,17 +176,17 @@ void ComponentImpl::save(bool force) {
     }
   } parts{m_source};
   m_module->text().store(m_source.code, m_source.memberAttributes);
-  auto project = m_project.lock();
-  auto vbe = project ? project->vbe() : nullptr;
-  try {
-    writeFileAtomically(m_filePath, writeModule(m_source, m_filePath));
-  } catch (...) {
-    if (vbe) vbe->fireFileWritten(project, fileTypeOf(m_type), m_filePath, 2);
-    throw;
-  }
-  m_savedChangeCount = m_module->text().changeCount();
-  m_changed = false;
-  if (vbe) vbe->fireFileWritten(project, fileTypeOf(m_type), m_filePath, 0);
+  batch.files->add(m_filePath, writeModule(m_source, m_filePath));
+  const quint64 savedChangeCount = m_module->text().changeCount();
+  batch.done.push_back([self = shared_from_this(), savedChangeCount, path = m_filePath](bool written) {
+    if (written) {
+      self->m_savedChangeCount = savedChangeCount;
+      self->m_changed = false;
+    }
+    auto project = self->project();
+    if (auto vbe = project ? project->vbe() : nullptr)
+      vbe->fireFileWritten(project, fileTypeOf(self->m_type), path, written ? 0 : 2);
+  });
 }
 
 bool ComponentImpl::IsDirty() {

@@ -22,6 +22,7 @@ namespace host {
 
 class VbeImpl;
 class ProjectImpl;
+class FileWriteBatch;
 class ComponentImpl;
 class CodeModuleImpl;
 class CodePaneImpl;
@@ -31,6 +32,17 @@ class ControlImpl;
 
 // ---------------------------------------------------------------------------------------------------
 // Windows and panes
+
+/// Files to write together (see FileWriteBatch), with what to do for each once the batch succeeded or
+/// failed: a component or project notes what it saved and the file event is fired.
+struct SaveBatch {
+  SaveBatch();
+  ~SaveBatch();
+  std::unique_ptr<FileWriteBatch> files;
+  std::vector<std::function<void(bool written)>> done;
+  /// Commits the files, then runs every `done`; a failure runs them with false and is thrown.
+  void commit();
+};
 
 /// The kind of file a component is kept in, as file events report it.
 ide::FileType fileTypeOf(ide::ComponentType type);
@@ -188,6 +200,8 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   void create(const QString& name);
   /// Writes the component's file when it changed (or when `force`), to its path.
   void save(bool force = false);
+  /// Adds the component's file to `batch` when it changed (or when `force`).
+  void addToBatch(SaveBatch& batch, bool force = false);
   QString filePath() const { return m_filePath; }
   void setFilePath(const QString& path) { m_filePath = path; }
   std::shared_ptr<ProjectImpl> project() const { return m_project.lock(); }
@@ -260,6 +274,8 @@ class ProjectImpl final : public ide::VBProject,
   void create(ide::ProjectType type, const QString& name);
   /// Writes every changed component and the project file (when changed) to their paths.
   void save();
+  /// Adds what save() writes to `batch`.
+  void addToBatch(SaveBatch& batch);
   const std::vector<std::shared_ptr<ComponentImpl>>& components() const { return m_components; }
   std::shared_ptr<ComponentImpl> component(const QString& name) const;
   std::shared_ptr<VbeImpl> vbe() const { return m_vbe.lock(); }
@@ -289,7 +305,6 @@ class ProjectImpl final : public ide::VBProject,
   int indexOf(const ComponentImpl& component) const;
   /// Gives new components a file in `dir`, named after them.
   void assignFilePaths(const QString& dir);
-  void writeProjectFile();
 
   std::weak_ptr<VbeImpl> m_vbe;
   QString m_fileName;

@@ -3,6 +3,7 @@
 #include "host/files/fileio.h"
 #include "host/files/modulefile.h"
 #include "host/model/objects.h"
+#include "host/model/parallel.h"
 #include "host/model/vbe.h"
 
 #include <QDir>
@@ -210,25 +211,33 @@ void ProjectImpl::load(const QString& fileName) {
   const auto entries = m_file->components();
   const auto entryLines = componentEntryLines(*m_file);
   auto self = shared_from_this();
-  for (size_t i = 0; i < entries.size(); ++i) {
-    const ProjectComponent& entry = entries[i];
+  std::vector<std::shared_ptr<ComponentImpl>> loaded;
+  for (const ProjectComponent& entry : entries)
+    loaded.push_back(
+        std::make_shared<ComponentImpl>(self, typeOfEntry(entry.kind), resolveProjectPath(dir, entry.path)));
+  // Each component reads and indexes its own file: they are read side by side.
+  std::vector<std::exception_ptr> failures;
+  parallelFor(
+      loaded.size(), [&](size_t i) { loaded[i]->load(); }, failures);
+  for (size_t i = 0; i < loaded.size(); ++i) {
     const int line = i < entryLines.size() ? entryLines[i] : 0;
-    const QString path = resolveProjectPath(dir, entry.path);
-    auto component = std::make_shared<ComponentImpl>(self, typeOfEntry(entry.kind), path);
-    try {
-      component->load();
-    } catch (const ide::Error& error) {
-      if (error.number() == ide::err::FileNotFound)
-        ide::raise(error.number(),
-                   QStringLiteral("%1, line %2: file not found: %3").arg(fileName).arg(line).arg(entry.path));
-      throw;
+    if (failures[i]) {
+      try {
+        std::rethrow_exception(failures[i]);
+      } catch (const ide::Error& error) {
+        if (error.number() == ide::err::FileNotFound)
+          ide::raise(
+              error.number(),
+              QStringLiteral("%1, line %2: file not found: %3").arg(fileName).arg(line).arg(entries[i].path));
+        throw;
+      }
     }
-    if (this->component(component->Name()))
+    if (this->component(loaded[i]->Name()))
       ide::raise(ide::err::NameConflict, QStringLiteral("%1, line %2: %3 is the name of another component")
                                              .arg(fileName)
                                              .arg(line)
-                                             .arg(component->Name()));
-    m_components.push_back(component);
+                                             .arg(loaded[i]->Name()));
+    m_components.push_back(loaded[i]);
   }
   m_changed = false;
 }
@@ -435,20 +444,32 @@ void ProjectImpl::assignFilePaths(const QString& dir) {
 }
 
 void ProjectImpl::save() {
+  SaveBatch batch;
+  addToBatch(batch);
+  batch.commit();
+}
+
+void ProjectImpl::addToBatch(SaveBatch& batch) {
   if (m_fileName.isEmpty()) {
     // A project opened from a lone module file has nothing to write but its components.
     for (const auto& component : m_components)
       if (component->filePath().isEmpty() && component->IsDirty()) ide::raise(ide::err::BadFileNameOrNumber);
     for (const auto& component : m_components)
-      component->save();
+      component->addToBatch(batch);
     return;
   }
   assignFilePaths(directory());
   for (const auto& component : m_components) {
-    component->save();
+    component->addToBatch(batch);
     componentEntryChanged(*component, component->Name());
   }
-  if (m_changed) writeProjectFile();
+  if (!m_changed) return;
+  batch.files->add(m_fileName, m_file->toBytes(m_fileName));
+  batch.done.push_back([self = shared_from_this(), path = m_fileName](bool written) {
+    if (written) self->m_changed = false;
+    if (auto vbe = self->m_vbe.lock())
+      vbe->fireFileWritten(self, ide::FileType::Project, path, written ? 0 : 2);
+  });
 }
 
 void ProjectImpl::SaveAs(const QString& fileName) {
@@ -458,33 +479,18 @@ void ProjectImpl::SaveAs(const QString& fileName) {
   const ProjectFile oldFile = *m_file;
   m_fileName = target;
   try {
-    assignFilePaths(directory());
     // Components stay where they are; the new project file refers to them from its own folder.
-    for (const auto& component : m_components) {
-      component->save();
-      componentEntryChanged(*component, component->Name());
-    }
-    writeProjectFile();
+    m_changed = true;
+    save();
   } catch (...) {
     m_fileName = oldName;
     *m_file = oldFile;
+    m_changed = true;
     throw;
   }
   if (oldName != target)
     if (auto vbe = m_vbe.lock())
       vbe->fireFileNameChanged(shared_from_this(), ide::FileType::Project, target, oldName);
-}
-
-void ProjectImpl::writeProjectFile() {
-  auto vbe = m_vbe.lock();
-  try {
-    writeFileAtomically(m_fileName, m_file->toBytes(m_fileName));
-  } catch (...) {
-    if (vbe) vbe->fireFileWritten(shared_from_this(), ide::FileType::Project, m_fileName, 2);
-    throw;
-  }
-  m_changed = false;
-  if (vbe) vbe->fireFileWritten(shared_from_this(), ide::FileType::Project, m_fileName, 0);
 }
 
 void ProjectImpl::detach() {

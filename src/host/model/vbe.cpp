@@ -547,12 +547,17 @@ void VbeImpl::removeProject(const std::shared_ptr<ProjectImpl>& project) {
 }
 
 void VbeImpl::saveAll() {
+  // One batch: every file is replaced only once all of them are written and on disk.
+  SaveBatch batch;
   for (const auto& project : m_projects)
-    project->save();
+    project->addToBatch(batch);
   if (m_group && m_groupChanged) {
-    writeFileAtomically(m_groupPath, m_group->toBytes(m_groupPath));
-    m_groupChanged = false;
+    batch.files->add(m_groupPath, m_group->toBytes(m_groupPath));
+    batch.done.push_back([this](bool written) {
+      if (written) m_groupChanged = false;
+    });
   }
+  batch.commit();
 }
 
 // ---------------------------------------------------------------------------------------------------
