@@ -35,6 +35,7 @@
 #include <QRadioButton>
 #include <QSlider>
 #include <QSpinBox>
+#include <QStatusBar>
 #include <QTabWidget>
 #include <QTest>
 #include <QTextEdit>
@@ -636,6 +637,9 @@ void ScriptRunner::execute(const ScriptStep& step) {
       const int n = toNumber(args[1], "the count");
       if (static_cast<int>(vbe.projects().size()) != n)
         fail(QStringLiteral("%1 projects are open, not %2").arg(vbe.projects().size()).arg(n));
+    } else if (what == QLatin1StringView("status")) {
+      const QString shown = m_window.statusBar()->currentMessage();
+      if (!shown.contains(args[1])) fail(QStringLiteral("the status bar says \"%1\"").arg(shown));
     } else if (what == QLatin1StringView("title")) {
       if (!m_window.windowTitle().contains(args[1]))
         fail(QStringLiteral("the title is \"%1\"").arg(m_window.windowTitle()));
@@ -683,8 +687,8 @@ void ScriptRunner::execute(const ScriptStep& step) {
       if (actual != args[2])
         fail(QStringLiteral("%1 shows \"%2\", not \"%3\"").arg(args[1], actual, args[2]));
     } else {
-      fail(QStringLiteral(
-               "cannot expect \"%1\" (line, message, projects, title, control, no-control, value, property)")
+      fail(QStringLiteral("cannot expect \"%1\" (line, message, projects, title, status, control, "
+                          "no-control, value, property)")
                .arg(args[0]));
     }
   } else if (command == QLatin1StringView("echo")) {

@@ -175,6 +175,22 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
   }
 }
 
+TEST(EndToEnd, WithoutItsAddInTheIdeStartsAndSaysSo) {
+  QTemporaryDir work;
+  const QString scriptPath = work.filePath(QStringLiteral("noaddin.qis"));
+  writeBytes(scriptPath,
+             "expect status \"add-in was not found at /nonexistent/libquimbel-addin.so\"\n"
+             "expect no-control \"Menu Bar\" Quimbel\n"
+             "expect control \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n");
+  QProcessEnvironment environment;
+  environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), work.filePath(QStringLiteral("config")));
+  const Session session =
+      runIde(scriptPath, environment,
+             {QStringLiteral("--addin"), QStringLiteral("/nonexistent/libquimbel-addin.so")});
+  EXPECT_EQ(session.exitCode, 0) << session.err.toStdString();
+  EXPECT_FALSE(session.out.contains(QStringLiteral("msgbox:"))) << "said in the status bar, not in a box";
+}
+
 TEST(EndToEnd, AScriptMistakeIsReportedWithItsLineBeforeAnythingRuns) {
   QTemporaryDir work;
   const QString scriptPath = work.filePath(QStringLiteral("bad.qis"));
