@@ -95,7 +95,10 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
     updateProperties();
   }));
   m_connections.push_back(events.components->ItemSelected.connect([this](auto&&...) { updateProperties(); }));
-  m_connections.push_back(m_vbe->mainWindow()->changed.connect([this](host::WindowImpl*) { updateTitle(); }));
+  m_connections.push_back(m_vbe->mainWindow()->changed.connect([this](host::WindowImpl*) {
+    updateTitle();
+    m_windows->setCodeReadOnly(m_vbe->mode() == ide::IdeMode::Run);
+  }));
 
   resize(options.size);
   if (QScreen* screen = options.fitToScreen ? QGuiApplication::primaryScreen() : nullptr) {

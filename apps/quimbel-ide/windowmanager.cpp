@@ -81,6 +81,12 @@ void WindowManager::refreshCaptions() {
     if (entry.sub) entry.sub->setWindowTitle(entry.window->Caption());
 }
 
+void WindowManager::setCodeReadOnly(bool readOnly) {
+  m_codeReadOnly = readOnly;
+  for (CodeWindow* code : codeWindows())
+    code->editor()->setReadOnly(readOnly);
+}
+
 void WindowManager::windowOpened(host::WindowImpl* window) {
   if (m_entries.count(window)) return;
   auto shared = window->shared_from_this();
@@ -100,6 +106,7 @@ void WindowManager::windowOpened(host::WindowImpl* window) {
       auto w = weak.lock();
       return w ? w->hWnd() : ide::HWnd(0);
     });
+    code->editor()->setReadOnly(m_codeReadOnly);
     view = code;
     const QSize area = m_area->viewport()->size();
     size = QSize(std::clamp(area.width() * 3 / 4, 480, 1000), std::clamp(area.height() * 17 / 20, 320, 900));

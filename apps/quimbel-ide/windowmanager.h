@@ -45,6 +45,8 @@ class WindowManager final : public QObject {
   std::vector<CodeWindow*> codeWindows() const;
   /// Refreshes the sub-windows' captions (after a rename).
   void refreshCaptions();
+  /// While the program runs, its code cannot be typed into (the object model may still change it).
+  void setCodeReadOnly(bool readOnly);
 
  Q_SIGNALS:
   void activeViewChanged();
@@ -76,6 +78,7 @@ class WindowManager final : public QObject {
   std::map<const host::WindowImpl*, Entry> m_entries;
   std::function<void(const QString&)> m_report;
   bool m_syncing = false;
+  bool m_codeReadOnly = false;
   ide::Connection m_opened;
   ide::Connection m_activated;
 };

@@ -276,12 +276,17 @@ TEST_F(MainWindowTest, RunCommandsSwitchTheModeAndTheTitle) {
     m_window->commandBars().click(control);
     settle();
   };
+  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  ASSERT_NE(sub, nullptr);
+  CodeEditor* editor = qobject_cast<CodeWindow*>(sub->widget())->editor();
   EXPECT_TRUE(m_window->windowTitle().endsWith(QStringLiteral("[design]")));
   run(QStringLiteral("Start"));
   EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Run);
   EXPECT_TRUE(m_window->windowTitle().endsWith(QStringLiteral("[run]")));
+  EXPECT_TRUE(editor->isReadOnly()) << "running code is not typed into";
   run(QStringLiteral("Break"));
   EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Break);
+  EXPECT_FALSE(editor->isReadOnly()) << "in break mode it is";
   EXPECT_EQ(m_window->codeWindowMenuName(), QStringLiteral("Code Window (Break)"));
   run(QStringLiteral("End"));
   EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Design);
