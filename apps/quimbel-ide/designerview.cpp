@@ -153,6 +153,35 @@ std::shared_ptr<host::ControlImpl> DesignerWindow::addControl(const QString& cla
   auto container = m_canvas->selected();
   if (container && !isContainer(bareClass(container->liveNode().className()))) container.reset();
   auto control = form()->addControl(className, container);
+  // The form gives every new control the same place and size; the designer sizes it for its class, and
+  // puts one added into a frame or picture box inside it.
+  struct Size {
+    const char* className;
+    int width;
+    int height;
+  };
+  static constexpr Size kSizes[] = {
+      {"Frame", 2055, 1455},       {"PictureBox", 1215, 1215}, {"ListBox", 1215, 1035},
+      {"ComboBox", 1215, 315},     {"Label", 1215, 255},       {"CheckBox", 1215, 255},
+      {"OptionButton", 1215, 255}, {"HScrollBar", 1215, 255},  {"VScrollBar", 255, 1215},
+      {"Image", 1215, 1215},       {"Shape", 1215, 735},       {"DriveListBox", 1215, 315},
+      {"DirListBox", 1215, 1215},  {"FileListBox", 1215, 1065}};
+  const QString bare = bareClass(control->liveNode().className());
+  try {
+    for (const Size& size : kSizes) {
+      if (bare != QLatin1StringView(size.className)) continue;
+      control->setProperty(QStringLiteral("Width"), size.width);
+      control->setProperty(QStringLiteral("Height"), size.height);
+    }
+    if (container && control->hasProperty(QStringLiteral("Left"))) {
+      control->setProperty(QStringLiteral("Left"), 120);
+      control->setProperty(
+          QStringLiteral("Top"),
+          bareClass(container->liveNode().className()) == QLatin1StringView("Frame") ? 240 : 120);
+    }
+  } catch (const ide::Error&) {
+    // A size the form refuses leaves the control as the form made it.
+  }
   m_canvas->setSelected(control);
   return control;
 }

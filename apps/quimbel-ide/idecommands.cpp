@@ -250,6 +250,7 @@ bool IdeCommands::saveProjectAs(const std::shared_ptr<host::ProjectImpl>& projec
     if (QFileInfo(path).suffix().isEmpty()) path += QStringLiteral(".vbp");
   }
   try {
+    QDir().mkpath(QFileInfo(path).absolutePath());
     project->SaveAs(path);
     m_window.showStatus(QStringLiteral("Saved %1").arg(QDir::toNativeSeparators(path)), 5000);
     return true;

@@ -414,6 +414,14 @@ QWidget* ScriptRunner::findWidget(const QString& name) const {
 void ScriptRunner::execute(const ScriptStep& step) {
   const QString& command = step.command;
   const QStringList& args = step.arguments;
+  // A message box stops the IDE until it is answered: only the steps that deal with it go on meanwhile.
+  static const QStringList kWhileABoxIsOpen = {QStringLiteral("press"),      QStringLiteral("answer"),
+                                               QStringLiteral("screenshot"), QStringLiteral("expect"),
+                                               QStringLiteral("echo"),       QStringLiteral("wait"),
+                                               QStringLiteral("set"),        QStringLiteral("quit")};
+  if (auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
+      box && !kWhileABoxIsOpen.contains(command))
+    throw NotReady{QStringLiteral("a message box is open: \"%1\"").arg(box->text())};
   auto& vbe = *m_window.vbe();
   auto component = [&](const QString& name) {
     const qsizetype dot = name.indexOf(u'.');
