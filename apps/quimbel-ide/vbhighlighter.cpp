@@ -5,11 +5,14 @@
 #include <QScrollBar>
 #include <QSet>
 #include <QTextBlock>
+#include <QTextDocument>
+
+#include <vector>
 
 namespace desktop {
 namespace {
 
-/// Blocks coloured beyond the visible ones, so that small scrolls find them ready.
+/// Lines coloured beyond the visible ones, so that small scrolls find them ready.
 constexpr int kMargin = 60;
 
 const QSet<QString>& keywords() {
@@ -55,13 +58,19 @@ bool continues(QStringView text) {
   return trimmed.endsWith(u'_') && (trimmed.size() == 1 || trimmed.at(trimmed.size() - 2).isSpace());
 }
 
+void addRange(QList<QTextLayout::FormatRange>* formats, qsizetype start, qsizetype length,
+              const QTextCharFormat& format) {
+  if (formats && length > 0)
+    formats->append(QTextLayout::FormatRange{static_cast<int>(start), static_cast<int>(length), format});
+}
+
 }  // namespace
 
-VbHighlighter::VbHighlighter(QPlainTextEdit* editor)
-    : QSyntaxHighlighter(editor->document()), m_editor(editor) {
+VbHighlighter::VbHighlighter(QPlainTextEdit* editor) : QObject(editor), m_editor(editor) {
   m_keyword.setForeground(QColor(0x00, 0x00, 0x90));
   m_comment.setForeground(QColor(0x00, 0x80, 0x00));
   m_string.setForeground(QColor(0x9a, 0x1c, 0x1c));
+  connect(editor->document(), &QTextDocument::contentsChange, this, &VbHighlighter::contentsChanged);
 }
 
 bool VbHighlighter::isKeyword(QStringView word) {
@@ -69,53 +78,88 @@ bool VbHighlighter::isKeyword(QStringView word) {
 }
 
 bool VbHighlighter::nearVisible(int blockNumber) const {
-  if (m_colourAll) return true;
   const int first = m_editor->verticalScrollBar()->value();
-  const int height =
-      std::max(1, m_editor->viewport()->height() / std::max(1, m_editor->fontMetrics().height()));
+  const int height = m_editor->viewport()->height() / std::max(1, m_editor->fontMetrics().lineSpacing());
   return blockNumber >= first - kMargin && blockNumber <= first + height + kMargin;
 }
 
 void VbHighlighter::colourVisible() {
   const int first = m_editor->verticalScrollBar()->value();
-  const int height =
-      std::max(1, m_editor->viewport()->height() / std::max(1, m_editor->fontMetrics().height()));
-  QTextBlock block = document()->findBlockByNumber(std::max(0, first - kMargin));
+  const int height = m_editor->viewport()->height() / std::max(1, m_editor->fontMetrics().lineSpacing());
+  QTextBlock block = m_editor->document()->findBlockByNumber(std::max(0, first - kMargin));
   const int last = first + height + kMargin;
   for (; block.isValid() && block.blockNumber() <= last; block = block.next())
-    if (block.userState() == kNotColoured) rehighlightBlock(block);
+    if (block.userState() == kNotColoured) colourFrom(block);
 }
 
-void VbHighlighter::highlightBlock(const QString& text) {
-  if (!nearVisible(currentBlock().blockNumber())) {
-    setCurrentBlockState(kNotColoured);
-    return;
+void VbHighlighter::contentsChanged(int position, int /*removed*/, int added) {
+  if (m_applying) return;  // the formats this class sets mark their blocks changed
+  QTextDocument* document = m_editor->document();
+  QTextBlock block = document->findBlock(position);
+  QTextBlock last = document->findBlock(position + added);
+  if (!last.isValid()) last = document->lastBlock();
+  // Changed lines near the view are coloured now; the others when they come into view.
+  const int first = m_editor->verticalScrollBar()->value() - kMargin;
+  const int height = m_editor->viewport()->height() / std::max(1, m_editor->fontMetrics().lineSpacing());
+  const int end = first + height + 2 * kMargin;
+  for (int number = block.blockNumber(); block.isValid(); block = block.next(), ++number) {
+    if (number >= first && number <= end)
+      colourFrom(block);
+    else
+      block.setUserState(kNotColoured);
+    if (block == last) break;
   }
-  const bool inComment =
-      previousBlockState() == kNotColoured ? startsInComment() : previousBlockState() == kInComment;
-  setCurrentBlockState(colour(text, inComment, true) ? kInComment : kColoured);
 }
 
-bool VbHighlighter::startsInComment() {
-  // Walk up to the first line of the logical line, then read forward.
-  QTextBlock block = currentBlock().previous();
-  if (!block.isValid() || !continues(block.text())) return false;
+bool VbHighlighter::startsInComment(const QTextBlock& block) const {
+  QTextBlock previous = block.previous();
+  if (!previous.isValid()) return false;
+  if (previous.userState() != kNotColoured) return previous.userState() == kInComment;
+  if (!continues(previous.text())) return false;
+  // Up to the first line of the logical line (at most 24 continuations), then read forward.
   std::vector<QString> lines;
-  int guard = 0;
-  while (block.isValid() && continues(block.text()) && guard++ < 25) {
-    lines.push_back(block.text());
-    block = block.previous();
+  while (previous.isValid() && continues(previous.text()) && lines.size() < 25) {
+    lines.push_back(previous.text());
+    previous = previous.previous();
   }
   bool inComment = false;
   for (auto it = lines.rbegin(); it != lines.rend(); ++it)
-    inComment = colour(*it, inComment, false);
+    inComment = colour(*it, inComment, nullptr);
   return inComment;
 }
 
-bool VbHighlighter::colour(const QString& text, bool inComment, bool apply) {
+void VbHighlighter::colourFrom(QTextBlock block) {
+  QTextDocument* document = m_editor->document();
+  bool inComment = startsInComment(block);
+  while (block.isValid()) {
+    const int before = block.userState();
+    QList<QTextLayout::FormatRange> formats;
+    const bool endsInComment = colour(block.text(), inComment, &formats);
+    const int after = endsInComment ? kInComment : kColoured;
+    block.setUserState(after);
+    if (block.layout()->formats() != formats) {
+      m_applying = true;
+      block.layout()->setFormats(formats);
+      document->markContentsDirty(block.position(), block.length());
+      m_applying = false;
+    }
+    // The next line starts where this one ends: only a change of that carries on.
+    QTextBlock next = block.next();
+    if (!next.isValid() || before == after || next.userState() == kNotColoured) break;
+    if (!nearVisible(next.blockNumber())) {
+      next.setUserState(kNotColoured);
+      break;
+    }
+    block = next;
+    inComment = endsInComment;
+  }
+}
+
+bool VbHighlighter::colour(const QString& text, bool inComment,
+                           QList<QTextLayout::FormatRange>* formats) const {
   const qsizetype n = text.size();
   if (inComment) {
-    if (apply) setFormat(0, static_cast<int>(n), m_comment);
+    addRange(formats, 0, n, m_comment);
     return continues(text);
   }
   bool statementStart = true;
@@ -123,7 +167,7 @@ bool VbHighlighter::colour(const QString& text, bool inComment, bool apply) {
   while (i < n) {
     const QChar c = text.at(i);
     if (c == u'\'') {
-      if (apply) setFormat(static_cast<int>(i), static_cast<int>(n - i), m_comment);
+      addRange(formats, i, n - i, m_comment);
       return continues(text);
     }
     if (c == u'"') {
@@ -138,7 +182,7 @@ bool VbHighlighter::colour(const QString& text, bool inComment, bool apply) {
         }
         ++j;
       }
-      if (apply) setFormat(static_cast<int>(i), static_cast<int>(std::min(j + 1, n) - i), m_string);
+      addRange(formats, i, std::min(j + 1, n) - i, m_string);
       i = j + 1;
       statementStart = false;
       continue;
@@ -147,7 +191,7 @@ bool VbHighlighter::colour(const QString& text, bool inComment, bool apply) {
       qsizetype j = i + 1;
       while (j < n && isWordChar(text.at(j)))
         ++j;
-      if (apply) setFormat(static_cast<int>(i), static_cast<int>(j - i), m_keyword);
+      addRange(formats, i, j - i, m_keyword);
       i = j;
       statementStart = false;
       continue;
@@ -159,13 +203,12 @@ bool VbHighlighter::colour(const QString& text, bool inComment, bool apply) {
       const QStringView word = QStringView(text).mid(i, j - i);
       if (statementStart && word.compare(u"Rem", Qt::CaseInsensitive) == 0 &&
           (j == n || text.at(j).isSpace())) {
-        if (apply) setFormat(static_cast<int>(i), static_cast<int>(n - i), m_comment);
+        addRange(formats, i, n - i, m_comment);
         return continues(text);
       }
       // A member after a dot (obj.Print, rs.Close) is not a keyword.
       const bool afterDot = i > 0 && text.at(i - 1) == u'.';
-      if (!afterDot && isKeyword(word) && apply)
-        setFormat(static_cast<int>(i), static_cast<int>(j - i), m_keyword);
+      if (!afterDot && isKeyword(word)) addRange(formats, i, j - i, m_keyword);
       i = j;
       statementStart = false;
       continue;

@@ -1,48 +1,52 @@
 // SPDX-License-Identifier: MIT
 // VB syntax colours for a code window: keywords, comments (also continued with " _"), strings. Only the
-// blocks near the visible part of the editor are coloured, so that a module of a hundred thousand lines
-// opens at once; the editor colours the rest as it scrolls to them.
+// lines in and around the visible part of the editor are coloured, when they come into view or change, so
+// that a module of a hundred thousand lines opens without colouring it all first.
 #pragma once
 
-#include <QSyntaxHighlighter>
+#include <QList>
+#include <QObject>
+#include <QStringView>
 #include <QTextCharFormat>
+#include <QTextLayout>
 
 class QPlainTextEdit;
+class QTextBlock;
 
 namespace desktop {
 
-class VbHighlighter final : public QSyntaxHighlighter {
+class VbHighlighter final : public QObject {
   Q_OBJECT
 
  public:
-  /// Block states: not coloured yet, coloured, coloured and ending inside a continued comment.
+  /// A block's user state: not coloured yet, coloured, coloured and ending inside a continued comment.
   static constexpr int kNotColoured = -1;
   static constexpr int kColoured = 0;
   static constexpr int kInComment = 1;
 
   explicit VbHighlighter(QPlainTextEdit* editor);
 
-  /// Colours the blocks of the visible part that are not coloured yet.
+  /// Colours the lines of the visible part (and a margin around it) that are not coloured yet.
   void colourVisible();
 
   static bool isKeyword(QStringView word);
-
- protected:
-  void highlightBlock(const QString& text) override;
+  /// The colours of one line: the format ranges, and whether the line ends inside a continued comment.
+  bool colour(const QString& text, bool inComment, QList<QTextLayout::FormatRange>* formats) const;
 
  private:
+  void contentsChanged(int position, int removed, int added);
+  /// Colours `block`, then the blocks after it while the comment state they start with changed.
+  void colourFrom(QTextBlock block);
+  /// Whether the line before `block` ends inside a continued comment, read from its text when it is not
+  /// coloured.
+  bool startsInComment(const QTextBlock& block) const;
   bool nearVisible(int blockNumber) const;
-  /// Whether the line above starts inside a continued comment, worked out from the text when the line
-  /// above is not coloured.
-  bool startsInComment();
-  /// Colours `text` (starting inside a comment or not); returns whether it ends inside a continued one.
-  bool colour(const QString& text, bool inComment, bool apply);
 
   QPlainTextEdit* m_editor;
   QTextCharFormat m_keyword;
   QTextCharFormat m_comment;
   QTextCharFormat m_string;
-  bool m_colourAll = false;
+  bool m_applying = false;
 };
 
 }  // namespace desktop

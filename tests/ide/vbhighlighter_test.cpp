@@ -1,0 +1,98 @@
+// SPDX-License-Identifier: MIT
+// VB colours: which parts of a line are keywords, strings and comments (comments continued with " _"
+// included), and that only the lines near the view are coloured, the others when they come into view.
+#include "vbhighlighter.h"
+#include "codeeditor.h"
+#include "idefixture.h"
+
+#include <gtest/gtest.h>
+
+#include <QScrollBar>
+#include <QTest>
+#include <QTextBlock>
+
+namespace desktop {
+namespace {
+
+using test::settle;
+
+/// The ranges of a line as "start+length:kind" with kind k (keyword), s (string) or c (comment).
+QString rangesOf(VbHighlighter& highlighter, const QString& text, bool inComment = false,
+                 bool* endsInComment = nullptr) {
+  QList<QTextLayout::FormatRange> formats;
+  const bool ends = highlighter.colour(text, inComment, &formats);
+  if (endsInComment) *endsInComment = ends;
+  QStringList parts;
+  for (const auto& range : formats) {
+    const QColor color = range.format.foreground().color();
+    const char kind = color == QColor(0x00, 0x80, 0x00) ? 'c' : color == QColor(0x00, 0x00, 0x90) ? 'k' : 's';
+    parts << QStringLiteral("%1+%2:%3").arg(range.start).arg(range.length).arg(QLatin1Char(kind));
+  }
+  return parts.join(u' ');
+}
+
+class Colours : public ::testing::Test {
+ protected:
+  CodeEditor m_editor;
+  VbHighlighter& highlighter() { return *m_editor.highlighter(); }
+};
+
+TEST_F(Colours, KeywordsStringsAndCommentsOfALine) {
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("Dim s As String ' nota")),
+            QStringLiteral("0+3:k 6+2:k 9+6:k 16+6:c"));
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("x = \"a\"\"b\" & y")), QStringLiteral("4+6:s"));
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("#If Win32 Then")), QStringLiteral("0+3:k 10+4:k"));
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("rs.Close: Rem feito")), QStringLiteral("10+9:c"))
+      << "a member after a dot is no keyword; Rem after a colon starts a comment";
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("10010 Rem numerada")), QStringLiteral("6+12:c"));
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("Lembrete = 1")), QString()) << "Rem only as a word";
+}
+
+TEST_F(Colours, ACommentContinuedWithAnUnderscoreGoesOnOnTheNextLine) {
+  bool continued = false;
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("x = 1 ' primeira _"), false, &continued),
+            QStringLiteral("6+12:c"));
+  EXPECT_TRUE(continued);
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("  segunda"), true, &continued), QStringLiteral("0+9:c"));
+  EXPECT_FALSE(continued);
+  rangesOf(highlighter(), QStringLiteral("x = 1 + _"), false, &continued);
+  EXPECT_FALSE(continued) << "a continued statement is not a comment";
+}
+
+TEST_F(Colours, OnlyTheLinesNearTheViewAreColouredUntilTheyComeIntoView) {
+  QStringList lines;
+  for (int i = 1; i <= 2000; ++i)
+    lines << QStringLiteral("Dim v%1 As Long").arg(i);
+  m_editor.resize(500, 300);
+  m_editor.show();
+  m_editor.setPlainText(lines.join(u'\n'));
+  settle();
+  QTextDocument* document = m_editor.document();
+  EXPECT_EQ(document->findBlockByNumber(0).userState(), VbHighlighter::kColoured);
+  EXPECT_FALSE(document->findBlockByNumber(0).layout()->formats().isEmpty());
+  EXPECT_EQ(document->findBlockByNumber(1500).userState(), VbHighlighter::kNotColoured);
+  EXPECT_TRUE(document->findBlockByNumber(1500).layout()->formats().isEmpty());
+  m_editor.verticalScrollBar()->setValue(1495);
+  EXPECT_EQ(document->findBlockByNumber(1500).userState(), VbHighlighter::kColoured);
+  EXPECT_FALSE(document->findBlockByNumber(1500).layout()->formats().isEmpty());
+}
+
+TEST_F(Colours, AnEditedLineIsColouredAgainAndTheLinesItContinuesInto) {
+  m_editor.resize(500, 300);
+  m_editor.show();
+  m_editor.setPlainText(QStringLiteral("x = 1\ny = 2\nz = 3"));
+  settle();
+  QTextDocument* document = m_editor.document();
+  EXPECT_TRUE(document->findBlockByNumber(1).layout()->formats().isEmpty());
+  QTextCursor cursor(document->findBlockByNumber(0));
+  cursor.movePosition(QTextCursor::EndOfBlock);
+  cursor.insertText(QStringLiteral(" ' nota _"));
+  EXPECT_EQ(document->findBlockByNumber(0).userState(), VbHighlighter::kInComment);
+  ASSERT_EQ(document->findBlockByNumber(1).layout()->formats().size(), 1);
+  EXPECT_EQ(document->findBlockByNumber(1).layout()->formats().front().length, 5)
+      << "the next line became comment";
+  EXPECT_TRUE(document->findBlockByNumber(2).layout()->formats().isEmpty());
+}
+
+}  // namespace
+}  // namespace desktop
