@@ -143,6 +143,20 @@ TEST_F(FilesTest, NewProjectReplacesTheProjectsWithAFreshOneAndItsForm) {
   EXPECT_EQ(m_ide.vbe->ActiveWindow(), project->components().front()->designerWindow());
 }
 
+TEST_F(FilesTest, ClosingTheWindowAsksAboutChanges) {
+  m_window->show();
+  component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))
+      ->codeModule()
+      ->InsertLines(1, QStringLiteral("' x"));
+  m_ide.ui->queueAnswer(ide::mb::Cancel);
+  EXPECT_FALSE(m_window->close());
+  EXPECT_TRUE(m_window->isVisible());
+  ASSERT_EQ(m_messages.size(), 1);
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("modPrincipal.bas")));
+  m_ide.ui->queueAnswer(ide::mb::No);
+  EXPECT_TRUE(m_window->close());
+}
+
 // ---------------------------------------------------------------------------------------------------
 // Bad input
 

