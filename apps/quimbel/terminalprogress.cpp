@@ -10,13 +10,18 @@
 namespace cli {
 
 namespace {
-// A run shorter than this shows no bar; a drawn bar is redrawn at most this often.
-constexpr auto kShowAfter = std::chrono::milliseconds(500);
+// A run shorter than this shows no bar ($QUIMBEL_PROGRESS_AFTER_MS changes it, for tests); a drawn bar is
+// redrawn at most this often.
+std::chrono::milliseconds showAfter() {
+  bool ok = false;
+  const int configured = qEnvironmentVariableIntValue("QUIMBEL_PROGRESS_AFTER_MS", &ok);
+  return std::chrono::milliseconds(ok && configured >= 0 ? configured : 500);
+}
 constexpr auto kRedrawEvery = std::chrono::milliseconds(100);
 constexpr int kWidth = 40;
 }  // namespace
 
-TerminalProgress::TerminalProgress() : m_terminal(isatty(fileno(stderr)) != 0) {}
+TerminalProgress::TerminalProgress() : m_terminal(isatty(fileno(stderr)) != 0), m_showAfter(showAfter()) {}
 
 TerminalProgress::~TerminalProgress() {
   clear();
@@ -35,7 +40,7 @@ void TerminalProgress::setVisible(bool visible) {
 void TerminalProgress::draw() {
   if (!m_terminal || !m_visible) return;
   const auto now = Clock::now();
-  if (now - m_started < kShowAfter || now - m_drawn < kRedrawEvery) return;
+  if (now - m_started < m_showAfter || now - m_drawn < kRedrawEvery) return;
   const int span = std::max(1, m_maximum - m_minimum);
   const int percent = std::clamp(int(qint64(m_value - m_minimum) * 100 / span), 0, 100);
   if (percent == m_shownPercent) return;

@@ -32,6 +32,7 @@ class TerminalProgress final : public transform::ProgressSink {
   void clear();
 
   bool m_terminal;
+  std::chrono::milliseconds m_showAfter;
   Clock::time_point m_started = Clock::now();
   Clock::time_point m_drawn{};
   int m_minimum = 0;

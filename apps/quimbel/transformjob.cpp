@@ -10,7 +10,12 @@
 #include <QDir>
 #include <QFile>
 
+#include <algorithm>
+#include <atomic>
+#include <limits>
 #include <memory>
+#include <mutex>
+#include <thread>
 #include <vector>
 
 namespace cli {
@@ -35,6 +40,29 @@ struct Target {
   ide::Ref<ide::VBProject> project;
   ide::Ref<ide::CodeModule> module;
   ide::Ref<ide::Member> member;
+};
+
+/// A walk's progress bar that only counts its steps (one per worker); `onChange` is told of every move.
+class StepCounter final : public transform::ProgressSink {
+ public:
+  int minimum() const override { return m_minimum; }
+  void setMinimum(int minimum) override { m_minimum = minimum; }
+  int maximum() const override { return m_maximum; }
+  void setMaximum(int maximum) override { m_maximum = maximum; }
+  int value() const override { return m_value.load(std::memory_order_relaxed); }
+  void setValue(int value) override {
+    m_value.store(value, std::memory_order_relaxed);
+    if (onChange) onChange();
+  }
+  bool isVisible() const override { return m_visible; }
+  void setVisible(bool visible) override { m_visible = visible; }
+  std::function<void()> onChange;
+
+ private:
+  int m_minimum = 0;
+  int m_maximum = 1;
+  std::atomic<int> m_value{0};
+  bool m_visible = false;
 };
 
 struct Snapshot {
@@ -187,36 +215,88 @@ int runTransform(const TransformOptions& options,
     for (const auto& component : codeComponents(input))
       snapshots.push_back({&input, component, codeLines(*component->codeModule())});
 
-  int failures = 0;
+  // Whole projects are walked module by module: a project walk is nothing but the walks of its modules.
+  // Each module's walk touches that module alone, so the modules are walked side by side on every core.
+  std::vector<Target> units;
+  for (const Target& target : *targets) {
+    if (target.module) {
+      units.push_back(target);
+      continue;
+    }
+    for (const auto& component : codeComponents(*target.input))
+      if (component->project() == target.project)
+        units.push_back({target.input, target.project, component->codeModule(), {}});
+  }
+
+  qint64 totalUnits = 0;
+  transform::ProgressUnit progressUnit = transform::ProgressUnit::Lines;
   {
-    transform::WalkContext context(QStringLiteral("quimbel"), nullptr, &bar);
-    const Input* current = nullptr;
+    transform::WalkContext counting(QStringLiteral("quimbel"), nullptr, nullptr);
+    progressUnit = makeWalks(counting).unit;
+  }
+  for (const Target& unit : units)
+    totalUnits += unitsOf(unit, progressUnit);
+  const qint32 range = qint32(std::min<qint64>(totalUnits, std::numeric_limits<qint32>::max()));
+
+  struct Report {
+    size_t unit;
+    QString text;
+  };
+  std::mutex reportsMutex;
+  std::vector<Report> reports;
+  const size_t workers =
+      std::max<size_t>(1, std::min<size_t>(units.size(), std::thread::hardware_concurrency()));
+  // Every worker's bar counts its own steps; the first one shows the sum on the terminal.
+  std::vector<std::unique_ptr<StepCounter>> counters;
+  for (size_t w = 0; w < workers; ++w)
+    counters.push_back(std::make_unique<StepCounter>());
+  counters.front()->onChange = [&] {
+    int steps = 0;
+    for (const auto& counter : counters)
+      steps += counter->value();
+    bar.setValue(std::min(steps, bar.maximum()));
+  };
+  bar.setMinimum(0);
+  bar.setMaximum(std::max(1, std::min<qint32>(range, transform::ProgressScale::kMaxSteps)));
+  bar.setValue(0);
+  bar.setVisible(true);
+  std::atomic<size_t> nextUnit{0};
+  auto work = [&](size_t worker) {
+    transform::WalkContext context(QStringLiteral("quimbel"), nullptr, counters[worker].get());
+    size_t current = 0;
     const auto report = [&](const transform::WalkFailure& failure) {
-      bar.setVisible(false);  // the message gets a line of its own
-      printError(QStringLiteral("%1: %2").arg(current->file, failureText(failure)));
-      bar.setVisible(true);
-      ++failures;
+      const std::lock_guard lock(reportsMutex);
+      reports.push_back(
+          {current, QStringLiteral("%1: %2").arg(units[current].input->file, failureText(failure))});
     };
     context.onFailure = report;
     context.onLineSkipped = report;
     const Walks walks = makeWalks(context);
-    qint64 units = 0;
-    for (const Target& target : *targets)
-      units += unitsOf(target, walks.unit);
-    context.SetProgressRange(qint32(std::min<qint64>(units, std::numeric_limits<qint32>::max())));
-    context.showProgress();
-    for (const Target& target : *targets) {
+    context.SetProgressRange(range);
+    for (current = nextUnit++; current < units.size(); current = nextUnit++) {
       if (context.stopped()) break;
-      current = target.input;
-      if (target.member)
-        walks.member(target.module, target.member);
-      else if (target.module)
-        walks.module(target.module);
+      const Target& unit = units[current];
+      if (unit.member)
+        walks.member(unit.module, unit.member);
       else
-        walks.project(target.project);
+        walks.module(unit.module);
     }
-    context.hideProgress();
+  };
+  {
+    std::vector<std::thread> helpers;
+    for (size_t w = 1; w < workers; ++w)
+      helpers.emplace_back(work, w);
+    work(0);
+    for (std::thread& helper : helpers)
+      helper.join();
   }
+  bar.setVisible(false);
+  // Reported in the order a walk of one module after the other would have met them.
+  std::stable_sort(reports.begin(), reports.end(),
+                   [](const Report& a, const Report& b) { return a.unit < b.unit; });
+  for (const Report& report : reports)
+    printError(report.text);
+  const size_t failures = reports.size();
   if (failures) {
     printError(QStringLiteral("nothing was written"));
     return kInputError;
@@ -240,8 +320,10 @@ int runTransform(const TransformOptions& options,
   // All files are replaced together, once every one of them is written: a failure changes none.
   host::SaveBatch batch;
   try {
+    std::vector<std::shared_ptr<host::ComponentImpl>> components;
     for (const Snapshot* snapshot : changed)
-      snapshot->component->addToBatch(batch);
+      components.push_back(snapshot->component);
+    host::addToBatch(batch, components);
     batch.commit();
   } catch (const ide::Error& error) {
     printError(error.description());

@@ -11,7 +11,9 @@
 namespace common {
 
 LastError& lastError() {
-  static LastError record;
+  // Per thread: the IDE's user-interface thread is the only one in the add-in, and the command-line
+  // tool's parallel walks each keep their own.
+  thread_local LastError record;
   return record;
 }
 

@@ -5,6 +5,7 @@
 #include "host/model/designer.h"
 #include "host/model/events.h"
 #include "host/model/objects.h"
+#include "host/model/parallel.h"
 #include "host/model/vbe.h"
 
 #include <QDir>
@@ -164,9 +165,9 @@ void ComponentImpl::save(bool force) {
   batch.commit();
 }
 
-void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
-  if (!m_module) return;  // binary documents are never written
-  if (!force && !IsDirty()) return;
+std::optional<QByteArray> ComponentImpl::fileContents(bool force) {
+  if (!m_module) return std::nullopt;  // binary documents are never written
+  if (!force && !IsDirty()) return std::nullopt;
   if (m_filePath.isEmpty()) ide::raise(ide::err::BadFileNameOrNumber);
   struct CodeParts {
     ModuleSource& source;
@@ -176,7 +177,15 @@ void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
     }
   } parts{m_source};
   m_module->text().store(m_source.code, m_source.memberAttributes);
-  batch.files->add(m_filePath, writeModule(m_source, m_filePath));
+  return writeModule(m_source, m_filePath);
+}
+
+void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
+  if (auto contents = fileContents(force)) addContentsToBatch(batch, *contents);
+}
+
+void ComponentImpl::addContentsToBatch(SaveBatch& batch, const QByteArray& contents) {
+  batch.files->add(m_filePath, contents);
   const quint64 savedChangeCount = m_module->text().changeCount();
   batch.done.push_back([self = shared_from_this(), savedChangeCount, path = m_filePath](bool written) {
     if (written) {
@@ -187,6 +196,18 @@ void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
     if (auto vbe = project ? project->vbe() : nullptr)
       vbe->fireFileWritten(project, fileTypeOf(self->m_type), path, written ? 0 : 2);
   });
+}
+
+void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImpl>>& components, bool force) {
+  // Each file is put together from its own component alone: on every core.
+  std::vector<std::optional<QByteArray>> contents(components.size());
+  std::vector<std::exception_ptr> failures;
+  parallelFor(
+      components.size(), [&](size_t i) { contents[i] = components[i]->fileContents(force); }, failures);
+  for (const std::exception_ptr& failure : failures)
+    if (failure) std::rethrow_exception(failure);
+  for (size_t i = 0; i < components.size(); ++i)
+    if (contents[i]) components[i]->addContentsToBatch(batch, *contents[i]);
 }
 
 bool ComponentImpl::IsDirty() {

@@ -202,6 +202,10 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   void save(bool force = false);
   /// Adds the component's file to `batch` when it changed (or when `force`).
   void addToBatch(SaveBatch& batch, bool force = false);
+  /// What saving would write: the file's bytes, or nothing when it need not be written. Reads only this
+  /// component, so that several can be put together at once.
+  std::optional<QByteArray> fileContents(bool force = false);
+  void addContentsToBatch(SaveBatch& batch, const QByteArray& contents);
   QString filePath() const { return m_filePath; }
   void setFilePath(const QString& path) { m_filePath = path; }
   std::shared_ptr<ProjectImpl> project() const { return m_project.lock(); }
@@ -236,6 +240,10 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   quint64 m_savedChangeCount = 0;
   bool m_changed = false;  // header, form or name changed since the last save
 };
+
+/// Adds the files of several components to `batch`, put together side by side.
+void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImpl>>& components,
+                bool force = false);
 
 // ---------------------------------------------------------------------------------------------------
 // Projects

@@ -454,15 +454,13 @@ void ProjectImpl::addToBatch(SaveBatch& batch) {
     // A project opened from a lone module file has nothing to write but its components.
     for (const auto& component : m_components)
       if (component->filePath().isEmpty() && component->IsDirty()) ide::raise(ide::err::BadFileNameOrNumber);
-    for (const auto& component : m_components)
-      component->addToBatch(batch);
+    host::addToBatch(batch, m_components);
     return;
   }
   assignFilePaths(directory());
-  for (const auto& component : m_components) {
-    component->addToBatch(batch);
+  host::addToBatch(batch, m_components);
+  for (const auto& component : m_components)
     componentEntryChanged(*component, component->Name());
-  }
   if (!m_changed) return;
   batch.files->add(m_fileName, m_file->toBytes(m_fileName));
   batch.done.push_back([self = shared_from_this(), path = m_fileName](bool written) {
