@@ -29,12 +29,11 @@ QString configDirectory() {
 QString defaultAddInPath() {
   const QString fromEnvironment = qEnvironmentVariable("QUIMBEL_ADDIN");
   if (!fromEnvironment.isEmpty()) return fromEnvironment;
-  // The build tree keeps it in lib/, an installation in lib/quimbel/.
-  const QDir programs(QCoreApplication::applicationDirPath());
-  const QString installed = programs.absoluteFilePath(QStringLiteral("../lib/quimbel/libquimbel-addin.so"));
-  const QString built = programs.absoluteFilePath(QStringLiteral("../lib/libquimbel-addin.so"));
-  return QFileInfo::exists(built) || !QFileInfo::exists(installed) ? QDir::cleanPath(built)
-                                                                   : QDir::cleanPath(installed);
+  // The build tree keeps it in lib/ beside bin/; an installation where the install put it.
+  const QString built = QDir::cleanPath(QDir(QCoreApplication::applicationDirPath())
+                                            .absoluteFilePath(QStringLiteral("../lib/libquimbel-addin.so")));
+  const QString installed = QStringLiteral(QUIMBEL_INSTALLED_ADDIN);
+  return QFileInfo::exists(built) || !QFileInfo::exists(installed) ? built : installed;
 }
 
 /// A build tree has no machine-wide configuration installed; the add-in finds the build's own through the
