@@ -587,6 +587,20 @@ TEST(Designers, AddingRenamingAndRemovingControlsFireEventsAndReachTheFile) {
   EXPECT_EQ(errorNumberOf([&] { box->ClassName(); }), ide::err::ObjectVariableNotSet);
 }
 
+TEST(Designers, NewControlsGetOnlyThePropertiesTheirClassHas) {
+  auto vbe = VbeImpl::create();
+  auto form = vbe->newProject()->VBComponents()->Add(ide::ComponentType::VBForm);
+  auto controls = form->Designer()->VBControls();
+  auto timer = std::dynamic_pointer_cast<ControlImpl>(controls->Add(QStringLiteral("VB.Timer")));
+  auto line = std::dynamic_pointer_cast<ControlImpl>(controls->Add(QStringLiteral("Line")));
+  auto label = std::dynamic_pointer_cast<ControlImpl>(controls->Add(QStringLiteral("Label")));
+  EXPECT_EQ(timer->node()->propertyNames(), (QStringList{QStringLiteral("Left"), QStringLiteral("Top")}));
+  EXPECT_FALSE(line->node()->property(QStringLiteral("Width")));
+  EXPECT_FALSE(line->node()->property(QStringLiteral("Caption")));
+  EXPECT_EQ(label->node()->property(QStringLiteral("Caption")), QStringLiteral("\"Label1\""));
+  EXPECT_TRUE(label->node()->property(QStringLiteral("Height")));
+}
+
 TEST(Designers, SelectionChangesAreAnnounced) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();

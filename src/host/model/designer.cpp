@@ -350,23 +350,23 @@ std::shared_ptr<ControlImpl> FormImpl::addControl(const QString& progId,
   FormNode& node = parent->addChild(info->className, name);
   auto created = control(&node);
   // What the IDE gives a new control: its name as caption or text, a place and a size, the next tab stop.
-  const QString bare = withoutLibrary(info->className);
-  if (findPropertyInfo(info->className, QStringLiteral("Caption")))
-    node.setProperty(QStringLiteral("Caption"), quoteVbString(name));
-  if (findPropertyInfo(info->className, QStringLiteral("Text")))
-    node.setProperty(QStringLiteral("Text"), quoteVbString(name));
-  if (bare != QLatin1StringView("Menu")) {
-    const int count = static_cast<int>(controls().size());
-    node.setProperty(QStringLiteral("Height"), QStringLiteral("375"));
-    node.setProperty(QStringLiteral("Left"), QString::number(120 + (count % 8) * 240));
-    node.setProperty(QStringLiteral("Top"), QString::number(120 + (count % 8) * 480));
-    node.setProperty(QStringLiteral("Width"), QStringLiteral("1215"));
-    if (findPropertyInfo(info->className, QStringLiteral("TabIndex"))) {
-      int tabIndex = 0;
-      for (const auto& other : controls())
-        if (other.get() != created.get() && other->node()->property(QStringLiteral("TabIndex"))) ++tabIndex;
-      node.setProperty(QStringLiteral("TabIndex"), QString::number(tabIndex));
-    }
+  // Only what the class has: a Timer has a place but no size, a Line has neither, a Menu none of them.
+  auto give = [&](const char* property, const QString& valueText) {
+    const QString name = QString::fromLatin1(property);
+    if (findPropertyInfo(info->className, name)) node.setProperty(name, valueText);
+  };
+  give("Caption", quoteVbString(name));
+  give("Text", quoteVbString(name));
+  const int count = static_cast<int>(controls().size());
+  give("Height", QStringLiteral("375"));
+  give("Left", QString::number(120 + (count % 8) * 240));
+  give("Top", QString::number(120 + (count % 8) * 480));
+  give("Width", QStringLiteral("1215"));
+  if (findPropertyInfo(info->className, QStringLiteral("TabIndex"))) {
+    int tabIndex = 0;
+    for (const auto& other : controls())
+      if (other.get() != created.get() && other->node()->property(QStringLiteral("TabIndex"))) ++tabIndex;
+    node.setProperty(QStringLiteral("TabIndex"), QString::number(tabIndex));
   }
   changed(nullptr);
   if (auto component = m_component.lock(); component && component->project())
