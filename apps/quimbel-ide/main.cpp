@@ -45,9 +45,18 @@ void useBuildTreeConfiguration() {
   if (QFileInfo::exists(config)) qputenv("QUIMBEL_MACHINE_CONFIG", QDir::cleanPath(config).toLocal8Bit());
 }
 
+/// Window-system plugins without a window manager (offscreen, a bare X server) warn about every window hint
+/// they cannot honour; those lines say nothing to the user of a scripted session and hide its output.
+QtMessageHandler defaultMessageHandler = nullptr;
+void filterPlatformNoise(QtMsgType type, const QMessageLogContext& context, const QString& message) {
+  if (type == QtWarningMsg && message.startsWith(QLatin1StringView("This plugin does not support"))) return;
+  defaultMessageHandler(type, context, message);
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
+  defaultMessageHandler = qInstallMessageHandler(filterPlatformNoise);
   QApplication app(argc, argv);
   QApplication::setApplicationName(QStringLiteral("Quimbel IDE"));
   QApplication::setOrganizationName(QStringLiteral("Quimbel"));
