@@ -233,7 +233,7 @@ QByteArray quoted(QByteArrayView text) {
 enum class ComponentKind { Module, Class, Form };
 enum class ProcKind { Sub, Function, PropertyGet, PropertyLet, PropertySet };
 
-struct ProcSpec {
+struct ProcPlan {
   QByteArray scope;
   ProcKind kind = ProcKind::Sub;
   QByteArray name;
@@ -302,14 +302,14 @@ class ComponentWriter {
  private:
   void writeDeclarations(int budget, bool withProcedures, const std::vector<QByteArray>& fields);
   void writeTrailingLines(int count);
-  int drawProcedureLength(const ProcSpec& spec);
-  ProcSpec genericProcedure();
-  void planProperties(qint64 target, std::deque<ProcSpec>& queue, std::vector<QByteArray>& fields);
+  int drawProcedureLength(const ProcPlan& plan);
+  ProcPlan genericProcedure();
+  void planProperties(qint64 target, std::deque<ProcPlan>& queue, std::vector<QByteArray>& fields);
 
-  void writeProcedure(const ProcSpec& spec, int lines);
-  void writeHeader(const ProcSpec& spec, int headerLines);
-  void writeBody(const ProcSpec& spec, int budget);
-  void writeReturn(const ProcSpec& spec, const BlockContext& ctx);
+  void writeProcedure(const ProcPlan& plan, int lines);
+  void writeHeader(const ProcPlan& plan, int headerLines);
+  void writeBody(const ProcPlan& plan, int budget);
+  void writeReturn(const ProcPlan& plan, const BlockContext& ctx);
 
   void writeBlock(int indent, int depth, int budget, BlockContext& ctx);
   int writeStatement(int indent, int depth, int budget, BlockContext& ctx);
@@ -759,42 +759,42 @@ void ComponentWriter::writeSimple(int indent, BlockContext& ctx) {
 // ---------------------------------------------------------------------------------------------------------
 // Procedures.
 
-ProcSpec ComponentWriter::genericProcedure() {
+ProcPlan ComponentWriter::genericProcedure() {
   static constexpr std::array<const char*, 6> kParams = {
       "ByVal lngCodigo As Long", "ByVal strDescricao As String", "ByRef curValor As Currency",
       "ByVal dtmData As Date",   "ByVal blnAtivo As Boolean",    "ByVal vntChave As Variant"};
   static constexpr std::array<const char*, 2> kOptionalParams = {
       "Optional ByVal blnForcar As Boolean = False", "Optional ByVal lngLimite As Long = 100"};
 
-  ProcSpec spec;
+  ProcPlan plan;
   switch (m_kind) {
     case ComponentKind::Module:
-      spec.scope = m_rng.chance(60) ? "Public" : "Private";
+      plan.scope = m_rng.chance(60) ? "Public" : "Private";
       break;
     case ComponentKind::Class: {
       const int roll = m_rng.between(0, 9);
-      spec.scope = roll < 6 ? "Public" : (roll < 9 ? "Private" : "Friend");
+      plan.scope = roll < 6 ? "Public" : (roll < 9 ? "Private" : "Friend");
       break;
     }
     case ComponentKind::Form:
-      spec.scope = m_rng.chance(80) ? "Private" : "Public";
+      plan.scope = m_rng.chance(80) ? "Private" : "Public";
       break;
   }
-  spec.kind = m_rng.chance(45) ? ProcKind::Function : ProcKind::Sub;
-  spec.name = QByteArray(m_rng.pick(kVerbs)) + m_rng.pick(kNouns) + QByteArray::number(++m_procedureCount);
-  if (spec.kind == ProcKind::Function) spec.returnType = m_rng.pick(kReturnTypes);
+  plan.kind = m_rng.chance(45) ? ProcKind::Function : ProcKind::Sub;
+  plan.name = QByteArray(m_rng.pick(kVerbs)) + m_rng.pick(kNouns) + QByteArray::number(++m_procedureCount);
+  if (plan.kind == ProcKind::Function) plan.returnType = m_rng.pick(kReturnTypes);
 
   const int count = m_rng.between(0, 4);
   int first = m_rng.between(0, int(kParams.size()) - 1);
   for (int i = 0; i < count; ++i)
-    spec.params.push_back(kParams[(first + i) % kParams.size()]);
-  if (m_rng.chance(20)) spec.params.push_back(m_rng.pick(kOptionalParams));
-  return spec;
+    plan.params.push_back(kParams[(first + i) % kParams.size()]);
+  if (m_rng.chance(20)) plan.params.push_back(m_rng.pick(kOptionalParams));
+  return plan;
 }
 
 // Most procedures are short, a fair number are medium, a few are long and very few very long.
-int ComponentWriter::drawProcedureLength(const ProcSpec& spec) {
-  if (spec.maxLines > 0) return m_rng.between(kMinProcedureLines, spec.maxLines);
+int ComponentWriter::drawProcedureLength(const ProcPlan& plan) {
+  if (plan.maxLines > 0) return m_rng.between(kMinProcedureLines, plan.maxLines);
   const int roll = m_rng.between(0, 99);
   if (roll < 55) return m_rng.between(5, 25);
   if (roll < 85) return m_rng.between(26, 80);
@@ -802,12 +802,12 @@ int ComponentWriter::drawProcedureLength(const ProcSpec& spec) {
   return m_rng.between(201, 600);
 }
 
-void ComponentWriter::writeHeader(const ProcSpec& spec, int headerLines) {
-  QByteArray opening = spec.scope + ' ' + procKeyword(spec.kind).toByteArray() + ' ' + spec.name + '(';
+void ComponentWriter::writeHeader(const ProcPlan& plan, int headerLines) {
+  QByteArray opening = plan.scope + ' ' + procKeyword(plan.kind).toByteArray() + ' ' + plan.name + '(';
   QByteArray closing = ")";
-  if (!spec.returnType.isEmpty()) closing += " As " + spec.returnType;
+  if (!plan.returnType.isEmpty()) closing += " As " + plan.returnType;
 
-  const int count = int(spec.params.size());
+  const int count = int(plan.params.size());
   const std::vector<int> groups = count == 0 ? std::vector<int>{0} : split(count, headerLines);
   int next = 0;
   for (size_t g = 0; g < groups.size(); ++g) {
@@ -818,38 +818,38 @@ void ComponentWriter::writeHeader(const ProcSpec& spec, int headerLines) {
     }
     for (int i = 0; i < groups[g]; ++i, ++next) {
       if (i > 0) m_code << ", ";
-      m_code << spec.params[next];
+      m_code << plan.params[next];
     }
     m_code << (g + 1 < groups.size() ? QByteArrayView(", _") : QByteArrayView(closing));
     m_code.end();
   }
 }
 
-void ComponentWriter::writeReturn(const ProcSpec& spec, const BlockContext& ctx) {
-  if (!spec.finalLine.isEmpty()) {
-    m_code.line(kBodyIndent, spec.finalLine, 0);
+void ComponentWriter::writeReturn(const ProcPlan& plan, const BlockContext& ctx) {
+  if (!plan.finalLine.isEmpty()) {
+    m_code.line(kBodyIndent, plan.finalLine, 0);
     return;
   }
   QByteArrayView value;
-  if (spec.returnType == "String") {
+  if (plan.returnType == "String") {
     value = ctx.locals ? "sTexto" : "m_strNome";
-  } else if (spec.returnType == "Long") {
+  } else if (plan.returnType == "Long") {
     value = ctx.locals ? "n" : "m_lngContador";
-  } else if (spec.returnType == "Currency") {
+  } else if (plan.returnType == "Currency") {
     value = ctx.locals ? "cTotal" : "m_curSaldo";
-  } else if (spec.returnType == "Boolean") {
+  } else if (plan.returnType == "Boolean") {
     value = ctx.locals ? "(cTotal > 0)" : "(m_lngContador > 0)";
   } else {
     value = ctx.locals ? "vValor" : "m_strNome";
   }
-  m_code.start(kBodyIndent) << spec.name << " = " << value;
+  m_code.start(kBodyIndent) << plan.name << " = " << value;
   m_code.end();
 }
 
-void ComponentWriter::writeBody(const ProcSpec& spec, int budget) {
+void ComponentWriter::writeBody(const ProcPlan& plan, int budget) {
   BlockContext ctx;
-  ctx.exitKeyword = exitKeyword(spec.kind);
-  const bool returns = !spec.finalLine.isEmpty() || !spec.returnType.isEmpty();
+  ctx.exitKeyword = exitKeyword(plan.kind);
+  const bool returns = !plan.finalLine.isEmpty() || !plan.returnType.isEmpty();
   const int reserve = returns ? 1 : 0;
 
   ctx.locals = budget - reserve >= 10 && m_rng.chance(85);
@@ -874,7 +874,7 @@ void ComponentWriter::writeBody(const ProcSpec& spec, int budget) {
     const bool blankBeforeLabel = m_rng.chance(60);
     const int tail = 1 + (blankBeforeLabel ? 1 : 0) + 1 + handlerLines;  // Exit, blank, label, handler
     writeBlock(kBodyIndent, 0, budget - reserve - tail, ctx);
-    if (returns) writeReturn(spec, ctx);
+    if (returns) writeReturn(plan, ctx);
     m_code.start(kBodyIndent, lineNumber(ctx)) << "Exit " << ctx.exitKeyword;
     m_code.end();
     if (blankBeforeLabel) m_code.blank();
@@ -887,24 +887,24 @@ void ComponentWriter::writeBody(const ProcSpec& spec, int budget) {
     return;
   }
   writeBlock(kBodyIndent, 0, budget - reserve, ctx);
-  if (returns) writeReturn(spec, ctx);
+  if (returns) writeReturn(plan, ctx);
 }
 
-void ComponentWriter::writeProcedure(const ProcSpec& spec, int lines) {
+void ComponentWriter::writeProcedure(const ProcPlan& plan, int lines) {
   int comments = 0;
   if (lines >= 7 && m_rng.chance(40)) comments = m_rng.between(1, std::min(3, lines - 6));
-  const int maxHeaderLines = std::min(3, int(spec.params.size()));
+  const int maxHeaderLines = std::min(3, int(plan.params.size()));
   int headerLines = 1;
   if (maxHeaderLines >= 2 && lines - comments >= 6 && m_rng.chance(18)) {
     headerLines = maxHeaderLines >= 3 && m_rng.chance(35) ? 3 : 2;
   }
   for (int i = 0; i < comments; ++i)
     writeComment(0);
-  writeHeader(spec, headerLines);
-  writeBody(spec, lines - comments - headerLines - 1);
+  writeHeader(plan, headerLines);
+  writeBody(plan, lines - comments - headerLines - 1);
   m_code.start(0) << "End "
-                  << (spec.kind == ProcKind::Sub        ? QByteArrayView("Sub")
-                      : spec.kind == ProcKind::Function ? QByteArrayView("Function")
+                  << (plan.kind == ProcKind::Sub        ? QByteArrayView("Sub")
+                      : plan.kind == ProcKind::Function ? QByteArrayView("Function")
                                                         : QByteArrayView("Property"));
   m_code.end();
 }
@@ -912,16 +912,16 @@ void ComponentWriter::writeProcedure(const ProcSpec& spec, int lines) {
 // ---------------------------------------------------------------------------------------------------------
 // Module level.
 
-void ComponentWriter::planProperties(qint64 target, std::deque<ProcSpec>& queue,
+void ComponentWriter::planProperties(qint64 target, std::deque<ProcPlan>& queue,
                                      std::vector<QByteArray>& fields) {
   const int groups = target >= 60 ? m_rng.between(1, 4) : (target >= 30 ? 1 : 0);
   for (int g = 0; g < groups; ++g) {
     const QByteArray suffix = QByteArray::number(g + 1);
-    ProcSpec get;
+    ProcPlan get;
     get.scope = "Public";
     get.kind = ProcKind::PropertyGet;
     get.maxLines = 12;
-    ProcSpec put = get;
+    ProcPlan put = get;
     put.maxLines = 10;
     if (m_rng.chance(25)) {
       // An object property: Get and Set.
@@ -1072,16 +1072,16 @@ void ComponentWriter::writeTrailingLines(int count) {
 }
 
 void ComponentWriter::writeCode(qint64 target, bool withMain) {
-  std::deque<ProcSpec> queue;
+  std::deque<ProcPlan> queue;
   std::vector<QByteArray> fields;
   if (withMain) {
-    ProcSpec main;
+    ProcPlan main;
     main.scope = "Public";
     main.name = "Main";
     queue.push_back(main);
   }
   if (m_kind == ComponentKind::Form) {
-    ProcSpec event;
+    ProcPlan event;
     event.scope = "Private";
     event.maxLines = 40;
     event.name = "Form_Load";
@@ -1104,7 +1104,7 @@ void ComponentWriter::writeCode(qint64 target, bool withMain) {
       queue.push_back(event);
     }
   } else if (m_kind == ComponentKind::Class) {
-    ProcSpec event;
+    ProcPlan event;
     event.scope = "Private";
     event.maxLines = 15;
     event.name = "Class_Initialize";
@@ -1132,14 +1132,14 @@ void ComponentWriter::writeCode(qint64 target, bool withMain) {
       writeTrailingLines(int(remaining));
       break;
     }
-    ProcSpec spec;
+    ProcPlan plan;
     if (queue.empty()) {
-      spec = genericProcedure();
+      plan = genericProcedure();
     } else {
-      spec = queue.front();
+      plan = queue.front();
       queue.pop_front();
     }
-    int lines = int(std::min<qint64>(drawProcedureLength(spec), remaining - gap));
+    int lines = int(std::min<qint64>(drawProcedureLength(plan), remaining - gap));
     int trailing = 0;
     const qint64 left = remaining - gap - lines;
     if (left > 0 && left < 1 + kMinProcedureLines) {
@@ -1152,8 +1152,8 @@ void ComponentWriter::writeCode(qint64 target, bool withMain) {
     }
     for (int i = 0; i < gap; ++i)
       m_code.blank();
-    writeProcedure(spec, lines);
-    if (spec.name == "Main") m_wroteMain = true;
+    writeProcedure(plan, lines);
+    if (plan.name == "Main") m_wroteMain = true;
     remaining -= gap + lines;
     if (trailing > 0) {
       writeTrailingLines(trailing);
