@@ -398,6 +398,48 @@ TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
   expectSameAnswers(text);
 }
 
+TEST(Editing, TheIndexFollowsLinesAddedAndRemovedInsideProcedures) {
+  // Ordinary lines only, so that the index moves procedures instead of reading their headers again; the
+  // module has a continued header and procedures without End lines, in the middle and at the end.
+  const QStringList module = {
+      QStringLiteral("Option Explicit"),  QStringLiteral("Dim a As Long"),
+      QStringLiteral("Sub Alfa()"),       QStringLiteral("    a = 1"),
+      QStringLiteral("End Sub"),          QString(),
+      QStringLiteral("Function Beta( _"), QStringLiteral("    ByVal x As Long) As Long"),
+      QStringLiteral("    Beta = x"),     QStringLiteral("End Function"),
+      QStringLiteral("Sub Gama()"),       QStringLiteral("    a = 2"),
+      QStringLiteral("' sem fim"),        QStringLiteral("Property Get Delta() As Long"),
+      QStringLiteral("    Delta = a"),    QStringLiteral("End Property"),
+      QStringLiteral("Sub Epsilon()"),    QStringLiteral("    a = 3"),
+  };
+  const QStringList pool = {QStringLiteral("    x = x + 1"), QStringLiteral("' nota"), QString(),
+                            QStringLiteral("    If a Then b = 1"), QStringLiteral("    Dim k As Long")};
+  std::mt19937 random(7);
+  auto pick = [&] { return pool[static_cast<int>(random() % static_cast<unsigned>(pool.size()))]; };
+  CodeText text;
+  loadLines(text, module);
+  for (int step = 0; step < 600; ++step) {
+    const int count = text.countOfLines();
+    // Below the declarations: the lines above the first header are the declarations' business.
+    const int low = 4;
+    if (random() % 2 == 0 || count < 25) {
+      const int at = low + static_cast<int>(random() % static_cast<unsigned>(count - low + 2));
+      text.insertLines(at, random() % 3 == 0 ? pick() + "\r\n" + pick() : pick());
+    } else {
+      const int first = low + static_cast<int>(random() % static_cast<unsigned>(count - low + 1));
+      const QString line = text.line(first);
+      const LineClass cls = classifyStatement(line);
+      if (isStructural(cls) || continuesOnNextLine(line) ||
+          (first > 1 && continuesOnNextLine(text.line(first - 1))))
+        continue;  // keep the structure: this test is about lines that come and go around it
+      text.deleteLines(first, 1);
+    }
+    SCOPED_TRACE(step);
+    expectSameAnswers(text);
+    if (HasFatalFailure()) return;
+  }
+}
+
 // ---------------------------------------------------------------------------------------------------
 // Hidden member attributes
 

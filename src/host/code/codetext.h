@@ -132,6 +132,7 @@ class CodeText {
   void shiftMarkers(int fromLine, int delta);
   void updateMarker(int lineNumber, bool wasStructural, bool isNowStructural);
   void touch(int firstLine, int removed, int inserted, bool structural);
+  bool shiftIndex(int firstLine, int removed, int inserted);
   Index& index();
   void rebuildIndex();
   QString statementText(int firstLine, int lastLine) const;
@@ -153,6 +154,8 @@ class CodeText {
   /// Attribute lines whose line was deleted, kept until a member of their owner's name takes them back.
   std::vector<SourceLine> m_orphanAttributes;
   quint64 m_changeCount = 0;
+  /// Grows whenever a line becomes or stops being a header or End line.
+  quint64 m_markerEdits = 0;
   std::vector<Listener*> m_listeners;
 };
 
