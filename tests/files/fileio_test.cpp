@@ -180,6 +180,32 @@ TEST(FileWriteBatchTest, ABatchThatIsNotCommittedOrFailsChangesNothing) {
   EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 1);
 }
 
+TEST(FileWriteBatchTest, FilesAddedTogetherAreAllOrNothing) {
+  QTemporaryDir dir;
+  std::vector<std::pair<QString, QByteArray>> files;
+  for (int i = 0; i < 12; ++i) {
+    const QString path = dir.filePath(QStringLiteral("m%1.bas").arg(i));
+    writePlainFile(path, "old");
+    files.emplace_back(path, QByteArray("new ") + QByteArray::number(i));
+  }
+  ASSERT_TRUE(QDir().mkpath(dir.filePath(QStringLiteral("in-the-way.bas"))));
+  files.emplace(files.begin() + 5, dir.filePath(QStringLiteral("in-the-way.bas")), QByteArray("x"));
+  FileWriteBatch failing;
+  const ide::Error error = expectError([&] { failing.addAll(files); });
+  EXPECT_TRUE(error.description().contains(QStringLiteral("in-the-way.bas")));
+  for (int i = 0; i < 12; ++i)
+    EXPECT_EQ(readPlainFile(dir.filePath(QStringLiteral("m%1.bas").arg(i))), QByteArray("old"));
+  EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 12);  // no temporary left
+
+  files.erase(files.begin() + 5);
+  FileWriteBatch batch;
+  batch.addAll(files);
+  batch.commit();
+  for (int i = 0; i < 12; ++i)
+    EXPECT_EQ(readPlainFile(dir.filePath(QStringLiteral("m%1.bas").arg(i))),
+              QByteArray("new ") + QByteArray::number(i));
+}
+
 TEST(FileWriteBatchTest, ALinkKeepsPointingAtTheFileThatGetsTheContent) {
   QTemporaryDir dir;
   const QString real = dir.filePath(QStringLiteral("real.bas"));

@@ -115,6 +115,14 @@ bool appendAnsi(QByteArray& out, QStringView text, qsizetype* firstBad) {
   out.resize(start + text.size());
   char* target = out.data() + start;
   const char16_t* source = text.utf16();
+  // Code is nearly all ASCII: narrow the whole line in one loop the compiler can vectorise, and go over
+  // it character by character only when something above 0x7F was in it.
+  char16_t seen = 0;
+  for (qsizetype i = 0, size = text.size(); i < size; ++i) {
+    target[i] = static_cast<char>(source[i]);
+    seen |= source[i];
+  }
+  if (seen < 0x80) return true;
   for (qsizetype i = 0, size = text.size(); i < size; ++i) {
     const char16_t character = source[i];
     if (character < 0x80 || (character >= 0xA0 && character <= 0xFF)) {

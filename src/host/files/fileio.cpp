@@ -86,37 +86,67 @@ void FileWriteBatch::abandon() {
   m_files.clear();
 }
 
-void FileWriteBatch::add(const QString& path, const QByteArray& bytes) {
+FileWriteBatch::Pending FileWriteBatch::createTemporary(const QString& path, const QByteArray& bytes,
+                                                        mode_t newFileMode, int& error) {
+  error = 0;
   // A link is followed, so that the file it points to gets the new content and the link stays.
   const QFileInfo info(path);
   const QString target = info.isSymLink() && !info.symLinkTarget().isEmpty() ? info.symLinkTarget() : path;
+  Pending pending{target, {}, -1};
   if (QFileInfo(target).isDir()) {
-    abandon();
-    failWrite(path, EISDIR);
+    error = EISDIR;
+    return pending;
   }
   const QFileInfo targetInfo(target);
-  QByteArray temporary =
+  pending.temporary =
       QFile::encodeName(targetInfo.absolutePath() + QStringLiteral("/.") + targetInfo.fileName()) +
       ".quimbel-XXXXXX";
-  const int descriptor = ::mkstemp(temporary.data());
-  if (descriptor < 0) {
-    const int error = errno;
-    abandon();
-    failWrite(path, error);
+  pending.descriptor = ::mkstemp(pending.temporary.data());
+  if (pending.descriptor < 0) {
+    error = errno;
+    pending.temporary.clear();
+    return pending;
   }
-  m_files.push_back(Pending{target, temporary, descriptor});
   // The new file keeps the old one's permissions (a new file gets what the umask allows).
   struct stat existing {};
-  const mode_t mode =
-      ::stat(QFile::encodeName(target).constData(), &existing) == 0 ? (existing.st_mode & 07777) : [] {
-        const mode_t mask = ::umask(0);
-        ::umask(mask);
-        return static_cast<mode_t>(0666 & ~mask);
-      }();
-  if (::fchmod(descriptor, mode) != 0 || !writeAll(descriptor, bytes)) {
-    const int error = errno;
+  const mode_t mode = ::stat(QFile::encodeName(target).constData(), &existing) == 0
+                          ? (existing.st_mode & 07777)
+                          : newFileMode;
+  if (::fchmod(pending.descriptor, mode) != 0 || !writeAll(pending.descriptor, bytes)) error = errno;
+  return pending;
+}
+
+void FileWriteBatch::add(const QString& path, const QByteArray& bytes) {
+  addAll({{path, bytes}});
+}
+
+void FileWriteBatch::addAll(const std::vector<std::pair<QString, QByteArray>>& files) {
+  // Read once, before any thread runs: reading the umask means setting it.
+  const mode_t mask = ::umask(0);
+  ::umask(mask);
+  const mode_t newFileMode = static_cast<mode_t>(0666 & ~mask);
+  std::vector<Pending> created(files.size());
+  std::vector<int> errors(files.size(), 0);
+  {
+    std::atomic<size_t> next{0};
+    auto write = [&] {
+      for (size_t i = next++; i < files.size(); i = next++)
+        created[i] = createTemporary(files[i].first, files[i].second, newFileMode, errors[i]);
+    };
+    std::vector<std::thread> writers;
+    const size_t threads = std::min<size_t>(files.size(), std::max(1u, std::thread::hardware_concurrency()));
+    for (size_t t = 1; t < threads; ++t)
+      writers.emplace_back(write);
+    write();
+    for (std::thread& writer : writers)
+      writer.join();
+  }
+  for (Pending& pending : created)
+    if (!pending.temporary.isEmpty()) m_files.push_back(std::move(pending));
+  for (size_t i = 0; i < files.size(); ++i) {
+    if (errors[i] == 0) continue;
     abandon();
-    failWrite(path, error);
+    failWrite(files[i].first, errors[i]);
   }
 }
 

@@ -6,6 +6,9 @@
 #include <QByteArray>
 #include <QString>
 
+#include <sys/types.h>
+
+#include <utility>
 #include <vector>
 
 namespace host {
@@ -33,6 +36,8 @@ class FileWriteBatch {
   /// Writes `bytes` to a temporary file for `path`. Throws ide::Error 75 "Cannot write <path>: <reason>";
   /// nothing of the batch is replaced then (the batch is abandoned).
   void add(const QString& path, const QByteArray& bytes);
+  /// The same for several files at once, written side by side.
+  void addAll(const std::vector<std::pair<QString, QByteArray>>& files);
   /// Flushes and puts every file in place. Throws ide::Error 75 naming the file that failed.
   void commit();
   bool empty() const { return m_files.empty(); }
@@ -43,6 +48,9 @@ class FileWriteBatch {
     QByteArray temporary;  // local 8-bit path
     int descriptor;
   };
+  /// Writes one temporary file; `error` is 0 or the reason it failed (the file may exist then).
+  static Pending createTemporary(const QString& path, const QByteArray& bytes, mode_t newFileMode,
+                                 int& error);
   void abandon();
   std::vector<Pending> m_files;
 };

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Components: their files, names, code modules, designers and windows.
+#include <QElapsedTimer>
+#include <cstdio>
 #include "host/files/ansi.h"
 #include "host/files/fileio.h"
 #include "host/model/designer.h"
@@ -181,13 +183,16 @@ std::optional<QByteArray> ComponentImpl::fileContents(bool force) {
 }
 
 void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
-  if (auto contents = fileContents(force)) addContentsToBatch(batch, *contents);
+  if (auto contents = fileContents(force)) {
+    batch.files->add(m_filePath, *contents);
+    batch.done.push_back(whenWritten());
+  }
 }
 
-void ComponentImpl::addContentsToBatch(SaveBatch& batch, const QByteArray& contents) {
-  batch.files->add(m_filePath, contents);
+std::function<void(bool)> ComponentImpl::whenWritten() {
+  // What is being written is the module as it is now.
   const quint64 savedChangeCount = m_module->text().changeCount();
-  batch.done.push_back([self = shared_from_this(), savedChangeCount, path = m_filePath](bool written) {
+  return [self = shared_from_this(), savedChangeCount, path = m_filePath](bool written) {
     if (written) {
       self->m_savedChangeCount = savedChangeCount;
       self->m_changed = false;
@@ -195,7 +200,7 @@ void ComponentImpl::addContentsToBatch(SaveBatch& batch, const QByteArray& conte
     auto project = self->project();
     if (auto vbe = project ? project->vbe() : nullptr)
       vbe->fireFileWritten(project, fileTypeOf(self->m_type), path, written ? 0 : 2);
-  });
+  };
 }
 
 void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImpl>>& components, bool force) {
@@ -206,8 +211,12 @@ void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImp
       components.size(), [&](size_t i) { contents[i] = components[i]->fileContents(force); }, failures);
   for (const std::exception_ptr& failure : failures)
     if (failure) std::rethrow_exception(failure);
+  std::vector<std::pair<QString, QByteArray>> files;
   for (size_t i = 0; i < components.size(); ++i)
-    if (contents[i]) components[i]->addContentsToBatch(batch, *contents[i]);
+    if (contents[i]) files.emplace_back(components[i]->filePath(), std::move(*contents[i]));
+  batch.files->addAll(files);
+  for (size_t i = 0; i < components.size(); ++i)
+    if (contents[i]) batch.done.push_back(components[i]->whenWritten());
 }
 
 bool ComponentImpl::IsDirty() {

@@ -205,7 +205,8 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   /// What saving would write: the file's bytes, or nothing when it need not be written. Reads only this
   /// component, so that several can be put together at once.
   std::optional<QByteArray> fileContents(bool force = false);
-  void addContentsToBatch(SaveBatch& batch, const QByteArray& contents);
+  /// What to do once the batch holding this component's file is done: note it saved, tell the IDE.
+  std::function<void(bool written)> whenWritten();
   QString filePath() const { return m_filePath; }
   void setFilePath(const QString& path) { m_filePath = path; }
   std::shared_ptr<ProjectImpl> project() const { return m_project.lock(); }
