@@ -1,12 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "host/code/linesyntax.h"
+#include "host/files/blanks.h"
 
 namespace host {
 namespace {
-
-bool isBlank(QChar c) {
-  return c == u' ' || c == u'\t';
-}
 
 bool is(QStringView word, QLatin1StringView keyword) {
   return word.compare(keyword, Qt::CaseInsensitive) == 0;

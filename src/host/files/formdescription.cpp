@@ -2,6 +2,7 @@
 // Form descriptions: a recursive-descent reader that looks at each line once, and the edits that keep every
 // untouched line as it was read.
 #include "host/files/formdescription.h"
+#include "host/files/blanks.h"
 
 #include "ide/error.h"
 
@@ -13,16 +14,6 @@ namespace {
 
 // Deeper nesting than any designer produces; the limit keeps a damaged file from exhausting the stack.
 constexpr int kMaxNesting = 200;
-
-bool isBlank(QChar character) {
-  return character == u' ' || character == u'\t';
-}
-
-qsizetype skipBlanks(QStringView text, qsizetype from) {
-  while (from < text.size() && isBlank(text[from]))
-    ++from;
-  return from;
-}
 
 qsizetype wordEnd(QStringView text, qsizetype from) {
   while (from < text.size() && !isBlank(text[from]))

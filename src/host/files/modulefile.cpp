@@ -2,6 +2,7 @@
 // One pass over a module's lines: the header parts in the order the IDE writes them, then the code with its
 // hidden attribute lines moved aside and remembered by the code line they follow.
 #include "host/files/modulefile.h"
+#include "host/files/blanks.h"
 
 #include "ide/error.h"
 
@@ -10,16 +11,6 @@
 
 namespace host {
 namespace {
-
-bool isBlank(QChar character) {
-  return character == u' ' || character == u'\t';
-}
-
-qsizetype skipBlanks(QStringView text, qsizetype from) {
-  while (from < text.size() && isBlank(text[from]))
-    ++from;
-  return from;
-}
 
 /// Whether the line's first word is `word` (case-insensitively), followed by a blank or the line's end;
 /// `after` receives the position after the word.
