@@ -10,6 +10,7 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QStringEncoder>
+#include <QTemporaryDir>
 
 #include <algorithm>
 #include <array>
@@ -1460,5 +1461,12 @@ GeneratedGroup generateProjects(const QString& directory, const GeneratorOptions
   }
   return result;
 }
+
+TemporaryGroup::TemporaryGroup(const GeneratorOptions& options) : m_dir(std::make_unique<QTemporaryDir>()) {
+  if (!m_dir->isValid()) throw std::runtime_error("cannot create a temporary directory");
+  m_group = generateProjects(m_dir->path(), options);
+}
+
+TemporaryGroup::~TemporaryGroup() = default;
 
 }  // namespace gen

@@ -8,6 +8,10 @@
 #include <QStringList>
 #include <QtGlobal>
 
+#include <memory>
+
+class QTemporaryDir;
+
 namespace gen {
 
 struct GeneratorOptions {
@@ -37,5 +41,23 @@ struct GeneratedGroup {
 /// Throws std::invalid_argument for impossible options and std::runtime_error, naming the path, when a
 /// directory or file cannot be written.
 GeneratedGroup generateProjects(const QString& directory, const GeneratorOptions& options);
+
+/// Generated projects in a temporary directory of their own, removed with the object: what a benchmark
+/// program works on for its whole run.
+class TemporaryGroup {
+ public:
+  explicit TemporaryGroup(const GeneratorOptions& options);
+  ~TemporaryGroup();
+  TemporaryGroup(const TemporaryGroup&) = delete;
+  TemporaryGroup& operator=(const TemporaryGroup&) = delete;
+
+  const GeneratedGroup& group() const { return m_group; }
+  /// The first (startup) project file.
+  const QString& projectFile() const { return m_group.projectFiles.front(); }
+
+ private:
+  std::unique_ptr<QTemporaryDir> m_dir;
+  GeneratedGroup m_group;
+};
 
 }  // namespace gen

@@ -45,20 +45,9 @@ constexpr double kKeystrokeTargetMs = 5;
 constexpr double kTimerLatencyTargetMs = 50;
 constexpr double kWalkLatencyTargetMs = 100;
 
-struct Corpus {
-  QTemporaryDir dir;
-  gen::GeneratedGroup group;
-  Corpus() {
-    gen::GeneratorOptions options;
-    options.codeLines = 100'000;
-    options.components = 1;
-    options.seed = 11;
-    group = gen::generateProjects(dir.path(), options);
-  }
-};
-
-Corpus& corpus() {
-  static Corpus instance;
+/// Generated once for the whole run.
+const gen::TemporaryGroup& corpus() {
+  static const gen::TemporaryGroup instance({100'000, 1, 1, 11});
   return instance;
 }
 
@@ -75,7 +64,7 @@ struct Ide {
     windowOptions.fitToScreen = false;
     window = std::make_unique<desktop::MainWindow>(vbe, *ui, windowOptions);
     window->show();
-    vbe->open(corpus().group.projectFiles.front());
+    vbe->open(corpus().projectFile());
     QCoreApplication::processEvents();
   }
   ~Ide() {

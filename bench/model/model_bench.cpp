@@ -9,27 +9,14 @@
 #include <benchmark/benchmark.h>
 
 #include <QFile>
-#include <QTemporaryDir>
 
 #include <memory>
 
 namespace {
 
-struct Corpus {
-  QTemporaryDir dir;
-  gen::GeneratedGroup group;
-  Corpus() {
-    gen::GeneratorOptions options;
-    options.codeLines = 1'000'000;
-    options.components = 200;
-    options.seed = 42;
-    group = gen::generateProjects(dir.path(), options);
-  }
-  QString projectFile() const { return group.projectFiles.front(); }
-};
-
-Corpus& corpus() {
-  static Corpus instance;
+/// Generated once for the whole run.
+const gen::TemporaryGroup& corpus() {
+  static const gen::TemporaryGroup instance({1'000'000, 200, 1, 42});
   return instance;
 }
 
@@ -68,7 +55,7 @@ void BM_Load(benchmark::State& state) {
   }
   state.counters["rss_mb"] = peak;
   state.counters["model_mb"] = peak - before;
-  state.counters["lines"] = static_cast<double>(corpus().group.codeLines);
+  state.counters["lines"] = static_cast<double>(corpus().group().codeLines);
 }
 BENCHMARK(BM_Load)->Unit(benchmark::kMillisecond)->Iterations(3);
 

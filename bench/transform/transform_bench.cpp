@@ -11,26 +11,13 @@
 
 #include <benchmark/benchmark.h>
 
-#include <QTemporaryDir>
-
 #include <memory>
 
 namespace {
 
-struct Corpus {
-  QTemporaryDir dir;
-  gen::GeneratedGroup group;
-  Corpus() {
-    gen::GeneratorOptions options;
-    options.codeLines = 1'000'000;
-    options.components = 200;
-    options.seed = 7;
-    group = gen::generateProjects(dir.path(), options);
-  }
-};
-
-Corpus& corpus() {
-  static Corpus instance;
+/// Generated once for the whole run.
+const gen::TemporaryGroup& corpus() {
+  static const gen::TemporaryGroup instance({1'000'000, 200, 1, 7});
   return instance;
 }
 
@@ -41,7 +28,7 @@ struct Model {
   int failures = 0;
 
   Model() {
-    project = vbe->open(corpus().group.projectFiles.front()).front();
+    project = vbe->open(corpus().projectFile()).front();
     context.onFailure = [this](const transform::WalkFailure&) { ++failures; };
     context.onLineSkipped = [this](const transform::WalkFailure&) { ++failures; };
   }
@@ -65,7 +52,7 @@ void walkFreshModels(benchmark::State& state, Prepare&& prepare, Walk&& walk) {
     state.ResumeTiming();
   }
   if (failures) state.SkipWithError("the walk reported failures");
-  state.counters["lines"] = double(corpus().group.codeLines);
+  state.counters["lines"] = double(corpus().group().codeLines);
 }
 
 void BM_NumberProject(benchmark::State& state) {
