@@ -68,6 +68,21 @@ constexpr Entry kStrings[] = {
     {5130, u"Erro na indentação do projeto."},
     {5135, u"Indentar Código"},
     {5161, u"&Fechar"},
+
+    // Text insertion: its failure, and the placeholders as the macro editor names them.
+    {5096, u"Erro na inserção de código."},
+    {5138, u"Nome do Projeto {ProjectName}"},
+    {5139, u"Nome do Módulo {ModuleName}"},
+    {5140, u"Nome do Procedimento {ProcedureName}"},
+    {5141, u"Tipo de Procedimento {ProcedureType}"},
+    {5142, u"Nome do Controle {ControlName}"},
+    {5143, u"Nome do Computador {ComputerName}"},
+    {5144, u"Nome do Usuário {UserName}"},
+    {5145, u"Início de Seleção {SS}"},
+    {5146, u"Fim de Seleção {SE}"},
+    {5147, u"Posição do Cursor {C}"},
+    {5148, u"Inserir Data {Date}"},
+    {5149, u"Inserir Hora {Time}"},
 };
 // clang-format on
 
