@@ -13,7 +13,8 @@
 namespace textins {
 namespace {
 
-Q_LOGGING_CATEGORY(lcInsertion, "quimbel.textins")
+// Off by default; QT_LOGGING_RULES="quimbel.textins.debug=true" shows the IDE failures that were done without.
+Q_LOGGING_CATEGORY(lcInsertion, "quimbel.textins", QtInfoMsg)
 
 constexpr int kInsertionFailedText = 5096;
 
