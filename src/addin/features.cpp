@@ -14,8 +14,8 @@ namespace {
 
 class AddInFeatures final : public Features {
  public:
-  AddInFeatures(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings)
-      : m_vbe(std::move(vbe)), m_settings(settings) {}
+  explicit AddInFeatures(const FeatureServices& services)
+      : m_vbe(services.vbe), m_settings(services.settings) {}
 
   void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
   void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
@@ -60,8 +60,8 @@ class AddInFeatures final : public Features {
 
 }  // namespace
 
-std::unique_ptr<Features> createFeatures(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings) {
-  return std::make_unique<AddInFeatures>(vbe, settings);
+std::unique_ptr<Features> createFeatures(const FeatureServices& services) {
+  return std::make_unique<AddInFeatures>(services);
 }
 
 }  // namespace addin

@@ -15,6 +15,12 @@
 namespace common {
 class SettingsStore;
 }
+namespace appdata {
+class CAppInfoFile;
+}
+namespace textins {
+class TextInsertion;
+}
 
 namespace addin {
 
@@ -74,7 +80,20 @@ class Features {
   virtual HotKeyClient* macros() = 0;
 };
 
+/// What the add-in hands its feature areas when it creates them; all of it outlives them.
+struct FeatureServices {
+  ide::Ref<ide::VBE> vbe;
+  common::SettingsStore& settings;
+  /// The application database (macros, copy buffers, templates, project identifiers); null when it could
+  /// not be opened at start-up. A command that needs it then shows `appInfoUnavailable`, which names the
+  /// file and says why.
+  appdata::CAppInfoFile* appInfo;
+  QString appInfoUnavailable;
+  /// InsertText for macros, copy buffers and templates.
+  textins::TextInsertion& textInsertion;
+};
+
 /// The feature areas as the add-in has them today.
-std::unique_ptr<Features> createFeatures(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings);
+std::unique_ptr<Features> createFeatures(const FeatureServices& services);
 
 }  // namespace addin

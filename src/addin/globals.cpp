@@ -70,13 +70,28 @@ Globals::Globals(ide::Ref<ide::VBE> vbe, ide::Ref<ide::AddIn> addIn, StartupValu
   m_computerName = systemName(platform.computerName());
   m_userName = systemName(platform.userName());
 
+  // The application database, at the path the machine configuration names now. Without it the add-in
+  // works on: the message names the file and says what is missing, and the file is left as it is.
+  m_appInfo.emplace();
+  try {
+    m_appInfo->OpenFile(config.installationPath());
+  } catch (const std::exception&) {
+    common::recordError(ide::Error(appdata::kAppDataError, m_appInfo->UnavailableMessage()),
+                        QStringLiteral("Globals"), QStringLiteral("OpenAppInfo"), __LINE__);
+    common::logLastError();
+    platform.ui().MsgBox(m_appInfo->UnavailableMessage(), ide::mb::Exclamation, common::title());
+  }
+  m_textInsertion.emplace(
+      *m_vbe, textins::InsertionContext{m_computerName, m_userName, [this] { return m_lastWindowType; }});
+
   // 11. The browse history.
   m_histories.emplace(*m_vbe, m_commandState);
   m_sampler.emplace(*m_histories);
 
   // 13. The event object, the utilities and the feature areas.
   m_envUtils.emplace(*m_vbe);
-  m_features = environment.createFeatures(m_vbe, m_settings);
+  m_features = environment.createFeatures(
+      {m_vbe, m_settings, AppInfo(), m_appInfo->UnavailableMessage(), *m_textInsertion});
   m_vbEvents.emplace(*this);
 
   // 15. The toolbar, the menus and the context-menu items, their click sinks, the IDE's event sinks and

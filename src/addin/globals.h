@@ -12,10 +12,12 @@
 #include "addin/machineconfig.h"
 #include "addin/options.h"
 #include "addin/vbevents.h"
+#include "appdata/appinfofile.h"
 #include "common/commandstate.h"
 #include "common/settings.h"
 #include "navigation/browsesampler.h"
 #include "navigation/histories.h"
+#include "textins/textinsertion.h"
 
 #include <array>
 #include <functional>
@@ -36,7 +38,7 @@ struct StartupValues {
 /// The platform stand-ins the add-in uses; empty members get the real ones.
 struct Environment {
   std::shared_ptr<MachineConfig> machineConfig;
-  std::function<std::unique_ptr<Features>(const ide::Ref<ide::VBE>&, common::SettingsStore&)> createFeatures;
+  std::function<std::unique_ptr<Features>(const FeatureServices&)> createFeatures;
 };
 
 /// The add-in's controls in the IDE's command bars. Released in this order: the menu items (in table
@@ -99,6 +101,11 @@ class Globals {
   const Options& options() const { return m_options; }
   common::CommandState& CommandState() { return m_commandState; }
   int LastWindowType() const { return m_lastWindowType; }
+  /// The application database; null when it could not be opened (the add-in runs on without it).
+  appdata::CAppInfoFile* AppInfo() { return m_appInfo && m_appInfo->IsOpen() ? &*m_appInfo : nullptr; }
+  /// What the user was told when the database could not be opened; empty while it is open.
+  const QString& AppInfoUnavailable() const { return m_appInfo->UnavailableMessage(); }
+  textins::TextInsertion& TextInsertion() { return *m_textInsertion; }
   navigation::CHistories& Histories() { return *m_histories; }
   navigation::BrowseSampler& sampler() { return *m_sampler; }
   CEnvUtils& EnvUtils() { return *m_envUtils; }
@@ -124,8 +131,10 @@ class Globals {
   common::CommandState m_commandState;
   int m_lastWindowType = -1;
 
-  // Released last: the project info objects will sit here, then the application database after the
+  // Released last: the project info objects will sit here; then the application database, after the
   // history.
+  std::optional<appdata::CAppInfoFile> m_appInfo;
+  std::optional<textins::TextInsertion> m_textInsertion;
   std::optional<navigation::CHistories> m_histories;
   std::optional<navigation::BrowseSampler> m_sampler;
   std::optional<CEnvUtils> m_envUtils;

@@ -122,7 +122,7 @@ LinkedAddIn::~LinkedAddIn() {
 
 void LinkedAddIn::connect() {
   Environment environment;
-  environment.createFeatures = [this](const ide::Ref<ide::VBE>&, common::SettingsStore&) {
+  environment.createFeatures = [this](const FeatureServices&) {
     auto features = std::make_unique<RecordingFeatures>(featureLog);
     features->copyBuffersClient = copyBuffers;
     features->macrosClient = macros;

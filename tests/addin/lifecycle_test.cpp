@@ -254,6 +254,33 @@ TEST(StartUpFailures, WithoutAnAddInsMenuTheStartUpFailsAndTakesApartWhatItBuilt
       << log.front().toStdString();
 }
 
+TEST(StartUpFailures, AnUnusableDatabaseIsNamedAndTheAddInStartsWithoutIt) {
+  AddInEnvironment environment;
+  const QString file = environment.installDir() + u"/Quimbel.inf"_qs;
+  {
+    LinkedAddIn ide;
+    ide.connect();
+    ASSERT_NE(ide.globals().AppInfo(), nullptr) << "a missing database is created";
+    EXPECT_EQ(ide.globals().AppInfo()->FilePath(), file);
+    EXPECT_TRUE(ide.ui().messageBoxes().empty());
+  }
+  const QByteArray notADatabase = "VERSION 1.0 CLASS\r\nBEGIN\r\n  MultiUse = -1  'True\r\nEND\r\n";
+  QFile bad(file);
+  ASSERT_TRUE(bad.open(QIODevice::WriteOnly | QIODevice::Truncate));
+  bad.write(notADatabase);
+  bad.close();
+  LinkedAddIn ide;
+  ide.connect();
+  EXPECT_TRUE(ide.addIn->Connect());
+  EXPECT_EQ(quimbelPopups(*ide.vbe), 1);
+  EXPECT_EQ(ide.globals().AppInfo(), nullptr);
+  ASSERT_EQ(boxTexts(ide.ui()), QStringList{ide.globals().AppInfoUnavailable()});
+  EXPECT_TRUE(ide.globals().AppInfoUnavailable().contains(file));
+  EXPECT_EQ(ide::mb::iconOf(ide.ui().messageBoxes().front().style), kExclamation);
+  ASSERT_TRUE(bad.open(QIODevice::ReadOnly));
+  EXPECT_EQ(bad.readAll(), notADatabase);
+}
+
 TEST(StartUpFailures, AFailureThreeCallsDeepShowsOneMessageNamingTheInnermostProcedure) {
   RealAddIn ide;
   auto& addIn = ide.registerAddIn(true);
