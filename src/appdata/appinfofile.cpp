@@ -393,7 +393,7 @@ void CAppInfoFile::CreateFileInfo(const QString& FilePath) {
   const QString directory = target.absolutePath();
   QTemporaryFile temp(directory + QStringLiteral("/.") + target.fileName() + QStringLiteral(".XXXXXX"));
   if (!temp.open())
-    throw ide::Error(SQLITE_CANTOPEN,
+    throw ide::Error(ide::err::PathFileAccessError,
                      QStringLiteral("%1 (%2)").arg(QString::fromUtf16(kCannotCreate), temp.errorString()));
   temp.close();
   {
