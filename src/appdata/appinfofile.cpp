@@ -39,7 +39,7 @@ COMMIT;)";
 
 // What the user reads when the database cannot be used.
 constexpr char16_t kOpenFailed[] =
-    u"Não foi possível abrir o banco de dados do Quimbel, %1: %2.\n\nAs macros de teclado, as memórias de "
+    u"Não foi possível abrir o banco de dados do Quimbel, %1: %2\n\nAs macros de teclado, as memórias de "
     u"cópia, os modelos de código e os identificadores de projeto ficam indisponíveis nesta sessão.";
 constexpr char16_t kNotADatabase[] =
     u"o arquivo não é um banco de dados do Quimbel, ou foi cifrado com outra senha";
@@ -162,6 +162,11 @@ QString openFailureReason(const std::exception& failure) {
       return detail;
   }
   return QStringLiteral("%1 (%2)").arg(QString::fromUtf16(reason), detail);
+}
+
+QString unavailableMessage(const QString& file, QString reason) {
+  if (!reason.endsWith(u'.')) reason += u'.';
+  return QString::fromUtf16(kOpenFailed).arg(file, reason);
 }
 
 QString describe(const std::exception& failure) {
@@ -340,8 +345,8 @@ void CAppInfoFile::OpenFile(const QString& installationPath) {
   QString directory = installationPath.trimmed();
   if (directory.isEmpty()) {
     m_filePath.clear();
-    m_unavailable = QString::fromUtf16(kOpenFailed)
-                        .arg(QLatin1StringView(kFileName), QLatin1StringView(kNoInstallationPath));
+    m_unavailable =
+        unavailableMessage(QString::fromLatin1(kFileName), QString::fromLatin1(kNoInstallationPath));
     throw ide::Error(kAppDataError, QString::fromLatin1(kNoInstallationPath),
                      QString::fromLatin1(kInitializeSource));
   }
@@ -376,7 +381,7 @@ void CAppInfoFile::OpenFile(const QString& installationPath) {
     m_db = db.release();
   } catch (const std::exception& failure) {
     m_statements.reset();
-    m_unavailable = QString::fromUtf16(kOpenFailed).arg(m_filePath, openFailureReason(failure));
+    m_unavailable = unavailableMessage(m_filePath, openFailureReason(failure));
     common::recordErrorNumber(failure);
     throw ide::Error(kAppDataError, QString::fromLatin1(kInitializationError),
                      QString::fromLatin1(kInitializeSource));
