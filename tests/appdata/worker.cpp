@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: MIT
 // A second process on the application database, for the tests: `appdata_worker DIR ids N` draws N
 // project identifiers and prints them; `appdata_worker DIR write N` writes versions 0 to N-1 of a macro
-// text, printing each version's number once it is committed.
-#include "worker.h"
+// text (300,000 times one letter, then the number), printing each version's number once it is committed.
 #include "appdata/appinfofile.h"
 
 #include <cstdio>
@@ -19,7 +18,8 @@ int main(int argc, char** argv) {
       if (mode == QLatin1StringView("ids")) {
         std::printf("%s\n", file.GetNextProjId().toLatin1().constData());
       } else {
-        file.WriteMacroText(QStringLiteral("Ctrl+Alt+A"), appdata::test::workerText(i));
+        file.WriteMacroText(QStringLiteral("Ctrl+Alt+A"),
+                            QString(300'000, QChar(u'a' + i % 26)) + QString::number(i));
         std::printf("%d\n", i);
       }
       std::fflush(stdout);
