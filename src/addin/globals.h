@@ -3,7 +3,8 @@
 // the settings to starting the timer); destroying it is the shut-down. The members are declared so that
 // C++ releases them in the shut-down order: the timer, the hotkey procedure, the command-bar controls
 // (menu items, popup, context-menu items, toolbar), the event sinks (clicks, then the IDE's), the
-// utilities and the history. A start-up that fails half-way therefore takes apart exactly what it built.
+// utilities, the history and the application database. A start-up that fails half-way therefore takes
+// apart exactly what it built.
 #pragma once
 
 #include "addin/envutils.h"
