@@ -13,7 +13,7 @@
 namespace textins {
 namespace {
 
-// Off by default; QT_LOGGING_RULES="quimbel.textins.debug=true" shows the IDE failures that were done without.
+// IDE failures that insertion does without; QT_LOGGING_RULES="quimbel.textins.debug=true" shows them.
 Q_LOGGING_CATEGORY(lcInsertion, "quimbel.textins", QtInfoMsg)
 
 constexpr int kInsertionFailedText = 5096;
