@@ -20,15 +20,33 @@
 
 namespace host {
 
+namespace {
+
+/// Why a file of this type is not read: opening a directory succeeds and only the read fails, with a less
+/// helpful reason; opening a FIFO waits for a writer; a device may never end. Empty for a regular file.
+QString unreadableKind(mode_t mode) {
+  if (S_ISREG(mode)) return {};
+  if (S_ISDIR(mode)) return QStringLiteral("it is a directory");
+  if (S_ISFIFO(mode)) return QStringLiteral("it is a FIFO");
+  if (S_ISCHR(mode) || S_ISBLK(mode)) return QStringLiteral("it is a device");
+  if (S_ISSOCK(mode)) return QStringLiteral("it is a socket");
+  return QStringLiteral("it is not a regular file");
+}
+
+}  // namespace
+
 QByteArray readFileBytes(const QString& path) {
-  const QFileInfo info(path);
-  if (!info.exists()) {
-    throw ide::Error(ide::err::FileNotFound, QStringLiteral("File not found: %1").arg(path));
+  struct stat status {};
+  if (::stat(QFile::encodeName(path).constData(), &status) != 0) {
+    if (errno == ENOENT || errno == ENOTDIR)
+      throw ide::Error(ide::err::FileNotFound, QStringLiteral("File not found: %1").arg(path));
+    throw ide::Error(
+        ide::err::PathFileAccessError,
+        QStringLiteral("Cannot read %1: %2").arg(path, QString::fromLocal8Bit(std::strerror(errno))));
   }
-  // Opening a directory succeeds on Linux and only the read fails, with a less helpful reason.
-  if (info.isDir()) {
-    throw ide::Error(ide::err::PathFileAccessError,
-                     QStringLiteral("Cannot read %1: it is a directory").arg(path));
+  // Checked before opening: the file is never opened for reading unless it is a regular file.
+  if (const QString kind = unreadableKind(status.st_mode); !kind.isEmpty()) {
+    throw ide::Error(ide::err::PathFileAccessError, QStringLiteral("Cannot read %1: %2").arg(path, kind));
   }
   QFile file(path);
   if (!file.open(QIODevice::ReadOnly)) {

@@ -13,7 +13,8 @@
 
 namespace host {
 
-/// The file's bytes. Throws ide::Error: 53 "File not found: <path>", 75 "Cannot read <path>: <reason>".
+/// The file's bytes. Throws ide::Error: 53 "File not found: <path>", 75 "Cannot read <path>: <reason>";
+/// a directory, FIFO, device or socket is refused (75, "it is a FIFO" ...) without being opened.
 QByteArray readFileBytes(const QString& path);
 
 /// Writes `bytes` to `path` through a temporary file in the same directory that replaces the old file
