@@ -245,6 +245,12 @@ TEST(ProjectFileErrorTest, MalformedMainPartLinesNameTheFileAndLine) {
   const ide::Error binary =
       expectError([] { ProjectFile::parse(QByteArray("Type=Exe\r\n\0", 11), QStringLiteral("P.vbp")); });
   EXPECT_EQ(binary.description(), u"P.vbp, line 2: not a text file");
+
+  for (const char* entry : {"Module=modA", "Module=;", "Form=", "ResFile32=\"\""}) {  // no file named
+    const QByteArray bytes = "Type=Exe\r\n" + QByteArray(entry) + "\r\n";
+    EXPECT_EQ(expectError([&] { ProjectFile::parse(bytes, QStringLiteral("P.vbp")); }).description(),
+              QStringLiteral("P.vbp, line 2: the entry names no file: ") + entry);
+  }
 }
 
 TEST(ProjectFileErrorTest, SectionsMayHoldAnything) {

@@ -113,6 +113,14 @@ ProjectFile ProjectFile::parse(const std::vector<SourceLine>& lines, const QStri
                            .arg(i + 1)
                            .arg(text.trimmed().left(60)));
     }
+    // Without a file name the entry would name the project's own folder.
+    const std::optional<ComponentKind> kind = componentKindOf(keyOf(text));
+    if (kind && componentFromLine(*kind, valueOf(text)).path.trimmed().isEmpty()) {
+      throw ide::Error(ide::err::InvalidFileFormat, QStringLiteral("%1, line %2: the entry names no file: %3")
+                                                        .arg(fileName)
+                                                        .arg(i + 1)
+                                                        .arg(text.trimmed().left(60)));
+    }
   }
   ProjectFile project;
   project.m_lines = lines;

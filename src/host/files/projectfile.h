@@ -45,7 +45,7 @@ struct ProjectComponent {
 class ProjectFile {
  public:
   /// Reads the lines of a project file. Throws ide::Error 321 "<fileName>, line <n>: ..." for a line of the
-  /// main part that is neither blank nor "Key=value".
+  /// main part that is neither blank nor "Key=value", and for a component entry without a file name.
   static ProjectFile parse(const std::vector<SourceLine>& lines, const QString& fileName);
   static ProjectFile parse(QByteArrayView bytes, const QString& fileName);
 
