@@ -145,13 +145,15 @@ QByteArray writeModule(const ModuleSource& source, const QString& fileName) {
   QByteArray out;
   out.reserve(estimate);
   int lineNumber = 0;
-  bool previousEnded = true;
+  LineEnd previous = LineEnd::None;
   const auto write = [&](const SourceLine& line) {
     // Only the last line of a file read from disk lacks a line end; after edits put lines behind it, it
     // needs one to stay a line of its own.
-    if (!previousEnded) out.append("\r\n");
-    appendSourceLine(out, line, fileName, ++lineNumber);
-    previousEnded = line.end != LineEnd::None;
+    if (lineNumber > 0 && previous == LineEnd::None) {
+      out.append("\r\n");
+      previous = LineEnd::CRLF;
+    }
+    previous = appendSourceLine(out, line, fileName, ++lineNumber, previous);
   };
   for (const std::vector<SourceLine>* part :
        {&source.preamble, &std::as_const(formLines), &source.moduleAttributes}) {

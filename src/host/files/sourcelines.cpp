@@ -72,7 +72,14 @@ std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fil
   return lines;
 }
 
-void appendSourceLine(QByteArray& out, const SourceLine& line, const QString& fileName, int lineNumber) {
+LineEnd lineEndToWrite(const SourceLine& line, LineEnd previous) {
+  if (!line.text.isEmpty() || previous == LineEnd::None) return line.end;
+  if (line.end == LineEnd::None || (line.end == LineEnd::LF && previous == LineEnd::CR)) return previous;
+  return line.end;
+}
+
+LineEnd appendSourceLine(QByteArray& out, const SourceLine& line, const QString& fileName, int lineNumber,
+                         LineEnd previous) {
   qsizetype bad = 0;
   if (!appendAnsi(out, line.text, &bad)) {
     const QString code = QString::number(line.text.at(bad).unicode(), 16).toUpper().rightJustified(4, u'0');
@@ -81,7 +88,9 @@ void appendSourceLine(QByteArray& out, const SourceLine& line, const QString& fi
                        .arg(code)
                        .arg(bad + 1));
   }
-  out.append(lineEndBytes(line.end));
+  const LineEnd end = lineEndToWrite(line, previous);
+  out.append(lineEndBytes(end));
+  return end;
 }
 
 LineEnd lineEndAt(const std::vector<SourceLine>& lines, std::size_t position) {
@@ -111,8 +120,9 @@ QByteArray writeSourceLines(const std::vector<SourceLine>& lines, const QString&
   QByteArray out;
   out.reserve(total);
   int lineNumber = 0;
+  LineEnd previous = LineEnd::None;
   for (const SourceLine& line : lines)
-    appendSourceLine(out, line, fileName, ++lineNumber);
+    previous = appendSourceLine(out, line, fileName, ++lineNumber, previous);
   return out;
 }
 

@@ -35,8 +35,18 @@ std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fil
 /// character cannot be written in the code page.
 QByteArray writeSourceLines(const std::vector<SourceLine>& lines, const QString& fileName);
 
-/// Appends one line (text and end) to `out`; throws as writeSourceLines.
-void appendSourceLine(QByteArray& out, const SourceLine& line, const QString& fileName, int lineNumber);
+/// Appends one line (text and end) to `out`; throws as writeSourceLines. `previous` is the line end written
+/// before it (None for a first line); returns the line end written, which is the line's own except where
+/// edits put together what no file can hold (see lineEndToWrite).
+LineEnd appendSourceLine(QByteArray& out, const SourceLine& line, const QString& fileName, int lineNumber,
+                         LineEnd previous = LineEnd::None);
+
+/// The line end to write after `line` when the line before it ended with `previous` (None for a first
+/// line), so that the bytes read back give the same lines. Edits can make two sequences that no file read
+/// from disk holds: an empty line ending in LF after a lone CR (the two would read back as one CRLF), and
+/// an empty last line without a line end (it would read back as no line at all). Such an empty line ends
+/// like the line before it.
+LineEnd lineEndToWrite(const SourceLine& line, LineEnd previous);
 
 /// The line end to give a new line at `position`: the one of the line before it, else of the line after
 /// it, else CRLF.
