@@ -144,12 +144,6 @@ TEST(BadInput, FailuresNameTheFileAndLineAndAddNothing) {
             ide::err::FileNotFound);
   EXPECT_TRUE(description.contains(QStringLiteral("Nada.vbp")));
 
-  // A project naming a module that is not there.
-  QFile::remove(copy.path(QStringLiteral("Loja/modConstantes.bas")));
-  EXPECT_EQ(errorNumberOf([&] { vbe->open(copy.groupFile()); }, &description), ide::err::FileNotFound);
-  EXPECT_TRUE(description.contains(QStringLiteral("Loja.vbp, line 5"))) << description.toStdString();
-  EXPECT_TRUE(description.contains(QStringLiteral("modConstantes.bas")));
-
   // A form whose description lacks its End.
   const QString form = copy.path(QStringLiteral("Utilitarios/Quebrado.frm"));
   writeBytes(form, "VERSION 5.00\r\nBegin VB.Form Quebrado \r\n   Caption = \"x\"\r\n");
@@ -166,6 +160,30 @@ TEST(BadInput, FailuresNameTheFileAndLineAndAddNothing) {
   EXPECT_EQ(errorNumberOf([&] { vbe->open(binary); }, &description), 321);
 
   EXPECT_EQ(vbe->VBProjects()->Count(), 0);
+}
+
+TEST(MessyProjects, EntriesKeepTheirSpellingAndMissingFilesTheirLines) {
+  QTemporaryDir dir;
+  const QString file = test::writeMessyProject(dir.path());
+  const QByteArray original = readBytes(file);
+  writeBytes(dir.filePath(QStringLiteral("Grupo.vbg")),
+             "VBGROUP 5.0\r\nStartupProject=entrada.VBP\r\nProject=Outro\\Falta.vbp\r\n");
+  auto vbe = VbeImpl::create();
+  auto project = vbe->open(dir.filePath(QStringLiteral("Grupo.vbg"))).at(0);
+  EXPECT_EQ(project->Count(), 3);
+  QStringList missing;
+  for (const MissingFile& entry : vbe->missingFiles())
+    missing << QStringLiteral("%1: %2").arg(entry.line).arg(entry.entry);
+  EXPECT_EQ(missing,
+            QStringList({QStringLiteral("3: Outro\\Falta.vbp"), QStringLiteral("4: Classes\\clsFalta.cls")}));
+  // A change touches its own entry only (the entries after the missing one still find their lines).
+  project->component(QStringLiteral("modMisto"))->setName(QStringLiteral("modAntigo"));
+  project->Remove(project->component(QStringLiteral("modEntrada")));
+  vbe->saveAll();
+  QByteArray expected = original;
+  expected.replace("Module=modEntrada; FONTES\\ModEntrada.bas\r\n", "")
+      .replace("Module=modMisto;", "Module=modAntigo;");
+  EXPECT_EQ(readBytes(file), expected);
 }
 
 TEST(Saving, AWriteThatCannotBeDoneSaysWhatFailedAndKeepsTheChanges) {

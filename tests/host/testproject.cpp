@@ -33,6 +33,26 @@ QMap<QString, QByteArray> ExampleCopy::snapshot() const {
   return files;
 }
 
+QString writeMessyProject(const QString& dir) {
+  writeBytes(dir + QStringLiteral("/Forms/frmLuzNegra.frm"),
+             "VERSION 5.00\r\nBegin VB.Form frmLuzNegra \r\n   Caption         =   \"Ilumina\xE7\xE3o\"\r\n"
+             "End\r\nAttribute VB_Name = \"frmLuzNegra\"\r\nOption Explicit\r\n");
+  writeBytes(dir + QStringLiteral("/Fontes/modEntrada.bas"),
+             "Attribute VB_Name = \"modEntrada\"\r\nOption Explicit\r\n' Configura\xE7\xE3o\r\n"
+             "Public Sub Principal()\r\n    If Dir$(\"C:\\Dados\") = \"\" Then GoTo 10\r\n"
+             "    frmLuzNegra.Show\r\n10  Exit Sub\r\nEnd Sub\r\n");
+  writeBytes(
+      dir + QStringLiteral("/Fontes/modMisto.bas"),
+      "Attribute VB_Name = \"modMisto\"\nOption Explicit\n' Vers\xE3o antiga\rSub Velha()\r    x = 1\r\r"
+      "    y = 2\rEnd Sub");
+  const QString project = dir + QStringLiteral("/Entrada.vbp");
+  writeBytes(project,
+             "Type=Exe\r\nForm=forms\\frmLuzNEGRA.frm\r\nModule=modEntrada; FONTES\\ModEntrada.bas\r\n"
+             "Class=clsFalta; Classes\\clsFalta.cls\r\nModule=modMisto; .\\fontes\\modmisto.BAS\r\n"
+             "Startup=\"frmLuzNegra\"\r\nName=\"Entrada\"\r\n");
+  return project;
+}
+
 QByteArray readBytes(const QString& path) {
   QFile file(path);
   if (!file.open(QIODevice::ReadOnly)) throw std::runtime_error("cannot read " + path.toStdString());

@@ -26,6 +26,10 @@ class ExampleCopy {
   QTemporaryDir m_dir;
 };
 
+/// Entrada.vbp in `dir` as real code leaves it: backslash entries in another case than the disk's, a missing
+/// class (line 4), cp1252, CRLF, and modMisto with LF, then lone CRs, and no final line end.
+QString writeMessyProject(const QString& dir);
+
 QByteArray readBytes(const QString& path);
 void writeBytes(const QString& path, const QByteArray& bytes);
 

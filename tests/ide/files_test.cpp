@@ -163,15 +163,16 @@ TEST_F(FilesTest, ClosingTheWindowAsksAboutChanges) {
 TEST_F(FilesTest, ABrokenProjectIsNamedWithItsLineAndNothingOpens) {
   QTemporaryDir dir;
   writeBytes(dir.filePath(QStringLiteral("Broken.vbp")),
-             "Type=Exe\r\nModule=modA; modA.bas\r\nForm=Falta.frm\r\nName=\"Broken\"\r\n");
+             "Type=Exe\r\nModule=modA; modA.bas\r\nForm=Pasta.frm\r\nName=\"Broken\"\r\n");
   writeBytes(dir.filePath(QStringLiteral("modA.bas")), "Attribute VB_Name = \"modA\"\r\nOption Explicit\r\n");
+  QDir(dir.path()).mkdir(QStringLiteral("Pasta.frm"));
   m_ide.ui->queueAnswer(ide::mb::OK);
   EXPECT_FALSE(commands().open(dir.filePath(QStringLiteral("Broken.vbp")), false));
   EXPECT_EQ(m_ide.vbe->projects().size(), 2u);
   ASSERT_EQ(m_messages.size(), 1);
   EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Broken.vbp"))) << m_messages.front().toStdString();
   EXPECT_TRUE(m_messages.front().contains(QStringLiteral("line 3"))) << m_messages.front().toStdString();
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Falta.frm"))) << m_messages.front().toStdString();
+  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Pasta.frm"))) << m_messages.front().toStdString();
 }
 
 TEST_F(FilesTest, AnUnreadableFileIsNamed) {

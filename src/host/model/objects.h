@@ -249,6 +249,14 @@ void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImp
 // ---------------------------------------------------------------------------------------------------
 // Projects
 
+/// A file that a project or group file lists but that was not there when it was opened. Nothing is loaded
+/// for it, and its entry stays in the file as it was.
+struct MissingFile {
+  QString listedIn;  // the project or group file
+  int line = 0;      // the entry's line there (1-based)
+  QString entry;     // the path as the entry writes it
+};
+
 class ProjectImpl final : public ide::VBProject,
                           public ide::VBComponents,
                           public std::enable_shared_from_this<ProjectImpl> {
@@ -300,6 +308,8 @@ class ProjectImpl final : public ide::VBProject,
   std::shared_ptr<ComponentImpl> addExistingFile(const QString& path, bool announce);
   /// Left the IDE (closed): its operations that need the IDE fail from now on.
   void detach();
+  /// The files the project file listed that were missing when it was loaded, in file order.
+  const std::vector<MissingFile>& missingFiles() const { return m_missing; }
 
   // Event sources of this project (the IDE-wide ones are fired alongside by the VBE).
   std::shared_ptr<ide::ComponentsEventSource> componentEvents;
@@ -312,6 +322,9 @@ class ProjectImpl final : public ide::VBProject,
   QString componentEntryPath(const ComponentImpl& component) const;
   void addComponentEntry(ComponentImpl& component);
   int indexOf(const ComponentImpl& component) const;
+  /// The index among the project file's component entries of the component at `index` (the entries of
+  /// missing files have no component).
+  int entryIndexOf(int index) const;
   /// Gives new components a file in `dir`, named after them.
   void assignFilePaths(const QString& dir);
 
@@ -321,6 +334,9 @@ class ProjectImpl final : public ide::VBProject,
   ide::ProjectType m_type = ide::ProjectType::StandardExe;
   std::optional<ProjectFile> m_file;
   std::vector<std::shared_ptr<ComponentImpl>> m_components;
+  std::vector<MissingFile> m_missing;
+  /// One per component entry of the project file, in file order: whether its file was missing.
+  std::vector<bool> m_entryMissing;
   bool m_changed = false;
   bool m_detached = false;
 };

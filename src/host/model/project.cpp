@@ -225,10 +225,15 @@ void ProjectImpl::load(const QString& fileName) {
       try {
         std::rethrow_exception(failures[i]);
       } catch (const ide::Error& error) {
-        if (error.number() == ide::err::FileNotFound)
-          ide::raise(
-              error.number(),
-              QStringLiteral("%1, line %2: file not found: %3").arg(fileName).arg(line).arg(entries[i].path));
+        // The rest of the project loads without a missing file, as in the IDE; its entry stays.
+        if (error.number() == ide::err::FileNotFound) {
+          m_missing.push_back({fileName, line, entries[i].path});
+          m_entryMissing.push_back(true);
+          continue;
+        }
+        if (error.number() == ide::err::PathFileAccessError)
+          ide::raise(error.number(),
+                     QStringLiteral("%1, line %2: %3").arg(fileName).arg(line).arg(error.description()));
         throw;
       }
     }
@@ -238,6 +243,7 @@ void ProjectImpl::load(const QString& fileName) {
                                              .arg(line)
                                              .arg(loaded[i]->Name()));
     m_components.push_back(loaded[i]);
+    m_entryMissing.push_back(false);
   }
   m_changed = false;
 }
@@ -334,6 +340,13 @@ int ProjectImpl::indexOf(const ComponentImpl& component) const {
   return -1;
 }
 
+int ProjectImpl::entryIndexOf(int index) const {
+  int entry = 0;
+  for (int loaded = -1; entry < static_cast<int>(m_entryMissing.size()); ++entry)
+    if (!m_entryMissing[static_cast<size_t>(entry)] && ++loaded == index) return entry;
+  return entry;  // past the entries: only for a component that has none, which cannot happen
+}
+
 QString ProjectImpl::componentEntryPath(const ComponentImpl& component) const {
   const QString dir = directory();
   if (component.filePath().isEmpty()) return {};
@@ -341,16 +354,20 @@ QString ProjectImpl::componentEntryPath(const ComponentImpl& component) const {
 }
 
 void ProjectImpl::componentEntryChanged(ComponentImpl& component, const QString& /*oldName*/) {
-  const int index = indexOf(component);
-  if (index < 0) return;
+  const int found = indexOf(component);
+  if (found < 0) return;
+  const int index = entryIndexOf(found);
   const ProjectComponent entry = m_file->components()[static_cast<size_t>(index)];
   if ((entry.kind == ComponentKind::Module || entry.kind == ComponentKind::Class) &&
       entry.name != component.Name()) {
     m_file->setComponentName(index, component.Name());
     m_changed = true;
   }
+  // An entry keeps its spelling (backslashes, ".\", a letter case the disk does not have) for as long as
+  // it names the component's file: the project is rewritten only when a file really moved.
   const QString path = componentEntryPath(component);
-  if (!path.isEmpty() && entry.path != path) {
+  if (!path.isEmpty() && entry.path != path &&
+      resolveProjectPath(directory(), entry.path) != QDir::cleanPath(component.filePath())) {
     m_file->setComponentPath(index, path);
     m_changed = true;
   }
@@ -364,6 +381,7 @@ void ProjectImpl::addComponentEntry(ComponentImpl& component) {
   entry.path = componentEntryPath(component);
   if (entry.path.isEmpty()) entry.path = component.Name() + u'.' + fileSuffixOf(component.Type());
   m_file->addComponent(entry);
+  m_entryMissing.push_back(false);  // the new entry follows the other component entries
   m_changed = true;
 }
 
@@ -422,7 +440,9 @@ void ProjectImpl::Remove(const ide::Ref<ide::VBComponent>& component) {
   const int now = indexOf(*impl);
   if (now < 0) return;
   impl->closeWindows();
-  m_file->removeComponent(now);
+  const int entry = entryIndexOf(now);
+  m_file->removeComponent(entry);
+  m_entryMissing.erase(m_entryMissing.begin() + entry);
   m_components.erase(m_components.begin() + now);
   impl->detach();
   m_changed = true;

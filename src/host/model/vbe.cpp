@@ -420,6 +420,13 @@ void VbeImpl::runCommand(int command) {
 // ---------------------------------------------------------------------------------------------------
 // Files
 
+std::vector<MissingFile> VbeImpl::missingFiles() const {
+  std::vector<MissingFile> all = m_missingProjects;
+  for (const auto& project : m_projects)
+    all.insert(all.end(), project->missingFiles().begin(), project->missingFiles().end());
+  return all;
+}
+
 std::shared_ptr<ProjectImpl> VbeImpl::project(const QString& name) const {
   for (const auto& project : m_projects)
     if (project->Name().compare(name, Qt::CaseInsensitive) == 0) return project;
@@ -436,6 +443,14 @@ std::vector<std::shared_ptr<ProjectImpl>> VbeImpl::open(const QString& path) {
   const QString suffix = QFileInfo(path).suffix().toLower();
   if (suffix == QLatin1StringView("vbg")) return openGroup(path);
   if (suffix == QLatin1StringView("vbp")) return {openProject(path)};
+  static const QStringList kModuleSuffixes = {
+      QStringLiteral("bas"), QStringLiteral("cls"), QStringLiteral("frm"), QStringLiteral("ctl"),
+      QStringLiteral("pag"), QStringLiteral("dob"), QStringLiteral("dsr")};
+  // Anything else would become a related document of a new project: a folder, a FIFO, a device.
+  if (!kModuleSuffixes.contains(suffix))
+    ide::raise(ide::err::InvalidFileFormat,
+               QStringLiteral("%1: not a project group, project or module file (.vbg, .vbp, .%2)")
+                   .arg(path, kModuleSuffixes.join(QStringLiteral(", ."))));
   return {openModuleFile(path)};
 }
 
@@ -463,14 +478,16 @@ std::vector<std::shared_ptr<ProjectImpl>> VbeImpl::openGroup(const QString& path
   }
   // Everything is read before anything is added, so that a failure leaves the IDE as it was.
   std::vector<std::shared_ptr<ProjectImpl>> loaded;
+  std::vector<MissingFile> missing;
   const auto entries = group->projects();
   for (size_t i = 0; i < entries.size(); ++i) {
     const int line = i < entryLines.size() ? entryLines[i] : 0;
     const QString projectPath = resolveProjectPath(directory, entries[i].path);
-    if (!QFileInfo::exists(projectPath))
-      ide::raise(
-          ide::err::FileNotFound,
-          QStringLiteral("%1, line %2: project file not found: %3").arg(path).arg(line).arg(entries[i].path));
+    // The other projects open without a missing one; the group keeps its line.
+    if (!QFileInfo::exists(projectPath)) {
+      missing.push_back({absolute, line, entries[i].path});
+      continue;
+    }
     auto project = std::make_shared<ProjectImpl>(shared_from_this());
     project->load(projectPath);
     for (const auto& other : loaded)
@@ -492,6 +509,7 @@ std::vector<std::shared_ptr<ProjectImpl>> VbeImpl::openGroup(const QString& path
   m_groupPath = absolute;
   m_group = std::move(group);
   m_groupChanged = false;
+  m_missingProjects = std::move(missing);
   return loaded;
 }
 

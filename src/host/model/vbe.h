@@ -53,7 +53,9 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
 
   // --- Files
   /// Opens a group (.vbg), a project (.vbp) or a single module file (then in a new, unsaved project).
-  /// Nothing is added when anything fails; throws ide::Error naming the file and line.
+  /// Nothing is added when anything fails; throws ide::Error naming the file and line. A file of another
+  /// kind is refused without being read. Files that a group or project lists but that are missing are
+  /// left out (see missingFiles()).
   std::vector<std::shared_ptr<ProjectImpl>> open(const QString& path);
   std::shared_ptr<ProjectImpl> openProject(const QString& path);
   std::vector<std::shared_ptr<ProjectImpl>> openGroup(const QString& path);
@@ -64,6 +66,9 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   /// Saves every project (and the group file when one is open and changed).
   void saveAll();
   QString groupFileName() const { return m_groupPath; }
+  /// The project files the open group listed and the files the open projects listed that were missing
+  /// when they were opened: their entries stay as they are.
+  std::vector<MissingFile> missingFiles() const;
   const std::vector<std::shared_ptr<ProjectImpl>>& projects() const { return m_projects; }
   std::shared_ptr<ProjectImpl> project(const QString& name) const;
 
@@ -161,6 +166,7 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   QString m_groupPath;
   std::unique_ptr<GroupFile> m_group;
   bool m_groupChanged = false;
+  std::vector<MissingFile> m_missingProjects;
   std::function<void(int)> m_commandHandler;
 };
 
