@@ -2,22 +2,41 @@
 // The command-line tool's commands and its exit codes.
 #pragma once
 
+#include <QHash>
 #include <QString>
 #include <QStringList>
 
 #include <cstdio>
 #include <optional>
 
+namespace host {
+class VbeImpl;
+}
+
 namespace cli {
 
 /// Exit codes, documented in `quimbel --help` and the README.
 enum ExitCode : int {
   kSuccess = 0,
-  kWouldChange = 1,  // --check found something to change
-  kUsageError = 2,   // bad command line
-  kInputError = 3,   // a file could not be read or is not a valid VB6 file
-  kOutputError = 4,  // a file could not be written (nothing on disk was damaged)
+  kWouldChange = 1,   // --check found something to change
+  kUsageError = 2,    // bad command line
+  kInputError = 3,    // a file could not be read or is not a valid VB6 file
+  kOutputError = 4,   // a file could not be written (nothing on disk was damaged), or standard output
+  kMissingFiles = 5,  // files a group or project lists are missing: each was named, the rest was done
 };
+
+/// Opens a group, project or module file given on the command line in `vbe`; module files given on their
+/// own are noted in `givenPaths` under the path the user gave. What cannot be opened is named on standard
+/// error, and false returned.
+bool openInput(host::VbeImpl& vbe, const QString& file, QHash<QString, QString>& givenPaths);
+
+/// Names on standard error each file that the group and projects open in `vbe` list but that is missing;
+/// returns whether there was one.
+bool reportMissingFiles(const host::VbeImpl& vbe);
+
+/// The exit code of a run that ended with `code`: missing files turn success and --check's 1 into
+/// kMissingFiles, so that scripts notice what was left out.
+int withMissingFiles(int code, bool missing);
 
 struct ListOptions {
   QStringList files;

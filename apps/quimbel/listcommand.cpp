@@ -70,13 +70,9 @@ int runList(const ListOptions& options) {
   auto vbe = host::VbeImpl::create();
   // Module files are listed under the path the user gave; the rest under their path from here.
   QHash<QString, QString> givenPaths;
-  for (const QString& file : options.files) {
-    for (const auto& project : vbe->open(file)) {
-      if (project->FileName().isEmpty())
-        for (const auto& component : project->components())
-          givenPaths.insert(component->filePath(), file);
-    }
-  }
+  for (const QString& file : options.files)
+    if (!openInput(*vbe, file, givenPaths)) return kInputError;
+  const bool missing = reportMissingFiles(*vbe);
   const QDir here = QDir::current();
   auto shownPath = [&](const QString& path) { return givenPaths.value(path, here.relativeFilePath(path)); };
 
@@ -126,7 +122,7 @@ int runList(const ListOptions& options) {
       }
     }
   }
-  return kSuccess;
+  return withMissingFiles(kSuccess, missing);
 }
 
 }  // namespace cli

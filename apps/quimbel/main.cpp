@@ -8,15 +8,28 @@
 
 #include <QCoreApplication>
 
+#include <cerrno>
+#include <cstring>
 #include <iostream>
 #include <limits>
 
+#include <fcntl.h>
+#include <unistd.h>
+
 namespace cli {
+namespace {
+
+// The first failure to write standard output (an errno value), reported when the tool ends.
+int outputError = 0;
+
+}  // namespace
 
 void printLine(const QString& text) {
-  const QByteArray bytes = text.toLocal8Bit();
-  std::fwrite(bytes.constData(), 1, static_cast<size_t>(bytes.size()), stdout);
-  std::fputc('\n', stdout);
+  const QByteArray bytes = text.toLocal8Bit() + '\n';
+  if (std::fwrite(bytes.constData(), 1, static_cast<size_t>(bytes.size()), stdout) !=
+          static_cast<size_t>(bytes.size()) &&
+      outputError == 0)
+    outputError = errno;
 }
 
 void printError(const QString& text) {
@@ -156,10 +169,33 @@ void addOptions(CLI::App& app, unsigned takes, CommandLine& line) {
   }
 }
 
+/// A standard stream that was closed gets /dev/null opened the wrong way round: writing to it then fails
+/// (and is reported) instead of reaching the first file the tool opens, which would take its number.
+void keepStandardStreamsOpen() {
+  for (const int descriptor : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
+    if (::fcntl(descriptor, F_GETFD) != -1 || errno != EBADF) continue;
+    const int opened = ::open("/dev/null", descriptor == STDIN_FILENO ? O_WRONLY : O_RDONLY);
+    if (opened >= 0 && opened != descriptor) {
+      ::dup2(opened, descriptor);
+      ::close(opened);
+    }
+  }
+}
+
+/// What was written to standard output must have got there (a full disk, a closed stream), as with
+/// coreutils: otherwise the run fails with kOutputError.
+int checkOutput(int code) {
+  if (std::fflush(stdout) != 0 && outputError == 0) outputError = errno;
+  if (outputError == 0 && std::ferror(stdout)) outputError = EIO;
+  if (outputError == 0) return code;
+  printError(QStringLiteral("write error: %1").arg(QString::fromLocal8Bit(std::strerror(outputError))));
+  return kOutputError;
+}
+
 }  // namespace
 }  // namespace cli
 
-int main(int argc, char** argv) {
+static int runTool(int argc, char** argv) {
   QCoreApplication app(argc, argv);
   CLI::App parser{
       "quimbel: the Quimbel add-in's batch features for VB6 projects.\n\n"
@@ -167,7 +203,8 @@ int main(int argc, char** argv) {
       "last chosen in the numbering and indentation dialogs.\n\n"
       "Exit codes: 0 done, 1 --check found changes, 2 bad command line, 3 unreadable or invalid\n"
       "input, or code the command cannot rewrite (nothing is written then), 4 a file could not be\n"
-      "written (what was on disk is kept)."};
+      "written (what was on disk is kept) or standard output failed, 5 files that a group or project\n"
+      "lists are missing (each is named; the rest was done)."};
   parser.require_subcommand(1);
 
   cli::CommandLine line;
@@ -200,4 +237,9 @@ int main(int argc, char** argv) {
     return error.number() == ide::err::PathFileAccessError ? cli::kOutputError : cli::kInputError;
   }
   return cli::kUsageError;
+}
+
+int main(int argc, char** argv) {
+  cli::keepStandardStreamsOpen();
+  return cli::checkOutput(runTool(argc, argv));
 }

@@ -15,6 +15,7 @@
 #include <limits>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <thread>
 #include <vector>
 
@@ -157,6 +158,28 @@ DiffSide diffSide(const QByteArray& bytes, const QString& path) {
   return side;
 }
 
+// The line of the module's file that holds each code line (index 0: code line 1), as saving writes it:
+// below the header, with the hidden attribute lines in between.
+std::vector<int> fileLinesOf(host::ComponentImpl& component) {
+  host::ModuleSource source = component.source();
+  component.codeModule()->text().store(source.code, source.memberAttributes);
+  std::vector<host::SourceLine> form;
+  if (source.form) source.form->appendLines(form);
+  int fileLine = int(source.preamble.size() + form.size() + source.moduleAttributes.size());
+  std::vector<int> attributesAfter;
+  for (const host::MemberAttributeLine& attribute : source.memberAttributes)
+    attributesAfter.push_back(attribute.afterCodeLine);
+  std::sort(attributesAfter.begin(), attributesAfter.end());
+  std::vector<int> lines(source.code.size());
+  auto attribute = attributesAfter.begin();
+  for (size_t i = 0; i < lines.size(); ++i) {
+    for (; attribute != attributesAfter.end() && *attribute <= int(i); ++attribute)
+      ++fileLine;
+    lines[i] = ++fileLine;
+  }
+  return lines;
+}
+
 // The file as saving the component would write it.
 QByteArray fileAfter(host::ComponentImpl& component) {
   host::ModuleSource source = component.source();
@@ -187,18 +210,12 @@ int runTransform(const TransformOptions& options,
   // Deliberately never freed: the process ends right after the run, and taking a million lines apart one
   // by one would only delay its exit.
   std::vector<Input>& inputs = *new std::vector<Input>(size_t(options.files.size()));
+  bool missing = false;
   for (qsizetype i = 0; i < options.files.size(); ++i) {
     Input& input = inputs[size_t(i)];
     input.file = options.files[i];
-    try {
-      for (const auto& project : input.vbe->open(input.file))
-        if (project->FileName().isEmpty())
-          for (const auto& component : project->components())
-            input.givenPaths.insert(component->filePath(), input.file);
-    } catch (const ide::Error& error) {
-      printError(QStringLiteral("%1: %2").arg(input.file, error.description()));
-      return kInputError;
-    }
+    if (!openInput(*input.vbe, input.file, input.givenPaths)) return kInputError;
+    missing = reportMissingFiles(*input.vbe) || missing;
   }
   const auto targets = findTargets(inputs, options);
   if (!targets) return kUsageError;
@@ -233,7 +250,7 @@ int runTransform(const TransformOptions& options,
 
   struct Report {
     size_t unit;
-    QString text;
+    transform::WalkFailure failure;
   };
   std::mutex reportsMutex;
   std::vector<Report> reports;
@@ -259,8 +276,7 @@ int runTransform(const TransformOptions& options,
     size_t current = 0;
     const auto report = [&](const transform::WalkFailure& failure) {
       const std::lock_guard lock(reportsMutex);
-      reports.push_back(
-          {current, QStringLiteral("%1: %2").arg(units[current].input->file, failureText(failure))});
+      reports.push_back({current, failure});
     };
     context.onFailure = report;
     context.onLineSkipped = report;
@@ -287,8 +303,28 @@ int runTransform(const TransformOptions& options,
   // Reported in the order a walk of one module after the other would have met them.
   std::stable_sort(reports.begin(), reports.end(),
                    [](const Report& a, const Report& b) { return a.unit < b.unit; });
-  for (const Report& report : reports)
-    printError(report.text);
+  std::optional<size_t> linesOfUnit;
+  std::vector<int> fileLines;
+  for (const Report& report : reports) {
+    const Target& unit = units[report.unit];
+    auto module = std::dynamic_pointer_cast<host::CodeModuleImpl>(unit.module);
+    auto component = module ? module->component() : nullptr;
+    const int line = report.failure.line;
+    if (!component || line <= 0 ||
+        report.failure.module.compare(component->Name(), Qt::CaseInsensitive) != 0) {
+      printError(QStringLiteral("%1: %2").arg(unit.input->file, failureText(report.failure)));
+      continue;
+    }
+    if (linesOfUnit != report.unit) {
+      fileLines = fileLinesOf(*component);
+      linesOfUnit = report.unit;
+    }
+    // Where the line is in the file as well as in the code window.
+    printError(QStringLiteral("%1, line %2: %3")
+                   .arg(unit.input->shownPath(*component))
+                   .arg(size_t(line) <= fileLines.size() ? fileLines[size_t(line) - 1] : 0)
+                   .arg(failureText(report.failure)));
+  }
   const size_t failures = reports.size();
   if (failures) {
     printError(QStringLiteral("nothing was written"));
@@ -307,8 +343,8 @@ int runTransform(const TransformOptions& options,
     for (const Walked* module : changed)
       printLine(QStringLiteral("would change %1").arg(module->input->shownPath(*module->component)));
   }
-  if (options.check) return changed.empty() ? kSuccess : kWouldChange;
-  if (options.diff) return kSuccess;
+  if (options.check) return withMissingFiles(changed.empty() ? kSuccess : kWouldChange, missing);
+  if (options.diff) return withMissingFiles(kSuccess, missing);
 
   // All files are replaced together, once every one of them is written: a failure changes none.
   host::SaveBatch batch;
@@ -322,7 +358,7 @@ int runTransform(const TransformOptions& options,
     printError(error.description());
     return kOutputError;
   }
-  return kSuccess;
+  return withMissingFiles(kSuccess, missing);
 }
 
 transform::NumberingOptions numberingOf(const TransformOptions& options) {

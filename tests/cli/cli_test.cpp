@@ -15,6 +15,7 @@
 #include <QStandardPaths>
 #include <QTemporaryDir>
 
+#include <sys/stat.h>
 #include <unistd.h>
 
 namespace {
@@ -179,12 +180,14 @@ TEST(UnreadableInput, ExitsWithThreeNamingTheFileAndWritesNothing) {
 TEST(UnreadableInput, CodeTheCommandCannotRewriteStopsItAndNothingIsWritten) {
   // Numbering would take this line past the IDE's 1023 characters.
   const QByteArray longLine = "s = \"" + QByteArray(1015, 'a') + "\"";
-  Workspace work("Attribute VB_Name = \"Longo\"\r\nSub A()\r\nx = 1\r\n" + longLine + "\r\nEnd Sub\r\n");
+  Workspace work(
+      "Attribute VB_Name = \"Longo\"\r\nSub A()\r\nAttribute A.VB_Description = \"x\"\r\nx = 1\r\n" +
+      longLine + "\r\nEnd Sub\r\n");
   const QByteArray before = work.bytes();
   Tool tool;
   const Result result = tool.run({QStringLiteral("number"), work.file});
   EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("Longo, line 3: Line too long")))
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Calculo.bas, line 5: Longo, line 3: Line too long")))
       << result.err.toStdString();
   EXPECT_TRUE(result.err.contains(QStringLiteral("nothing was written"))) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), before);
@@ -447,6 +450,41 @@ TEST(CheckAndDiff, GroupPathsAreShownFromTheCurrentDirectory) {
   EXPECT_TRUE(result.out.startsWith(
       QStringLiteral("--- a/Utilitarios/modApi.bas\n+++ b/Utilitarios/modApi.bas\n@@ ")))
       << result.out.toStdString();
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Messy projects and input that is not VB6 code
+
+TEST(MessyInput, MissingFilesAreNamedAndWhatIsNotVb6CodeOrOutputThatFailsIsRefused) {
+  QTemporaryDir dir;
+  const QString project = host::test::writeMessyProject(dir.path());
+  const QByteArray before = readBytes(project);
+  ASSERT_EQ(::mkfifo(QFile::encodeName(dir.filePath(QStringLiteral("Fila.bas"))).constData(), 0600), 0);
+  ASSERT_TRUE(QDir(dir.path()).mkdir(QStringLiteral("Pasta.bas")));
+  ASSERT_TRUE(QFile::link(QStringLiteral("/dev/zero"), dir.filePath(QStringLiteral("Zero.bas"))));
+  writeBytes(dir.filePath(QStringLiteral("Leiame.txt")), "Attribute VB_Name = \"Leiame\"\r\n");
+  writeBytes(dir.filePath(QStringLiteral("Pasta.vbp")), "Type=Exe\r\nModule=modPasta; PASTA.bas\r\n");
+  const std::tuple<const char*, int, const char*> runs[] = {
+      {"list Entrada.vbp > /dev/full", 4, "write error: No space left on device"},
+      {"indent --diff Entrada.vbp >&-", 4, "write error: Bad file descriptor"},
+      {"indent Leiame.txt", 3, "not a project group, project or module file"},
+      {"list Fila.bas", 3, "it is a FIFO"},
+      {"list Zero.bas", 3, "it is a device"},
+      {"list Pasta.bas", 3, "it is a directory"},
+      {"number --check Pasta.bas", 3, "it is a directory"},
+      {"number Pasta.vbp", 3, "Pasta.vbp, line 2: Cannot read"},
+      {"list Entrada.vbp", 5, "Entrada.vbp, line 4: file not found: Classes\\clsFalta.cls"},
+      {"number Entrada.vbp", 5, "Entrada.vbp, line 4: file not found: Classes\\clsFalta.cls"}};
+  Tool tool;
+  for (const auto& [arguments, code, message] : runs) {
+    const QStringList shell = {QStringLiteral("-c"),
+                               QStringLiteral("'%1' %2").arg(QUIMBEL_BINARY, arguments)};
+    const Result result = tool.runProgram(QStringLiteral("/bin/sh"), shell, dir.path());
+    EXPECT_EQ(result.code, code) << arguments;
+    EXPECT_TRUE(result.err.contains(QString::fromLatin1(message))) << result.err.toStdString();
+  }
+  EXPECT_TRUE(readBytes(dir.filePath(QStringLiteral("Fontes/modEntrada.bas"))).contains("\r\n10000 "));
+  EXPECT_EQ(readBytes(project), before);
 }
 
 // ---------------------------------------------------------------------------------------------------
