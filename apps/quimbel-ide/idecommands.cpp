@@ -227,6 +227,23 @@ bool IdeCommands::open(const QString& path, bool replace) {
   try {
     const auto projects = vbe.open(path);
     m_window.showStatus(QStringLiteral("Opened %1").arg(QDir::toNativeSeparators(path)), 5000);
+    // The projects are open without the files they list that are missing: one message names them all.
+    QStringList missing;
+    const QString opened = QFileInfo(path).absoluteFilePath();
+    for (const host::MissingFile& file : vbe.missingFiles()) {
+      const bool listedHere =
+          file.listedIn == opened || std::any_of(projects.begin(), projects.end(),
+                                                 [&](auto& p) { return p->FileName() == file.listedIn; });
+      if (listedHere)
+        missing << QStringLiteral("%1    (%2, line %3)")
+                       .arg(file.entry, QFileInfo(file.listedIn).fileName())
+                       .arg(file.line);
+    }
+    if (!missing.isEmpty())
+      m_window.ui().MsgBox(QStringLiteral("These files were not found and are not loaded; the project "
+                                          "files keep their lines for them:\n\n") +
+                               missing.join(u'\n'),
+                           ide::mb::OKOnly | ide::mb::Exclamation, kTitle);
     rememberDirectory(QFileInfo(path).absoluteFilePath());
     // The start-up component (or the first one) is selected, as the IDE does after opening.
     if (!projects.empty() && !projects.front()->components().empty())

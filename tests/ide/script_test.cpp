@@ -94,6 +94,21 @@ TEST_F(ScriptTest, AScriptEditsCodeThroughTheEditor) {
   EXPECT_EQ(code, 0) << m_error.toStdString();
 }
 
+TEST_F(ScriptTest, AMessyProjectOpensWithoutItsMissingFileAndKeepsItsLineEnds) {
+  QTemporaryDir dir;
+  const QString project = host::test::writeMessyProject(dir.path());
+  const QByteArray before = host::test::readBytes(project);
+  const int code = run(QStringLiteral("answer OK\nopen \"%1\"\nexpect message \"Classes\\\\clsFalta.cls    "
+                                      "(Entrada.vbp, line 4)\"\ncode Entrada.modMisto\ncaret 4 1\n"
+                                      "key End Return\ncaret 8 1\nkey End Return\nsave\nsave\n")
+                           .arg(project));
+  EXPECT_EQ(code, 0) << m_error.toStdString();
+  EXPECT_EQ(host::test::readBytes(project), before);
+  EXPECT_EQ(host::test::readBytes(dir.filePath(QStringLiteral("Fontes/modMisto.bas"))),
+            QByteArray("Attribute VB_Name = \"modMisto\"\nOption Explicit\n' Vers\xE3o antiga\rSub Velha()\r"
+                       "    x = 1\r\r\r    y = 2\rEnd Sub\n\n"));
+}
+
 TEST_F(ScriptTest, AFailingStepEndsTheScriptWithItsLine) {
   EXPECT_EQ(run(QStringLiteral("echo one\nselect Loja.naoExiste\necho never\n")), 1);
   EXPECT_EQ(m_error, QStringLiteral("test.qis:2: no component \"Loja.naoExiste\" is open"));
