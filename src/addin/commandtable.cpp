@@ -11,7 +11,7 @@ namespace {
 constexpr unsigned kBar = OnToolBar | OnPopup;
 
 // clang-format off
-constexpr std::array<CommandSpec, 14> kCommands{{
+constexpr std::array<CommandEntry, 14> kCommands{{
     // number, picture, tag, placement, state entry, handler
     {1, 2, "MVBackward", kBar, 0, &CVBEvents::EvButtonBrowseBackward_Click},
     {2, 3, "MVForward", kBar, 1, &CVBEvents::EvButtonBrowseForward_Click},
@@ -33,7 +33,7 @@ constexpr std::array<CommandSpec, 14> kCommands{{
 
 }  // namespace
 
-std::span<const CommandSpec> commandTable() {
+std::span<const CommandEntry> commandTable() {
   return kCommands;
 }
 

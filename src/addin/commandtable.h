@@ -18,7 +18,7 @@ enum Placement : unsigned {
   OnCodeWindowMenus = 4,
 };
 
-struct CommandSpec {
+struct CommandEntry {
   /// The command's number; its caption (and tooltip) is the string resource of that number.
   int number;
   /// The picture: bitmap resource number.
@@ -34,7 +34,7 @@ struct CommandSpec {
 inline constexpr int kUngated = -1;
 
 /// Every command, toolbar order first.
-std::span<const CommandSpec> commandTable();
+std::span<const CommandEntry> commandTable();
 
 /// The toolbar's twelve buttons hold table rows 1 to 12; the popup the thirteen rows with OnPopup.
 inline constexpr int kToolBarButtons = 12;

@@ -107,7 +107,7 @@ OwnedBar CEnvUtils::AddToolBar() {
   }
   OwnedBar bar(bars->Add(name, ide::BarPosition::Top, false, false));
   auto controls = bar->Controls();
-  for (const CommandSpec& command : commandTable()) {
+  for (const CommandEntry& command : commandTable()) {
     if (!(command.placement & OnToolBar)) continue;
     auto button = controls->Add(ide::ControlType::Button, 1, {}, 0, true);
     button->setFace(pictureData(command.picture));

@@ -54,19 +54,21 @@ Globals::Globals(ide::Ref<ide::VBE> vbe, ide::Ref<ide::AddIn> addIn, StartupValu
       m_settings(common::SettingsStore::userStorePath()) {
   ide::Platform& platform = m_vbe->Platform();
 
-  // 5. The settings.
+  // The settings.
   m_options = GetOptionsFromRegistry(m_settings);
 
-  // 7. The idle message (6, the hotkey procedure, is made with its keeper below).
+  // The message that defers work until the IDE is idle (the hotkey window procedure is made with its keeper
+  // below).
   m_idleMessage = platform.windows().RegisterWindowMessage(QString::fromLatin1(kIdleMessageName));
   if (m_idleMessage == 0) ide::raise(ide::err::InvalidProcedureCall, QStringLiteral("RegisterWindowMessage"));
 
-  // 8. The machine-wide configuration must be readable (reading is all the add-in does with it).
+  // The machine-wide configuration must be readable, at the second try at the latest (reading is all the
+  // add-in does with it).
   MachineConfig& config = *environment.machineConfig;
   if (!config.canRead() && !config.canRead())
     ide::raise(kNoConfigurationAccessError, QString::fromUtf16(kNoConfigurationAccess), config.location());
 
-  // 9. The names for the placeholders.
+  // The computer and user names for the placeholders.
   m_computerName = systemName(platform.computerName());
   m_userName = systemName(platform.userName());
 
@@ -84,17 +86,17 @@ Globals::Globals(ide::Ref<ide::VBE> vbe, ide::Ref<ide::AddIn> addIn, StartupValu
   m_textInsertion.emplace(
       *m_vbe, textins::InsertionContext{m_computerName, m_userName, [this] { return m_lastWindowType; }});
 
-  // 11. The browse history.
+  // The browse history.
   m_histories.emplace(*m_vbe, m_commandState);
   m_sampler.emplace(*m_histories);
 
-  // 13. The event object, the utilities and the feature areas.
+  // The event object, the utilities and the feature areas.
   m_envUtils.emplace(*m_vbe);
   m_features = environment.createFeatures(
       {m_vbe, m_settings, AppInfo(), m_appInfo->UnavailableMessage(), *m_textInsertion});
   m_vbEvents.emplace(*this);
 
-  // 15. The toolbar, the menus and the context-menu items, their click sinks, the IDE's event sinks and
+  // The toolbar, the menus and the context-menu items, their click sinks, the IDE's event sinks and
   // the timer.
   m_hotKeyWindow.emplace(*m_vbe, m_values.StartDisplayModel, m_features->copyBuffers(), m_features->macros(),
                          [this] { m_lastWindowType = -1; });
@@ -123,7 +125,7 @@ void Globals::buildCommandBars() {
   m_commandState.set(10, false);  // new procedure: only while a code window is active
 
   auto popupBar = controls.popup->CommandBar();
-  for (const CommandSpec& command : commandTable()) {
+  for (const CommandEntry& command : commandTable()) {
     if (!(command.placement & OnPopup)) continue;
     OwnedControl item =
         m_envUtils->AddMenuItem(popupBar, common::LoadResString(command.number), 0, false, command.picture);
@@ -132,7 +134,7 @@ void Globals::buildCommandBars() {
   }
 
   const char* const contextBars[] = {"Code Window", "Code Window (Break)"};
-  for (const CommandSpec& command : commandTable()) {
+  for (const CommandEntry& command : commandTable()) {
     if (!(command.placement & OnCodeWindowMenus)) continue;
     for (size_t i = 0; i < controls.contextItems.size(); ++i) {
       auto bar = bars->Item(QString::fromLatin1(contextBars[i]));

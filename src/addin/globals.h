@@ -80,7 +80,9 @@ class Globals {
  public:
   static constexpr int kTimerIntervalMs = 100;
 
-  /// Steps 5 to 15 of the start-up; raises the failure of any of them (what was built is released).
+  /// The start-up once the installation directory is known: settings, idle message, machine configuration,
+  /// names, history, feature areas, command bars, event sinks and timer. Raises the failure of any of them
+  /// (what was built is released).
   Globals(ide::Ref<ide::VBE> vbe, ide::Ref<ide::AddIn> addIn, StartupValues values, Environment& environment);
   ~Globals();
   Globals(const Globals&) = delete;
@@ -118,7 +120,7 @@ class Globals {
 
  private:
   void buildCommandBars();
-  /// Step 7 of the tick: notes the active window's type; true when a code window is active.
+  /// The tick's window tracking: notes the active window's type; true when a code window is active.
   bool trackActiveWindow(const ide::Ref<ide::Window>& active);
 
   ide::Ref<ide::VBE> m_vbe;      // VBInstance

@@ -56,7 +56,7 @@ void CVBEvents::ConnectMenus(bool connect) {
   AddInControls& controls = m_globals.controls();
   m_mnuQuimbelHandler = connectClick(m_vbe, controls.popup.get(), [] {});
   size_t item = 0;
-  for (const CommandSpec& command : commandTable()) {
+  for (const CommandEntry& command : commandTable()) {
     if (!(command.placement & OnPopup)) continue;
     // A menu item does what the toolbar button of the same command does.
     m_menuItems.push_back(
@@ -71,7 +71,7 @@ void CVBEvents::ConnectMenus(bool connect) {
 void CVBEvents::ConnectToolBarEvents(const ide::Ref<ide::CommandBar>& toolbar) {
   auto buttons = toolbar->Controls();
   int k = 0;
-  for (const CommandSpec& command : commandTable()) {
+  for (const CommandEntry& command : commandTable()) {
     if (!(command.placement & OnToolBar)) continue;
     m_toolBarButtons.at(static_cast<size_t>(k)) =
         connectClick(m_vbe, buttons->Item(k + 1), [this, &command] { runCommand(command); });
@@ -183,7 +183,7 @@ bool CVBEvents::running() {
 // ---------------------------------------------------------------------------------------------------
 // Commands
 
-void CVBEvents::runCommand(const CommandSpec& command) {
+void CVBEvents::runCommand(const CommandEntry& command) {
   if (command.stateEntry != kUngated && !m_globals.CommandState()[command.stateEntry]) return;
   try {
     (this->*command.handler)();

@@ -61,7 +61,7 @@ class CVBEvents {
 
   /// A click on a command of the table: nothing when its command-state entry is false; failures end
   /// silently.
-  void runCommand(const CommandSpec& command);
+  void runCommand(const CommandEntry& command);
 
   // IDE events.
   void EvProjectsHandler_ItemAdded(const ide::Ref<ide::VBProject>& project);
