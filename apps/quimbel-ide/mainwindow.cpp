@@ -152,8 +152,7 @@ void MainWindow::buildDocks() {
 
 void MainWindow::updateTitle() {
   setWindowTitle(m_vbe->MainWindow()->Caption());
-  static const char* const kModes[] = {"design", "run", "break"};
-  m_mode->setText(QStringLiteral("[%1]").arg(QLatin1StringView(kModes[static_cast<int>(m_vbe->mode())])));
+  m_mode->setText(QStringLiteral("[%1]").arg(host::modeName(m_vbe->mode())));
 }
 
 void MainWindow::updateProperties() {

@@ -150,6 +150,18 @@ void EventsImpl::forgetForm(const FormImpl* form) {
   m_formSelected.erase(form);
 }
 
+QLatin1StringView modeName(ide::IdeMode mode) {
+  switch (mode) {
+    case ide::IdeMode::Run:
+      return QLatin1StringView("run");
+    case ide::IdeMode::Break:
+      return QLatin1StringView("break");
+    case ide::IdeMode::Design:
+      break;
+  }
+  return QLatin1StringView("design");
+}
+
 // ---------------------------------------------------------------------------------------------------
 // Construction
 
@@ -191,10 +203,8 @@ void VbeImpl::init() {
       [weak] {
         auto vbe = weak.lock();
         if (!vbe) return QString();
-        static const char* const kModes[] = {"design", "run", "break"};
         auto project = vbe->m_activeProject.lock();
-        const QString title =
-            QStringLiteral("Quimbel IDE [%1]").arg(QLatin1StringView(kModes[static_cast<int>(vbe->m_mode)]));
+        const QString title = QStringLiteral("Quimbel IDE [%1]").arg(modeName(vbe->m_mode));
         return project ? project->Name() + QStringLiteral(" - ") + title : title;
       },
       QStringLiteral("QuimbelIdeMainWindow"));

@@ -21,6 +21,9 @@ class ManualEventLoop;
 class HeadlessUi;
 class GroupFile;
 
+/// The mode as the IDE's caption shows it: "design", "run" or "break".
+QLatin1StringView modeName(ide::IdeMode mode);
+
 struct IdeOptions {
   ide::DisplayModel displayModel = ide::DisplayModel::MDI;
   /// The loop and user interface of a desktop host; empty: a ManualEventLoop and a HeadlessUi.
