@@ -42,6 +42,7 @@
 #include <QTreeWidget>
 
 #include <cstdio>
+#include <span>
 
 namespace desktop {
 namespace {
@@ -57,26 +58,6 @@ struct StepError {
 
 [[noreturn]] void fail(const QString& message) {
   throw StepError{message};
-}
-
-struct CommandShape {
-  const char* name;
-  int minimum;
-  int maximum;  // -1: any number
-};
-
-constexpr CommandShape kCommands[] = {
-    {"open", 1, 1},      {"select", 1, 1},   {"code", 1, 1},       {"designer", 1, 1}, {"caret", 2, 2},
-    {"selection", 4, 4}, {"type", 1, 1},     {"key", 1, -1},       {"click", 2, -1},   {"tool", 1, 1},
-    {"control", 1, 1},   {"property", 2, 2}, {"set", 2, 2},        {"press", 1, 1},    {"answer", 1, 1},
-    {"save", 0, 0},      {"saveas", 1, 1},   {"screenshot", 1, 2}, {"wait", 1, 1},     {"expect", 2, -1},
-    {"echo", 1, -1},     {"quit", 0, 0},
-};
-
-const CommandShape* shapeOf(const QString& command) {
-  for (const CommandShape& shape : kCommands)
-    if (command == QLatin1StringView(shape.name)) return &shape;
-  return nullptr;
 }
 
 int answerCode(const QString& text) {
@@ -216,6 +197,440 @@ bool controlMatches(host::CommandBarControlImpl& control, const QString& name) {
 
 }  // namespace
 
+// ---------------------------------------------------------------------------------------------------
+// The commands
+
+/// Every command of the language in one table: its name, how many arguments it takes, whether it runs
+/// while a message box waits for its answer, what parse() checks of its arguments and what it does.
+struct ScriptRunner::Commands {
+  struct Entry {
+    const char* name;
+    int minimum;
+    int maximum;  // -1: any number
+    /// A message box stops the IDE until it is answered: only the steps that deal with it go on meanwhile.
+    bool whileABoxIsOpen;
+    /// Checked when the script is read: an empty text or the mistake.
+    QString (*check)(const QStringList& args);
+    void (*run)(ScriptRunner& runner, const QStringList& args);
+  };
+  /// The kinds of "expect": the word after it, how many arguments that takes in all and what they are.
+  struct Expectation {
+    const char* what;
+    int minimum;
+    int maximum;  // -1: any number
+    const char* takes;
+    void (*check)(ScriptRunner& runner, const QStringList& args);
+  };
+
+  static std::span<const Entry> table();
+  static const Entry* find(const QString& name) {
+    for (const Entry& entry : table())
+      if (name == QLatin1StringView(entry.name)) return &entry;
+    return nullptr;
+  }
+
+  static host::VbeImpl& vbe(ScriptRunner& runner) { return *runner.m_window.vbe(); }
+  static QString absolute(const QString& path) {
+    return QFileInfo(path).isAbsolute() ? path : QDir::current().absoluteFilePath(path);
+  }
+  static std::shared_ptr<host::ComponentImpl> component(ScriptRunner& runner, const QString& name) {
+    const qsizetype dot = name.indexOf(u'.');
+    for (const auto& project : vbe(runner).projects()) {
+      if (dot >= 0 && project->Name().compare(name.left(dot), Qt::CaseInsensitive) != 0) continue;
+      if (auto found = project->component(dot >= 0 ? name.mid(dot + 1) : name)) return found;
+    }
+    fail(QStringLiteral("no component \"%1\" is open").arg(name));
+  }
+  static CodeWindow* activeCode(ScriptRunner& runner) {
+    WindowManager& windows = runner.m_window.windows();
+    CodeWindow* window = windows.activeCodeWindow();
+    if (!window) {
+      if (auto pane = std::dynamic_pointer_cast<host::CodePaneImpl>(vbe(runner).ActiveCodePane()))
+        window = windows.codeWindowOf(pane->window().get());
+    }
+    if (!window) fail(QStringLiteral("no code window is active"));
+    return window;
+  }
+
+  static void open(ScriptRunner& runner, const QStringList& args) {
+    runner.m_window.commands().open(absolute(args[0]), false);
+  }
+
+  static void select(ScriptRunner& runner, const QStringList& args) {
+    runner.m_window.explorer().selectComponent(component(runner, args[0]));
+  }
+
+  static void code(ScriptRunner& runner, const QStringList& args) {
+    runner.m_window.commands().show(component(runner, args[0]), true);
+  }
+
+  static void designer(ScriptRunner& runner, const QStringList& args) {
+    auto found = component(runner, args[0]);
+    if (!found->hasDesigner()) fail(QStringLiteral("%1 has no designer").arg(args[0]));
+    runner.m_window.commands().show(found, false);
+  }
+
+  /// caret LINE COLUMN, selection LINE COLUMN END-LINE END-COLUMN.
+  static void selection(ScriptRunner& runner, const QStringList& args) {
+    CodeWindow* window = activeCode(runner);
+    const int l1 = toNumber(args[0], "the line"), c1 = toNumber(args[1], "the column");
+    const int l2 = args.size() > 2 ? toNumber(args[2], "the end line") : l1;
+    const int c2 = args.size() > 2 ? toNumber(args[3], "the end column") : c1;
+    window->pane()->SetSelection(l1, c1, l2, c2);
+    window->editor()->setFocus();
+  }
+
+  static void type(ScriptRunner&, const QStringList& args) {
+    QWidget* target = QApplication::focusWidget();
+    if (!target) fail(QStringLiteral("nothing has the keyboard focus"));
+    typeText(target, args[0]);
+  }
+
+  static void key(ScriptRunner& runner, const QStringList& args) {
+    for (const QString& combination : args) {
+      const QKeySequence sequence = QKeySequence::fromString(combination, QKeySequence::PortableText);
+      if (sequence.isEmpty() || sequence[0].key() == Qt::Key_unknown)
+        fail(QStringLiteral("\"%1\" is not a key combination").arg(combination));
+      for (int i = 0; i < sequence.count(); ++i) {
+        QWidget* target = QApplication::focusWidget();
+        if (!target)
+          target = QApplication::activeModalWidget() ? QApplication::activeModalWidget() : &runner.m_window;
+        QTest::keyClick(target, sequence[i].key(), sequence[i].keyboardModifiers());
+      }
+    }
+  }
+
+  static void click(ScriptRunner& runner, const QStringList& args) {
+    runner.m_window.commandBars().syncNow();
+    auto bar = vbe(runner).commandBars()->bar(args[0]);
+    if (!bar) fail(QStringLiteral("no command bar \"%1\"").arg(args[0]));
+    std::shared_ptr<host::CommandBarControlImpl> control;
+    for (int i = 1; i < args.size(); ++i) {
+      control.reset();
+      QStringList known;
+      for (const auto& candidate : bar->controls()) {
+        known << plain(candidate->Caption().isEmpty() ? candidate->TooltipText() : candidate->Caption());
+        if (controlMatches(*candidate, args[i])) {
+          control = candidate;
+          break;
+        }
+      }
+      if (!control)
+        fail(QStringLiteral("no control \"%1\" on \"%2\" (it has: %3)")
+                 .arg(args[i], bar->Name().isEmpty() ? args[i - 1] : bar->Name(),
+                      known.join(QStringLiteral(", "))));
+      if (i + 1 < args.size()) {
+        bar = control->popupBar();
+        if (!bar) fail(QStringLiteral("\"%1\" is not a menu").arg(args[i]));
+      }
+    }
+    if (!control->Visible()) fail(QStringLiteral("\"%1\" is not visible").arg(args.last()));
+    if (!control->Enabled()) fail(QStringLiteral("\"%1\" is disabled").arg(args.last()));
+    runner.m_window.commandBars().click(control);
+  }
+
+  static void tool(ScriptRunner& runner, const QStringList& args) {
+    if (!runner.m_window.toolbox().click(args[0]))
+      fail(QStringLiteral("the toolbox has no \"%1\"").arg(args[0]));
+  }
+
+  static void control(ScriptRunner& runner, const QStringList& args) {
+    DesignerWindow* designer = runner.m_window.windows().activeDesigner();
+    if (!designer) fail(QStringLiteral("no form designer is active"));
+    auto control = designer->form()->findControl(args[0]);
+    if (!control) fail(QStringLiteral("the form has no control \"%1\"").arg(args[0]));
+    designer->selectControl(control);
+  }
+
+  static void property(ScriptRunner& runner, const QStringList& args) {
+    if (!runner.m_window.properties().applyEdit(args[0], args[1]))
+      fail(QStringLiteral("the property %1 did not take \"%2\"").arg(args[0], args[1]));
+  }
+
+  static void set(ScriptRunner& runner, const QStringList& args) {
+    QWidget* widget = runner.findWidget(args[0]);
+    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[0])};
+    const QString& value = args[1];
+    if (auto* line = qobject_cast<QLineEdit*>(widget)) {
+      line->selectAll();
+      line->insert(value);
+    } else if (auto* plainEdit = qobject_cast<QPlainTextEdit*>(widget)) {
+      plainEdit->setPlainText(value);
+    } else if (auto* textEdit = qobject_cast<QTextEdit*>(widget)) {
+      textEdit->setPlainText(value);
+    } else if (auto* spin = qobject_cast<QSpinBox*>(widget)) {
+      spin->setValue(toNumber(value, "the value"));
+    } else if (auto* check = qobject_cast<QCheckBox*>(widget)) {
+      if (check->isChecked() != toBool(value)) check->click();
+    } else if (auto* radio = qobject_cast<QRadioButton*>(widget)) {
+      if (toBool(value) && !radio->isChecked()) radio->click();
+    } else if (auto* combo = qobject_cast<QComboBox*>(widget)) {
+      int index = combo->findText(value);
+      if (index < 0) index = combo->findText(value, Qt::MatchFixedString);
+      if (index >= 0) {
+        combo->setCurrentIndex(index);
+        Q_EMIT combo->activated(index);
+      } else if (combo->isEditable()) {
+        combo->setEditText(value);
+      } else {
+        fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
+      }
+    } else if (auto* slider = qobject_cast<QAbstractSlider*>(widget)) {
+      slider->setValue(toNumber(value, "the value"));
+    } else if (auto* tabs = qobject_cast<QTabWidget*>(widget)) {
+      int index = -1;
+      for (int i = 0; i < tabs->count(); ++i)
+        if (plain(tabs->tabText(i)).compare(value, Qt::CaseInsensitive) == 0) index = i;
+      if (index < 0) fail(QStringLiteral("\"%1\" has no tab \"%2\"").arg(args[0], value));
+      tabs->setCurrentIndex(index);
+    } else if (auto* view = qobject_cast<QAbstractItemView*>(widget)) {
+      const QModelIndexList found = view->model()->match(view->model()->index(0, 0), Qt::DisplayRole, value,
+                                                         1, Qt::MatchFixedString | Qt::MatchRecursive);
+      if (found.isEmpty()) fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
+      view->setCurrentIndex(found.front());
+      view->scrollTo(found.front());
+    } else {
+      fail(QStringLiteral("cannot set a value on \"%1\" (%2)")
+               .arg(args[0], QLatin1StringView(widget->metaObject()->className())));
+    }
+  }
+
+  static void press(ScriptRunner& runner, const QStringList& args) {
+    QAbstractButton* found = nullptr;
+    std::vector<QWidget*> tops = runner.dialogs();
+    tops.push_back(&runner.m_window);
+    for (QWidget* top : tops) {
+      for (QAbstractButton* button : top->findChildren<QAbstractButton*>()) {
+        if (!button->isVisible()) continue;
+        if (button->objectName() == args[0] ||
+            plain(button->text()).compare(plain(args[0]), Qt::CaseInsensitive) == 0) {
+          found = button;
+          break;
+        }
+      }
+      if (found) break;
+    }
+    if (!found) throw NotReady{QStringLiteral("no button \"%1\" is open").arg(args[0])};
+    if (!found->isEnabled()) fail(QStringLiteral("the button \"%1\" is disabled").arg(args[0]));
+    found->click();
+  }
+
+  static QString checkAnswer(const QStringList& args) {
+    if (answerCode(args[0])) return {};
+    return QStringLiteral("\"%1\" is not an answer (OK, Cancel, Yes, No, Abort, Retry, Ignore)").arg(args[0]);
+  }
+
+  static void answer(ScriptRunner& runner, const QStringList& args) {
+    runner.m_ui.queueAnswer(answerCode(args[0]));
+  }
+
+  static void save(ScriptRunner& runner, const QStringList&) {
+    if (!runner.m_window.commands().saveAll()) fail(QStringLiteral("saving failed"));
+  }
+
+  static void saveAs(ScriptRunner& runner, const QStringList& args) {
+    IdeCommands& commands = runner.m_window.commands();
+    auto project = commands.currentProject();
+    if (!project) fail(QStringLiteral("no project is open"));
+    const QString path = absolute(args[0]);
+    if (!commands.saveProjectAs(project, path)) fail(QStringLiteral("saving %1 failed").arg(path));
+  }
+
+  static void screenshot(ScriptRunner& runner, const QStringList& args) {
+    const QString which = args.size() == 2 ? args[0].toLower() : QString();
+    QWidget* target = nullptr;
+    if (which == QLatin1StringView("main")) {
+      target = &runner.m_window;
+    } else if (which == QLatin1StringView("dialog")) {
+      const auto open = runner.dialogs();
+      if (open.empty()) throw NotReady{QStringLiteral("no dialog is open")};
+      target = open.front();
+    } else if (!which.isEmpty()) {
+      fail(QStringLiteral("screenshot takes main or dialog, not \"%1\"").arg(args[0]));
+    } else {
+      const auto open = runner.dialogs();
+      target = open.empty() ? &runner.m_window : open.front();
+    }
+    runner.m_window.commandBars().syncNow();
+    for (CodeWindow* window : runner.m_window.windows().codeWindows())
+      window->binding()->flush();
+    QCoreApplication::processEvents();
+    const QString path = absolute(args.last());
+    QDir().mkpath(QFileInfo(path).absolutePath());
+    if (!target->grab().save(path)) fail(QStringLiteral("cannot write %1").arg(path));
+  }
+
+  static void wait(ScriptRunner& runner, const QStringList& args) {
+    // A time has put the next step off already (tick()); a condition holds the script until it is met.
+    const QString what = args[0].toLower();
+    if (what == QLatin1StringView("dialog")) {
+      if (runner.dialogs().empty()) throw NotReady{QStringLiteral("no dialog opened")};
+    } else if (what == QLatin1StringView("closed")) {
+      if (QWidget* open = QApplication::activeModalWidget())
+        throw NotReady{QStringLiteral("the dialog \"%1\" stayed open").arg(open->windowTitle())};
+    } else {
+      toNumber(args[0], "the time");
+    }
+  }
+
+  static std::span<const Expectation> expectations();
+
+  static void expect(ScriptRunner& runner, const QStringList& args) {
+    const QString what = args[0].toLower();
+    QStringList known;
+    for (const Expectation& expectation : expectations()) {
+      known << QLatin1StringView(expectation.what);
+      if (what != QLatin1StringView(expectation.what)) continue;
+      if (args.size() < expectation.minimum ||
+          (expectation.maximum >= 0 && args.size() > expectation.maximum))
+        fail(QStringLiteral("expect %1 takes %2").arg(what, QLatin1StringView(expectation.takes)));
+      return expectation.check(runner, args);
+    }
+    fail(QStringLiteral("cannot expect \"%1\" (%2)").arg(args[0], known.join(QStringLiteral(", "))));
+  }
+
+  static void expectLine(ScriptRunner& runner, const QStringList& args) {
+    CodeWindow* window = activeCode(runner);
+    window->binding()->flush();
+    auto module = window->binding()->module();
+    const int n = toNumber(args[1], "the line");
+    if (n < 1 || n > module->CountOfLines())
+      fail(QStringLiteral("line %1 is past the end of %2 (%3 lines)")
+               .arg(n)
+               .arg(module->Name())
+               .arg(module->CountOfLines()));
+    const QString actual = module->Lines(n, 1);
+    if (actual != args[2]) fail(QStringLiteral("line %1 is \"%2\", not \"%3\"").arg(n).arg(actual, args[2]));
+  }
+
+  static void expectMessage(ScriptRunner& runner, const QStringList& args) {
+    if (!runner.m_lastMessage.contains(args[1]))
+      fail(QStringLiteral("the last message was \"%1\", which does not contain \"%2\"")
+               .arg(runner.m_lastMessage, args[1]));
+  }
+
+  static void expectProjects(ScriptRunner& runner, const QStringList& args) {
+    const int n = toNumber(args[1], "the count");
+    const size_t open = vbe(runner).projects().size();
+    if (static_cast<int>(open) != n) fail(QStringLiteral("%1 projects are open, not %2").arg(open).arg(n));
+  }
+
+  static void expectStatus(ScriptRunner& runner, const QStringList& args) {
+    const QString shown = runner.m_window.statusBar()->currentMessage();
+    if (!shown.contains(args[1])) fail(QStringLiteral("the status bar says \"%1\"").arg(shown));
+  }
+
+  static void expectTitle(ScriptRunner& runner, const QStringList& args) {
+    if (!runner.m_window.windowTitle().contains(args[1]))
+      fail(QStringLiteral("the title is \"%1\"").arg(runner.m_window.windowTitle()));
+  }
+
+  static bool controlPresent(ScriptRunner& runner, const QStringList& args) {
+    runner.m_window.commandBars().syncNow();
+    auto bar = vbe(runner).commandBars()->bar(args[1]);
+    for (int i = 2; bar && i < args.size(); ++i) {
+      std::shared_ptr<host::CommandBarControlImpl> control;
+      for (const auto& candidate : bar->controls())
+        if (controlMatches(*candidate, args[i])) control = candidate;
+      if (!control || !control->Visible()) return false;
+      if (i + 1 == args.size()) return true;
+      bar = control->popupBar();
+    }
+    return false;
+  }
+
+  static void expectControl(ScriptRunner& runner, const QStringList& args) {
+    if (!controlPresent(runner, args))
+      fail(QStringLiteral("\"%1\" is not there on \"%2\"")
+               .arg(args.mid(2).join(QStringLiteral(" > ")), args[1]));
+  }
+
+  static void expectNoControl(ScriptRunner& runner, const QStringList& args) {
+    if (controlPresent(runner, args))
+      fail(QStringLiteral("\"%1\" is there on \"%2\"").arg(args.mid(2).join(QStringLiteral(" > ")), args[1]));
+  }
+
+  static void expectValue(ScriptRunner& runner, const QStringList& args) {
+    QWidget* widget = runner.findWidget(args[1]);
+    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[1])};
+    QString actual;
+    if (auto* line = qobject_cast<QLineEdit*>(widget))
+      actual = line->text();
+    else if (auto* edit = qobject_cast<QPlainTextEdit*>(widget))
+      actual = edit->toPlainText();
+    else if (auto* check = qobject_cast<QAbstractButton*>(widget))
+      actual = check->isChecked() ? QStringLiteral("true") : QStringLiteral("false");
+    else if (auto* combo = qobject_cast<QComboBox*>(widget))
+      actual = combo->currentText();
+    else if (auto* spin = qobject_cast<QAbstractSpinBox*>(widget))
+      actual = spin->text();
+    else
+      actual = widget->property("text").toString();
+    if (actual != args[2])
+      fail(QStringLiteral("\"%1\" holds \"%2\", not \"%3\"").arg(args[1], actual, args[2]));
+  }
+
+  static void expectProperty(ScriptRunner& runner, const QStringList& args) {
+    const QString actual = runner.m_window.properties().shownValue(args[1]);
+    if (actual != args[2]) fail(QStringLiteral("%1 shows \"%2\", not \"%3\"").arg(args[1], actual, args[2]));
+  }
+
+  static void echo(ScriptRunner&, const QStringList& args) {
+    std::printf("%s\n", qPrintable(args.join(u' ')));
+    std::fflush(stdout);
+  }
+
+  static void quit(ScriptRunner& runner, const QStringList&) { runner.m_next = runner.m_steps.size(); }
+};
+
+std::span<const ScriptRunner::Commands::Entry> ScriptRunner::Commands::table() {
+  constexpr bool kBlocked = false;  // waits while a message box is open
+  constexpr bool kAlways = true;
+  static const Entry kTable[] = {
+      {"open", 1, 1, kBlocked, nullptr, &open},
+      {"select", 1, 1, kBlocked, nullptr, &select},
+      {"code", 1, 1, kBlocked, nullptr, &code},
+      {"designer", 1, 1, kBlocked, nullptr, &designer},
+      {"caret", 2, 2, kBlocked, nullptr, &selection},
+      {"selection", 4, 4, kBlocked, nullptr, &selection},
+      {"type", 1, 1, kBlocked, nullptr, &type},
+      {"key", 1, -1, kBlocked, nullptr, &key},
+      {"click", 2, -1, kBlocked, nullptr, &click},
+      {"tool", 1, 1, kBlocked, nullptr, &tool},
+      {"control", 1, 1, kBlocked, nullptr, &control},
+      {"property", 2, 2, kBlocked, nullptr, &property},
+      {"set", 2, 2, kAlways, nullptr, &set},
+      {"press", 1, 1, kAlways, nullptr, &press},
+      {"answer", 1, 1, kAlways, &checkAnswer, &answer},
+      {"save", 0, 0, kBlocked, nullptr, &save},
+      {"saveas", 1, 1, kBlocked, nullptr, &saveAs},
+      {"screenshot", 1, 2, kAlways, nullptr, &screenshot},
+      {"wait", 1, 1, kAlways, nullptr, &wait},
+      {"expect", 2, -1, kAlways, nullptr, &expect},
+      {"echo", 1, -1, kAlways, nullptr, &echo},
+      {"quit", 0, 0, kAlways, nullptr, &quit},
+  };
+  return kTable;
+}
+
+std::span<const ScriptRunner::Commands::Expectation> ScriptRunner::Commands::expectations() {
+  static const Expectation kExpectations[] = {
+      {"line", 3, 3, "a line number and a text", &expectLine},
+      {"message", 2, -1, "a text", &expectMessage},
+      {"projects", 2, -1, "a count", &expectProjects},
+      {"title", 2, -1, "a text", &expectTitle},
+      {"status", 2, -1, "a text", &expectStatus},
+      {"control", 3, -1, "a bar and a caption", &expectControl},
+      {"no-control", 3, -1, "a bar and a caption", &expectNoControl},
+      {"value", 3, 3, "a widget name and a text", &expectValue},
+      {"property", 3, 3, "a property name and a text", &expectProperty},
+  };
+  return kExpectations;
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Running
+
 ScriptRunner::ScriptRunner(MainWindow& window, QtUserInterface& ui)
     : QObject(&window), m_window(window), m_ui(ui) {
   m_previousObserver = m_ui.messageObserver();
@@ -258,21 +673,20 @@ bool ScriptRunner::parse(const QString& text, const QString& name, QString* erro
     if (!splitWords(lines[i], environment, &words, &problem)) return mistake(problem);
     if (words.isEmpty()) continue;
     ScriptStep step{i + 1, words.takeFirst().toLower(), words};
-    const CommandShape* shape = shapeOf(step.command);
-    if (!shape) return mistake(QStringLiteral("unknown command \"%1\"").arg(step.command));
+    const Commands::Entry* entry = Commands::find(step.command);
+    if (!entry) return mistake(QStringLiteral("unknown command \"%1\"").arg(step.command));
     const int count = static_cast<int>(step.arguments.size());
-    if (count < shape->minimum || (shape->maximum >= 0 && count > shape->maximum))
+    if (count < entry->minimum || (entry->maximum >= 0 && count > entry->maximum))
       return mistake(QStringLiteral("\"%1\" takes %2 argument%3, not %4")
                          .arg(step.command)
-                         .arg(shape->maximum == shape->minimum ? QString::number(shape->minimum)
-                              : shape->maximum < 0
-                                  ? QStringLiteral("%1 or more").arg(shape->minimum)
-                                  : QStringLiteral("%1 to %2").arg(shape->minimum).arg(shape->maximum))
-                         .arg(shape->maximum == 1 && shape->minimum == 1 ? QString() : QStringLiteral("s"))
+                         .arg(entry->maximum == entry->minimum ? QString::number(entry->minimum)
+                              : entry->maximum < 0
+                                  ? QStringLiteral("%1 or more").arg(entry->minimum)
+                                  : QStringLiteral("%1 to %2").arg(entry->minimum).arg(entry->maximum))
+                         .arg(entry->maximum == 1 && entry->minimum == 1 ? QString() : QStringLiteral("s"))
                          .arg(count));
-    if (step.command == QLatin1StringView("answer") && !answerCode(step.arguments[0]))
-      return mistake(QStringLiteral("\"%1\" is not an answer (OK, Cancel, Yes, No, Abort, Retry, Ignore)")
-                         .arg(step.arguments[0]));
+    if (entry->check)
+      if (const QString invalid = entry->check(step.arguments); !invalid.isEmpty()) return mistake(invalid);
     m_steps.push_back(std::move(step));
   }
   return true;
@@ -412,299 +826,12 @@ QWidget* ScriptRunner::findWidget(const QString& name) const {
 }
 
 void ScriptRunner::execute(const ScriptStep& step) {
-  const QString& command = step.command;
-  const QStringList& args = step.arguments;
-  // A message box stops the IDE until it is answered: only the steps that deal with it go on meanwhile.
-  static const QStringList kWhileABoxIsOpen = {QStringLiteral("press"),      QStringLiteral("answer"),
-                                               QStringLiteral("screenshot"), QStringLiteral("expect"),
-                                               QStringLiteral("echo"),       QStringLiteral("wait"),
-                                               QStringLiteral("set"),        QStringLiteral("quit")};
+  const Commands::Entry* command = Commands::find(step.command);
+  if (!command) fail(QStringLiteral("unknown command \"%1\"").arg(step.command));
   if (auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
-      box && !kWhileABoxIsOpen.contains(command))
+      box && !command->whileABoxIsOpen)
     throw NotReady{QStringLiteral("a message box is open: \"%1\"").arg(box->text())};
-  auto& vbe = *m_window.vbe();
-  auto component = [&](const QString& name) {
-    const qsizetype dot = name.indexOf(u'.');
-    for (const auto& project : vbe.projects()) {
-      if (dot >= 0 && project->Name().compare(name.left(dot), Qt::CaseInsensitive) != 0) continue;
-      if (auto found = project->component(dot >= 0 ? name.mid(dot + 1) : name)) return found;
-    }
-    fail(QStringLiteral("no component \"%1\" is open").arg(name));
-  };
-  auto activeCode = [&]() -> CodeWindow* {
-    CodeWindow* window = m_window.windows().activeCodeWindow();
-    if (!window) {
-      if (auto pane = std::dynamic_pointer_cast<host::CodePaneImpl>(vbe.ActiveCodePane()))
-        window = m_window.windows().codeWindowOf(pane->window().get());
-    }
-    if (!window) fail(QStringLiteral("no code window is active"));
-    return window;
-  };
-
-  if (command == QLatin1StringView("open")) {
-    const QString path =
-        QFileInfo(args[0]).isAbsolute() ? args[0] : QDir::current().absoluteFilePath(args[0]);
-    m_window.commands().open(path, false);
-  } else if (command == QLatin1StringView("select")) {
-    m_window.explorer().selectComponent(component(args[0]));
-  } else if (command == QLatin1StringView("code") || command == QLatin1StringView("designer")) {
-    auto found = component(args[0]);
-    const bool code = command == QLatin1StringView("code");
-    if (!code && !found->hasDesigner()) fail(QStringLiteral("%1 has no designer").arg(args[0]));
-    m_window.commands().show(found, code);
-  } else if (command == QLatin1StringView("caret") || command == QLatin1StringView("selection")) {
-    CodeWindow* window = activeCode();
-    const int l1 = toNumber(args[0], "the line"), c1 = toNumber(args[1], "the column");
-    const int l2 = args.size() > 2 ? toNumber(args[2], "the end line") : l1;
-    const int c2 = args.size() > 2 ? toNumber(args[3], "the end column") : c1;
-    window->pane()->SetSelection(l1, c1, l2, c2);
-    window->editor()->setFocus();
-  } else if (command == QLatin1StringView("type")) {
-    QWidget* target = QApplication::focusWidget();
-    if (!target) fail(QStringLiteral("nothing has the keyboard focus"));
-    typeText(target, args[0]);
-  } else if (command == QLatin1StringView("key")) {
-    for (const QString& combination : args) {
-      const QKeySequence sequence = QKeySequence::fromString(combination, QKeySequence::PortableText);
-      if (sequence.isEmpty() || sequence[0].key() == Qt::Key_unknown)
-        fail(QStringLiteral("\"%1\" is not a key combination").arg(combination));
-      for (int i = 0; i < sequence.count(); ++i) {
-        QWidget* target = QApplication::focusWidget();
-        if (!target)
-          target = QApplication::activeModalWidget() ? QApplication::activeModalWidget() : &m_window;
-        QTest::keyClick(target, sequence[i].key(), sequence[i].keyboardModifiers());
-      }
-    }
-  } else if (command == QLatin1StringView("click")) {
-    m_window.commandBars().syncNow();
-    auto bar = vbe.commandBars()->bar(args[0]);
-    if (!bar) fail(QStringLiteral("no command bar \"%1\"").arg(args[0]));
-    std::shared_ptr<host::CommandBarControlImpl> control;
-    for (int i = 1; i < args.size(); ++i) {
-      control.reset();
-      QStringList known;
-      for (const auto& candidate : bar->controls()) {
-        known << plain(candidate->Caption().isEmpty() ? candidate->TooltipText() : candidate->Caption());
-        if (controlMatches(*candidate, args[i])) {
-          control = candidate;
-          break;
-        }
-      }
-      if (!control)
-        fail(QStringLiteral("no control \"%1\" on \"%2\" (it has: %3)")
-                 .arg(args[i], bar->Name().isEmpty() ? args[i - 1] : bar->Name(),
-                      known.join(QStringLiteral(", "))));
-      if (i + 1 < args.size()) {
-        bar = control->popupBar();
-        if (!bar) fail(QStringLiteral("\"%1\" is not a menu").arg(args[i]));
-      }
-    }
-    if (!control->Visible()) fail(QStringLiteral("\"%1\" is not visible").arg(args.last()));
-    if (!control->Enabled()) fail(QStringLiteral("\"%1\" is disabled").arg(args.last()));
-    m_window.commandBars().click(control);
-  } else if (command == QLatin1StringView("tool")) {
-    if (!m_window.toolbox().click(args[0])) fail(QStringLiteral("the toolbox has no \"%1\"").arg(args[0]));
-  } else if (command == QLatin1StringView("control")) {
-    DesignerWindow* designer = m_window.windows().activeDesigner();
-    if (!designer) fail(QStringLiteral("no form designer is active"));
-    auto control = designer->form()->findControl(args[0]);
-    if (!control) fail(QStringLiteral("the form has no control \"%1\"").arg(args[0]));
-    designer->selectControl(control);
-  } else if (command == QLatin1StringView("property")) {
-    if (!m_window.properties().applyEdit(args[0], args[1]))
-      fail(QStringLiteral("the property %1 did not take \"%2\"").arg(args[0], args[1]));
-  } else if (command == QLatin1StringView("set")) {
-    QWidget* widget = findWidget(args[0]);
-    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[0])};
-    const QString& value = args[1];
-    if (auto* line = qobject_cast<QLineEdit*>(widget)) {
-      line->selectAll();
-      line->insert(value);
-    } else if (auto* plainEdit = qobject_cast<QPlainTextEdit*>(widget)) {
-      plainEdit->setPlainText(value);
-    } else if (auto* textEdit = qobject_cast<QTextEdit*>(widget)) {
-      textEdit->setPlainText(value);
-    } else if (auto* spin = qobject_cast<QSpinBox*>(widget)) {
-      spin->setValue(toNumber(value, "the value"));
-    } else if (auto* check = qobject_cast<QCheckBox*>(widget)) {
-      if (check->isChecked() != toBool(value)) check->click();
-    } else if (auto* radio = qobject_cast<QRadioButton*>(widget)) {
-      if (toBool(value) && !radio->isChecked()) radio->click();
-    } else if (auto* combo = qobject_cast<QComboBox*>(widget)) {
-      int index = combo->findText(value);
-      if (index < 0) index = combo->findText(value, Qt::MatchFixedString);
-      if (index >= 0) {
-        combo->setCurrentIndex(index);
-        Q_EMIT combo->activated(index);
-      } else if (combo->isEditable()) {
-        combo->setEditText(value);
-      } else {
-        fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
-      }
-    } else if (auto* slider = qobject_cast<QAbstractSlider*>(widget)) {
-      slider->setValue(toNumber(value, "the value"));
-    } else if (auto* tabs = qobject_cast<QTabWidget*>(widget)) {
-      int index = -1;
-      for (int i = 0; i < tabs->count(); ++i)
-        if (plain(tabs->tabText(i)).compare(value, Qt::CaseInsensitive) == 0) index = i;
-      if (index < 0) fail(QStringLiteral("\"%1\" has no tab \"%2\"").arg(args[0], value));
-      tabs->setCurrentIndex(index);
-    } else if (auto* view = qobject_cast<QAbstractItemView*>(widget)) {
-      const QModelIndexList found = view->model()->match(view->model()->index(0, 0), Qt::DisplayRole, value,
-                                                         1, Qt::MatchFixedString | Qt::MatchRecursive);
-      if (found.isEmpty()) fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
-      view->setCurrentIndex(found.front());
-      view->scrollTo(found.front());
-    } else {
-      fail(QStringLiteral("cannot set a value on \"%1\" (%2)")
-               .arg(args[0], QLatin1StringView(widget->metaObject()->className())));
-    }
-  } else if (command == QLatin1StringView("press")) {
-    QAbstractButton* found = nullptr;
-    std::vector<QWidget*> tops = dialogs();
-    tops.push_back(&m_window);
-    for (QWidget* top : tops) {
-      for (QAbstractButton* button : top->findChildren<QAbstractButton*>()) {
-        if (!button->isVisible()) continue;
-        if (button->objectName() == args[0] ||
-            plain(button->text()).compare(plain(args[0]), Qt::CaseInsensitive) == 0) {
-          found = button;
-          break;
-        }
-      }
-      if (found) break;
-    }
-    if (!found) throw NotReady{QStringLiteral("no button \"%1\" is open").arg(args[0])};
-    if (!found->isEnabled()) fail(QStringLiteral("the button \"%1\" is disabled").arg(args[0]));
-    found->click();
-  } else if (command == QLatin1StringView("answer")) {
-    m_ui.queueAnswer(answerCode(args[0]));
-  } else if (command == QLatin1StringView("save")) {
-    if (!m_window.commands().saveAll()) fail(QStringLiteral("saving failed"));
-  } else if (command == QLatin1StringView("saveas")) {
-    auto project = m_window.commands().currentProject();
-    if (!project) fail(QStringLiteral("no project is open"));
-    const QString path =
-        QFileInfo(args[0]).isAbsolute() ? args[0] : QDir::current().absoluteFilePath(args[0]);
-    if (!m_window.commands().saveProjectAs(project, path)) fail(QStringLiteral("saving %1 failed").arg(path));
-  } else if (command == QLatin1StringView("screenshot")) {
-    const QString which = args.size() == 2 ? args[0].toLower() : QString();
-    const QString file = args.last();
-    QWidget* target = nullptr;
-    if (which == QLatin1StringView("main")) {
-      target = &m_window;
-    } else if (which == QLatin1StringView("dialog")) {
-      const auto open = dialogs();
-      if (open.empty()) throw NotReady{QStringLiteral("no dialog is open")};
-      target = open.front();
-    } else if (!which.isEmpty()) {
-      fail(QStringLiteral("screenshot takes main or dialog, not \"%1\"").arg(args[0]));
-    } else {
-      const auto open = dialogs();
-      target = open.empty() ? &m_window : open.front();
-    }
-    m_window.commandBars().syncNow();
-    for (CodeWindow* window : m_window.windows().codeWindows())
-      window->binding()->flush();
-    QCoreApplication::processEvents();
-    const QString path = QFileInfo(file).isAbsolute() ? file : QDir::current().absoluteFilePath(file);
-    QDir().mkpath(QFileInfo(path).absolutePath());
-    if (!target->grab().save(path)) fail(QStringLiteral("cannot write %1").arg(path));
-  } else if (command == QLatin1StringView("wait")) {
-    // A time has put the next step off already (tick()); a condition holds the script until it is met.
-    const QString what = args[0].toLower();
-    if (what == QLatin1StringView("dialog")) {
-      if (dialogs().empty()) throw NotReady{QStringLiteral("no dialog opened")};
-    } else if (what == QLatin1StringView("closed")) {
-      if (QWidget* open = QApplication::activeModalWidget())
-        throw NotReady{QStringLiteral("the dialog \"%1\" stayed open").arg(open->windowTitle())};
-    } else {
-      toNumber(args[0], "the time");
-    }
-  } else if (command == QLatin1StringView("expect")) {
-    const QString what = args[0].toLower();
-    if (what == QLatin1StringView("line")) {
-      if (args.size() != 3) fail(QStringLiteral("expect line takes a line number and a text"));
-      CodeWindow* window = activeCode();
-      window->binding()->flush();
-      auto module = window->binding()->module();
-      const int n = toNumber(args[1], "the line");
-      if (n < 1 || n > module->CountOfLines())
-        fail(QStringLiteral("line %1 is past the end of %2 (%3 lines)")
-                 .arg(n)
-                 .arg(module->Name())
-                 .arg(module->CountOfLines()));
-      const QString actual = module->Lines(n, 1);
-      if (actual != args[2])
-        fail(QStringLiteral("line %1 is \"%2\", not \"%3\"").arg(n).arg(actual, args[2]));
-    } else if (what == QLatin1StringView("message")) {
-      if (!m_lastMessage.contains(args[1]))
-        fail(QStringLiteral("the last message was \"%1\", which does not contain \"%2\"")
-                 .arg(m_lastMessage, args[1]));
-    } else if (what == QLatin1StringView("projects")) {
-      const int n = toNumber(args[1], "the count");
-      if (static_cast<int>(vbe.projects().size()) != n)
-        fail(QStringLiteral("%1 projects are open, not %2").arg(vbe.projects().size()).arg(n));
-    } else if (what == QLatin1StringView("status")) {
-      const QString shown = m_window.statusBar()->currentMessage();
-      if (!shown.contains(args[1])) fail(QStringLiteral("the status bar says \"%1\"").arg(shown));
-    } else if (what == QLatin1StringView("title")) {
-      if (!m_window.windowTitle().contains(args[1]))
-        fail(QStringLiteral("the title is \"%1\"").arg(m_window.windowTitle()));
-    } else if (what == QLatin1StringView("control") || what == QLatin1StringView("no-control")) {
-      if (args.size() < 3) fail(QStringLiteral("expect %1 takes a bar and a caption").arg(what));
-      m_window.commandBars().syncNow();
-      bool present = false;
-      if (auto bar = vbe.commandBars()->bar(args[1])) {
-        for (int i = 2; bar && i < args.size(); ++i) {
-          std::shared_ptr<host::CommandBarControlImpl> control;
-          for (const auto& candidate : bar->controls())
-            if (controlMatches(*candidate, args[i])) control = candidate;
-          if (!control || !control->Visible()) break;
-          if (i + 1 == args.size()) present = true;
-          bar = control->popupBar();
-        }
-      }
-      const bool wanted = what == QLatin1StringView("control");
-      if (present != wanted)
-        fail(QStringLiteral("\"%1\" is %2 on \"%3\"")
-                 .arg(args.mid(2).join(QStringLiteral(" > ")),
-                      present ? QStringLiteral("there") : QStringLiteral("not there"), args[1]));
-    } else if (what == QLatin1StringView("value")) {
-      if (args.size() != 3) fail(QStringLiteral("expect value takes a widget name and a text"));
-      QWidget* widget = findWidget(args[1]);
-      if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[1])};
-      QString actual;
-      if (auto* line = qobject_cast<QLineEdit*>(widget))
-        actual = line->text();
-      else if (auto* edit = qobject_cast<QPlainTextEdit*>(widget))
-        actual = edit->toPlainText();
-      else if (auto* check = qobject_cast<QAbstractButton*>(widget))
-        actual = check->isChecked() ? QStringLiteral("true") : QStringLiteral("false");
-      else if (auto* combo = qobject_cast<QComboBox*>(widget))
-        actual = combo->currentText();
-      else if (auto* spin = qobject_cast<QAbstractSpinBox*>(widget))
-        actual = spin->text();
-      else
-        actual = widget->property("text").toString();
-      if (actual != args[2])
-        fail(QStringLiteral("\"%1\" holds \"%2\", not \"%3\"").arg(args[1], actual, args[2]));
-    } else if (what == QLatin1StringView("property")) {
-      if (args.size() != 3) fail(QStringLiteral("expect property takes a property name and a text"));
-      const QString actual = m_window.properties().shownValue(args[1]);
-      if (actual != args[2])
-        fail(QStringLiteral("%1 shows \"%2\", not \"%3\"").arg(args[1], actual, args[2]));
-    } else {
-      fail(QStringLiteral("cannot expect \"%1\" (line, message, projects, title, status, control, "
-                          "no-control, value, property)")
-               .arg(args[0]));
-    }
-  } else if (command == QLatin1StringView("echo")) {
-    std::printf("%s\n", qPrintable(args.join(u' ')));
-    std::fflush(stdout);
-  } else if (command == QLatin1StringView("quit")) {
-    m_next = m_steps.size();
-  }
+  command->run(*this, step.arguments);
 }
 
 }  // namespace desktop

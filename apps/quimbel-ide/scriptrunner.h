@@ -61,6 +61,8 @@ class ScriptRunner final : public QObject {
   void noteMessage(const QString& title, const QString& text);
   bool answerOpenMessageBox();
   QWidget* findWidget(const QString& name) const;
+  /// The script's commands, each with its handler (scriptrunner.cpp).
+  struct Commands;
   std::vector<QWidget*> dialogs() const;
 
   MainWindow& m_window;
