@@ -9,25 +9,26 @@ namespace addin {
 namespace {
 
 constexpr unsigned kBar = OnToolBar | OnPopup;
+using Id = common::CommandId;
 
 // clang-format off
 constexpr std::array<CommandEntry, 14> kCommands{{
-    // number, picture, tag, placement, state entry, handler
-    {1, 2, "MVBackward", kBar, 0, &CVBEvents::EvButtonBrowseBackward_Click},
-    {2, 3, "MVForward", kBar, 1, &CVBEvents::EvButtonBrowseForward_Click},
-    {3, 4, "MVDirectAccess", kBar, 2, &CVBEvents::EvButtonFavorites_Click},
-    {4, 5, "MVMacros", kBar, 3, &CVBEvents::EvButtonMacros_Click},
-    {5, 6, "MVCopyBuffers", kBar, 4, &CVBEvents::EvButtonCopyBuffers_Click},
-    {6, 7, "MVLinesNumbering", kBar, 5, &CVBEvents::EvButtonLinesNumbering_Click},
-    {7, 8, "MVIndentation", kBar, 6, &CVBEvents::EvButtonIndentation_Click},
-    {8, 9, "MVCloseWindows", kBar, 7, &CVBEvents::EvButtonCloseWindows_Click},
-    {9, 10, "MVExtendedFind", kBar, 8, &CVBEvents::EvButtonExtendedFind_Click},
-    {10, 11, "MVNotes", kBar, 9, &CVBEvents::EvButtonTaskList_Click},
-    {11, 12, "MVNewProcedure", kBar, 10, &CVBEvents::EvButtonNewProcedure_Click},
-    {12, 13, "MVOptions", kBar, kUngated, &CVBEvents::EvButtonOptions_Click},
-    {14, 15, nullptr, OnPopup, 13, &CVBEvents::EvMnuQMHelpHandler_Click},
+    // command, picture, tag, placement, gated, handler
+    {Id::BrowseBackward, 2, "MVBackward", kBar, true, &CVBEvents::EvButtonBrowseBackward_Click},
+    {Id::BrowseForward, 3, "MVForward", kBar, true, &CVBEvents::EvButtonBrowseForward_Click},
+    {Id::Favorites, 4, "MVDirectAccess", kBar, true, &CVBEvents::EvButtonFavorites_Click},
+    {Id::Macros, 5, "MVMacros", kBar, true, &CVBEvents::EvButtonMacros_Click},
+    {Id::CopyBuffers, 6, "MVCopyBuffers", kBar, true, &CVBEvents::EvButtonCopyBuffers_Click},
+    {Id::LinesNumbering, 7, "MVLinesNumbering", kBar, true, &CVBEvents::EvButtonLinesNumbering_Click},
+    {Id::Indentation, 8, "MVIndentation", kBar, true, &CVBEvents::EvButtonIndentation_Click},
+    {Id::CloseWindows, 9, "MVCloseWindows", kBar, true, &CVBEvents::EvButtonCloseWindows_Click},
+    {Id::ExtendedFind, 10, "MVExtendedFind", kBar, true, &CVBEvents::EvButtonExtendedFind_Click},
+    {Id::TaskList, 11, "MVNotes", kBar, true, &CVBEvents::EvButtonTaskList_Click},
+    {Id::NewProcedure, 12, "MVNewProcedure", kBar, true, &CVBEvents::EvButtonNewProcedure_Click},
+    {Id::Options, 13, "MVOptions", kBar, false, &CVBEvents::EvButtonOptions_Click},
+    {Id::Help, 15, nullptr, OnPopup, true, &CVBEvents::EvMnuQMHelpHandler_Click},
     // The context-menu item follows its state through its Enabled property instead of a gate.
-    {20, 4, nullptr, OnCodeWindowMenus, kUngated, &CVBEvents::EvMnuAddToFavoritesDsg_Click},
+    {Id::AddToFavorites, 4, nullptr, OnCodeWindowMenus, false, &CVBEvents::EvMnuAddToFavoritesDsg_Click},
 }};
 // clang-format on
 

@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: MIT
 // The add-in's commands in one table: what each puts into the IDE (toolbar button, popup menu item,
-// code-window context-menu item), with which caption, tag and picture, which command-state entry gates it,
+// code-window context-menu item), with which caption, tag and picture, whether its command state gates it,
 // and which handler of CVBEvents runs it. The toolbar and the popup list the commands in table order.
 #pragma once
+
+#include "common/commandstate.h"
 
 #include <span>
 
@@ -19,19 +21,19 @@ enum Placement : unsigned {
 };
 
 struct CommandEntry {
-  /// The command's number; its caption (and tooltip) is the string resource of that number.
-  int number;
+  /// The command; its caption (and tooltip) is the string resource of its number.
+  common::CommandId id;
   /// The picture: bitmap resource number.
   int picture;
   /// The toolbar button's tag (toolbar commands only).
   const char* tag;
   unsigned placement;
-  /// The CommandState entry that must be true for a click to do anything; kUngated for none.
-  int stateEntry;
+  /// Whether a click does anything only while the command's state is true.
+  bool gated;
   void (CVBEvents::*handler)();
-};
 
-inline constexpr int kUngated = -1;
+  int captionResource() const { return static_cast<int>(id); }
+};
 
 /// Every command, toolbar order first.
 std::span<const CommandEntry> commandTable();

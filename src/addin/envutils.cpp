@@ -113,7 +113,7 @@ OwnedBar CEnvUtils::AddToolBar() {
     button->setFace(pictureData(command.picture));
     button->setVisible(true);
     button->setTag(QString::fromLatin1(command.tag));
-    button->setTooltipText(common::LoadResString(command.number));
+    button->setTooltipText(common::LoadResString(command.captionResource()));
   }
   bar->setVisible(true);
   return bar;

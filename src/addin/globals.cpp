@@ -9,6 +9,8 @@
 namespace addin {
 namespace {
 
+using common::CommandId;
+
 constexpr long kNoConfigurationAccessError = 999;
 /// Names longer than this are cut, as the system's name buffers are.
 constexpr int kMaxNameLength = 255;
@@ -121,14 +123,14 @@ void Globals::buildCommandBars() {
       bars->Item(QStringLiteral("Menu Bar"))->Controls()->Add(ide::ControlType::Popup, 1, {}, 11, true));
   controls.popup->setCaption(common::title());
 
-  m_commandState.setRange(2, 13, true);
-  m_commandState.set(10, false);  // new procedure: only while a code window is active
+  m_commandState.setRange(CommandId::Favorites, CommandId::Help, true);
+  m_commandState.set(CommandId::NewProcedure, false);  // only while a code window is active
 
   auto popupBar = controls.popup->CommandBar();
   for (const CommandEntry& command : commandTable()) {
     if (!(command.placement & OnPopup)) continue;
-    OwnedControl item =
-        m_envUtils->AddMenuItem(popupBar, common::LoadResString(command.number), 0, false, command.picture);
+    OwnedControl item = m_envUtils->AddMenuItem(popupBar, common::LoadResString(command.captionResource()), 0,
+                                                false, command.picture);
     item->setEnabled(true);
     controls.menuItems.push_back(std::move(item));
   }
@@ -139,7 +141,7 @@ void Globals::buildCommandBars() {
     for (size_t i = 0; i < controls.contextItems.size(); ++i) {
       auto bar = bars->Item(QString::fromLatin1(contextBars[i]));
       OwnedControl item(bar->Controls()->Add(ide::ControlType::Button, 1, {}, 1, true));
-      item->setCaption(common::LoadResString(command.number));
+      item->setCaption(common::LoadResString(command.captionResource()));
       item->setStyle(ide::ButtonStyle::IconAndCaption);
       item->setFace(pictureData(command.picture));
       controls.contextItems[i] = std::move(item);
@@ -188,14 +190,14 @@ bool Globals::trackActiveWindow(const ide::Ref<ide::Window>& active) {
 }
 
 void Globals::updateCommandState(bool codeWindowActive) {
-  m_commandState.set(10, codeWindowActive);
+  m_commandState.set(CommandId::NewProcedure, codeWindowActive);
   m_controls->setContextItemsEnabled(codeWindowActive);
   if (m_vbe->VBProjects()->Count() != 0) return;
   m_features->allProjectsClosed();
   m_histories->ClearHistories(navigation::CA_TOTAL);
   m_lastWindowType = -1;
   m_controls->setContextItemsEnabled(false);
-  m_commandState.setRange(2, 10, false);
+  m_commandState.setRange(CommandId::Favorites, CommandId::NewProcedure, false);
 }
 
 }  // namespace addin

@@ -184,7 +184,7 @@ bool CVBEvents::running() {
 // Commands
 
 void CVBEvents::runCommand(const CommandEntry& command) {
-  if (command.stateEntry != kUngated && !m_globals.CommandState()[command.stateEntry]) return;
+  if (command.gated && !m_globals.CommandState()[command.id]) return;
   try {
     (this->*command.handler)();
   } catch (const std::exception&) {
@@ -285,7 +285,7 @@ void CVBEvents::EvProjectsHandler_ItemAdded(const ide::Ref<ide::VBProject>& proj
   try {
     m_globals.features().projectAdded(project);
     m_globals.controls().setContextItemsEnabled(true);
-    m_globals.CommandState().setRange(2, 9, true);
+    m_globals.CommandState().setRange(common::CommandId::Favorites, common::CommandId::TaskList, true);
     // The component events follow the new project once the IDE has finished adding it.
     ide::WindowSystem& windows = m_vbe.Platform().windows();
     const ide::HWnd main = m_vbe.MainWindow()->hWnd();
@@ -346,8 +346,10 @@ void CVBEvents::EvProjectsHandler_ItemRenamed(const ide::Ref<ide::VBProject>& pr
 void CVBEvents::EvProjectsHandler_ItemActivated(const ide::Ref<ide::VBProject>& project) {
   try {
     common::CommandState& state = m_globals.CommandState();
-    for (const int entry : {2, 3, 4, 7, 8, 9})
-      state.set(entry, true);
+    using common::CommandId;
+    for (const CommandId command : {CommandId::Favorites, CommandId::Macros, CommandId::CopyBuffers,
+                                    CommandId::CloseWindows, CommandId::ExtendedFind, CommandId::TaskList})
+      state.set(command, true);
     connectProjectEvents(project);
   } catch (const std::exception&) {
   }

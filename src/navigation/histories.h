@@ -32,10 +32,6 @@ struct HISTORY_ENTRY {
 class CHistories {
  public:
   static constexpr int kCapacity = 10;
-  /// Command-state entries of the two browse commands.
-  static constexpr int kBackEntry = 0;
-  static constexpr int kForwardEntry = 1;
-
   /// Both references must outlive the history.
   CHistories(ide::VBE& vbe, common::CommandState& commandState);
   CHistories(const CHistories&) = delete;
@@ -68,8 +64,8 @@ class CHistories {
   /// which case the whole history has been cleared.
   bool take(int index);
   bool show(const HISTORY_ENTRY& place);
-  void setBack(bool enabled) { m_state.set(kBackEntry, enabled); }
-  void setForward(bool enabled) { m_state.set(kForwardEntry, enabled); }
+  void setBack(bool enabled) { m_state.set(common::CommandId::BrowseBackward, enabled); }
+  void setForward(bool enabled) { m_state.set(common::CommandId::BrowseForward, enabled); }
 
   ide::VBE& m_vbe;
   common::CommandState& m_state;

@@ -151,15 +151,16 @@ ide::Ref<ide::CommandBarControl> findControl(const ide::Ref<ide::CommandBar>& ba
 }
 }  // namespace
 
-void LinkedAddIn::clickToolBar(int number) {
-  auto button =
-      findControl(vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2")), common::LoadResString(number));
+void LinkedAddIn::clickToolBar(common::CommandId command) {
+  auto button = findControl(vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2")),
+                            common::LoadResString(static_cast<int>(command)));
   if (button) button->Execute();
 }
 
-void LinkedAddIn::clickMenu(int number) {
+void LinkedAddIn::clickMenu(common::CommandId command) {
   auto popup = vbe->CommandBars()->Item(QStringLiteral("Menu Bar"))->Controls()->Item(common::title());
-  if (auto item = findControl(popup->CommandBar(), common::LoadResString(number))) item->Execute();
+  if (auto item = findControl(popup->CommandBar(), common::LoadResString(static_cast<int>(command))))
+    item->Execute();
 }
 
 QStringList LinkedAddIn::takeFeatureLog() {

@@ -6,6 +6,7 @@
 
 #include "addin/connect.h"
 #include "addin/features.h"
+#include "common/commandstate.h"
 #include "host/model/addins.h"
 #include "host/model/vbe.h"
 #include "host/platform/headlessui.h"
@@ -177,9 +178,9 @@ class LinkedAddIn {
   Globals& globals() { return *connection->globals(); }
   host::ManualEventLoop& loop() { return *vbe->manualLoop(); }
   host::HeadlessUi& ui() { return *vbe->headlessUi(); }
-  /// Clicks the toolbar button or popup item of command `number`.
-  void clickToolBar(int number);
-  void clickMenu(int number);
+  /// Clicks the toolbar button or popup item of `command`.
+  void clickToolBar(common::CommandId command);
+  void clickMenu(common::CommandId command);
   /// The features called since the last take.
   QStringList takeFeatureLog();
 };

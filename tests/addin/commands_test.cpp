@@ -14,16 +14,21 @@
 namespace addin::test {
 namespace {
 
-// Commands 3 to 12 and what the recording features note for each (close windows, 8, acts itself).
-const std::map<int, QString>& featureOfCommand() {
-  static const std::map<int, QString> map{
-      {3, u"favorites"_qs}, {4, u"macros"_qs},         {5, u"copy buffers"_qs},
-      {6, u"numbering"_qs}, {7, u"indentation"_qs},    {9, u"find"_qs},
-      {10, u"tasks"_qs},    {11, u"new procedure"_qs}, {12, u"options"_qs}};
+using common::CommandId;
+
+// The commands from favourites to options and what the recording features note for each (close windows
+// acts itself).
+const std::map<CommandId, QString>& featureOfCommand() {
+  static const std::map<CommandId, QString> map{
+      {CommandId::Favorites, u"favorites"_qs},      {CommandId::Macros, u"macros"_qs},
+      {CommandId::CopyBuffers, u"copy buffers"_qs}, {CommandId::LinesNumbering, u"numbering"_qs},
+      {CommandId::Indentation, u"indentation"_qs},  {CommandId::ExtendedFind, u"find"_qs},
+      {CommandId::TaskList, u"tasks"_qs},           {CommandId::NewProcedure, u"new procedure"_qs},
+      {CommandId::Options, u"options"_qs}};
   return map;
 }
 
-/// Clicks every toolbar button from 3 to 12 and returns what reached the feature areas.
+/// Clicks the toolbar buttons of those commands and returns what reached the feature areas.
 QStringList clickAll(LinkedAddIn& addIn) {
   addIn.takeFeatureLog();
   for (const auto& [number, feature] : featureOfCommand())
@@ -46,13 +51,13 @@ TEST(CommandState, WithNoProjectOnlyBackForwardOptionsAndHelpCanRun) {
   EXPECT_EQ(clickAll(addIn), QStringList{u"options"_qs});
   EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
   auto& state = addIn.globals().CommandState();
-  for (int entry = 2; entry <= 10; ++entry)
-    EXPECT_FALSE(state[entry]) << entry;
-  EXPECT_TRUE(state[11]);
-  EXPECT_TRUE(state[13]);
+  for (int command = int(CommandId::Favorites); command <= int(CommandId::NewProcedure); ++command)
+    EXPECT_FALSE(state[CommandId(command)]) << command;
+  EXPECT_TRUE(state[CommandId::Options]);
+  EXPECT_TRUE(state[CommandId::Help]);
   // Back and forward with an empty history do nothing (and fail nothing).
-  addIn.clickToolBar(1);
-  addIn.clickToolBar(2);
+  addIn.clickToolBar(CommandId::BrowseBackward);
+  addIn.clickToolBar(CommandId::BrowseForward);
   EXPECT_TRUE(addIn.ui().messageBoxes().empty());
 }
 
@@ -81,13 +86,13 @@ TEST(CommandState, AfterTheFirstProjectTheProjectCommandsWorkAtOnceAndNewProcedu
   // A minimised code window does not count.
   addIn.vbe->ActiveWindow()->setWindowState(ide::WindowState::Minimize);
   addIn.loop().advance(100);
-  EXPECT_FALSE(addIn.globals().CommandState()[10]);
+  EXPECT_FALSE(addIn.globals().CommandState()[CommandId::NewProcedure]);
   addIn.vbe->ActiveWindow()->setWindowState(ide::WindowState::Normal);
 
   // A tool window in front: no code window.
   addIn.vbe->activateWindow(addIn.vbe->projectWindow());
   addIn.loop().advance(100);
-  EXPECT_FALSE(addIn.globals().CommandState()[10]);
+  EXPECT_FALSE(addIn.globals().CommandState()[CommandId::NewProcedure]);
   EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
   EXPECT_EQ(addIn.globals().LastWindowType(), static_cast<int>(ide::WindowType::ProjectWindow));
 
@@ -123,7 +128,7 @@ TEST(CommandState, AMenuItemDoesWhatItsToolBarButtonDoes) {
   addIn.takeFeatureLog();
   for (const auto& [number, feature] : featureOfCommand()) {
     addIn.clickMenu(number);
-    EXPECT_EQ(addIn.takeFeatureLog(), QStringList{feature}) << number;
+    EXPECT_EQ(addIn.takeFeatureLog(), QStringList{feature}) << int(number);
   }
 }
 
@@ -161,7 +166,7 @@ TEST(Commands, CloseWindowsClosesCodeAndDesignerWindowsAndLeavesToolWindows) {
   ASSERT_EQ(countOf(ide::WindowType::Designer), 1);
   const int tools = addIn.vbe->Windows()->Count() - 3;
   addIn.loop().advance(100);
-  addIn.clickToolBar(8);
+  addIn.clickToolBar(CommandId::CloseWindows);
   EXPECT_EQ(countOf(ide::WindowType::CodeWindow), 0);
   EXPECT_EQ(countOf(ide::WindowType::Designer), 0);
   EXPECT_EQ(addIn.vbe->Windows()->Count(), tools);
@@ -175,14 +180,14 @@ TEST(Commands, HelpOpensTheContentsPageOrSaysItCannot) {
   LinkedAddIn addIn;
   addIn.ui().setCanOpenDocuments(true);
   addIn.connect();
-  addIn.clickMenu(14);
+  addIn.clickMenu(CommandId::Help);
   ASSERT_EQ(addIn.ui().openedDocuments().size(), 1u);
   EXPECT_EQ(addIn.ui().openedDocuments().front(),
             environment.installDir() + QStringLiteral("/help/index.html"));
   EXPECT_TRUE(addIn.ui().messageBoxes().empty());
 
   QFile::remove(environment.installDir() + QStringLiteral("/help/index.html"));
-  addIn.clickMenu(14);
+  addIn.clickMenu(CommandId::Help);
   ASSERT_EQ(addIn.ui().messageBoxes().size(), 1u);
   EXPECT_EQ(addIn.ui().messageBoxes().front().prompt,
             QStringLiteral("Não foi possível localizar o arquivo de ajuda."));

@@ -60,8 +60,8 @@ TEST(Browsing, APlaceLeftAfterTwoSecondsOrLessIsNotRecorded) {
   ide.go(ide.one, 3);
   ide.stay(600);  // 2.4 s in Proc2
   EXPECT_EQ(ide.places(), QStringList{u"modUm.Proc2"_qs});
-  EXPECT_TRUE(ide.addIn.globals().CommandState()[0]);
-  EXPECT_FALSE(ide.addIn.globals().CommandState()[1]);
+  EXPECT_TRUE(ide.addIn.globals().CommandState()[common::CommandId::BrowseBackward]);
+  EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseForward]);
 }
 
 TEST(Browsing, ScrollingWithinAProcedureOnlyMovesTheCurrentPlacesTopLine) {
@@ -100,7 +100,7 @@ TEST(Browsing, BackAndForwardThroughTheButtons) {
   ide.go(ide.two, 2);
   ide.stay(3000);
   ASSERT_EQ(ide.places(), QStringList{u"modUm.Proc1"_qs});
-  ide.addIn.clickToolBar(1);
+  ide.addIn.clickToolBar(common::CommandId::BrowseBackward);
   EXPECT_EQ(ide.places(), (QStringList{u"modUm.Proc1"_qs, u"modDois.Proc2"_qs}));
   EXPECT_EQ(ide.addIn.vbe->ActiveCodePane()->CodeModule()->Name(), u"modUm"_qs);
   EXPECT_EQ(ide.shownTopLine(), topOf(1));
@@ -108,11 +108,11 @@ TEST(Browsing, BackAndForwardThroughTheButtons) {
   ide.stay(3000);
   EXPECT_EQ(ide.histories().HistoryCount(), 2);
   EXPECT_EQ(ide.histories().CurrentHistoryIndex(), 1);
-  ide.addIn.clickMenu(2);
+  ide.addIn.clickMenu(common::CommandId::BrowseForward);
   EXPECT_EQ(ide.addIn.vbe->ActiveCodePane()->CodeModule()->Name(), u"modDois"_qs);
   EXPECT_EQ(ide.shownTopLine(), topOf(2));
   EXPECT_EQ(ide.histories().CurrentHistoryIndex(), 2);
-  EXPECT_FALSE(ide.addIn.globals().CommandState()[1]);
+  EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseForward]);
 }
 
 TEST(Browsing, MovingElsewhereWhileBrowsingDropsThePlacesAheadAndRecordsNothing) {
@@ -121,8 +121,8 @@ TEST(Browsing, MovingElsewhereWhileBrowsingDropsThePlacesAheadAndRecordsNothing)
     ide.go(ide.one, procedure);
     ide.stay(3000);
   }
-  ide.addIn.clickToolBar(1);
-  ide.addIn.clickToolBar(1);
+  ide.addIn.clickToolBar(common::CommandId::BrowseBackward);
+  ide.addIn.clickToolBar(common::CommandId::BrowseBackward);
   ASSERT_EQ(ide.histories().CurrentHistoryIndex(), 2);
   ASSERT_EQ(ide.histories().HistoryCount(), 4);
   ide.stay(3000);
@@ -130,7 +130,7 @@ TEST(Browsing, MovingElsewhereWhileBrowsingDropsThePlacesAheadAndRecordsNothing)
   ide.stay(600);
   EXPECT_EQ(ide.places(), (QStringList{u"modUm.Proc1"_qs, u"modUm.Proc2"_qs}));
   EXPECT_EQ(ide.histories().CurrentHistoryIndex(), 0);
-  EXPECT_FALSE(ide.addIn.globals().CommandState()[1]);
+  EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseForward]);
 }
 
 TEST(Browsing, BackToAPlaceWhoseComponentWasRemovedEmptiesTheHistory) {
@@ -145,9 +145,9 @@ TEST(Browsing, BackToAPlaceWhoseComponentWasRemovedEmptiesTheHistory) {
   ide.two->Collection()->Remove(ide.two);
   ide.addIn.vbe->setMode(ide::IdeMode::Design);
   EXPECT_EQ(ide.histories().HistoryCount(), 1);
-  ide.addIn.clickToolBar(1);
+  ide.addIn.clickToolBar(common::CommandId::BrowseBackward);
   EXPECT_EQ(ide.histories().HistoryCount(), 0);
-  EXPECT_FALSE(ide.addIn.globals().CommandState()[0]);
+  EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseBackward]);
 }
 
 TEST(Browsing, RemovingAComponentInDesignModeTakesOutItsPlaces) {

@@ -30,8 +30,8 @@ struct HistoryIde {
     current.ProcName = proc;
     current.TopLine = topLine;
   }
-  bool back() const { return state[CHistories::kBackEntry]; }
-  bool forward() const { return state[CHistories::kForwardEntry]; }
+  bool back() const { return state[common::CommandId::BrowseBackward]; }
+  bool forward() const { return state[common::CommandId::BrowseForward]; }
   int shownTopLine() { return vbe->ActiveCodePane()->TopLine(); }
   QString shownModule() { return vbe->ActiveCodePane()->CodeModule()->Name(); }
 
@@ -98,7 +98,7 @@ TEST(CHistories, BrowsingAnEmptyHistoryOrForwardFromThePresentDoesNothing) {
   EXPECT_EQ(ide.histories.HistoryCount(), 0);
   EXPECT_EQ(ide.vbe->ActiveCodePane(), nullptr);
   ide.record(ide.one, 3, u"Proc1"_qs);
-  ide.state.set(CHistories::kForwardEntry, true);
+  ide.state.set(common::CommandId::BrowseForward, true);
   ide.histories.Browse(BD_FORWARD);
   EXPECT_FALSE(ide.forward());
   EXPECT_EQ(ide.histories.CurrentHistoryIndex(), 0);
