@@ -2,6 +2,7 @@
 #include "designerview.h"
 
 #include "icons.h"
+#include "qtplatform.h"
 
 #include <QApplication>
 #include <QKeyEvent>
@@ -179,8 +180,9 @@ std::shared_ptr<host::ControlImpl> DesignerWindow::addControl(const QString& cla
           QStringLiteral("Top"),
           bareClass(container->liveNode().className()) == QLatin1StringView("Frame") ? 240 : 120);
     }
-  } catch (const ide::Error&) {
+  } catch (const ide::Error& error) {
     // A size the form refuses leaves the control as the form made it.
+    qCDebug(lcIde) << "the form kept the size it gave a new" << className << ":" << error.description();
   }
   m_canvas->setSelected(control);
   return control;

@@ -2,6 +2,7 @@
 #include "propertiesview.h"
 
 #include "host/files/controlclasses.h"
+#include "qtplatform.h"
 
 #include <QComboBox>
 #include <QHeaderView>
@@ -191,7 +192,9 @@ void PropertiesView::refreshValues() {
       QString text;
       try {
         text = displayText(m_control->property(name), className, name);
-      } catch (const ide::Error&) {
+      } catch (const ide::Error& error) {
+        // Shown empty, as the IDE shows a value it cannot read.
+        qCDebug(lcIde) << "cannot read" << name << "of a" << className << ":" << error.description();
       }
       item->setText(text);
     }

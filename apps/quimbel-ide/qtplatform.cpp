@@ -15,6 +15,9 @@
 #include <exception>
 
 namespace desktop {
+
+Q_LOGGING_CATEGORY(lcIde, "quimbel.ide", QtInfoMsg)
+
 namespace {
 
 /// Work the IDE runs from its loop must not throw into Qt's event dispatch.
@@ -22,9 +25,9 @@ void runGuarded(const std::function<void()>& work) {
   try {
     work();
   } catch (const std::exception& e) {
-    qWarning("Quimbel IDE: a timer or posted call failed: %s", e.what());
+    qCWarning(lcIde, "a timer or posted call failed: %s", e.what());
   } catch (...) {
-    qWarning("Quimbel IDE: a timer or posted call failed");
+    qCWarning(lcIde, "a timer or posted call failed");
   }
 }
 

@@ -7,6 +7,7 @@
 #include "ide/platform.h"
 
 #include <QElapsedTimer>
+#include <QLoggingCategory>
 #include <QObject>
 #include <QPointer>
 #include <QString>
@@ -21,6 +22,10 @@ class QTimer;
 class QWidget;
 
 namespace desktop {
+
+/// The desktop IDE's log ("quimbel.ide"): failures it goes on after. Debug messages, for failures that are
+/// part of normal use, show with QT_LOGGING_RULES="quimbel.ide.debug=true".
+Q_DECLARE_LOGGING_CATEGORY(lcIde)
 
 class QtEventLoop final : public ide::EventLoop {
  public:

@@ -68,7 +68,8 @@ std::unique_ptr<Globals> Connect::startupRoutine() {
 void Connect::unload() {
   try {
     if (m_addInInstance) m_addInInstance->setConnect(false);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("Connect"), QStringLiteral("unload"), __LINE__);
   }
 }
 

@@ -25,8 +25,9 @@ void OwnedControl::release() noexcept {
   if (!control) return;
   try {
     control->Delete();
-  } catch (...) {
+  } catch (const std::exception& failure) {
     // Gone already (with its bar, or removed by someone else).
+    common::logFailure(failure, QStringLiteral("OwnedControl"), QStringLiteral("release"), __LINE__);
   }
 }
 
@@ -44,7 +45,8 @@ void OwnedBar::release() noexcept {
   if (!bar) return;
   try {
     bar->Delete();
-  } catch (...) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("OwnedBar"), QStringLiteral("release"), __LINE__);
   }
 }
 
@@ -101,10 +103,13 @@ OwnedBar CEnvUtils::AddToolBar() {
   const QString name = QString::fromLatin1(kToolBarName);
   // The toolbar is not temporary: one left behind by a connection that could not remove it would make
   // every later start-up fail on the name.
+  ide::Ref<ide::CommandBar> leftover;
   try {
-    bars->Item(name)->Delete();
-  } catch (const ide::Error&) {
+    leftover = bars->Item(name);
+  } catch (const ide::Error& error) {
+    if (error.number() != ide::err::InvalidProcedureCall) throw;  // else there is none, as usual
   }
+  if (leftover) leftover->Delete();
   OwnedBar bar(bars->Add(name, ide::BarPosition::Top, false, false));
   auto controls = bar->Controls();
   for (const CommandEntry& command : commandTable()) {

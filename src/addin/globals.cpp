@@ -42,7 +42,8 @@ ScopedTimer::ScopedTimer(ide::EventLoop& loop, int intervalMs, std::function<voi
 ScopedTimer::~ScopedTimer() {
   try {
     m_loop.KillTimer(m_id);
-  } catch (...) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("ScopedTimer"), QStringLiteral("KillTimer"), __LINE__);
   }
 }
 
@@ -164,6 +165,7 @@ void Globals::onTimer() {
     updateCommandState(trackActiveWindow(active));
   } catch (const std::exception& failure) {
     common::recordErrorNumber(failure);
+    common::logFailure(failure, QStringLiteral("Globals"), QStringLiteral("onTimer"), __LINE__);
   }
 }
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "addin/hotkeys.h"
 
+#include "common/errors.h"
+
 namespace addin {
 namespace {
 
@@ -46,6 +48,10 @@ ide::HWnd FindActiveCodeWindow(ide::VBE& vbe, ide::DisplayModel startDisplayMode
 // ---------------------------------------------------------------------------------------------------
 
 namespace {
+void logIgnored(const std::exception& failure, const char* procedure, int line) {
+  common::logFailure(failure, QStringLiteral("HotKeyWindow"), QString::fromLatin1(procedure), line);
+}
+
 /// The hotkeys of both clients registered on one window while this lives.
 class HotKeyRegistrations {
  public:
@@ -55,13 +61,16 @@ class HotKeyRegistrations {
     if (m_macros) m_macros->registerHotKeys(m_window);
   }
   ~HotKeyRegistrations() {
+    // Each client lets its hotkeys go whatever the other's did.
     try {
       if (m_copyBuffers) m_copyBuffers->unregisterHotKeys(m_window);
-    } catch (...) {
+    } catch (const std::exception& failure) {
+      logIgnored(failure, "HotKeyRegistrations", __LINE__);
     }
     try {
       if (m_macros) m_macros->unregisterHotKeys(m_window);
-    } catch (...) {
+    } catch (const std::exception& failure) {
+      logIgnored(failure, "HotKeyRegistrations", __LINE__);
     }
   }
   HotKeyRegistrations(const HotKeyRegistrations&) = delete;
@@ -132,8 +141,9 @@ void HotKeyWindow::followFocus() {
     if (m_carrier && m_carrier->window() != focus) remove();
     if (m_carrier) return;
     if (const ide::HWnd window = focusedCodeWindow()) install(window);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
     // The next tick tries again.
+    logIgnored(failure, "followFocus", __LINE__);
   }
 }
 
@@ -142,8 +152,9 @@ void HotKeyWindow::moveToFocusedCodeWindow() {
     const ide::HWnd window = focusedCodeWindow();
     remove();
     if (window) install(window);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
     // The timer puts it right.
+    logIgnored(failure, "moveToFocusedCodeWindow", __LINE__);
   }
 }
 
@@ -172,8 +183,9 @@ qintptr HotKeyWindow::procedure(ide::HWnd window, unsigned message, quintptr wPa
     if (client) {
       try {
         client->HandleHotKey(static_cast<int>(wParam));
-      } catch (const std::exception&) {
+      } catch (const std::exception& failure) {
         // The client reports its own failures; the key is taken either way.
+        logIgnored(failure, "procedure", __LINE__);
       }
       return 0;
     }

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "addin/subclass.h"
 
+#include "common/errors.h"
+
 namespace addin {
 namespace {
 QString property(const char* name) {
@@ -58,8 +60,9 @@ std::unique_ptr<SubclassedWindow> SubclassedWindow::install(ide::WindowSystem& w
 SubclassedWindow::~SubclassedWindow() {
   try {
     UnSubClass(m_windows, m_window);
-  } catch (...) {
+  } catch (const std::exception& failure) {
     // A window that is gone has nothing left to restore.
+    common::logFailure(failure, QStringLiteral("SubclassedWindow"), QStringLiteral("Release"), __LINE__);
   }
 }
 

@@ -103,15 +103,18 @@ void CVBEvents::UpdateEventHandlers(bool connect) {
         [this](auto& p, const QString& oldName) { EvProjectsHandler_ItemRenamed(p, oldName); }));
     m_projectsHandler.push_back(
         projects->ItemActivated.connect([this](auto& p) { EvProjectsHandler_ItemActivated(p); }));
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "UpdateEventHandlers");
   }
   try {
     if (auto project = m_vbe.ActiveVBProject()) connectProjectEvents(project);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "UpdateEventHandlers");
   }
   try {
     if (auto component = m_vbe.SelectedVBComponent()) connectControlEvents(component);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "UpdateEventHandlers");
   }
 }
 
@@ -176,6 +179,11 @@ void CVBEvents::reportUndetermined(const std::exception& failure, const char* pr
   m_vbe.Platform().ui().MsgBox(QString::fromUtf16(kUndeterminedError), ide::mb::Critical, common::title());
 }
 
+void CVBEvents::logIgnored(const std::exception& failure, const char* procedure, std::source_location where) {
+  common::logFailure(failure, QString::fromLatin1(kModule), QString::fromLatin1(procedure),
+                     static_cast<int>(where.line()));
+}
+
 bool CVBEvents::running() {
   return m_globals.EnvUtils().IdeMode() == ide::IdeMode::Run;
 }
@@ -187,8 +195,9 @@ void CVBEvents::runCommand(const CommandEntry& command) {
   if (command.gated && !m_globals.CommandState()[command.id]) return;
   try {
     (this->*command.handler)();
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
     // Command handlers end silently.
+    logIgnored(failure, "runCommand");
   }
 }
 
@@ -270,7 +279,8 @@ void CVBEvents::EvMnuAddToFavoritesDsg_Click() {
       place.procKind = m_globals.EnvUtils().GetPropertyType(module, place.procName, startLine);
     }
     m_globals.features().addFavorite(place);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "EvMnuAddToFavoritesDsg_Click");
   }
 }
 
@@ -301,7 +311,8 @@ qintptr CVBEvents::idleProcedure(ide::HWnd window, unsigned message, quintptr wP
   if (message == m_globals.IdleMessage()) {
     try {
       if (auto project = m_vbe.ActiveVBProject()) connectProjectEvents(project);
-    } catch (const std::exception&) {
+    } catch (const std::exception& failure) {
+      logIgnored(failure, "idleProcedure");
     }
     const qintptr result = callOldWindowProc(windows, window, message, wParam, lParam);
     m_idleSubclass.reset();
@@ -339,7 +350,8 @@ void CVBEvents::EvProjectsHandler_ItemRenamed(const ide::Ref<ide::VBProject>& pr
                                               const QString& oldName) {
   try {
     m_globals.features().projectRenamed(project, oldName);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "EvProjectsHandler_ItemRenamed");
   }
 }
 
@@ -351,7 +363,8 @@ void CVBEvents::EvProjectsHandler_ItemActivated(const ide::Ref<ide::VBProject>& 
                                     CommandId::CloseWindows, CommandId::ExtendedFind, CommandId::TaskList})
       state.set(command, true);
     connectProjectEvents(project);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "EvProjectsHandler_ItemActivated");
   }
 }
 
@@ -387,14 +400,16 @@ void CVBEvents::EvComponentsHandler_ItemRenamed(const ide::Ref<ide::VBComponent>
                                                 const QString& oldName) {
   try {
     m_globals.features().componentRenamed(component, oldName);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "EvComponentsHandler_ItemRenamed");
   }
 }
 
 void CVBEvents::EvComponentsHandler_ItemActivated(const ide::Ref<ide::VBComponent>& component) {
   try {
     componentActivatedOrSelected(component);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    logIgnored(failure, "EvComponentsHandler_ItemActivated");
   }
 }
 

@@ -89,6 +89,9 @@ class CVBEvents {
   void reportFailure(const std::exception& failure, const char* procedure, std::source_location where);
   /// The handler's failure, shown as "Erro indeterminado." (and logged with its location).
   void reportUndetermined(const std::exception& failure, const char* procedure, std::source_location where);
+  /// A failure the handler ends on silently: only logged with its location.
+  static void logIgnored(const std::exception& failure, const char* procedure,
+                         std::source_location where = std::source_location::current());
   qintptr idleProcedure(ide::HWnd window, unsigned message, quintptr wParam, qintptr lParam);
 
   Globals& m_globals;

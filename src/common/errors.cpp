@@ -26,6 +26,14 @@ long numberOf(const std::exception& failure) {
   const auto* error = dynamic_cast<const ide::Error*>(&failure);
   return error ? error->number() : ide::err::InvalidProcedureCall;  // not the IDE's: an invalid call
 }
+
+/// The record of a failure caught at module_procedure, line: the innermost location wins.
+LastError describe(const std::exception& failure, const QString& module, const QString& procedure, int line) {
+  const auto* error = dynamic_cast<const ide::Error*>(&failure);
+  const QString source = error ? error->source() : QString();
+  return {numberOf(failure), error ? error->description() : QString::fromLocal8Bit(failure.what()),
+          source.startsWith(QLatin1StringView("em ")) ? source : locationText(module, procedure, line)};
+}
 }  // namespace
 
 void recordErrorNumber(const std::exception& failure) {
@@ -35,12 +43,7 @@ void recordErrorNumber(const std::exception& failure) {
 ide::Error recordError(const std::exception& failure, const QString& module, const QString& procedure,
                        int line) {
   LastError& record = lastError();
-  const auto* error = dynamic_cast<const ide::Error*>(&failure);
-  record.number = numberOf(failure);
-  record.description = error ? error->description() : QString::fromLocal8Bit(failure.what());
-  const QString source = error ? error->source() : QString();
-  record.location =
-      source.startsWith(QLatin1StringView("em ")) ? source : locationText(module, procedure, line);
+  record = describe(failure, module, procedure, line);
   return ide::Error(record.number, record.description, record.location);
 }
 
@@ -69,6 +72,16 @@ void appendToLog(const LastError& record) {
 
 void logLastError() {
   appendToLog(lastError());
+}
+
+void logFailure(const std::exception& failure, const QString& module, const QString& procedure, int line) {
+  LastError record = describe(failure, module, procedure, line);
+  thread_local LastError previous;
+  if (record.number == previous.number && record.description == previous.description &&
+      record.location == previous.location)
+    return;
+  appendToLog(record);
+  previous = std::move(record);
 }
 
 void ShowErrorReport(ide::UserInterface& ui) {

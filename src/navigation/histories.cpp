@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "navigation/histories.h"
 
+#include "common/errors.h"
+
 #include <algorithm>
 #include <utility>
 
@@ -165,8 +167,9 @@ bool CHistories::show(const HISTORY_ENTRY& place) {
   pane->setTopLine(std::max(shown.TopLine, 1));
   try {
     pane->SetSelection(shown.TopLine, 1, shown.TopLine, 1);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
     // The caret stays where it was; the place itself is shown.
+    common::logFailure(failure, QStringLiteral("CHistories"), QStringLiteral("show"), __LINE__);
   }
   return true;
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "transform/dialogs.h"
 
+#include "common/errors.h"
 #include "common/strings.h"
 #include "transform/frmindenter.h"
 #include "transform/frmlinnumbers.h"
@@ -28,7 +29,8 @@ void showIndentationDialog(const ide::Ref<ide::VBE>& vbe, common::SettingsStore&
   std::optional<frmIndenter> dialog;
   try {
     dialog.emplace(vbe, settings, ownerOf(*vbe, parent));
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("frmIndenter"), QStringLiteral("Form_Load"), __LINE__);
     vbe->Platform().ui().MsgBox(common::LoadResString(5127), ide::mb::Exclamation, common::title());
     return;
   }

@@ -2,6 +2,7 @@
 // The indentation dialog.
 #include "transform/frmindenter.h"
 
+#include "common/errors.h"
 #include "common/strings.h"
 #include "transform/indentwalk.h"
 #include "transform/options.h"
@@ -149,7 +150,8 @@ void frmIndenter::cmdIndent_Click() {
   try {
     walk(scope(), unit);
     completed = true;
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("frmIndenter"), QStringLiteral("cmdIndent_Click"), __LINE__);
     ui.MsgBox(text(kRunFailed), ide::mb::Information, common::title());
   }
   m_running = false;

@@ -2,6 +2,7 @@
 // The line-numbering dialog.
 #include "transform/frmlinnumbers.h"
 
+#include "common/errors.h"
 #include "common/strings.h"
 #include "transform/numberwalk.h"
 #include "transform/options.h"
@@ -157,9 +158,10 @@ void frmLinNumbers::run(bool add) {
   try {
     walk(scope(), add);
     completed = true;
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
     // What reaches the button (no active project, a related document chosen as the module) is not
     // shown: the dialog simply goes back to idle.
+    common::logFailure(failure, QStringLiteral("frmLinNumbers"), QStringLiteral("run"), __LINE__);
   }
   m_running = false;
   m_numIndentError.disconnect();

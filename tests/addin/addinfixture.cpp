@@ -103,10 +103,10 @@ void RecordingHotKeyClient::unregisterHotKeys(ide::HWnd window) {
 }
 
 void RecordingFeatures::addFavorite(const FavoritePlace& place) {
-  m_log << QStringLiteral("favorite %1.%2 kind %3 line %4")
-               .arg(place.component ? place.component->Name() : QString(), place.procName)
-               .arg(static_cast<int>(place.procKind))
-               .arg(place.line);
+  note(QStringLiteral("favorite %1.%2 kind %3 line %4")
+           .arg(place.component ? place.component->Name() : QString(), place.procName)
+           .arg(static_cast<int>(place.procKind))
+           .arg(place.line));
 }
 
 LinkedAddIn::LinkedAddIn(ide::DisplayModel displayModel) {
@@ -123,7 +123,7 @@ LinkedAddIn::~LinkedAddIn() {
 void LinkedAddIn::connect() {
   Environment environment;
   environment.createFeatures = [this](const FeatureServices&) {
-    auto features = std::make_unique<RecordingFeatures>(featureLog);
+    auto features = std::make_unique<RecordingFeatures>(featureLog, failingFeature);
     features->copyBuffersClient = copyBuffers;
     features->macrosClient = macros;
     return features;

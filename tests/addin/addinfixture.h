@@ -105,45 +105,45 @@ class RecordingHotKeyClient final : public HotKeyClient {
 /// Feature areas that record every call instead of acting.
 class RecordingFeatures final : public Features {
  public:
-  explicit RecordingFeatures(QStringList& log) : m_log(log) {}
-  void showFavorites() override { m_log << QStringLiteral("favorites"); }
-  void showMacros() override { m_log << QStringLiteral("macros"); }
-  void showCopyBuffers() override { m_log << QStringLiteral("copy buffers"); }
-  void showLineNumbering() override { m_log << QStringLiteral("numbering"); }
-  void showIndentation() override { m_log << QStringLiteral("indentation"); }
-  void showExtendedFind() override { m_log << QStringLiteral("find"); }
-  void showTaskList() override { m_log << QStringLiteral("tasks"); }
-  void showNewProcedure() override { m_log << QStringLiteral("new procedure"); }
-  void showOptions() override { m_log << QStringLiteral("options"); }
+  RecordingFeatures(QStringList& log, const QString& failing) : m_log(log), m_failing(failing) {}
+  void showFavorites() override { note(QStringLiteral("favorites")); }
+  void showMacros() override { note(QStringLiteral("macros")); }
+  void showCopyBuffers() override { note(QStringLiteral("copy buffers")); }
+  void showLineNumbering() override { note(QStringLiteral("numbering")); }
+  void showIndentation() override { note(QStringLiteral("indentation")); }
+  void showExtendedFind() override { note(QStringLiteral("find")); }
+  void showTaskList() override { note(QStringLiteral("tasks")); }
+  void showNewProcedure() override { note(QStringLiteral("new procedure")); }
+  void showOptions() override { note(QStringLiteral("options")); }
   void addFavorite(const FavoritePlace& place) override;
   void projectAdded(const ide::Ref<ide::VBProject>& p) override {
-    m_log << QStringLiteral("project added ") + p->Name();
+    note(QStringLiteral("project added ") + p->Name());
   }
   void projectRemoved(const ide::Ref<ide::VBProject>& p) override {
-    m_log << QStringLiteral("project removed ") + p->Name();
+    note(QStringLiteral("project removed ") + p->Name());
   }
   void projectRenamed(const ide::Ref<ide::VBProject>& p, const QString& old) override {
-    m_log << QStringLiteral("project renamed ") + old + QStringLiteral(" ") + p->Name();
+    note(QStringLiteral("project renamed ") + old + QStringLiteral(" ") + p->Name());
   }
   void projectFileMoved(const ide::Ref<ide::VBProject>& p, const QString&, const QString&) override {
-    m_log << QStringLiteral("project moved ") + p->Name();
+    note(QStringLiteral("project moved ") + p->Name());
   }
   bool isIdentityModule(const ide::Ref<ide::VBComponent>&) override { return false; }
   void allProjectsClosed() override {}
   void componentAdded(const ide::Ref<ide::VBComponent>& c) override {
-    m_log << QStringLiteral("component added ") + c->Name();
+    note(QStringLiteral("component added ") + c->Name());
   }
   void componentRemoved(const ide::Ref<ide::VBComponent>& c) override {
-    m_log << QStringLiteral("component removed ") + c->Name();
+    note(QStringLiteral("component removed ") + c->Name());
   }
   void componentRenamed(const ide::Ref<ide::VBComponent>& c, const QString& old) override {
-    m_log << QStringLiteral("component renamed ") + old + QStringLiteral(" ") + c->Name();
+    note(QStringLiteral("component renamed ") + old + QStringLiteral(" ") + c->Name());
   }
   void controlAdded(const ide::Ref<ide::VBControl>& c) override {
-    m_log << QStringLiteral("control added ") + c->name();
+    note(QStringLiteral("control added ") + c->name());
   }
   void controlRenamed(const ide::Ref<ide::VBControl>& c, const QString& old, int) override {
-    m_log << QStringLiteral("control renamed ") + old + QStringLiteral(" ") + c->name();
+    note(QStringLiteral("control renamed ") + old + QStringLiteral(" ") + c->name());
   }
   void findWindowProjectRemoved(const ide::Ref<ide::VBProject>&) override {}
   void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>&) override {}
@@ -154,7 +154,14 @@ class RecordingFeatures final : public Features {
   HotKeyClient* macrosClient = nullptr;
 
  private:
+  /// Records a call, or fails it when it is the one the test wants to fail.
+  void note(const QString& call) {
+    if (!m_failing.isEmpty() && call.startsWith(m_failing)) ide::raise(ide::err::InvalidProcedureCall);
+    m_log << call;
+  }
+
   QStringList& m_log;
+  const QString& m_failing;
 };
 
 /// The add-in's core linked into the test, connected to a headless IDE with recording feature areas.
@@ -171,6 +178,8 @@ class LinkedAddIn {
   std::shared_ptr<FakeAddIn> addIn;
   std::unique_ptr<addin::Connect> connection;
   QStringList featureLog;
+  /// The feature call that fails (the start of what it records); empty: none.
+  QString failingFeature;
   /// Set before connect() to give the features hotkey clients.
   HotKeyClient* copyBuffers = nullptr;
   HotKeyClient* macros = nullptr;

@@ -232,6 +232,37 @@ TEST(Commands, WithoutAnAddInsMenuTheConnectionFailsWithItsOwnNumber) {
   EXPECT_EQ(common::lastError().description, QStringLiteral("Não há menu de Add-Ins."));
 }
 
+TEST(Commands, FailuresTheHandlersEndOnSilentlyAreLoggedOnceWithTheirPlace) {
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+  addIn.connect();
+  auto project = addIn.vbe->newProject();
+  addIn.loop().DoEvents();
+  common::lastError() = {};
+  const struct {
+    const char* failing;
+    std::function<void()> act;
+    const char* location;
+  } cases[] = {
+      {"options", [&] { addIn.clickToolBar(CommandId::Options); }, "em CVBEvents_runCommand, linha: "},
+      {"options", [&] { addIn.clickMenu(CommandId::Options); }, nullptr},  // the same again: no new line
+      {"project renamed", [&] { project->setName(u"Vendas"_qs); },
+       "em CVBEvents_EvProjectsHandler_ItemRenamed"},
+  };
+  int lines = 0;
+  for (const auto& c : cases) {
+    addIn.failingFeature = QString::fromLatin1(c.failing);
+    c.act();
+    const QStringList log = environment.errorLog();
+    ASSERT_EQ(log.size(), c.location ? ++lines : lines) << c.failing;
+    if (c.location) {
+      EXPECT_TRUE(log.back().contains(QLatin1StringView(c.location))) << log.back().toStdString();
+    }
+  }
+  EXPECT_TRUE(addIn.ui().messageBoxes().empty());
+  EXPECT_EQ(common::lastError().number, 0) << "the record of reported failures is left alone";
+}
+
 // ---------------------------------------------------------------------------------------------------
 // IDE events
 
