@@ -206,6 +206,7 @@ static int runTool(int argc, char** argv) {
       "written (what was on disk is kept) or standard output failed, 5 files that a group or project\n"
       "lists are missing (each is named; the rest was done)."};
   parser.require_subcommand(1);
+  parser.set_version_flag("--version", "quimbel " QUIMBEL_VERSION, "Print the version and exit");
 
   cli::CommandLine line;
   std::vector<std::pair<CLI::App*, const cli::Command*>> subcommands;
@@ -219,6 +220,9 @@ static int runTool(int argc, char** argv) {
     parser.parse(argc, argv);
   } catch (const CLI::CallForHelp&) {
     std::cout << parser.help();
+    return cli::kSuccess;
+  } catch (const CLI::CallForVersion& version) {
+    std::cout << version.what() << "\n";
     return cli::kSuccess;
   } catch (const CLI::ParseError& error) {
     std::cerr << "quimbel: " << error.what() << "\n"
