@@ -17,6 +17,7 @@
 #include <QStandardPaths>
 
 #include <cstdio>
+#include <string_view>
 
 namespace {
 
@@ -26,20 +27,26 @@ QString configDirectory() {
   return QStandardPaths::writableLocation(QStandardPaths::GenericConfigLocation) + QStringLiteral("/Quimbel");
 }
 
+/// The add-in of a build tree, in lib/ beside bin/.
+QString builtAddInPath() {
+  return QDir::cleanPath(QDir(QCoreApplication::applicationDirPath())
+                             .absoluteFilePath(QStringLiteral("../lib/libquimbel-addin.so")));
+}
+
 QString defaultAddInPath() {
   const QString fromEnvironment = qEnvironmentVariable("QUIMBEL_ADDIN");
   if (!fromEnvironment.isEmpty()) return fromEnvironment;
-  // The build tree keeps it in lib/ beside bin/; an installation where the install put it.
-  const QString built = QDir::cleanPath(QDir(QCoreApplication::applicationDirPath())
-                                            .absoluteFilePath(QStringLiteral("../lib/libquimbel-addin.so")));
-  const QString installed = QStringLiteral(QUIMBEL_INSTALLED_ADDIN);
-  return QFileInfo::exists(built) || !QFileInfo::exists(installed) ? built : installed;
+  // Where the install put it, relative to the program so that the installation can be moved as a whole.
+  const QString installed =
+      QDir::cleanPath(QDir(QCoreApplication::applicationDirPath())
+                          .absoluteFilePath(QStringLiteral(QUIMBEL_ADDIN_FROM_PROGRAM)));
+  return QFileInfo::exists(installed) || !QFileInfo::exists(builtAddInPath()) ? installed : builtAddInPath();
 }
 
 /// A build tree has no machine-wide configuration installed; the add-in finds the build's own through the
 /// variable it reads, unless the user set it.
 void useBuildTreeConfiguration() {
-  if (qEnvironmentVariableIsSet("QUIMBEL_MACHINE_CONFIG")) return;
+  if (qEnvironmentVariableIsSet("QUIMBEL_MACHINE_CONFIG") || !QFileInfo::exists(builtAddInPath())) return;
   const QString config = QDir(QCoreApplication::applicationDirPath())
                              .absoluteFilePath(QStringLiteral("../etc/quimbel/quimbel.conf"));
   if (QFileInfo::exists(config)) qputenv("QUIMBEL_MACHINE_CONFIG", QDir::cleanPath(config).toLocal8Bit());
@@ -53,29 +60,69 @@ void filterPlatformNoise(QtMsgType type, const QMessageLogContext& context, cons
   defaultMessageHandler(type, context, message);
 }
 
+void setIdentity() {
+  QCoreApplication::setApplicationName(QStringLiteral("Quimbel IDE"));
+  QCoreApplication::setOrganizationName(QStringLiteral("Quimbel"));
+  QCoreApplication::setApplicationVersion(QStringLiteral(QUIMBEL_VERSION));
+}
+
+struct CommandLine {
+  QCommandLineParser parser;
+  const QCommandLineOption script{
+      QStringLiteral("script"),
+      QStringLiteral("Run the session from a script, print every message box, and exit 0 when every "
+                     "step passed."),
+      QStringLiteral("file")};
+  const QCommandLineOption addIn{
+      QStringLiteral("addin"),
+      QStringLiteral("The add-in library to load (default: $QUIMBEL_ADDIN, else the installed one)."),
+      QStringLiteral("path")};
+  const QCommandLineOption noAddIn{QStringLiteral("no-addin"), QStringLiteral("Start without the add-in.")};
+
+  CommandLine() {
+    parser.setApplicationDescription(
+        QStringLiteral("The Quimbel desktop IDE for VB6 projects, with the Quimbel add-in loaded.\n"
+                       "Settings: ~/.config/Quimbel ($QUIMBEL_CONFIG_DIR); the add-in's error log: "
+                       "~/.local/share/Quimbel/errors.log ($QUIMBEL_DATA_DIR). See quimbel-ide(1)."));
+    parser.addHelpOption();
+    parser.addVersionOption();
+    parser.addOptions({script, addIn, noAddIn});
+    parser.addPositionalArgument(QStringLiteral("files"),
+                                 QStringLiteral("Groups, projects or modules to open."),
+                                 QStringLiteral("[files...]"));
+  }
+};
+
+bool asksForHelpOrVersion(int argc, char** argv) {
+  for (int i = 1; i < argc; ++i) {
+    const std::string_view argument(argv[i]);
+    if (argument == "--") break;
+    for (const char* option : {"-h", "-?", "--help", "--help-all", "-v", "--version"})
+      if (argument == option) return true;
+  }
+  return false;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
   defaultMessageHandler = qInstallMessageHandler(filterPlatformNoise);
+  // --help and --version answer without a window system, so that they work on a terminal with no display.
+  if (asksForHelpOrVersion(argc, argv)) {
+    QCoreApplication core(argc, argv);
+    setIdentity();
+    CommandLine line;
+    line.parser.process(core);  // prints the answer and exits
+  }
   QApplication app(argc, argv);
-  QApplication::setApplicationName(QStringLiteral("Quimbel IDE"));
-  QApplication::setOrganizationName(QStringLiteral("Quimbel"));
-  QApplication::setApplicationVersion(QStringLiteral(QUIMBEL_VERSION));
+  setIdentity();
+  // The desktop entry: window systems take the window's icon and name from it.
+  QApplication::setDesktopFileName(QStringLiteral("quimbel-ide"));
   QApplication::setStyle(QStringLiteral("Fusion"));
 
-  QCommandLineParser parser;
-  parser.setApplicationDescription(QStringLiteral("The Quimbel desktop IDE for VB6 projects."));
-  parser.addHelpOption();
-  parser.addVersionOption();
-  const QCommandLineOption script(QStringLiteral("script"), QStringLiteral("Run the session from a script."),
-                                  QStringLiteral("file"));
-  const QCommandLineOption addIn(QStringLiteral("addin"), QStringLiteral("The add-in library to load."),
-                                 QStringLiteral("path"));
-  const QCommandLineOption noAddIn(QStringLiteral("no-addin"), QStringLiteral("Start without the add-in."));
-  parser.addOptions({script, addIn, noAddIn});
-  parser.addPositionalArgument(QStringLiteral("files"),
-                               QStringLiteral("Groups, projects or modules to open."),
-                               QStringLiteral("[files...]"));
+  CommandLine line;
+  QCommandLineParser& parser = line.parser;
+  const QCommandLineOption &script = line.script, &addIn = line.addIn, &noAddIn = line.noAddIn;
   parser.process(app);
   const bool scripted = parser.isSet(script);
 

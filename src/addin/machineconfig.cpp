@@ -1,17 +1,41 @@
 // SPDX-License-Identifier: MIT
 #include "addin/machineconfig.h"
 
+#include <QDir>
 #include <QFile>
+#include <QFileInfo>
+
+#include <dlfcn.h>
 
 #ifndef QUIMBEL_MACHINE_CONFIG_FILE
 #define QUIMBEL_MACHINE_CONFIG_FILE "/etc/quimbel/quimbel.conf"
 #endif
+#ifndef QUIMBEL_MACHINE_CONFIG_FROM_ADDIN
+#define QUIMBEL_MACHINE_CONFIG_FROM_ADDIN "../../etc/quimbel/quimbel.conf"
+#endif
 
 namespace addin {
+namespace {
+
+/// The folder of the library (or program) this code is linked into.
+QString ownFolder() {
+  Dl_info info{};
+  if (dladdr(reinterpret_cast<const void*>(&ownFolder), &info) == 0 || !info.dli_fname) return {};
+  return QFileInfo(QString::fromLocal8Bit(info.dli_fname)).absolutePath();
+}
+
+}  // namespace
 
 QString MachineConfigFile::defaultPath() {
   const QString overridden = qEnvironmentVariable("QUIMBEL_MACHINE_CONFIG");
-  return overridden.isEmpty() ? QStringLiteral(QUIMBEL_MACHINE_CONFIG_FILE) : overridden;
+  if (!overridden.isEmpty()) return overridden;
+  // An installation moved as a whole keeps its configuration where it is from the add-in.
+  if (const QString folder = ownFolder(); !folder.isEmpty()) {
+    const QString beside =
+        QDir::cleanPath(QDir(folder).filePath(QStringLiteral(QUIMBEL_MACHINE_CONFIG_FROM_ADDIN)));
+    if (QFileInfo::exists(beside)) return beside;
+  }
+  return QStringLiteral(QUIMBEL_MACHINE_CONFIG_FILE);
 }
 
 QString MachineConfigFile::installationPath() {

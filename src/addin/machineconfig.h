@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: MIT
 // The machine-wide configuration that the installation writes: a file of "key=value" lines whose
 // InstallationPath value is the directory holding the add-in's shared files (help pages). It lives at
-// <sysconfdir>/quimbel/quimbel.conf; $QUIMBEL_MACHINE_CONFIG names another file, so that a build tree runs
-// without installing (the build writes <build>/etc/quimbel/quimbel.conf for that).
+// <sysconfdir>/quimbel/quimbel.conf, found from the installed add-in's own folder first, so that an
+// installation moved to another prefix finds its own. $QUIMBEL_MACHINE_CONFIG names another file, so that a
+// build tree runs without installing (the build writes <build>/etc/quimbel/quimbel.conf for that).
 #pragma once
 
 #include <QString>
@@ -32,7 +33,7 @@ class MachineConfigFile final : public MachineConfig {
   bool canRead() override;
   QString location() const override { return m_path; }
 
-  /// $QUIMBEL_MACHINE_CONFIG when set, else the installed file.
+  /// $QUIMBEL_MACHINE_CONFIG when set, else the installed file beside the add-in, else the configured one.
   static QString defaultPath();
 
  private:
