@@ -5,6 +5,7 @@ set -euo pipefail
 
 packages=(
   cmake ninja-build pkg-config g++ clang-format
+  dpkg-dev file
   qt6-base-dev
   xvfb xauth fonts-dejavu-core
   libsqlcipher-dev sqlcipher
