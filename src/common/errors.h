@@ -46,8 +46,8 @@ void ShowErrorReport(ide::UserInterface& ui);
 void logLastError();
 
 /// Logs, with its location, a failure that the user is not told of (or only by a fixed message), leaving
-/// the last-error record as it is. The same failure at the same place as the one logged just before is not logged again, so
-/// that a timer failing at every tick leaves one line.
+/// the last-error record as it is. The same failure at the same place as the one logged just before is not
+/// logged again, so that a timer failing at every tick leaves one line.
 void logFailure(const std::exception& failure, const QString& module, const QString& procedure, int line);
 
 /// Where reported locations are logged ($QUIMBEL_DATA_DIR or the user's data directory, file errors.log).
