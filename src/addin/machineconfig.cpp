@@ -29,7 +29,7 @@ QString ownFolder() {
 QString MachineConfigFile::defaultPath() {
   const QString overridden = qEnvironmentVariable("QUIMBEL_MACHINE_CONFIG");
   if (!overridden.isEmpty()) return overridden;
-  // An installation moved as a whole keeps its configuration where it is from the add-in.
+  // An installation into another prefix keeps its configuration at the same place relative to the add-in.
   if (const QString folder = ownFolder(); !folder.isEmpty()) {
     const QString beside =
         QDir::cleanPath(QDir(folder).filePath(QStringLiteral(QUIMBEL_MACHINE_CONFIG_FROM_ADDIN)));
