@@ -309,16 +309,11 @@ namespace {
 }
 }  // namespace
 
-bool CodeText::isDeclare(const ProcInfo* proc) const {
-  const auto& procs = m_index->procs;
-  return proc < procs.data() || proc >= procs.data() + procs.size();
-}
-
 int CodeText::procStartLine(QStringView name, ide::ProcKind kind) {
   const ProcInfo* proc = findProc(name, kind);
   if (!proc) raiseNotDefined();
   // A Declare statement starts where it stands: it sits in the declarations, not between procedures.
-  if (isDeclare(proc)) return proc->bodyLine;
+  if (proc->isDeclare) return proc->bodyLine;
   const Index& idx = *m_index;
   const size_t i = static_cast<size_t>(proc - idx.procs.data());
   return i == 0 ? idx.declarationLines + 1 : idx.procs[i - 1].endLine + 1;
@@ -333,7 +328,7 @@ int CodeText::procBodyLine(QStringView name, ide::ProcKind kind) {
 int CodeText::procCountLines(QStringView name, ide::ProcKind kind) {
   const ProcInfo* proc = findProc(name, kind);
   if (!proc) raiseNotDefined();
-  if (isDeclare(proc)) return proc->headerEnd - proc->bodyLine + 1;
+  if (proc->isDeclare) return proc->headerEnd - proc->bodyLine + 1;
   const Index& idx = *m_index;
   const size_t i = static_cast<size_t>(proc - idx.procs.data());
   const int start = procStartLine(name, kind);
@@ -394,6 +389,7 @@ const std::vector<MemberInfo>& CodeText::members() {
             ProcInfo declare;
             declare.name = name;
             declare.scope = decl->scope;
+            declare.isDeclare = true;
             declare.bodyLine = n;
             declare.headerEnd = last;
             declare.endLine = last;
