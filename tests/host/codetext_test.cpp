@@ -219,6 +219,68 @@ TEST(ModulesWithoutProcedures, StrayEndLinesCloseNothing) {
   EXPECT_EQ(text.procCountLines(u"B", ide::ProcKind::Proc), 3);
 }
 
+// Members of Type and Enum blocks and variables may carry keyword names in any letter case: only a name
+// after Sub, Function or Property Get/Let/Set starts a procedure, and a block's lines up to its End are its
+// members whatever they look like. Each row: a module, its procedures (name and body line), its
+// declarations count and its members.
+TEST(ProcedureExtents, KeywordLikeNamesStartNoProcedure) {
+  struct Case {
+    QStringList module;
+    std::vector<std::pair<const char*, int>> procedures;
+    int declarationLines;
+    QStringList members;
+  };
+  const Case cases[] = {
+      {{QStringLiteral("Option Explicit"),                            // 1
+        QStringLiteral("Private Type QSStack ' pilha do ordenação"),  // 2
+        QStringLiteral("    lO As Long"),                             // 3
+        QStringLiteral("    sUB As Long"),                            // 4
+        QStringLiteral("    FUNCTION(1 To 2) As Integer"),            // 5
+        QStringLiteral("    property As String"),                     // 6
+        QStringLiteral("    Type As Byte"),                           // 7
+        QStringLiteral("    Sub Fantasma() ' parece cabeçalho"),      // 8
+        QStringLiteral("End Type"),                                   // 9
+        QStringLiteral("Public Enum eTipo"),                          // 10
+        QStringLiteral("    Sub = 1"),                                // 11
+        QStringLiteral("    function"),                               // 12
+        QStringLiteral("    End Sub"),                                // 13
+        QStringLiteral("End Enum"),                                   // 14
+        QStringLiteral("Private sUB As Long, Function(3) As Long"),   // 15
+        QStringLiteral("Public Sub Ordena(v() As Long)"),             // 16
+        QStringLiteral("    Dim SUB As QSStack"),                     // 17
+        QStringLiteral("    Dim Property As Long"),                   // 18
+        QStringLiteral("End Sub"),                                    // 19
+        QStringLiteral("Private Property Get Topo() As Long"),        // 20
+        QStringLiteral("End Property")},                              // 21
+       {{"Ordena", 16}, {"Topo", 20}},
+       15,
+       {QStringLiteral("sUB"), QStringLiteral("Function"), QStringLiteral("Ordena"), QStringLiteral("Topo")}},
+      // A block being typed, without its End line, cannot hide the procedures below it.
+      {{QStringLiteral("Private Type tNovo"), QStringLiteral("    Sub As Long"), QString(),
+        QStringLiteral("Sub Main()"), QStringLiteral("End Sub")},
+       {{"Main", 4}},
+       2,
+       {QStringLiteral("Main")}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.module.join(u'|').toStdString());
+    CodeText text;
+    loadLines(text, c.module);
+    std::vector<std::pair<QString, int>> procedures;
+    for (const ProcInfo& proc : text.procedures())
+      procedures.emplace_back(proc.name, proc.bodyLine);
+    std::vector<std::pair<QString, int>> expected;
+    for (const auto& [name, line] : c.procedures)
+      expected.emplace_back(QString::fromLatin1(name), line);
+    EXPECT_EQ(procedures, expected);
+    EXPECT_EQ(text.countOfDeclarationLines(), c.declarationLines);
+    QStringList members;
+    for (const MemberInfo& member : text.members())
+      members << member.name;
+    EXPECT_EQ(members, c.members);
+  }
+}
+
 // ---------------------------------------------------------------------------------------------------
 // Editing
 
@@ -344,8 +406,8 @@ void expectSameAnswers(CodeText& edited) {
 }
 
 TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
-  // Lines that make and unmake structure: headers (also continued ones), End lines, declarations,
-  // comments, blanks, continuation marks, and ordinary statements.
+  // Lines that make and unmake structure: headers (also continued ones), End lines, declarations, Type and
+  // Enum blocks, comments, blanks, continuation marks, and ordinary statements.
   const QStringList pool = {
       QStringLiteral("Public Sub Alfa()"),
       QStringLiteral("Private Function Beta( _"),
@@ -370,6 +432,9 @@ TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
       QStringLiteral("Event Aviso()"),
       QStringLiteral("Sub Delta(): x = 1"),
       QStringLiteral("Public WithEvents w As C"),
+      QStringLiteral("Enum E"),
+      QStringLiteral("End Enum"),
+      QStringLiteral("    sUB As Long"),
   };
   std::mt19937 random(20261206);
   auto pick = [&] { return pool[static_cast<int>(random() % static_cast<unsigned>(pool.size()))]; };

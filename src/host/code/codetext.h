@@ -147,7 +147,8 @@ class CodeText {
   void checkLineNumber(int line, int last) const;
 
   std::vector<Line> m_lines;
-  /// Lines holding a procedure header or End statement, ascending: the structure's skeleton.
+  /// Lines holding a procedure header or End statement, or the first or End line of a Type or Enum
+  /// block, ascending: the structure's skeleton.
   std::vector<int> m_markers;
   std::unique_ptr<Index> m_index;  // derived from the markers; rebuilt lazily after structural edits
   bool m_indexValid = false;
