@@ -80,6 +80,7 @@ void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name
   } catch (const std::exception&) {
     return;  // a kind the property lacks, or a procedure that is gone
   }
+  const JumpTargets targets(text.lines);
   qint32 number = numberBeforeFirst();
   bool continuation = false;
   for (qsizetype i = text.first; i < text.stop; ++i) {
@@ -88,7 +89,7 @@ void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name
     m_context.setLine(line);
     try {
       QString& code = text.lines[size_t(i)];
-      if (NumberLine(code, number, continuation, m_interval)) module.ReplaceLine(line, code);
+      if (NumberLine(code, number, continuation, m_interval, targets)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
       m_context.lineSkipped(failure, u"NumberLine", module, line);
     }
@@ -102,6 +103,7 @@ void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& na
   } catch (const std::exception&) {
     return;
   }
+  const JumpTargets targets(text.lines);
   // The header's continuation lines hold parameters, never line numbers.
   bool continuation = isContinued(text.lines.front());
   for (qsizetype i = 1; i < text.unnumberStop; ++i) {
@@ -110,7 +112,7 @@ void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& na
     m_context.setLine(line);
     try {
       QString& code = text.lines[size_t(i)];
-      if (UnnumberLine(code, continuation)) module.ReplaceLine(line, code);
+      if (UnnumberLine(code, continuation, targets)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
       m_context.lineSkipped(failure, u"UnnumberLine", module, line);
     }
@@ -118,18 +120,19 @@ void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& na
 }
 
 void NumberingWalk::numberText(ProcedureText& text, bool add) const {
+  const JumpTargets targets(text.lines);
   if (add) {
     qint32 number = numberBeforeFirst();
     bool continuation = false;
     for (qsizetype i = text.first; i < text.stop; ++i) {
       m_context.setLine(text.moduleLine(i));  // where an overflow is reported
-      NumberLine(text.lines[size_t(i)], number, continuation, m_interval);
+      NumberLine(text.lines[size_t(i)], number, continuation, m_interval, targets);
     }
     return;
   }
   bool continuation = isContinued(text.lines.front());
   for (qsizetype i = 1; i < text.unnumberStop; ++i)
-    UnnumberLine(text.lines[size_t(i)], continuation);
+    UnnumberLine(text.lines[size_t(i)], continuation, targets);
 }
 
 }  // namespace transform
