@@ -30,17 +30,12 @@ void NumberingWalk::NumberProject(const ide::Ref<ide::VBProject>& project, bool 
 void NumberingWalk::NumberModule(const ide::Ref<ide::CodeModule>& module, bool add) {
   m_context.guard(u"NumberModule", kModuleFailed, module.get(), [&] {
     if (!module) ide::raise(ide::err::ObjectVariableNotSet);
-    auto members = module->Members();
-    const int count = members->Count();
-    for (int i = 1; i <= count; ++i) {
-      if (m_context.yieldAndCheck()) return;
-      auto member = members->Item(i);
-      const ide::MemberType type = member->Type();
-      if (type == ide::MemberType::Method || type == ide::MemberType::Property)
+    forEachMember(m_context, *module, [&](const ide::Ref<ide::Member>& member) {
+      if (hasProcedures(member->Type()))
         NumberMember(module, member, add);
       else
         m_context.AdvanceProgress(1);
-    }
+    });
   });
 }
 
@@ -48,12 +43,10 @@ void NumberingWalk::NumberMember(const ide::Ref<ide::CodeModule>& module, const 
                                  bool add) {
   m_context.guard(u"NumberMember", kProcedureFailed, module.get(), [&] {
     if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
-    const QString name = member->Name().trimmed();
-    if (!name.isEmpty()) {
-      // Adding passes over Declare statements, which are listed as methods; removing cannot harm them.
-      for (const ide::ProcKind kind : procedureKinds(*module, name, member->Type(), add))
-        numberOrUnnumber(*module, name, kind, add);
-    }
+    // Adding passes over Declare statements, which are listed as methods; removing cannot harm them.
+    forEachProcedure(*module, *member, add, [&](const QString& name, ide::ProcKind kind) {
+      numberOrUnnumber(*module, name, kind, add);
+    });
     m_context.AdvanceProgress(1);
   });
 }
