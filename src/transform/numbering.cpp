@@ -7,6 +7,7 @@
 #include <charconv>
 #include <iterator>
 #include <limits>
+#include <utility>
 
 namespace transform {
 
@@ -88,8 +89,13 @@ constexpr bool isDigit(QChar c) noexcept {
   return c >= u'0' && c <= u'9';
 }
 
-bool isKeyword(QStringView word, QStringView keyword) {
-  return word.size() == keyword.size() && word.compare(keyword, Qt::CaseInsensitive) == 0;
+/// `word` is `keyword` in any letter case (keywords are ASCII letters: setting the case bit cannot make
+/// another character equal to one).
+bool isKeyword(QStringView word, QStringView keyword) noexcept {
+  if (word.size() != keyword.size()) return false;
+  for (qsizetype i = 0; i < word.size(); ++i)
+    if ((word[i].unicode() | 0x20) != (keyword[i].unicode() | 0x20)) return false;
+  return true;
 }
 
 /// A label's digits as the set holds them: "010" and "10" name the same line.
@@ -104,6 +110,42 @@ bool isZero(QStringView digits) {
   return std::all_of(digits.begin(), digits.end(), [](QChar c) { return c == u'0'; });
 }
 
+/// The leading digits of a line that begins with a numeric label ("10 x", "10: x", "10"), else empty.
+QStringView leadingLabel(QStringView trimmed) {
+  qsizetype i = 0;
+  while (i < trimmed.size() && isDigit(trimmed[i]))
+    ++i;
+  if (i < trimmed.size() && !isBlank(trimmed[i]) && trimmed[i] != u':' && trimmed[i] != u'\'') return {};
+  return trimmed.first(i);
+}
+
+/// `line` after its leading blanks and its numeric label, if it has one.
+QStringView withoutLeadingLabel(QStringView line) {
+  const QStringView code = line.sliced(leadingBlanks(line).size());
+  return code.sliced(leadingLabel(code).size());
+}
+
+/// False when a whole statement cannot name a label: it has no digit (but for its own label), or no word
+/// that begins like GoTo, GoSub, Resume, Then or Else. Most lines are passed over after this one look.
+bool mayNameALabel(QStringView code) noexcept {
+  bool digit = false;
+  bool keyword = false;
+  bool inWord = false;
+  for (qsizetype i = 0; i < code.size(); ++i) {
+    const char16_t c = code[i].unicode();
+    const bool wordChar = (c | 0x20) >= u'a' && (c | 0x20) <= u'z';
+    if (c >= u'0' && c <= u'9') {
+      digit = true;
+    } else if (wordChar && !inWord && i + 1 < code.size()) {
+      const char16_t pair[2] = {char16_t(c | 0x20), char16_t(code[i + 1].unicode() | 0x20)};
+      keyword = keyword || (pair[0] == u'g' && pair[1] == u'o') || (pair[0] == u'r' && pair[1] == u'e') ||
+                (pair[0] == u't' && pair[1] == u'h') || (pair[0] == u'e' && pair[1] == u'l');
+    }
+    inWord = wordChar || (c >= u'0' && c <= u'9') || c == u'_' || c > 0x7F;
+  }
+  return digit && keyword;
+}
+
 /// Reads the labels a procedure jumps to, statement by statement, one physical line at a time.
 class JumpReader {
  public:
@@ -111,10 +153,12 @@ class JumpReader {
 
   void read(QStringView line) {
     const bool continues = isContinued(line);
+    const bool carried = std::exchange(m_carried, continues);
     if (m_inComment) {  // a comment goes on over its continuation marks
       m_inComment = continues;
       return;
     }
+    if (!carried && !continues && !mayNameALabel(withoutLeadingLabel(line))) return;
     const QStringView text = continues ? rightTrimmedView(line).chopped(1) : line;
     const qsizetype n = text.size();
     qsizetype i = 0;
@@ -234,16 +278,8 @@ class JumpReader {
   bool m_onError = false;
   bool m_zeroNamesNoLabel = false;
   bool m_inComment = false;
+  bool m_carried = false;  // the line before ended with the continuation mark
 };
-
-/// The leading digits of a line that begins with a numeric label ("10 x", "10: x", "10"), else empty.
-QStringView leadingLabel(QStringView trimmed) {
-  qsizetype i = 0;
-  while (i < trimmed.size() && isDigit(trimmed[i]))
-    ++i;
-  if (i < trimmed.size() && !isBlank(trimmed[i]) && trimmed[i] != u':' && trimmed[i] != u'\'') return {};
-  return trimmed.first(i);
-}
 
 /// `text` without its first character when that is a blank.
 QStringView withoutOneBlank(QStringView text) {
@@ -253,6 +289,10 @@ QStringView withoutOneBlank(QStringView text) {
 }  // namespace
 
 JumpTargets::JumpTargets(std::span<const QString> lines) {
+  // Only a line with a numeric label can be a target: most procedures have none, and need no reading.
+  if (std::none_of(lines.begin(), lines.end(),
+                   [](const QString& line) { return !leadingLabel(trimmedView(line)).isEmpty(); }))
+    return;
   JumpReader reader(m_labels);
   for (const QString& line : lines)
     reader.read(line);
