@@ -6,6 +6,9 @@
 
 #include <QDir>
 #include <QFileInfo>
+#include <QHash>
+
+#include <vector>
 
 namespace cli {
 namespace {
@@ -108,11 +111,15 @@ int runList(const ListOptions& options) {
       printLine(QStringLiteral("    %1 lines, declarations 1-%2")
                     .arg(text.countOfLines())
                     .arg(text.countOfDeclarationLines()));
+      // The procedures of each member, found by name once: a member does not search the whole module.
+      QHash<QString, std::vector<const host::ProcInfo*>> byMember;
+      for (const host::ProcInfo& proc : text.procedures())
+        byMember[proc.name.toCaseFolded()].push_back(&proc);
       for (const host::MemberInfo& member : text.members()) {
         printLine(QStringLiteral("    %1 %2 %3")
                       .arg(scopeName(member.scope), memberTypeName(member.type), member.name));
-        for (const host::ProcInfo& proc : text.procedures()) {
-          if (proc.name.compare(member.name, Qt::CaseInsensitive) != 0) continue;
+        for (const host::ProcInfo* procedure : byMember.value(member.name.toCaseFolded())) {
+          const host::ProcInfo& proc = *procedure;
           printLine(QStringLiteral("      %1: start %2, body %3, lines %4")
                         .arg(procedureKeyword(proc))
                         .arg(text.procStartLine(proc.name, proc.kind))

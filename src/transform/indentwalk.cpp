@@ -29,15 +29,10 @@ void IndentationWalk::IndentProject(const ide::Ref<ide::VBProject>& project) {
 void IndentationWalk::IndentModule(const ide::Ref<ide::CodeModule>& module) {
   m_context.guard(u"IndentModule", kModuleFailed, module.get(), [&] {
     if (!module) ide::raise(ide::err::ObjectVariableNotSet);
-    auto members = module->Members();
-    const int count = members->Count();
-    for (int i = 1; i <= count; ++i) {
-      if (m_context.yieldAndCheck()) return;
-      auto member = members->Item(i);
-      const ide::MemberType type = member->Type();
-      if (type == ide::MemberType::Method || type == ide::MemberType::Property) IndentMember(module, member);
-    }
-    IndentDeclarations(*module);
+    const bool walked = forEachMember(m_context, *module, [&](const ide::Ref<ide::Member>& member) {
+      if (hasProcedures(member->Type())) IndentMember(module, member);
+    });
+    if (walked) IndentDeclarations(*module);
   });
 }
 
@@ -45,10 +40,8 @@ void IndentationWalk::IndentMember(const ide::Ref<ide::CodeModule>& module,
                                    const ide::Ref<ide::Member>& member) {
   m_context.guard(u"IndentMember", kProcedureFailed, module.get(), [&] {
     if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
-    const QString name = member->Name().trimmed();
-    if (name.isEmpty()) return;
-    for (const ide::ProcKind kind : procedureKinds(*module, name, member->Type(), true))
-      IndentProcedure(*module, name, kind);
+    forEachProcedure(*module, *member, true,
+                     [&](const QString& name, ide::ProcKind kind) { IndentProcedure(*module, name, kind); });
   });
 }
 

@@ -30,17 +30,12 @@ void NumberingWalk::NumberProject(const ide::Ref<ide::VBProject>& project, bool 
 void NumberingWalk::NumberModule(const ide::Ref<ide::CodeModule>& module, bool add) {
   m_context.guard(u"NumberModule", kModuleFailed, module.get(), [&] {
     if (!module) ide::raise(ide::err::ObjectVariableNotSet);
-    auto members = module->Members();
-    const int count = members->Count();
-    for (int i = 1; i <= count; ++i) {
-      if (m_context.yieldAndCheck()) return;
-      auto member = members->Item(i);
-      const ide::MemberType type = member->Type();
-      if (type == ide::MemberType::Method || type == ide::MemberType::Property)
+    forEachMember(m_context, *module, [&](const ide::Ref<ide::Member>& member) {
+      if (hasProcedures(member->Type()))
         NumberMember(module, member, add);
       else
         m_context.AdvanceProgress(1);
-    }
+    });
   });
 }
 
@@ -48,12 +43,10 @@ void NumberingWalk::NumberMember(const ide::Ref<ide::CodeModule>& module, const 
                                  bool add) {
   m_context.guard(u"NumberMember", kProcedureFailed, module.get(), [&] {
     if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
-    const QString name = member->Name().trimmed();
-    if (!name.isEmpty()) {
-      // Adding passes over Declare statements, which are listed as methods; removing cannot harm them.
-      for (const ide::ProcKind kind : procedureKinds(*module, name, member->Type(), add))
-        numberOrUnnumber(*module, name, kind, add);
-    }
+    // Adding passes over Declare statements, which are listed as methods; removing cannot harm them.
+    forEachProcedure(*module, *member, add, [&](const QString& name, ide::ProcKind kind) {
+      numberOrUnnumber(*module, name, kind, add);
+    });
     m_context.AdvanceProgress(1);
   });
 }
@@ -80,6 +73,7 @@ void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name
   } catch (const std::exception&) {
     return;  // a kind the property lacks, or a procedure that is gone
   }
+  const JumpTargets targets(text.lines);
   qint32 number = numberBeforeFirst();
   bool continuation = false;
   for (qsizetype i = text.first; i < text.stop; ++i) {
@@ -88,7 +82,7 @@ void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name
     m_context.setLine(line);
     try {
       QString& code = text.lines[size_t(i)];
-      if (NumberLine(code, number, continuation, m_interval)) module.ReplaceLine(line, code);
+      if (NumberLine(code, number, continuation, m_interval, targets)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
       m_context.lineSkipped(failure, u"NumberLine", module, line);
     }
@@ -102,6 +96,7 @@ void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& na
   } catch (const std::exception&) {
     return;
   }
+  const JumpTargets targets(text.lines);
   // The header's continuation lines hold parameters, never line numbers.
   bool continuation = isContinued(text.lines.front());
   for (qsizetype i = 1; i < text.unnumberStop; ++i) {
@@ -110,7 +105,7 @@ void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& na
     m_context.setLine(line);
     try {
       QString& code = text.lines[size_t(i)];
-      if (UnnumberLine(code, continuation)) module.ReplaceLine(line, code);
+      if (UnnumberLine(code, continuation, targets)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
       m_context.lineSkipped(failure, u"UnnumberLine", module, line);
     }
@@ -118,18 +113,19 @@ void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& na
 }
 
 void NumberingWalk::numberText(ProcedureText& text, bool add) const {
+  const JumpTargets targets(text.lines);
   if (add) {
     qint32 number = numberBeforeFirst();
     bool continuation = false;
     for (qsizetype i = text.first; i < text.stop; ++i) {
       m_context.setLine(text.moduleLine(i));  // where an overflow is reported
-      NumberLine(text.lines[size_t(i)], number, continuation, m_interval);
+      NumberLine(text.lines[size_t(i)], number, continuation, m_interval, targets);
     }
     return;
   }
   bool continuation = isContinued(text.lines.front());
   for (qsizetype i = 1; i < text.unnumberStop; ++i)
-    UnnumberLine(text.lines[size_t(i)], continuation);
+    UnnumberLine(text.lines[size_t(i)], continuation, targets);
 }
 
 }  // namespace transform

@@ -24,15 +24,11 @@ void NumIndentWalk::NumIndentProject(const ide::Ref<ide::VBProject>& project) {
 void NumIndentWalk::NumIndentModule(const ide::Ref<ide::CodeModule>& module) {
   m_context.guard(u"NumIndentModule", 0, module.get(), [&] {
     if (!module) ide::raise(ide::err::ObjectVariableNotSet);
-    auto members = module->Members();
-    const int count = members->Count();
-    for (int i = 1; i <= count; ++i) {
-      if (m_context.yieldAndCheck()) return;
-      // A failing member is reported and the walk goes on with the next one.
-      m_context.guard(u"NumIndentModule", 0, module.get(),
-                      [&] { memberProcedures(module, members->Item(i)); });
-    }
-    if (m_context.yieldAndCheck()) return;
+    // A failing member is reported and the walk goes on with the next one.
+    const bool walked = forEachMember(
+        m_context, *module, [&](const ide::Ref<ide::Member>& member) { memberProcedures(module, member); },
+        u"NumIndentModule");
+    if (!walked || m_context.yieldAndCheck()) return;
     m_indentation.IndentDeclarations(*module);
   });
 }
@@ -58,12 +54,8 @@ void NumIndentWalk::NumIndentCurrentProcedure(ide::VBE& vbe, qint32 totalUnits) 
 
 void NumIndentWalk::memberProcedures(const ide::Ref<ide::CodeModule>& module,
                                      const ide::Ref<ide::Member>& member) {
-  const ide::MemberType type = member->Type();
-  if (type != ide::MemberType::Method && type != ide::MemberType::Property) return;
-  const QString name = member->Name().trimmed();
-  if (name.isEmpty()) return;
-  for (const ide::ProcKind kind : procedureKinds(*module, name, type, true))
-    numIndentProcedure(*module, name, kind);
+  forEachProcedure(*module, *member, true,
+                   [&](const QString& name, ide::ProcKind kind) { numIndentProcedure(*module, name, kind); });
 }
 
 void NumIndentWalk::numIndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {

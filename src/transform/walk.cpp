@@ -179,20 +179,6 @@ ProcedureRef currentProcedure(ide::VBE& vbe) {
   return procedure;
 }
 
-std::vector<ide::ProcKind> procedureKinds(ide::CodeModule& module, const QString& name, ide::MemberType type,
-                                          bool skipDeclares) {
-  switch (type) {
-    case ide::MemberType::Property:
-      return {ide::ProcKind::Get, ide::ProcKind::Let, ide::ProcKind::Set};
-    case ide::MemberType::Method:
-      if (skipDeclares && module.ProcStartLine(name, ide::ProcKind::Proc) <= module.CountOfDeclarationLines())
-        return {};
-      return {ide::ProcKind::Proc};
-    default:
-      return {};
-  }
-}
-
 void forEachCodeModule(WalkContext& context, ide::VBProject& project,
                        const std::function<void(const ide::Ref<ide::CodeModule>&)>& visit) {
   auto components = project.VBComponents();
@@ -209,6 +195,36 @@ void forEachCodeModule(WalkContext& context, ide::VBProject& project,
     }
     if (module) visit(module);
   }
+}
+
+bool forEachMember(WalkContext& context, ide::CodeModule& module,
+                   const std::function<void(const ide::Ref<ide::Member>&)>& visit, QStringView guardEach) {
+  auto members = module.Members();
+  const int count = members->Count();
+  for (int i = 1; i <= count; ++i) {
+    if (context.yieldAndCheck()) return false;
+    if (guardEach.isEmpty())
+      visit(members->Item(i));
+    else
+      context.guard(guardEach, 0, &module, [&] { visit(members->Item(i)); });
+  }
+  return true;
+}
+
+void forEachProcedure(ide::CodeModule& module, ide::Member& member, bool skipDeclares,
+                      const std::function<void(const QString& name, ide::ProcKind kind)>& visit) {
+  const ide::MemberType type = member.Type();
+  if (!hasProcedures(type)) return;
+  const QString name = member.Name().trimmed();
+  if (name.isEmpty()) return;
+  if (type == ide::MemberType::Property) {
+    for (const ide::ProcKind kind : {ide::ProcKind::Get, ide::ProcKind::Let, ide::ProcKind::Set})
+      visit(name, kind);
+    return;
+  }
+  if (skipDeclares && module.ProcStartLine(name, ide::ProcKind::Proc) <= module.CountOfDeclarationLines())
+    return;
+  visit(name, ide::ProcKind::Proc);
 }
 
 ProcedureText readProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {

@@ -153,18 +153,31 @@ struct ProcedureRef {
 /// the procedure change.
 ProcedureRef currentProcedure(ide::VBE& vbe);
 
-/// The procedure kinds a walk visits for a member: a property's Get, Let and Set in this order (the
-/// procedure walks pass over the kinds it lacks), a method's one procedure. A method whose first line
-/// lies in the declarations is a Declare statement, not a procedure: with `skipDeclares` it gets none.
-/// Other members (variables, constants, events) get none.
-std::vector<ide::ProcKind> procedureKinds(ide::CodeModule& module, const QString& name, ide::MemberType type,
-                                          bool skipDeclares);
+/// Methods and properties: the members that have procedures.
+inline bool hasProcedures(ide::MemberType type) {
+  return type == ide::MemberType::Method || type == ide::MemberType::Property;
+}
 
 /// Calls `visit` with the code module of every component of `project` that has one, yielding before
 /// each component and ending on cancel. Related documents are passed over, and so are components that
 /// fail to answer.
 void forEachCodeModule(WalkContext& context, ide::VBProject& project,
                        const std::function<void(const ide::Ref<ide::CodeModule>&)>& visit);
+
+/// Calls `visit` with every member of `module`, yielding before each; returns false when the walk must
+/// end (cancelled, or stopped by a failure). With `guardEach`, each member (fetching it included) runs
+/// under that walk's guard, so that a failing member is reported and the next one is walked.
+bool forEachMember(WalkContext& context, ide::CodeModule& module,
+                   const std::function<void(const ide::Ref<ide::Member>&)>& visit,
+                   QStringView guardEach = {});
+
+/// Calls `visit` with the name and kind of each procedure a walk visits for `member`: a property's Get,
+/// Let and Set in this order (the procedure walks pass over the kinds it lacks), a method's one procedure.
+/// A method whose first line lies in the declarations is a Declare statement, not a procedure: with
+/// `skipDeclares` it gets none. Other members (variables, constants, events) and members without a name
+/// get none.
+void forEachProcedure(ide::CodeModule& module, ide::Member& member, bool skipDeclares,
+                      const std::function<void(const QString& name, ide::ProcKind kind)>& visit);
 
 /// The lines of one procedure, read once: from its header line to the end of its extent (the last
 /// procedure's extent runs to the end of the module, comments after its End line included).

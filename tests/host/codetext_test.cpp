@@ -219,6 +219,55 @@ TEST(ModulesWithoutProcedures, StrayEndLinesCloseNothing) {
   EXPECT_EQ(text.procCountLines(u"B", ide::ProcKind::Proc), 3);
 }
 
+// Members of Type and Enum blocks and variables may carry keyword names in any letter case: only a name
+// after Sub, Function or Property Get/Let/Set starts a procedure, and a block's lines up to its End are its
+// members whatever they look like. Each row: a module, its procedures (name@header line), its
+// declarations count and its members.
+TEST(ProcedureExtents, KeywordLikeNamesStartNoProcedure) {
+  const struct {
+    const char16_t* module;
+    const char* procedures;
+    int declarationLines;
+    const char* members;
+  } cases[] = {
+      {uR"(Option Explicit
+Private Type QSStack ' pilha da ordenação
+    sUB As Long
+    FUNCTION(1 To 2) As Integer
+    property As String
+    Type As Byte
+    Sub Fantasma() ' parece cabeçalho
+End Type
+Public Enum eTipo
+    Sub = 1
+    function
+    End Sub
+End Enum
+Private sUB As Long, Function(3) As Long
+Public Sub Ordena(v() As Long)
+    Dim SUB As QSStack, Property As Long
+End Sub
+Private Property Get Topo() As Long
+End Property)",
+       "Ordena@15 Topo@18", 14, "sUB Function Ordena Topo"},
+      // A block being typed, without its End line, cannot hide the procedures below it.
+      {u"Private Type tNovo\n    Sub As Long\nSub Main()\nEnd Sub", "Main@3", 2, "Main"},
+  };
+  for (const auto& c : cases) {
+    CodeText text;
+    loadLines(text, QString::fromUtf16(c.module).split(u'\n'));
+    QStringList procedures;
+    for (const ProcInfo& proc : text.procedures())
+      procedures << proc.name + u'@' + QString::number(proc.bodyLine);
+    QStringList members;
+    for (const MemberInfo& member : text.members())
+      members << member.name;
+    EXPECT_EQ(procedures.join(u' '), QLatin1StringView(c.procedures));
+    EXPECT_EQ(text.countOfDeclarationLines(), c.declarationLines);
+    EXPECT_EQ(members.join(u' '), QLatin1StringView(c.members));
+  }
+}
+
 // ---------------------------------------------------------------------------------------------------
 // Editing
 
@@ -344,8 +393,8 @@ void expectSameAnswers(CodeText& edited) {
 }
 
 TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
-  // Lines that make and unmake structure: headers (also continued ones), End lines, declarations,
-  // comments, blanks, continuation marks, and ordinary statements.
+  // Lines that make and unmake structure: headers (also continued ones), End lines, declarations, Type and
+  // Enum blocks, comments, blanks, continuation marks, and ordinary statements.
   const QStringList pool = {
       QStringLiteral("Public Sub Alfa()"),
       QStringLiteral("Private Function Beta( _"),
@@ -370,6 +419,9 @@ TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
       QStringLiteral("Event Aviso()"),
       QStringLiteral("Sub Delta(): x = 1"),
       QStringLiteral("Public WithEvents w As C"),
+      QStringLiteral("Enum E"),
+      QStringLiteral("End Enum"),
+      QStringLiteral("    sUB As Long"),
   };
   std::mt19937 random(20261206);
   auto pick = [&] { return pool[static_cast<int>(random() % static_cast<unsigned>(pool.size()))]; };

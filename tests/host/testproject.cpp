@@ -24,11 +24,15 @@ ExampleCopy::ExampleCopy() {
 }
 
 QMap<QString, QByteArray> ExampleCopy::snapshot() const {
+  return test::snapshot(m_dir.path());
+}
+
+QMap<QString, QByteArray> snapshot(const QString& directory) {
   QMap<QString, QByteArray> files;
-  QDirIterator it(m_dir.path(), QDir::Files, QDirIterator::Subdirectories);
+  QDirIterator it(directory, QDir::Files, QDirIterator::Subdirectories);
   while (it.hasNext()) {
     const QString file = it.next();
-    files.insert(QDir(m_dir.path()).relativeFilePath(file), readBytes(file));
+    files.insert(QDir(directory).relativeFilePath(file), readBytes(file));
   }
   return files;
 }

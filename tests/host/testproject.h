@@ -30,6 +30,9 @@ class ExampleCopy {
 /// class (line 4), cp1252, CRLF, and modMisto with LF, then lone CRs, and no final line end.
 QString writeMessyProject(const QString& dir);
 
+/// Every file below `directory` with its bytes, by relative path.
+QMap<QString, QByteArray> snapshot(const QString& directory);
+
 QByteArray readBytes(const QString& path);
 void writeBytes(const QString& path, const QByteArray& bytes);
 

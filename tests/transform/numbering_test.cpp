@@ -57,11 +57,12 @@ TEST(NumberLineSkips, CommentLinesAreUnchangedAndEndAContinuation) {
     EXPECT_FALSE(n.changed) << text.toStdString();
     EXPECT_EQ(n.line, text);
     EXPECT_EQ(n.number, 9995);
-    EXPECT_FALSE(n.continuation);
+    // Unless the comment itself goes on over the next line.
+    EXPECT_EQ(n.continuation, text.endsWith(u'_'));
   }
 }
 
-TEST(NumberLineSkips, DeclarationsDirectivesAndCaseLinesGetNoNumber) {
+TEST(NumberLineSkips, DeclarationsDirectivesCaseLinesAndProcedureEndsGetNoNumber) {
   for (const QString& text : {
            QStringLiteral("Private Const A = 1"),
            QStringLiteral("    Public X As Long"),
@@ -74,6 +75,9 @@ TEST(NumberLineSkips, DeclarationsDirectivesAndCaseLinesGetNoNumber) {
            QStringLiteral("Property Get Nome() As String"),
            QStringLiteral("#If DEBUG Then"),
            QStringLiteral("\t#End If"),
+           QStringLiteral("End Sub"),
+           QStringLiteral("End Function"),
+           QStringLiteral("End Property"),
        }) {
     const Numbered n = numberOne(text);
     EXPECT_FALSE(n.changed) << text.toStdString();
@@ -90,16 +94,6 @@ TEST(NumberLineSkips, ContinuedDeclarationOrCaseMarksTheNextLineAsContinuation) 
   n = numberOne(QStringLiteral("        Case 1, 2, _"));
   EXPECT_FALSE(n.changed);
   EXPECT_TRUE(n.continuation);
-}
-
-TEST(NumberLineSkips, ProcedureEndsAreUnchanged) {
-  for (const QString& text :
-       {QStringLiteral("End Sub"), QStringLiteral("End Function"), QStringLiteral("End Property")}) {
-    const Numbered n = numberOne(text);
-    EXPECT_FALSE(n.changed);
-    EXPECT_EQ(n.line, text);
-    EXPECT_EQ(n.number, 9995);
-  }
 }
 
 TEST(NumberLineSkips, KeywordsAreCaseSensitive) {
@@ -140,12 +134,15 @@ TEST(NumberLineContinuation, BlankOrCommentLineEndsTheContinuation) {
       QStringLiteral("z = 3 + _"),
       QStringLiteral("\t' nota"),
       QStringLiteral("w = 4"),
+      QStringLiteral("' nota longa _"),
+      QStringLiteral("    que continua"),
       QStringLiteral("End Sub"),
   });
   const QStringList expected = {
       QStringLiteral("Sub A()"),     QStringLiteral("10000 x = 1 + _"), QString(),
       QStringLiteral("10005 y = 2"), QStringLiteral("10010 z = 3 + _"), QStringLiteral("\t' nota"),
-      QStringLiteral("10015 w = 4"), QStringLiteral("End Sub"),
+      QStringLiteral("10015 w = 4"), QStringLiteral("' nota longa _"),  QStringLiteral("    que continua"),
+      QStringLiteral("End Sub"),
   };
   EXPECT_EQ(walked, expected);
 }
@@ -181,22 +178,28 @@ TEST(NumberLineRules, EachNumberedLineAddsTheInterval) {
   EXPECT_EQ(number, 10010);
 }
 
-TEST(NumberLineRules, ExistingNumberFollowedBySpaceIsReplaced) {
-  EXPECT_EQ(numberOne(QStringLiteral("10 x = 1")).line, QStringLiteral("10000  x = 1"));
-  EXPECT_EQ(numberOne(QStringLiteral("-5 x = 1")).line, QStringLiteral("10000  x = 1"));
-}
-
-TEST(NumberLineRules, ExistingNumberAfterIndentationKeepsTheIndentationAfterTheNewNumber) {
-  // indent "  ", then the text from the blank after the old number on.
-  EXPECT_EQ(numberOne(QStringLiteral("  20 x = 1")).line, QStringLiteral("10000    x = 1"));
-}
-
-TEST(NumberLineRules, NumericLabelWithColonBecomesALineNumber) {
-  const Numbered n = numberOne(QStringLiteral("10: x = 1"));
-  EXPECT_TRUE(n.changed);
-  EXPECT_EQ(n.line, QStringLiteral("10000  x = 1"));
-  EXPECT_EQ(n.number, 10000);
-  EXPECT_EQ(numberOne(QStringLiteral("  10: x = 1")).line, QStringLiteral("10000    x = 1"));
+TEST(NumberLineRules, AnOldNumberGivesWayToTheNewOneWithItsSeparator) {
+  // The new number takes the old one's place and its blank (or colon and blank), the indentation before
+  // it goes after the new number, and numbering the result again changes nothing.
+  const std::pair<const char16_t*, const char16_t*> rows[] = {
+      {u"10 x = 1", u"10000 x = 1"},
+      {u"-5 x = 1", u"10000 x = 1"},
+      {u"  20 x = 1", u"10000   x = 1"},
+      {u"10: x = 1", u"10000 x = 1"},
+      {u"  10: x = 1", u"10000   x = 1"},
+      {u"10:x = 1", u"10000 x = 1"},
+      {u"10\tx = 1", u"10000 x = 1"},
+      {u"\t10 x = 1", u"10000 \tx = 1"},
+      {u"10  Next", u"10000  Next"},
+      {u"10 MsgBox \"a:b\"", u"10000 MsgBox \"a:b\""},
+      {u"10000      Loop", u"10000      Loop"},
+  };
+  for (const auto& [text, expected] : rows) {
+    const Numbered once = numberOne(QString::fromUtf16(text));
+    EXPECT_EQ(once.line, QString::fromUtf16(expected));
+    EXPECT_EQ(once.number, 10000);
+    EXPECT_EQ(numberOne(once.line).line, once.line);
+  }
 }
 
 TEST(NumberLineRules, NumberInFrontOfACommentIsDroppedAndTakesNoNumber) {
@@ -229,7 +232,6 @@ TEST(NumberLineRules, TextEndingInPointOrCommaIsNotANumber) {
 TEST(NumberLineRules, ColonsAndQuotesInsideCodeAreNotLabelsOrComments) {
   EXPECT_EQ(numberOne(QStringLiteral("x = a: y = b")).line, QStringLiteral("10000 x = a: y = b"));
   EXPECT_EQ(numberOne(QStringLiteral("MsgBox \"it's\"")).line, QStringLiteral("10000 MsgBox \"it's\""));
-  EXPECT_EQ(numberOne(QStringLiteral("10 MsgBox \"a:b\"")).line, QStringLiteral("10000  MsgBox \"a:b\""));
 }
 
 TEST(NumberLineRules, NegativeNumbersAreWrittenWithAMinus) {
@@ -343,11 +345,6 @@ TEST(NumberLineTabs, LeadingTabsAreKeptExactly) {
   EXPECT_EQ(numberOne(QStringLiteral(" \tx = 1\t")).line, QStringLiteral("10000  \tx = 1\t"));
 }
 
-TEST(NumberLineTabs, TabAfterAnOldNumberSeparatesIt) {
-  EXPECT_EQ(numberOne(QStringLiteral("10\tx = 1")).line, QStringLiteral("10000 \tx = 1"));
-  EXPECT_EQ(numberOne(QStringLiteral("\t10 x = 1")).line, QStringLiteral("10000 \t x = 1"));
-}
-
 TEST(NumberLineTabs, TrailingTabDoesNotHideTheContinuationMark) {
   const Numbered n = numberOne(QStringLiteral("x = 1 + _\t"));
   EXPECT_TRUE(n.continuation);
@@ -355,38 +352,38 @@ TEST(NumberLineTabs, TrailingTabDoesNotHideTheContinuationMark) {
 
 // --- Removing numbers ---
 
-TEST(UnnumberLineRules, NumberAndOneSpaceAreRemovedAndTheRestKept) {
-  EXPECT_EQ(unnumbered(QStringLiteral("10000 x = 1"), true), QStringLiteral("x = 1"));
-  EXPECT_EQ(unnumbered(QStringLiteral("10000     x = 1"), true), QStringLiteral("    x = 1"));
-  EXPECT_EQ(unnumbered(QStringLiteral("10000  Else"), true), QStringLiteral(" Else"));
-  EXPECT_EQ(unnumbered(QStringLiteral("-5 x"), true), QStringLiteral("x"));
-  EXPECT_EQ(unnumbered(QStringLiteral("10000 ' nota"), true), QStringLiteral("' nota"));
-}
-
-TEST(UnnumberLineRules, NumberColonAndSpaceAreRemoved) {
-  EXPECT_EQ(unnumbered(QStringLiteral("10000: x = 1"), true), QStringLiteral("x = 1"));
-  EXPECT_EQ(unnumbered(QStringLiteral("  10:   x = 1"), true), QStringLiteral("    x = 1"));
-  EXPECT_EQ(unnumbered(QStringLiteral("10000: "), true), QString());
-}
-
-TEST(UnnumberLineRules, LineWhoseFirstWordIsNotANumberIsUnchanged) {
-  for (const QString& text : {QStringLiteral("x = 1"), QStringLiteral("    Else"),
-                              QStringLiteral("Erro: x = 1"), QStringLiteral("10000"), QStringLiteral("10. x"),
-                              QStringLiteral("10, x"), QStringLiteral("' 10 x")}) {
-    EXPECT_EQ(unnumbered(text, false), text);
+TEST(UnnumberLineRules, TheNumberAndItsSeparatorGoTheRestStays) {
+  // A number and one blank (two before a one-word line, as numbering writes them), or a number, colon and
+  // blank, go; leading blanks and what followed stay. Lines whose first word is no number stay as they are.
+  const std::pair<const char16_t*, const char16_t*> rows[] = {
+      {u"10000 x = 1", u"x = 1"},
+      {u"10000     x = 1", u"    x = 1"},
+      {u"10000  Else", u"Else"},
+      {u"10000  \t  Loop  ", u"\t  Loop  "},
+      {u"10000  x = 1", u" x = 1"},
+      {u"-5 x", u"x"},
+      {u"10000 ' nota", u"' nota"},
+      {u"10000: x = 1", u"x = 1"},
+      {u"  10:   x = 1", u"    x = 1"},
+      {u"10000: ", u""},
+      {u"\t10000 x", u"\tx"},
+      {u"10000\tx", u"x"},
+      {u"10000 \t\tx", u"\t\tx"},
+      {u"x = 1", nullptr},
+      {u"    Else", nullptr},
+      {u"Erro: x = 1", nullptr},
+      {u"10000", nullptr},
+      {u"10. x", nullptr},
+      {u"10, x", nullptr},
+      {u"' 10 x", nullptr},
+      {u"", nullptr},
+      {u"   ", nullptr},
+      {u"\t", nullptr},
+  };
+  for (const auto& [text, expected] : rows) {
+    const QString line = QString::fromUtf16(text);
+    EXPECT_EQ(unnumbered(line, expected != nullptr), expected ? QString::fromUtf16(expected) : line);
   }
-}
-
-TEST(UnnumberLineRules, BlankLinesAreUnchanged) {
-  for (const QString& text : {QString(), QStringLiteral("   "), QStringLiteral("\t")}) {
-    EXPECT_EQ(unnumbered(text, false), text);
-  }
-}
-
-TEST(UnnumberLineRules, TabsCountAsBlanks) {
-  EXPECT_EQ(unnumbered(QStringLiteral("\t10000 x"), true), QStringLiteral("\tx"));
-  EXPECT_EQ(unnumbered(QStringLiteral("10000\tx"), true), QStringLiteral("x"));
-  EXPECT_EQ(unnumbered(QStringLiteral("10000 \t\tx"), true), QStringLiteral("\t\tx"));
 }
 
 TEST(UnnumberLineContinuation, ContinuationLinesKeepTheirLeadingNumber) {
@@ -465,12 +462,56 @@ TEST(NumberProcedureWalk, RenumberingReplacesOldNumbersAndRestartsPerProcedure) 
   const QStringList first = numberProcedure({QStringLiteral("Sub A()"), QStringLiteral("10 x = 1"),
                                              QStringLiteral("20: y = 2"), QStringLiteral("End Sub")},
                                             100, 10);
-  const QStringList expected = {QStringLiteral("Sub A()"), QStringLiteral("100  x = 1"),
-                                QStringLiteral("110  y = 2"), QStringLiteral("End Sub")};
+  const QStringList expected = {QStringLiteral("Sub A()"), QStringLiteral("100 x = 1"),
+                                QStringLiteral("110 y = 2"), QStringLiteral("End Sub")};
   EXPECT_EQ(first, expected);
   const QStringList second = numberProcedure(
       {QStringLiteral("Sub B()"), QStringLiteral("z = 3"), QStringLiteral("End Sub")}, 100, 10);
   EXPECT_EQ(second[1], QStringLiteral("100 z = 3"));
+}
+
+TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
+  // Each row: a line and what numbering makes of it. The targets of GoTo, GoSub, Resume, On ... GoTo lists
+  // (also continued), and a number after Then or Else stay as they are and take no number; jumps inside
+  // strings, comments and Rem, On Error GoTo 0 and Resume 0 protect nothing.
+  const std::pair<const char16_t*, const char16_t*> rows[] = {
+      {u"Private Sub Ordena(v() As Long)", nullptr},
+      {u"    Dim i As Long, u As Long", u"10000     Dim i As Long, u As Long"},
+      {u"    On Error GoTo 100", u"10005     On Error GoTo 100"},
+      {u"    On k GoSub 10, 020, 30 ' menu", u"10010     On k GoSub 10, 020, 30 ' menu"},
+      {u"    For i = 1 To u", u"10015     For i = 1 To u"},
+      {u"        If v(i) < u Then goto 1", u"10020         If v(i) < u Then goto 1"},
+      {u"        If v(i) = 0 Then 20 Else 30", u"10025         If v(i) = 0 Then 20 Else 30"},
+      {u"        Debug.Print \"GoTo 50\": Resume 40 ' GoTo 60", nullptr},
+      {u"        Rem Resume 70", u"10035         Rem Resume 70"},
+      {u"        On Error GoTo 0: Resume 0", u"10040         On Error GoTo 0: Resume 0"},
+      {u"        On k GoTo 1, _", u"10045         On k GoTo 1, _"},
+      {u"            110", nullptr},
+      {u"1       Next i", nullptr},
+      {u"10      s = \"índice\"", nullptr},
+      {u"20: x = 2", nullptr},
+      {u"30  ' fim", nullptr},
+      {u"40", nullptr},
+      {u"50      y = 3", u"10050      y = 3"},
+      {u"0       Exit Sub", u"10055       Exit Sub"},
+      {u"110", nullptr},
+      {u"100     Resume Next", nullptr},
+      {u"End Sub", nullptr},
+  };
+  QStringList code;
+  QStringList expected;
+  for (const auto& [line, numbered] : rows) {
+    code << QString::fromUtf16(line);
+    expected << QString::fromUtf16(numbered ? numbered : line);
+  }
+  expected[7] = QStringLiteral("10030 ") + code[7];
+  const QStringList numbered = numberProcedure(code);
+  EXPECT_EQ(numbered, expected);
+  EXPECT_EQ(numberProcedure(numbered), numbered);
+  // Removing numbers leaves the targets too: the code comes back as removing them from it gives.
+  EXPECT_EQ(unnumberProcedure(numbered), unnumberProcedure(code));
+  EXPECT_EQ(unnumberProcedure(code)[12], code[12]);
+  EXPECT_EQ(unnumberProcedure(code)[17], QStringLiteral("     y = 3"));
 }
 
 TEST(NumberProcedureWalk, RemovingNumbersRestoresTheCode) {

@@ -32,18 +32,20 @@ inline ProcedureBounds procedureBounds(const QStringList& lines) {
 
 inline QStringList numberProcedure(QStringList lines, qint32 start = 10000, qint32 interval = 5) {
   const ProcedureBounds bounds = procedureBounds(lines);
+  const JumpTargets targets(lines);
   qint32 number = start - interval;
   bool continuation = false;
   for (qsizetype i = bounds.first; i < bounds.last; ++i)
-    NumberLine(lines[i], number, continuation, interval);
+    NumberLine(lines[i], number, continuation, interval, targets);
   return lines;
 }
 
 // Removal has no header skipping: it runs from the line after the header line to the line before the End.
 inline QStringList unnumberProcedure(QStringList lines) {
+  const JumpTargets targets(lines);
   bool continuation = isContinued(lines.front());
   for (qsizetype i = 1; i + 1 < lines.size(); ++i)
-    UnnumberLine(lines[i], continuation);
+    UnnumberLine(lines[i], continuation, targets);
   return lines;
 }
 

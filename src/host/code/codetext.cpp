@@ -8,6 +8,7 @@
 #include <QSet>
 
 #include <algorithm>
+#include <limits>
 
 namespace host {
 namespace {
@@ -81,6 +82,8 @@ struct CodeText::Index {
   std::vector<MemberInfo> members;
   /// Declare statements: listed as methods and answered by the procedure queries.
   std::vector<ProcInfo> declares;
+  /// Type and Enum blocks in line order: first and End line (INT_MAX for a block without one).
+  std::vector<std::pair<int, int>> blocks;
 };
 
 CodeText::CodeText() : m_index(std::make_unique<Index>()) {}
@@ -232,10 +235,31 @@ void CodeText::rebuildIndex() {
   index.membersValid = false;
   index.members.clear();
   index.declares.clear();
+  index.blocks.clear();
+
+  // Every line of a Type or Enum block up to its End line is a member of the block, whatever it looks
+  // like. A block without an End line (one being typed) takes in the declarations below it, but not the
+  // procedures: the index reads on past its first line.
+  constexpr size_t kNone = static_cast<size_t>(-1);
+  std::vector<size_t> nextTypeEnd(m_markers.size() + 1, kNone);
+  std::vector<size_t> nextEnumEnd(m_markers.size() + 1, kNone);
+  for (size_t k = m_markers.size(); k-- > 0;) {
+    const LineClass cls = m_lines[static_cast<size_t>(m_markers[k] - 1)].cls;
+    nextTypeEnd[k] = cls == LineClass::TypeEnd ? k : nextTypeEnd[k + 1];
+    nextEnumEnd[k] = cls == LineClass::EnumEnd ? k : nextEnumEnd[k + 1];
+  }
 
   ProcInfo* open = nullptr;
-  for (const int marker : m_markers) {
+  for (size_t k = 0; k < m_markers.size(); ++k) {
+    const int marker = m_markers[k];
     const Line& line = m_lines[static_cast<size_t>(marker - 1)];
+    if (line.cls == LineClass::TypeBegin || line.cls == LineClass::EnumBegin) {
+      const size_t end = (line.cls == LineClass::TypeBegin ? nextTypeEnd : nextEnumEnd)[k + 1];
+      index.blocks.emplace_back(marker, end == kNone ? std::numeric_limits<int>::max() : m_markers[end]);
+      if (end != kNone) k = end;
+      continue;
+    }
+    if (line.cls == LineClass::TypeEnd || line.cls == LineClass::EnumEnd) continue;  // one without a block
     if (line.cls == LineClass::ProcHeader) {
       const int headerEnd = statementEnd(marker);
       auto header = parseProcHeader(statementText(marker, headerEnd));
@@ -309,16 +333,11 @@ namespace {
 }
 }  // namespace
 
-bool CodeText::isDeclare(const ProcInfo* proc) const {
-  const auto& procs = m_index->procs;
-  return proc < procs.data() || proc >= procs.data() + procs.size();
-}
-
 int CodeText::procStartLine(QStringView name, ide::ProcKind kind) {
   const ProcInfo* proc = findProc(name, kind);
   if (!proc) raiseNotDefined();
   // A Declare statement starts where it stands: it sits in the declarations, not between procedures.
-  if (isDeclare(proc)) return proc->bodyLine;
+  if (proc->isDeclare) return proc->bodyLine;
   const Index& idx = *m_index;
   const size_t i = static_cast<size_t>(proc - idx.procs.data());
   return i == 0 ? idx.declarationLines + 1 : idx.procs[i - 1].endLine + 1;
@@ -333,7 +352,7 @@ int CodeText::procBodyLine(QStringView name, ide::ProcKind kind) {
 int CodeText::procCountLines(QStringView name, ide::ProcKind kind) {
   const ProcInfo* proc = findProc(name, kind);
   if (!proc) raiseNotDefined();
-  if (isDeclare(proc)) return proc->headerEnd - proc->bodyLine + 1;
+  if (proc->isDeclare) return proc->headerEnd - proc->bodyLine + 1;
   const Index& idx = *m_index;
   const size_t i = static_cast<size_t>(proc - idx.procs.data());
   const int start = procStartLine(name, kind);
@@ -368,23 +387,17 @@ const std::vector<MemberInfo>& CodeText::members() {
   };
 
   const int declarationsEnd = m_firstHeaderLine > 0 ? m_firstHeaderLine - 1 : countOfLines();
-  int blockDepth = 0;  // inside Type or Enum: the lines are fields, not members
+  auto block = idx.blocks.cbegin();  // the lines of a Type or Enum block are its fields, not members
   for (int n = 1; n <= declarationsEnd; ++n) {
+    while (block != idx.blocks.cend() && block->second < n)
+      ++block;
+    if (block != idx.blocks.cend() && block->first <= n) continue;
     const LineClass cls = m_lines[static_cast<size_t>(n - 1)].cls;
     switch (cls) {
-      case LineClass::TypeBegin:
-      case LineClass::EnumBegin:
-        ++blockDepth;
-        break;
-      case LineClass::TypeEnd:
-      case LineClass::EnumEnd:
-        blockDepth = std::max(0, blockDepth - 1);
-        break;
       case LineClass::Variable:
       case LineClass::Const:
       case LineClass::Event:
       case LineClass::Declare: {
-        if (blockDepth > 0) break;
         const int last = statementEnd(n);
         const auto decl = parseDeclaration(statementText(n, last));
         if (!decl) break;
@@ -394,6 +407,7 @@ const std::vector<MemberInfo>& CodeText::members() {
             ProcInfo declare;
             declare.name = name;
             declare.scope = decl->scope;
+            declare.isDeclare = true;
             declare.bodyLine = n;
             declare.headerEnd = last;
             declare.endLine = last;
@@ -587,6 +601,7 @@ bool CodeText::shiftIndex(int firstLine, int removed, int inserted) {
     if (m_lines[static_cast<size_t>(proc.endLine - 1)].cls == LineClass::ProcEnd) continue;
     proc.endLine = i + 1 < index.procs.size() ? index.procs[i + 1].bodyLine - 1 : countOfLines();
   }
+  // The Type and Enum blocks stay: they matter only in the declarations, above the edit.
   index.membersValid = false;  // their lines moved
   return true;
 }

@@ -40,6 +40,9 @@ struct ProcInfo {
   bool isFunction = false;
   ide::Scope scope = ide::Scope::Public;
   bool isStatic = false;
+  /// A Declare statement: listed as a method and answered by the procedure queries, but it stands in the
+  /// declarations and is not one of procedures().
+  bool isDeclare = false;
   int bodyLine = 0;   // the header's first line
   int headerEnd = 0;  // the header's last physical line
   int endLine = 0;    // the End line (for an unterminated header: the line above the next header)
@@ -140,12 +143,12 @@ class CodeText {
   int memberAnchorLine(QStringView member);
   std::vector<std::pair<int, int>> memberLineRanges(QStringView member);
   SourceLine* findMemberAttribute(QStringView member, QStringView attribute, Line** owner);
-  bool isDeclare(const ProcInfo* proc) const;
   LineEnd newLineEnd() const;
   void checkLineNumber(int line, int last) const;
 
   std::vector<Line> m_lines;
-  /// Lines holding a procedure header or End statement, ascending: the structure's skeleton.
+  /// Lines holding a procedure header or End statement, or the first or End line of a Type or Enum
+  /// block, ascending: the structure's skeleton.
   std::vector<int> m_markers;
   std::unique_ptr<Index> m_index;  // derived from the markers; rebuilt lazily after structural edits
   bool m_indexValid = false;

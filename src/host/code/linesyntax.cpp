@@ -68,6 +68,12 @@ QStringView readModifiers(Scanner& scanner, Modifiers& mods) {
   }
 }
 
+/// A statement that declares something names it right after its keyword: "Sub As Long" or "Type = 2" is a
+/// Type or Enum member whose name only looks like a keyword. A lone "_" carries the name to the next line.
+bool namesSomething(QStringView word) {
+  return !word.isEmpty() && !is(word, QLatin1StringView("As"));
+}
+
 bool isProcKeyword(QStringView w) {
   return is(w, QLatin1StringView("Sub")) || is(w, QLatin1StringView("Function")) ||
          is(w, QLatin1StringView("Property"));
@@ -154,19 +160,27 @@ LineClass classifyStatement(QStringView line) {
       return LineClass::Code;
     }
   }
-  if (is(w, QLatin1StringView("Sub")) || is(w, QLatin1StringView("Function"))) return LineClass::ProcHeader;
+  // A keyword begins a procedure or a block only when the statement goes on with a name: the letter case
+  // of the keyword decides nothing.
+  const LineClass notDeclaring = mods.any() ? LineClass::Variable : LineClass::Code;
+  if (is(w, QLatin1StringView("Sub")) || is(w, QLatin1StringView("Function")))
+    return namesSomething(scanner.word()) ? LineClass::ProcHeader : notDeclaring;
   if (is(w, QLatin1StringView("Property"))) {
     const QStringView accessor = scanner.word();
     if (is(accessor, QLatin1StringView("Get")) || is(accessor, QLatin1StringView("Let")) ||
         is(accessor, QLatin1StringView("Set")))
-      return LineClass::ProcHeader;
-    return mods.any() ? LineClass::Variable : LineClass::Code;
+      return namesSomething(scanner.word()) ? LineClass::ProcHeader : notDeclaring;
+    return notDeclaring;
   }
   if (is(w, QLatin1StringView("Declare"))) return LineClass::Declare;
   if (is(w, QLatin1StringView("Event"))) return LineClass::Event;
   if (is(w, QLatin1StringView("Const"))) return LineClass::Const;
-  if (is(w, QLatin1StringView("Type")) && !mods.isDim && !mods.isStatic) return LineClass::TypeBegin;
-  if (is(w, QLatin1StringView("Enum")) && !mods.isDim && !mods.isStatic) return LineClass::EnumBegin;
+  if ((is(w, QLatin1StringView("Type")) || is(w, QLatin1StringView("Enum"))) && !mods.isDim &&
+      !mods.isStatic) {
+    const bool isType = is(w, QLatin1StringView("Type"));
+    if (namesSomething(scanner.word())) return isType ? LineClass::TypeBegin : LineClass::EnumBegin;
+    return notDeclaring;
+  }
   if (mods.any() && !w.isEmpty()) return LineClass::Variable;
   return LineClass::Code;
 }
@@ -217,7 +231,7 @@ std::optional<ProcHeader> parseProcHeader(QStringView statement) {
     return std::nullopt;
   }
   const QStringView name = scanner.word();
-  if (name.isEmpty()) return std::nullopt;
+  if (!namesSomething(name)) return std::nullopt;
   header.name = name.toString();
   header.scope = scopeOf(mods, ide::Scope::Public);
   header.isStatic = mods.isStatic;
@@ -259,13 +273,17 @@ std::optional<Declaration> parseDeclaration(QStringView statement) {
     }
     return decl.names.empty() ? std::nullopt : std::optional(decl);
   }
-  if (!mods.any() || isProcKeyword(w) || is(w, QLatin1StringView("Type")) || is(w, QLatin1StringView("Enum")))
+  if (!mods.any()) return std::nullopt;
+  const qsizetype firstDeclarator = scanner.lastWordStart();
+  // "Private Sub As Long" declares a variable named like a keyword; "Private Sub Main" is no variable.
+  if ((isProcKeyword(w) || is(w, QLatin1StringView("Type")) || is(w, QLatin1StringView("Enum"))) &&
+      namesSomething(scanner.word()))
     return std::nullopt;
 
   // A variable list: the word already read starts the first declarator.
   decl.type = ide::MemberType::Variable;
   decl.scope = scopeOf(mods, ide::Scope::Private);
-  for (const QStringView part : splitTopLevel(text.sliced(scanner.lastWordStart()))) {
+  for (const QStringView part : splitTopLevel(text.sliced(firstDeclarator))) {
     Scanner declarator(part);
     QStringView name = declarator.word();
     if (is(name, QLatin1StringView("WithEvents"))) name = declarator.word();

@@ -33,14 +33,28 @@ enum class LineClass : quint8 {
   EnumEnd,
 };
 
+/// The lines the module's structure is read from: procedure headers and ends, and the Type and Enum
+/// blocks whose members may look like them.
 inline bool isStructural(LineClass c) {
-  return c == LineClass::ProcHeader || c == LineClass::ProcEnd;
+  switch (c) {
+    case LineClass::ProcHeader:
+    case LineClass::ProcEnd:
+    case LineClass::TypeBegin:
+    case LineClass::TypeEnd:
+    case LineClass::EnumBegin:
+    case LineClass::EnumEnd:
+      return true;
+    default:
+      return false;
+  }
 }
 inline bool isBlankOrComment(LineClass c) {
   return c == LineClass::Blank || c == LineClass::Comment;
 }
 
-/// The class of a line that starts a statement (the line above does not continue onto it).
+/// The class of a line that starts a statement (the line above does not continue onto it), by the
+/// statement's shape: Sub, Function, Property Get/Let/Set, Type and Enum declare something only when a name
+/// follows them (never "As"), so "sUB As Long" or "Function = 2" in a Type or Enum is no header.
 LineClass classifyStatement(QStringView line);
 
 /// The line ends with the continuation mark: a blank and an underscore (trailing blanks ignored).
