@@ -3,16 +3,15 @@
 // IDE's error numbers with the path and the system's reason in the description.
 #include "host/files/fileio.h"
 
+#include "host/files/parallel.h"
 #include "ide/error.h"
 
 #include <QFile>
 #include <QFileInfo>
 
-#include <atomic>
 #include <cerrno>
 #include <cstring>
 #include <set>
-#include <thread>
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -145,20 +144,13 @@ void FileWriteBatch::addAll(const std::vector<std::pair<QString, QByteArray>>& f
   const mode_t newFileMode = static_cast<mode_t>(0666 & ~mask);
   std::vector<Pending> created(files.size());
   std::vector<int> errors(files.size(), 0);
-  {
-    std::atomic<size_t> next{0};
-    auto write = [&] {
-      for (size_t i = next++; i < files.size(); i = next++)
+  std::vector<std::exception_ptr> failures;
+  parallelFor(
+      files.size(),
+      [&](size_t i) {
         created[i] = createTemporary(files[i].first, files[i].second, newFileMode, errors[i]);
-    };
-    std::vector<std::thread> writers;
-    const size_t threads = std::min<size_t>(files.size(), std::max(1u, std::thread::hardware_concurrency()));
-    for (size_t t = 1; t < threads; ++t)
-      writers.emplace_back(write);
-    write();
-    for (std::thread& writer : writers)
-      writer.join();
-  }
+      },
+      failures);
   for (Pending& pending : created)
     if (!pending.temporary.isEmpty()) m_files.push_back(std::move(pending));
   for (size_t i = 0; i < files.size(); ++i) {
@@ -174,20 +166,13 @@ void FileWriteBatch::commit() {
   // of one commit per file, one after the other (for hundreds of files, the difference between a few
   // hundredths of a second and most of a second).
   std::vector<int> errors(m_files.size(), 0);
-  {
-    std::atomic<size_t> next{0};
-    auto flush = [&] {
-      for (size_t i = next++; i < m_files.size(); i = next++)
+  std::vector<std::exception_ptr> failures;
+  parallelFor(
+      m_files.size(),
+      [&](size_t i) {
         if (::fdatasync(m_files[i].descriptor) != 0) errors[i] = errno;
-    };
-    std::vector<std::thread> flushers;
-    const size_t threads = std::min<size_t>(m_files.size(), 16);
-    for (size_t t = 1; t < threads; ++t)
-      flushers.emplace_back(flush);
-    flush();
-    for (std::thread& flusher : flushers)
-      flusher.join();
-  }
+      },
+      failures, 16);
   for (size_t i = 0; i < m_files.size(); ++i) {
     if (errors[i] == 0) continue;
     const QString target = m_files[i].target;

@@ -4,10 +4,10 @@
 #include <cstdio>
 #include "host/files/ansi.h"
 #include "host/files/fileio.h"
+#include "host/files/parallel.h"
 #include "host/model/designer.h"
 #include "host/model/events.h"
 #include "host/model/objects.h"
-#include "host/model/parallel.h"
 #include "host/model/vbe.h"
 
 #include <QDir>

@@ -2,8 +2,8 @@
 // Projects: their project file, their components and what they write back.
 #include "host/files/fileio.h"
 #include "host/files/modulefile.h"
+#include "host/files/parallel.h"
 #include "host/model/objects.h"
-#include "host/model/parallel.h"
 #include "host/model/vbe.h"
 
 #include <QDir>
