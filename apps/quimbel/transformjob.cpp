@@ -345,6 +345,16 @@ int runTransform(const TransformOptions& options,
       components.push_back(module->component);
     host::addToBatch(batch, components);
     batch.commit();
+  } catch (const host::FilesChangedOnDisk& error) {
+    for (const QString& path : error.changed)
+      printError(QStringLiteral("%1: changed by another program since it was read").arg(path));
+    for (const QString& path : error.deleted)
+      printError(QStringLiteral("%1: deleted by another program since it was read").arg(path));
+    printError(QStringLiteral("nothing was written"));
+    return kOutputError;
+  } catch (const host::SaveHalfDone& error) {
+    printError(error.description());
+    return kPartlyWritten;
   } catch (const ide::Error& error) {
     printError(error.description());
     return kOutputError;
