@@ -532,21 +532,23 @@ int replace(Pending& file) {
   if (const int error = injected(FileStep::Replace, file.path)) return error;
   if (file.inPlace) {
     file.stamp.taken = now();
-    if (const int error = rewriteInPlace(file.target, file.bytes, &file.stamp)) {
-      // Part of it may be written.
-      file.replaced = true;
-      return error;
-    }
+    // Even a rewrite that fails may have written part of it: it is put back too.
     file.replaced = true;
-    return 0;
+    return rewriteInPlace(file.target, file.bytes, &file.stamp);
   }
+  file.stamp.taken = now();
   if (file.existed) {
-    // The old file stays reachable until the whole batch is in place; where the file system has no
-    // hard links, its content is kept instead.
+    // The old file stays reachable until the whole batch is in place: swapped with the new one, else
+    // under a second link, else (no hard links) its content is kept.
+    if (::renameat2(AT_FDCWD, file.temporary.constData(), AT_FDCWD, file.target.constData(),
+                    RENAME_EXCHANGE) == 0) {
+      file.backup = std::exchange(file.temporary, {});
+      file.replaced = true;
+      return 0;
+    }
     file.backup = linkHidden(file.target, file.target.constData());
     if (file.backup.isEmpty() && !readPath(file.target, file.oldBytes)) return errno;
   }
-  file.stamp.taken = now();
   if (::rename(file.temporary.constData(), file.target.constData()) != 0) {
     const int error = errno;
     if (!file.backup.isEmpty()) ::unlink(std::exchange(file.backup, {}).constData());
