@@ -266,16 +266,12 @@ bool IdeCommands::saveProjectAs(const std::shared_ptr<host::ProjectImpl>& projec
     if (path.isEmpty()) return false;
     if (QFileInfo(path).suffix().isEmpty()) path += QStringLiteral(".vbp");
   }
-  try {
-    QDir().mkpath(QFileInfo(path).absolutePath());
-    project->SaveAs(path);
-    m_window.showStatus(QStringLiteral("Saved %1").arg(QDir::toNativeSeparators(path)), 5000);
-    return true;
-  } catch (const ide::Error& error) {
-    m_window.reportError(
-        QStringLiteral("Cannot save project %1.\n\n%2").arg(project->Name(), error.description()));
+  QDir().mkpath(QFileInfo(path).absolutePath());
+  if (!runSave([&] { project->SaveAs(path); },
+               QStringLiteral("Cannot save project %1.").arg(project->Name())))
     return false;
-  }
+  m_window.showStatus(QStringLiteral("Saved %1").arg(QDir::toNativeSeparators(path)), 5000);
+  return true;
 }
 
 bool IdeCommands::saveAll() {
@@ -285,40 +281,61 @@ bool IdeCommands::saveAll() {
   // Flush what the editors still hold back, so that the files get the text the user sees.
   for (CodeWindow* window : m_window.windows().codeWindows())
     window->binding()->flush();
-  try {
-    vbe.saveAll();
-    m_window.showStatus(QStringLiteral("Saved"), 3000);
-    return true;
-  } catch (const ide::Error& error) {
-    m_window.reportError(QStringLiteral("Cannot save.\n\n%1\n\nThe files already on disk are unchanged.")
-                             .arg(error.description()));
+  if (!runSave([&] { vbe.saveAll(); }, QStringLiteral("Cannot save."),
+               QStringLiteral("The files already on disk are unchanged.")))
     return false;
+  m_window.showStatus(QStringLiteral("Saved"), 3000);
+  return true;
+}
+
+bool IdeCommands::runSave(const std::function<void()>& save, const QString& failure,
+                          const QString& nothingChanged) {
+  for (;;) {
+    try {
+      save();
+      return true;
+    } catch (const host::FilesChangedOnDisk& error) {
+      QStringList files;
+      for (const QString& path : error.changed)
+        files << QDir::toNativeSeparators(path);
+      for (const QString& path : error.deleted)
+        files << QDir::toNativeSeparators(path) + QStringLiteral(" (deleted)");
+      const int answer = m_window.ui().MsgBox(
+          QStringLiteral("These files were changed by another program since they were opened:\n\n%1\n\n"
+                         "Overwrite them with the text in the IDE?")
+              .arg(files.join(u'\n')),
+          ide::mb::YesNo | ide::mb::Exclamation, kTitle);
+      if (answer != ide::mb::Yes) return false;
+      m_window.vbe()->acceptFilesOnDisk(error.changed + error.deleted);
+    } catch (const host::SaveHalfDone& error) {
+      // Some files hold the new text: the description says which.
+      m_window.reportError(failure + QStringLiteral("\n\n") + error.description());
+      return false;
+    } catch (const ide::Error& error) {
+      QString text = failure + QStringLiteral("\n\n") + error.description();
+      if (!nothingChanged.isEmpty()) text += QStringLiteral("\n\n") + nothingChanged;
+      m_window.reportError(text);
+      return false;
+    }
   }
 }
 
 bool IdeCommands::saveComponent(const std::shared_ptr<host::ComponentImpl>& component, bool askName) {
   if (!component->hasCode()) return true;
-  try {
-    if (askName || component->filePath().isEmpty()) {
-      const QString suggestion =
-          component->filePath().isEmpty()
-              ? QDir(component->project() && !component->project()->directory().isEmpty()
-                         ? component->project()->directory()
-                         : lastDirectory())
-                    .filePath(component->Name())
-              : component->filePath();
-      QString path =
-          askFileName(QStringLiteral("Save File As"), componentFilter(component->Type()), suggestion, true);
-      if (path.isEmpty()) return false;
-      component->SaveAs(path);
-    } else {
-      component->save();
-    }
-    return true;
-  } catch (const ide::Error& error) {
-    m_window.reportError(QStringLiteral("Cannot save %1.\n\n%2").arg(component->Name(), error.description()));
-    return false;
+  const QString failure = QStringLiteral("Cannot save %1.").arg(component->Name());
+  if (askName || component->filePath().isEmpty()) {
+    const QString suggestion = component->filePath().isEmpty()
+                                   ? QDir(component->project() && !component->project()->directory().isEmpty()
+                                              ? component->project()->directory()
+                                              : lastDirectory())
+                                         .filePath(component->Name())
+                                   : component->filePath();
+    const QString path =
+        askFileName(QStringLiteral("Save File As"), componentFilter(component->Type()), suggestion, true);
+    if (path.isEmpty()) return false;
+    return runSave([&] { component->SaveAs(path); }, failure);
   }
+  return runSave([&] { component->save(); }, failure);
 }
 
 bool IdeCommands::confirmClose(const std::vector<std::shared_ptr<host::ProjectImpl>>& projects) {
@@ -342,14 +359,12 @@ bool IdeCommands::confirmClose(const std::vector<std::shared_ptr<host::ProjectIm
     if (project->FileName().isEmpty() && !saveProjectAs(project)) return false;
   for (CodeWindow* window : m_window.windows().codeWindows())
     window->binding()->flush();
-  try {
-    for (const auto& project : projects)
-      project->save();
-    return true;
-  } catch (const ide::Error& error) {
-    m_window.reportError(QStringLiteral("Cannot save.\n\n%1").arg(error.description()));
-    return false;
-  }
+  return runSave(
+      [&] {
+        for (const auto& project : projects)
+          project->save();
+      },
+      QStringLiteral("Cannot save."));
 }
 
 bool IdeCommands::closeProject(const std::shared_ptr<host::ProjectImpl>& project) {

@@ -2,7 +2,8 @@
 // The IDE's own commands behind its built-in command-bar controls: files and projects (new, open, add,
 // remove, save, save as, close, with the usual questions about unsaved changes), the edit commands on the
 // focused editor, the views, the Add-In Manager. Failures are told in a message box that names what
-// failed; nothing on disk is lost (the model writes every file atomically).
+// failed; nothing on disk is lost (the model writes every file atomically, and asks before overwriting a
+// file another program changed).
 #pragma once
 
 #include "host/model/commandbars.h"
@@ -11,6 +12,7 @@
 #include <QObject>
 #include <QString>
 
+#include <functional>
 #include <memory>
 #include <vector>
 
@@ -47,6 +49,10 @@ class IdeCommands final : public QObject {
 
  private:
   QString askFileName(const QString& title, const QString& filter, const QString& suggestion, bool save);
+  /// Runs `save`; when files were changed by another program since they were read, asks whether to
+  /// overwrite them and saves again if so. A failure is shown under `failure`, followed by
+  /// `nothingChanged` when every file on disk is as it was. Returns whether it saved.
+  bool runSave(const std::function<void()>& save, const QString& failure, const QString& nothingChanged = {});
   void editCommand(host::BuiltinCommand command);
   void find();
   void showAddInManager();

@@ -18,11 +18,12 @@ namespace cli {
 /// Exit codes, documented in `quimbel --help` and the README.
 enum ExitCode : int {
   kSuccess = 0,
-  kWouldChange = 1,   // --check found something to change
-  kUsageError = 2,    // bad command line
-  kInputError = 3,    // a file could not be read or is not a valid VB6 file
-  kOutputError = 4,   // a file could not be written (nothing on disk was damaged), or standard output
-  kMissingFiles = 5,  // files a group or project lists are missing: each was named, the rest was done
+  kWouldChange = 1,    // --check found something to change
+  kUsageError = 2,     // bad command line
+  kInputError = 3,     // a file could not be read or is not a valid VB6 file
+  kOutputError = 4,    // a file could not be written (nothing on disk was damaged), or standard output
+  kMissingFiles = 5,   // files a group or project lists are missing: each was named, the rest was done
+  kPartlyWritten = 6,  // a save failed half way and could not be undone (the message lists the files)
 };
 
 /// Opens a group, project or module file given on the command line in `vbe`; module files given on their

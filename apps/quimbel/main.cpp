@@ -203,8 +203,10 @@ static int runTool(int argc, char** argv) {
       "last chosen in the numbering and indentation dialogs.\n\n"
       "Exit codes: 0 done, 1 --check found changes, 2 bad command line, 3 unreadable or invalid\n"
       "input, or code the command cannot rewrite (nothing is written then), 4 a file could not be\n"
-      "written (what was on disk is kept) or standard output failed, 5 files that a group or project\n"
-      "lists are missing (each is named; the rest was done)."};
+      "written, is read-only or was changed by another program since it was read (what was on disk is\n"
+      "kept) or standard output failed, 5 files that a group or project lists are missing (each is\n"
+      "named; the rest was done), 6 a save failed half way and could not be undone (the message names\n"
+      "the files)."};
   parser.require_subcommand(1);
   parser.set_version_flag("--version", "quimbel " QUIMBEL_VERSION, "Print the version and exit");
 

@@ -3,6 +3,7 @@
 
 #include "diff.h"
 #include "host/files/modulefile.h"
+#include "host/files/parallel.h"
 #include "host/files/sourcelines.h"
 #include "host/model/vbe.h"
 #include "terminalprogress.h"
@@ -16,7 +17,6 @@
 #include <memory>
 #include <mutex>
 #include <optional>
-#include <thread>
 #include <vector>
 
 namespace cli {
@@ -254,8 +254,7 @@ int runTransform(const TransformOptions& options,
   };
   std::mutex reportsMutex;
   std::vector<Report> reports;
-  const size_t workers =
-      std::max<size_t>(1, std::min<size_t>(units.size(), std::thread::hardware_concurrency()));
+  const size_t workers = host::threadsFor(units.size());
   // Every worker's bar counts its own steps; the first one shows the sum on the terminal.
   std::vector<std::unique_ptr<StepCounter>> counters;
   for (size_t w = 0; w < workers; ++w)
@@ -270,8 +269,8 @@ int runTransform(const TransformOptions& options,
   bar.setMaximum(std::max(1, std::min<qint32>(range, transform::ProgressScale::kMaxSteps)));
   bar.setValue(0);
   bar.setVisible(true);
-  std::atomic<size_t> nextUnit{0};
-  auto work = [&](size_t worker) {
+  host::WorkQueue queue(units.size());
+  host::runWorkers(workers, [&](size_t worker) {
     transform::WalkContext context(QStringLiteral("quimbel"), nullptr, counters[worker].get());
     size_t current = 0;
     const auto report = [&](const transform::WalkFailure& failure) {
@@ -282,7 +281,7 @@ int runTransform(const TransformOptions& options,
     context.onLineSkipped = report;
     const Walks walks = makeWalks(context);
     context.SetProgressRange(range);
-    for (current = nextUnit++; current < units.size(); current = nextUnit++) {
+    while (queue.take(current)) {
       if (context.stopped()) break;
       const Target& unit = units[current];
       if (unit.member)
@@ -290,15 +289,7 @@ int runTransform(const TransformOptions& options,
       else
         walks.module(unit.module);
     }
-  };
-  {
-    std::vector<std::thread> helpers;
-    for (size_t w = 1; w < workers; ++w)
-      helpers.emplace_back(work, w);
-    work(0);
-    for (std::thread& helper : helpers)
-      helper.join();
-  }
+  });
   bar.setVisible(false);
   // Reported in the order a walk of one module after the other would have met them.
   std::stable_sort(reports.begin(), reports.end(),
@@ -354,6 +345,16 @@ int runTransform(const TransformOptions& options,
       components.push_back(module->component);
     host::addToBatch(batch, components);
     batch.commit();
+  } catch (const host::FilesChangedOnDisk& error) {
+    for (const QString& path : error.changed)
+      printError(QStringLiteral("%1: changed by another program since it was read").arg(path));
+    for (const QString& path : error.deleted)
+      printError(QStringLiteral("%1: deleted by another program since it was read").arg(path));
+    printError(QStringLiteral("nothing was written"));
+    return kOutputError;
+  } catch (const host::SaveHalfDone& error) {
+    printError(error.description());
+    return kPartlyWritten;
   } catch (const ide::Error& error) {
     printError(error.description());
     return kOutputError;

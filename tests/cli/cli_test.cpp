@@ -377,16 +377,18 @@ TEST(Rewriting, NumberingTwiceChangesNothingAndRemovingTheNumbersGivesTheCodeBac
   }
 }
 
-TEST(Rewriting, AFileThatCannotBeWrittenExitsWithFour) {
-  if (::geteuid() == 0) GTEST_SKIP() << "file permissions do not bind root";
+TEST(Rewriting, AReadOnlyFileIsRefusedWithFourAndNothingIsWritten) {
   Workspace work;
   Tool tool;
-  QFile::setPermissions(work.dir.path(), QFile::ReadOwner | QFile::ExeOwner);
-  const Result result = tool.run({QStringLiteral("number"), work.file});
-  QFile::setPermissions(work.dir.path(), QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+  const QString other = work.dir.filePath(QStringLiteral("Outro.bas"));
+  writeBytes(other, QByteArray(kCalculo).replace("Calculo", "Outro"));
+  QFile::setPermissions(work.file, QFile::ReadOwner | QFile::ReadGroup | QFile::ReadOther);
+  const Result result = tool.run({QStringLiteral("number"), other, work.file});
   EXPECT_EQ(result.code, 4);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("Calculo.bas"))) << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(work.file + QStringLiteral(": the file is read-only")))
+      << result.err.toStdString();
   EXPECT_EQ(work.bytes(), kCalculo);
+  EXPECT_EQ(readBytes(other), QByteArray(kCalculo).replace("Calculo", "Outro"));
 }
 
 // ---------------------------------------------------------------------------------------------------

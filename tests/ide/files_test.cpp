@@ -6,6 +6,7 @@
 #include "codebinding.h"
 #include "codeeditor.h"
 #include "codewindow.h"
+#include "host/files/fileio.h"
 #include "host/model/addins.h"
 #include "host/model/events.h"
 #include "idecommands.h"
@@ -199,6 +200,42 @@ TEST_F(FilesTest, AFailedSaveKeepsTheFilesOnDiskAndSaysWhatFailed) {
   EXPECT_TRUE(m_messages.last().contains(QStringLiteral("bloqueio/modApi.bas")))
       << m_messages.last().toStdString();
   EXPECT_EQ(m_copy.snapshot(), before);
+  EXPECT_TRUE(api->IsDirty());
+}
+
+TEST_F(FilesTest, AFileAnotherProgramChangedIsOverwrittenOnlyWhenTheUserSaysSo) {
+  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  const QByteArray theirs = "Attribute VB_Name = \"modApi\"\r\n' de outro programa\r\n";
+  writeBytes(api->filePath(), theirs);
+  m_ide.ui->queueAnswer(ide::mb::No);
+  EXPECT_FALSE(commands().saveAll());
+  ASSERT_FALSE(m_messages.isEmpty());
+  EXPECT_TRUE(m_messages.last().contains(QDir::toNativeSeparators(api->filePath())));
+  EXPECT_EQ(readBytes(api->filePath()), theirs);
+  EXPECT_TRUE(api->IsDirty());
+  m_ide.ui->queueAnswer(ide::mb::Yes);
+  EXPECT_TRUE(commands().saveAll());
+  EXPECT_TRUE(readBytes(api->filePath()).contains("' mudado\r\n"));
+  EXPECT_FALSE(api->IsDirty());
+}
+
+TEST_F(FilesTest, ASaveThatCannotBeUndoneSaysWhichFileHoldsTheNewText) {
+  auto principal = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  principal->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  host::setFileFaultHook([&](host::FileStep step, const QString& path) {
+    const bool replace = step == host::FileStep::Replace && path == api->filePath();
+    return replace || (step == host::FileStep::Restore && path == principal->filePath()) ? EIO : 0;
+  });
+  m_ide.ui->queueAnswer(ide::mb::OK);
+  EXPECT_FALSE(commands().saveAll());
+  host::setFileFaultHook({});
+  ASSERT_FALSE(m_messages.isEmpty());
+  EXPECT_FALSE(m_messages.last().contains(QStringLiteral("unchanged"))) << m_messages.last().toStdString();
+  EXPECT_TRUE(m_messages.last().contains(principal->filePath() + QStringLiteral(" holds the new text")));
+  EXPECT_FALSE(principal->IsDirty());
   EXPECT_TRUE(api->IsDirty());
 }
 

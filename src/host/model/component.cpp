@@ -4,10 +4,10 @@
 #include <cstdio>
 #include "host/files/ansi.h"
 #include "host/files/fileio.h"
+#include "host/files/parallel.h"
 #include "host/model/designer.h"
 #include "host/model/events.h"
 #include "host/model/objects.h"
-#include "host/model/parallel.h"
 #include "host/model/vbe.h"
 
 #include <QDir>
@@ -84,16 +84,38 @@ QString componentTypeName(ide::ComponentType type) {
 SaveBatch::SaveBatch() : files(std::make_unique<FileWriteBatch>()) {}
 SaveBatch::~SaveBatch() = default;
 
+void SaveBatch::add(FileWriteBatch::File file, Done finish) {
+  files->add(std::move(file));
+  done.push_back(std::move(finish));
+}
+
+void SaveBatch::addAll(std::vector<FileWriteBatch::File> batchFiles, std::vector<Done> finish) {
+  files->addAll(std::move(batchFiles));
+  for (Done& each : finish)
+    done.push_back(std::move(each));
+}
+
 void SaveBatch::commit() {
+  const auto finish = [&] {
+    for (size_t i = 0; i < done.size(); ++i)
+      done[i](files->written(i));
+  };
   try {
     files->commit();
   } catch (...) {
-    for (const auto& finish : done)
-      finish(false);
+    finish();
     throw;
   }
-  for (const auto& finish : done)
-    finish(true);
+  finish();
+}
+
+std::optional<FileStamp> stampFor(const std::optional<FileStamp>& stamp, const QString& path) {
+  if (stamp && stamp->path == path) return stamp;
+  return std::nullopt;
+}
+
+void restampIfListed(std::optional<FileStamp>& stamp, const QStringList& paths) {
+  if (stamp && paths.contains(stamp->path)) stamp = FileStamp::of(stamp->path);
 }
 
 ide::FileType fileTypeOf(ide::ComponentType type) {
@@ -134,7 +156,9 @@ void ComponentImpl::load() {
     m_name = QFileInfo(m_filePath).fileName();
     return;
   }
-  adopt(parseModule(readFileBytes(m_filePath), m_filePath));
+  FileStamp stamp;
+  adopt(parseModule(readFileBytes(m_filePath, &stamp), m_filePath));
+  m_stamp = std::move(stamp);
   if (m_name.isEmpty()) m_name = QFileInfo(m_filePath).completeBaseName();
   m_changed = false;
 }
@@ -183,19 +207,17 @@ std::optional<QByteArray> ComponentImpl::fileContents(bool force) {
 }
 
 void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
-  if (auto contents = fileContents(force)) {
-    batch.files->add(m_filePath, *contents);
-    batch.done.push_back(whenWritten());
-  }
+  if (auto contents = fileContents(force)) batch.add({m_filePath, *contents, fileStamp()}, whenWritten());
 }
 
-std::function<void(bool)> ComponentImpl::whenWritten() {
+SaveBatch::Done ComponentImpl::whenWritten() {
   // What is being written is the module as it is now.
   const quint64 savedChangeCount = m_module->text().changeCount();
-  return [self = shared_from_this(), savedChangeCount, path = m_filePath](bool written) {
+  return [self = shared_from_this(), savedChangeCount, path = m_filePath](const FileStamp* written) {
     if (written) {
       self->m_savedChangeCount = savedChangeCount;
       self->m_changed = false;
+      self->m_stamp = *written;
     }
     auto project = self->project();
     if (auto vbe = project ? project->vbe() : nullptr)
@@ -211,12 +233,14 @@ void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImp
       components.size(), [&](size_t i) { contents[i] = components[i]->fileContents(force); }, failures);
   for (const std::exception_ptr& failure : failures)
     if (failure) std::rethrow_exception(failure);
-  std::vector<std::pair<QString, QByteArray>> files;
-  for (size_t i = 0; i < components.size(); ++i)
-    if (contents[i]) files.emplace_back(components[i]->filePath(), std::move(*contents[i]));
-  batch.files->addAll(files);
-  for (size_t i = 0; i < components.size(); ++i)
-    if (contents[i]) batch.done.push_back(components[i]->whenWritten());
+  std::vector<FileWriteBatch::File> files;
+  std::vector<SaveBatch::Done> done;
+  for (size_t i = 0; i < components.size(); ++i) {
+    if (!contents[i]) continue;
+    files.push_back({components[i]->filePath(), std::move(*contents[i]), components[i]->fileStamp()});
+    done.push_back(components[i]->whenWritten());
+  }
+  batch.addAll(std::move(files), std::move(done));
 }
 
 bool ComponentImpl::IsDirty() {

@@ -7,6 +7,7 @@
 #pragma once
 
 #include "host/code/codetext.h"
+#include "host/files/fileio.h"
 #include "host/files/modulefile.h"
 #include "host/files/projectfile.h"
 #include "ide/vbide.h"
@@ -22,7 +23,6 @@ namespace host {
 
 class VbeImpl;
 class ProjectImpl;
-class FileWriteBatch;
 class ComponentImpl;
 class CodeModuleImpl;
 class CodePaneImpl;
@@ -33,16 +33,27 @@ class ControlImpl;
 // ---------------------------------------------------------------------------------------------------
 // Windows and panes
 
-/// Files to write together (see FileWriteBatch), with what to do for each once the batch succeeded or
-/// failed: a component or project notes what it saved and the file event is fired.
+/// Files to write together (see FileWriteBatch), with what to do for each once the batch is over: a
+/// component or project notes what it saved and the file event is fired.
 struct SaveBatch {
+  /// Told the file's new stamp, or null when the file does not hold its new content.
+  using Done = std::function<void(const FileStamp* written)>;
   SaveBatch();
   ~SaveBatch();
-  std::unique_ptr<FileWriteBatch> files;
-  std::vector<std::function<void(bool written)>> done;
-  /// Commits the files, then runs every `done`; a failure runs them with false and is thrown.
+  void add(FileWriteBatch::File file, Done done);
+  /// Several files at once, written side by side.
+  void addAll(std::vector<FileWriteBatch::File> files, std::vector<Done> done);
+  /// Commits the files, then runs every `done`, also when the commit fails (which is thrown then).
   void commit();
+
+  std::unique_ptr<FileWriteBatch> files;
+  std::vector<Done> done;
 };
+
+/// The stamp of what was read from `path`, when `stamp` was taken of that path.
+std::optional<FileStamp> stampFor(const std::optional<FileStamp>& stamp, const QString& path);
+/// Takes a new stamp when `stamp` is one of `paths` (the user chose to overwrite what is there now).
+void restampIfListed(std::optional<FileStamp>& stamp, const QStringList& paths);
 
 /// The kind of file a component is kept in, as file events report it.
 ide::FileType fileTypeOf(ide::ComponentType type);
@@ -206,7 +217,11 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   /// component, so that several can be put together at once.
   std::optional<QByteArray> fileContents(bool force = false);
   /// What to do once the batch holding this component's file is done: note it saved, tell the IDE.
-  std::function<void(bool written)> whenWritten();
+  SaveBatch::Done whenWritten();
+  /// The file as it was read or last written (to tell whether another program changed it since).
+  std::optional<FileStamp> fileStamp() const { return stampFor(m_stamp, m_filePath); }
+  /// The file on disk becomes the one to overwrite, whatever another program did to it.
+  void acceptFileOnDisk(const QStringList& paths) { restampIfListed(m_stamp, paths); }
   QString filePath() const { return m_filePath; }
   void setFilePath(const QString& path) { m_filePath = path; }
   std::shared_ptr<ProjectImpl> project() const { return m_project.lock(); }
@@ -240,6 +255,7 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   std::shared_ptr<WindowImpl> m_designerWindow;
   quint64 m_savedChangeCount = 0;
   bool m_changed = false;  // header, form or name changed since the last save
+  std::optional<FileStamp> m_stamp;
 };
 
 /// Adds the files of several components to `batch`, put together side by side.
@@ -310,6 +326,9 @@ class ProjectImpl final : public ide::VBProject,
   void detach();
   /// The files the project file listed that were missing when it was loaded, in file order.
   const std::vector<MissingFile>& missingFiles() const { return m_missing; }
+  /// The files of `paths` (the project file, its components' files) become the ones to overwrite,
+  /// whatever another program did to them.
+  void acceptFilesOnDisk(const QStringList& paths);
 
   // Event sources of this project (the IDE-wide ones are fired alongside by the VBE).
   std::shared_ptr<ide::ComponentsEventSource> componentEvents;
@@ -339,6 +358,7 @@ class ProjectImpl final : public ide::VBProject,
   std::vector<bool> m_entryMissing;
   bool m_changed = false;
   bool m_detached = false;
+  std::optional<FileStamp> m_stamp;
 };
 
 }  // namespace host

@@ -2,8 +2,8 @@
 // Projects: their project file, their components and what they write back.
 #include "host/files/fileio.h"
 #include "host/files/modulefile.h"
+#include "host/files/parallel.h"
 #include "host/model/objects.h"
-#include "host/model/parallel.h"
 #include "host/model/vbe.h"
 
 #include <QDir>
@@ -203,7 +203,9 @@ QString ProjectImpl::directory() const {
 
 void ProjectImpl::load(const QString& fileName) {
   m_fileName = fileName;
-  m_file = ProjectFile::parse(readFileBytes(fileName), fileName);
+  FileStamp stamp;
+  m_file = ProjectFile::parse(readFileBytes(fileName, &stamp), fileName);
+  m_stamp = std::move(stamp);
   m_name = m_file->name();
   if (m_name.isEmpty()) m_name = QFileInfo(fileName).completeBaseName();
   m_type = projectTypeOf(m_file->value(u"Type").value_or(QString()).trimmed());
@@ -482,12 +484,15 @@ void ProjectImpl::addToBatch(SaveBatch& batch) {
   for (const auto& component : m_components)
     componentEntryChanged(*component, component->Name());
   if (!m_changed) return;
-  batch.files->add(m_fileName, m_file->toBytes(m_fileName));
-  batch.done.push_back([self = shared_from_this(), path = m_fileName](bool written) {
-    if (written) self->m_changed = false;
-    if (auto vbe = self->m_vbe.lock())
-      vbe->fireFileWritten(self, ide::FileType::Project, path, written ? 0 : 2);
-  });
+  batch.add({m_fileName, m_file->toBytes(m_fileName), stampFor(m_stamp, m_fileName)},
+            [self = shared_from_this(), path = m_fileName](const FileStamp* written) {
+              if (written) {
+                self->m_changed = false;
+                self->m_stamp = *written;
+              }
+              if (auto vbe = self->m_vbe.lock())
+                vbe->fireFileWritten(self, ide::FileType::Project, path, written ? 0 : 2);
+            });
 }
 
 void ProjectImpl::SaveAs(const QString& fileName) {
@@ -509,6 +514,12 @@ void ProjectImpl::SaveAs(const QString& fileName) {
   if (oldName != target)
     if (auto vbe = m_vbe.lock())
       vbe->fireFileNameChanged(shared_from_this(), ide::FileType::Project, target, oldName);
+}
+
+void ProjectImpl::acceptFilesOnDisk(const QStringList& paths) {
+  restampIfListed(m_stamp, paths);
+  for (const auto& component : m_components)
+    component->acceptFileOnDisk(paths);
 }
 
 void ProjectImpl::detach() {

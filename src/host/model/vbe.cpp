@@ -476,7 +476,8 @@ std::shared_ptr<ProjectImpl> VbeImpl::openProject(const QString& path) {
 
 std::vector<std::shared_ptr<ProjectImpl>> VbeImpl::openGroup(const QString& path) {
   const QString absolute = QFileInfo(path).absoluteFilePath();
-  auto group = std::make_unique<GroupFile>(GroupFile::parse(readFileBytes(absolute), path));
+  FileStamp stamp;
+  auto group = std::make_unique<GroupFile>(GroupFile::parse(readFileBytes(absolute, &stamp), path));
   const QString directory = QFileInfo(absolute).absolutePath();
   // The line of each project entry, for messages.
   std::vector<int> entryLines;
@@ -518,6 +519,7 @@ std::vector<std::shared_ptr<ProjectImpl>> VbeImpl::openGroup(const QString& path
     addProject(project);
   m_groupPath = absolute;
   m_group = std::move(group);
+  m_groupStamp = std::move(stamp);
   m_groupChanged = false;
   m_missingProjects = std::move(missing);
   return loaded;
@@ -580,12 +582,20 @@ void VbeImpl::saveAll() {
   for (const auto& project : m_projects)
     project->addToBatch(batch);
   if (m_group && m_groupChanged) {
-    batch.files->add(m_groupPath, m_group->toBytes(m_groupPath));
-    batch.done.push_back([this](bool written) {
-      if (written) m_groupChanged = false;
-    });
+    batch.add({m_groupPath, m_group->toBytes(m_groupPath), stampFor(m_groupStamp, m_groupPath)},
+              [this](const FileStamp* written) {
+                if (!written) return;
+                m_groupChanged = false;
+                m_groupStamp = *written;
+              });
   }
   batch.commit();
+}
+
+void VbeImpl::acceptFilesOnDisk(const QStringList& paths) {
+  restampIfListed(m_groupStamp, paths);
+  for (const auto& project : m_projects)
+    project->acceptFilesOnDisk(paths);
 }
 
 // ---------------------------------------------------------------------------------------------------

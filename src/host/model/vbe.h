@@ -68,6 +68,9 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   void removeProject(const std::shared_ptr<ProjectImpl>& project);
   /// Saves every project (and the group file when one is open and changed).
   void saveAll();
+  /// The files of `paths` become the ones a save overwrites, whatever another program did to them since
+  /// they were read (the user chose to overwrite them).
+  void acceptFilesOnDisk(const QStringList& paths);
   QString groupFileName() const { return m_groupPath; }
   /// The project files the open group listed and the files the open projects listed that were missing
   /// when they were opened: their entries stay as they are.
@@ -170,6 +173,7 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   std::unique_ptr<GroupFile> m_group;
   bool m_groupChanged = false;
   std::vector<MissingFile> m_missingProjects;
+  std::optional<FileStamp> m_groupStamp;
   std::function<void(int)> m_commandHandler;
 };
 
