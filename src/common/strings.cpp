@@ -83,6 +83,22 @@ constexpr Entry kStrings[] = {
     {5147, u"Posição do Cursor {C}"},
     {5148, u"Inserir Data {Date}"},
     {5149, u"Inserir Hora {Time}"},
+
+    // Keyboard macros and copy buffers: their windows and messages.
+    {5000, u"Memórias de Cópia"},
+    {5001, u"&Teclas (Colar):"},
+    {5002, u"Conteúdo da &memória selecionada:"},
+    {5037, u"Definições de Macros"},
+    {5038, u"Palavras &Reservadas"},
+    {5039, u"&Atalhos:"},
+    {5040, u"&Texto a ser colado:"},
+    {5086, u"Deseja salvar as alterações feitas nas macros?"},
+    {5090, u"Deseja salvar as alterações feitas nas memórias de cópia?"},
+    {5091, u"Erro indeterminado."},
+    {5150, u"Ajuda em \"Palavras Reservadas\""},
+    {5152, u"Erro na carga do formulário de macros."},
+    {5158, u"Tópico não localizado no arquivo de ajuda."},
+    {5163, u"Erro na carga do formulário das memórias de cópia."},
 };
 // clang-format on
 
