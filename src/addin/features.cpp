@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
-// The one place that says what each feature area does today. Numbering and indentation open their dialogs.
-// Every other area is not part of the add-in yet: its command and its events are connected and arrive
-// here, and do nothing until the area lands; no stand-in dialog pretends to be the feature meanwhile.
+// The one place that says what each feature area does today. Numbering and indentation open their dialogs;
+// the keyboard macros and the copy buffers open theirs and take their hotkeys. Every other area is not part
+// of the add-in yet: its command and its events are connected and arrive here, and do nothing until the
+// area lands; no stand-in dialog pretends to be the feature meanwhile.
 #include "addin/features.h"
 
+#include "addin/texttools.h"
 #include "common/settings.h"
 #include "transform/dialogs.h"
 
@@ -15,7 +17,7 @@ namespace {
 class AddInFeatures final : public Features {
  public:
   explicit AddInFeatures(const FeatureServices& services)
-      : m_vbe(services.vbe), m_settings(services.settings) {}
+      : m_vbe(services.vbe), m_settings(services.settings), m_textTools(services) {}
 
   void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
   void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
@@ -24,11 +26,10 @@ class AddInFeatures final : public Features {
   void showFavorites() override {}
   void addFavorite(const FavoritePlace&) override {}
   void componentRenamed(const ide::Ref<ide::VBComponent>&, const QString&) override {}
-  // Not there yet: the keyboard macros and the copy buffers (and so no hotkeys).
-  void showMacros() override {}
-  void showCopyBuffers() override {}
-  HotKeyClient* copyBuffers() override { return nullptr; }
-  HotKeyClient* macros() override { return nullptr; }
+  void showMacros() override { m_textTools.showMacros(); }
+  void showCopyBuffers() override { m_textTools.showCopyBuffers(); }
+  HotKeyClient* copyBuffers() override { return m_textTools.copyBuffers(); }
+  HotKeyClient* macros() override { return m_textTools.macros(); }
   // Not there yet: the extended find.
   void showExtendedFind() override {}
   void findWindowProjectRemoved(const ide::Ref<ide::VBProject>&) override {}
@@ -56,6 +57,7 @@ class AddInFeatures final : public Features {
 
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
+  TextTools m_textTools;
 };
 
 }  // namespace

@@ -91,6 +91,9 @@ struct FeatureServices {
   QString appInfoUnavailable;
   /// InsertText for macros, copy buffers and templates.
   textins::TextInsertion& textInsertion;
+  /// Where the help pages are (ending in "/"), and the display model the code-window search follows.
+  QString installDir;
+  ide::DisplayModel startDisplayModel = ide::DisplayModel::MDI;
 };
 
 /// The feature areas as the add-in has them today.
