@@ -122,8 +122,12 @@ TEST(HotKeySets, SaveRegistersWhatWasSwitchedOnAndWritesOnlyWhatChanged) {
   CHotKey& d = scene.macro(u"Ctrl+Alt+D"_qs, working);
   d.Text = u"' {ModuleName}"_qs;
   d.Changed = HK_CHANGE_TEXT;
+  // While the editor had the focus the keys came off the code window; the working copy does not know.
+  scene.macros->UnregisterEnabledHotKeys(scene.window);
   scene.macros->SaveEdits(working);
   EXPECT_TRUE(scene.windows().hasHotKey(scene.window, kCtrlAlt, 'A')) << "registered at once";
+  scene.macros->RegisterEnabledHotKeys(scene.window);
+  EXPECT_TRUE(scene.windows().hasHotKey(scene.window, kCtrlAlt, 'E')) << "back on with the focus";
   EXPECT_FALSE(scene.windows().hasHotKey(scene.window, kCtrlAlt, 'B'));
   EXPECT_FALSE(scene.windows().hasHotKey(scene.window, kCtrlAlt, 'D'));
   EXPECT_TRUE(scene.db.GetMacroState(u"Ctrl+Alt+A"_qs));
@@ -306,9 +310,15 @@ TEST(HotKeyWindows, TheTextBoxKeysButtonsAndReservedWords) {
   window.list()->item(1)->setCheckState(Qt::Checked);
   EXPECT_EQ(window.workingSet()[1].Changed, 0);
   EXPECT_EQ(window.workingSet()[0].Changed, HK_CHANGE_TEXT);
+  window.list()->item(2)->setCheckState(Qt::Unchecked);
   window.button(u"Save"_qs)->trigger();
   EXPECT_EQ(scene.db.GetMacroText(u"Ctrl+Alt+A"_qs), u"If {C} Then"_qs);
+  EXPECT_FALSE(scene.db.GetMacroState(u"Ctrl+Alt+D"_qs));
   EXPECT_FALSE(window.isChanged());
+  // Switched on again after the save: a change of its own.
+  window.list()->item(2)->setCheckState(Qt::Checked);
+  window.button(u"Save"_qs)->trigger();
+  EXPECT_TRUE(scene.db.GetMacroState(u"Ctrl+Alt+D"_qs));
   window.reject();
   EXPECT_TRUE(scene.prompts().isEmpty());
 }
