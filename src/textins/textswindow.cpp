@@ -190,7 +190,8 @@ void TextsWindow::textChanged() {
   m_typedTo = typedOne ? caret : -1;
   m_shown = text;
   const TextEntry& entry = m_entries[size_t(m_current)];
-  *entry.text = text;
+  // The box breaks lines with LF; code and copied text have the IDE's CRLF.
+  *entry.text = QString(text).replace(u'\n', QStringLiteral("\r\n"));
   *entry.changed |= HK_CHANGE_TEXT;
   setChanged();
   button(QStringLiteral("Undo"))->setEnabled(true);

@@ -6,7 +6,8 @@
 // Undo swaps the text with the one it had before the last edit (so a second Undo redoes); characters
 // typed one after another count as one edit. Ctrl+C, Ctrl+X and Ctrl+Z act as Copy, Cut and Undo;
 // Delete and Backspace over a selection as Delete, or as Cut with Shift. The editing buttons follow the
-// text box: enabled while it has the focus and there is something for them to do.
+// text box: enabled while it has the focus and there is something for them to do. Lines of an edited text
+// are stored with the IDE's CRLF.
 #pragma once
 
 #include "ide/platform.h"
