@@ -81,7 +81,10 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
           });
   connect(m_explorer, &ProjectExplorer::contextMenuWanted, this, &MainWindow::showProjectMenu);
   connect(m_toolbox, &Toolbox::controlWanted, this, &MainWindow::addControl);
-  connect(qApp, &QApplication::focusChanged, this, [this](QWidget*, QWidget* now) { focusChanged(now); });
+  connect(qApp, &QApplication::focusChanged, this, [this](QWidget* old, QWidget* now) {
+    focusChanged(now);
+    if (old && !now) activateUnder(old->window());
+  });
 
   auto& events = m_vbe->events();
   auto titleLater = [this](auto&&...) { QTimer::singleShot(0, this, [this] { updateTitle(); }); };
@@ -185,6 +188,18 @@ void MainWindow::focusChanged(QWidget* now) {
   }
   // Focus in a dialog or another application is in no IDE window.
   m_vbe->windowSystem().setFocus(hwnd);
+}
+
+void MainWindow::activateUnder(QWidget* closed) {
+  // Without a window manager (Xvfb, the offscreen platform) nobody gives the activation back to the window
+  // under a dialog that closed, and keys would reach no window: do what a window manager does.
+  QPointer<QWidget> under = closed->parentWidget() ? closed->parentWidget()->window() : nullptr;
+  if (!under) return;
+  QTimer::singleShot(0, this, [under, dialog = QPointer<QWidget>(closed)] {
+    // Still open: the application was left, not the dialog.
+    if (dialog && dialog->isVisible()) return;
+    if (under && under->isVisible() && !QApplication::activeWindow()) under->activateWindow();
+  });
 }
 
 QString MainWindow::codeWindowMenuName() const {

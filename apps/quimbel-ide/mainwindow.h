@@ -75,6 +75,8 @@ class MainWindow final : public QMainWindow {
   void updateTitle();
   void updateProperties();
   void focusChanged(QWidget* now);
+  /// A window with the focus lost it: when it was a dialog that closed, the window under it is activated.
+  void activateUnder(QWidget* closed);
   void showCodeMenu(const QPoint& position);
   void showProjectMenu(const QPoint& position);
   void addControl(const QString& className);

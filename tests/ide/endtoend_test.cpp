@@ -105,7 +105,20 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
         "wait dialog\n"
         "set opIndent1 true\n"
         "press cmdIndent\n"
-        "wait closed\n");
+        "wait closed\n"
+        "# A macro written in its editor, then its key pressed in the code window.\n"
+        "click \"Menu Bar\" Quimbel \"Definir Macros de Teclado\"\n"
+        "wait dialog\n"
+        "set lstMacros Ctrl+Alt+D\n"
+        "set txtTexto \"' {ModuleName}: {C}\\n\"\n"
+        "press Save\n"
+        "key Escape\n"
+        "wait closed\n"
+        "caret 1 1\n"
+        "wait 300\n"
+        "key Ctrl+Alt+D\n"
+        "type Revisado\n"
+        "expect line 1 \"' modPrincipal: Revisado\"\n");
   else
     script += QStringLiteral("expect no-control \"Menu Bar\" Quimbel\n");
   script += QStringLiteral(
@@ -164,6 +177,7 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
     // of 5, and indents with tabs.
     EXPECT_FALSE(lines.filter(QRegularExpression(QStringLiteral("^10000 \\t\\S"))).isEmpty());
     EXPECT_FALSE(lines.filter(QRegularExpression(QStringLiteral("^10005 \\t\\S"))).isEmpty());
+    EXPECT_EQ(lines[1], QStringLiteral("' modPrincipal: Revisado"));
     EXPECT_TRUE(QFileInfo::exists(work.filePath(QStringLiteral("shots/numbering.png"))));
   } else {
     EXPECT_EQ(changed, QStringList{QStringLiteral("Loja/Loja.vbp")});
