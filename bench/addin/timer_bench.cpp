@@ -3,6 +3,7 @@
 // generated group of 50 projects with 2,000 components. Targets: a tick that does not sample < 5 µs; a
 // sampling tick (every sixth) < 50 µs.
 #include "addin/connect.h"
+#include "benchaddin.h"
 #include "generator.h"
 #include "host/model/objects.h"
 #include "host/model/vbe.h"
@@ -10,25 +11,13 @@
 
 #include <benchmark/benchmark.h>
 
-#include <QFile>
 #include <QTemporaryDir>
 
 #include <memory>
 
 namespace {
 
-class BenchAddIn final : public ide::AddIn {
- public:
-  explicit BenchAddIn(ide::Ref<ide::VBE> vbe) : m_vbe(std::move(vbe)) {}
-  QString ProgId() override { return QStringLiteral("Quimbel.Connect"); }
-  QString Description() override { return QStringLiteral("Quimbel 2.2 Add-In"); }
-  bool Connect() override { return true; }
-  void setConnect(bool) override {}
-  ide::Ref<ide::VBE> VBE() override { return m_vbe; }
-
- private:
-  ide::Ref<ide::VBE> m_vbe;
-};
+using bench::BenchAddIn;
 
 /// The IDE with the group open, the add-in connected and two code windows of a large module shown.
 struct Session {
@@ -45,13 +34,7 @@ struct Session {
     options.projects = 50;
     options.seed = 7;
     const gen::GeneratedGroup group = gen::generateProjects(dir.filePath(QStringLiteral("corpus")), options);
-    QFile config(dir.filePath(QStringLiteral("quimbel.conf")));
-    config.open(QIODevice::WriteOnly);
-    config.write("InstallationPath=" + dir.path().toUtf8() + "\n");
-    config.close();
-    qputenv("QUIMBEL_MACHINE_CONFIG", config.fileName().toLocal8Bit());
-    qputenv("QUIMBEL_CONFIG_DIR", dir.filePath(QStringLiteral("config")).toLocal8Bit());
-    qputenv("QUIMBEL_DATA_DIR", dir.filePath(QStringLiteral("data")).toLocal8Bit());
+    bench::installAddInIn(dir.path());
 
     vbe = host::VbeImpl::create();
     vbe->open(group.groupFile);

@@ -4,13 +4,13 @@
 // of the selection and the caret placed at {C}, in a module of 100,000 lines. Target: < 1 ms.
 #include "addin/connect.h"
 #include "appdata/appinfofile.h"
+#include "benchaddin.h"
 #include "host/model/objects.h"
 #include "host/model/vbe.h"
 #include "host/platform/manualloop.h"
 
 #include <benchmark/benchmark.h>
 
-#include <QFile>
 #include <QStringList>
 #include <QTemporaryDir>
 
@@ -22,18 +22,7 @@ constexpr int kProcedures = 1000;
 constexpr int kLinesEach = 100;
 constexpr char16_t kMacro[] = u"    Debug.Print \"{ModuleName}.{ProcedureName}\"{C}";
 
-class BenchAddIn final : public ide::AddIn {
- public:
-  explicit BenchAddIn(ide::Ref<ide::VBE> vbe) : m_vbe(std::move(vbe)) {}
-  QString ProgId() override { return QStringLiteral("Quimbel.Connect"); }
-  QString Description() override { return QStringLiteral("Quimbel 2.2 Add-In"); }
-  bool Connect() override { return true; }
-  void setConnect(bool) override {}
-  ide::Ref<ide::VBE> VBE() override { return m_vbe; }
-
- private:
-  ide::Ref<ide::VBE> m_vbe;
-};
+using bench::BenchAddIn;
 
 /// The add-in connected to an IDE whose one module (100,000 lines) has the focus and the macro hotkeys.
 struct Session {
@@ -45,13 +34,7 @@ struct Session {
   ide::HWnd window = 0;
 
   Session() {
-    QFile config(dir.filePath(QStringLiteral("quimbel.conf")));
-    config.open(QIODevice::WriteOnly);
-    config.write("InstallationPath=" + dir.path().toUtf8() + "\n");
-    config.close();
-    qputenv("QUIMBEL_MACHINE_CONFIG", config.fileName().toLocal8Bit());
-    qputenv("QUIMBEL_CONFIG_DIR", dir.filePath(QStringLiteral("config")).toLocal8Bit());
-    qputenv("QUIMBEL_DATA_DIR", dir.filePath(QStringLiteral("data")).toLocal8Bit());
+    bench::installAddInIn(dir.path());
     {
       appdata::CAppInfoFile db;
       db.OpenFile(dir.path());
