@@ -70,6 +70,8 @@ TEST(TextFeatures, MacroAndCopyBufferKeysInsertTextInTheCodeWindow) {
     db.WriteMacroState(u"Ctrl+Alt+D"_qs, false);
     db.WriteCopyBufferText(u"Ctrl+4"_qs, u"antigo"_qs);
     db.WriteCopyBufferText(u"Ctrl+5"_qs, u"' {ModuleName}"_qs);
+    db.WriteCopyBufferText(u"Ctrl+6"_qs, u"desligada"_qs);
+    db.WriteCopyBufferState(u"Ctrl+6"_qs, false);
   });
   appdata::CAppInfoFile stored;  // what another IDE would read
   stored.OpenFile(ide.environment.installDir());
@@ -87,6 +89,8 @@ TEST(TextFeatures, MacroAndCopyBufferKeysInsertTextInTheCodeWindow) {
   EXPECT_EQ(ide.selection(), (std::array{5, 5, 5, 5}));
 
   EXPECT_FALSE(ide.press(first, kCtrl | kAlt, 'D')) << "a disabled macro's key goes to the editor";
+  EXPECT_FALSE(ide.press(first, kCtrl, '6')) << "so do both keys of a disabled buffer";
+  EXPECT_FALSE(ide.press(first, kCtrl | kShift, '6'));
 
   // Two lines copied into buffer 3 are stored at once; nothing selected empties buffer 4.
   ide.select(4, 1, 6, 1);
