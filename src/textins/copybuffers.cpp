@@ -19,8 +19,9 @@ CHotKey bufferKey(ide::WindowSystem& windows, char digit, bool copy) {
   hk.Operation = copy ? kCopy : kPaste;
   try {
     addAtom(windows, hk);
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
     // The buffer keeps its text; this key just cannot be registered.
+    common::logFailure(failure, QLatin1StringView(kModule), QStringLiteral("Class_Initialize"), __LINE__);
   }
   return hk;
 }

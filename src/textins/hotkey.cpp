@@ -28,13 +28,16 @@ void unregisterHotKey(ide::WindowSystem& windows, CHotKey& hk) {
 }
 
 void releaseHotKey(ide::WindowSystem& windows, CHotKey& hk) noexcept {
+  // The atom goes whatever the unregistering did.
   try {
     unregisterHotKey(windows, hk);
-  } catch (...) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("CHotKey"), QStringLiteral("Release"), __LINE__);
   }
   try {
     if (hk.Id != 0) windows.GlobalDeleteAtom(static_cast<quint16>(hk.Id));
-  } catch (...) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("CHotKey"), QStringLiteral("Release"), __LINE__);
   }
   hk.Id = 0;
 }

@@ -38,8 +38,9 @@ CMacros::CMacros(ide::WindowSystem& windows, appdata::CAppInfoFile& appInfo, Tex
       hk.StrId = QLatin1StringView(keys.prefix) + QLatin1Char(letter);
       try {
         addAtom(m_windows, hk);
-      } catch (const std::exception&) {
+      } catch (const std::exception& failure) {
         // A macro without an atom still keeps its text; its key just cannot be registered.
+        common::logFailure(failure, QLatin1StringView(kModule), QStringLiteral("Class_Initialize"), __LINE__);
       }
       m_macros.push_back(std::move(hk));
     }
