@@ -389,6 +389,7 @@ struct ScriptRunner::Commands {
       if (found.isEmpty()) fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
       view->setCurrentIndex(found.front());
       view->scrollTo(found.front());
+      view->setFocus();  // as a click on the item gives it, so that keys go to the list
     } else {
       fail(QStringLiteral("cannot set a value on \"%1\" (%2)")
                .arg(args[0], QLatin1StringView(widget->metaObject()->className())));
