@@ -66,8 +66,7 @@ Records readRecords(const QString& infoFile, const char* storageName) {
     if (error.number() == projinfo::stg::FileNotFound) return records;  // none written yet
     throw;
   }
-  const auto elements = storage->Elements();
-  for (const auto& element : *elements) {
+  for (const auto& element : storage->Elements()) {
     try {
       records.texts.emplace_back(
           element.Name(),

@@ -49,12 +49,12 @@ void CFavorites::InitializeFromFile() {
   Project = owner->Project();
   bool failed = false;
   try {
-    const auto elements = owner->m_Favorites->Elements();
-    for (int i = 1; i <= elements->Count(); ++i) {
+    const projinfo::StorageElements elements = owner->m_Favorites->Elements();
+    for (int i = 1; i <= elements.Count(); ++i) {
       try {
         auto item = std::make_shared<CFavoritesItem>();
         item->owner = this;
-        item->setSerialization(owner->GetFavoritesItem(elements->Item(i).Name()));
+        item->setSerialization(owner->GetFavoritesItem(elements.Item(i).Name()));
         Favorites.Add(QLatin1StringView(projinfo::kFavoritePrefix) + QString::number(item->ItemId), item);
       } catch (const std::exception& failure) {
         common::recordErrorNumber(failure);

@@ -294,7 +294,7 @@ QString CProjInfo::GetTaskListItem(const QString& name) {
 
 qint32 CProjInfo::GetFavoritesCount() {
   if (!m_Favorites) ide::raise(ide::err::ObjectVariableNotSet);
-  return m_Favorites->Elements()->Count();
+  return m_Favorites->Elements().Count();
 }
 
 void CProjInfo::WriteFavoritesItem(const QString& name, const QString& text) {
@@ -311,8 +311,7 @@ QString CProjInfo::GetFavoritesItem(const QString& name) {
 qint32 CProjInfo::highestId(Storage& storage, const char* prefix) {
   const QLatin1StringView start(prefix);
   qint32 highest = 0;
-  const auto elements = storage.Elements();
-  for (const VBSTATSTG& element : *elements) {
+  for (const VBSTATSTG& element : storage.Elements()) {
     const QString name = element.Name();
     if (!name.startsWith(start, Qt::CaseInsensitive)) continue;
     bool ok = false;

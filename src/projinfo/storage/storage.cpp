@@ -228,11 +228,11 @@ void Storage::DestroyElement(const QString& name) {
   handle().file->touch();
 }
 
-std::shared_ptr<StorageElements> Storage::Elements() {
-  auto elements = std::make_shared<StorageElements>();
-  elements->m_items.reserve(element().children.size());
+StorageElements Storage::Elements() {
+  StorageElements elements;
+  elements.m_items.reserve(element().children.size());
   for (const auto& [key, child] : element().children)
-    elements->add(VBSTATSTG::of(*child, 0));
+    elements.add(VBSTATSTG::of(*child, 0));
   return elements;
 }
 

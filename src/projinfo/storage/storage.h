@@ -146,7 +146,7 @@ class Storage : public std::enable_shared_from_this<Storage> {
   std::shared_ptr<Storage> CreateStorage(const QString& name, qint32 mode);
   std::shared_ptr<Stream> CreateStream(const QString& name, qint32 mode);
   void DestroyElement(const QString& name);
-  std::shared_ptr<StorageElements> Elements();
+  StorageElements Elements();
   void MoveElementTo(const QString& name, const std::shared_ptr<Storage>& destination, const QString& newName,
                      qint32 flags);
   std::shared_ptr<Storage> OpenStorage(const QString& name, qint32 mode);
