@@ -43,8 +43,6 @@ frmOrgFav::frmOrgFav(CFavorites& favorites, QWidget* parent)
   auto* layout = new QVBoxLayout(this);
   layout->addWidget(m_lvFavorites);
   resize(460, 280);
-  connect(m_lvFavorites, &QTreeWidget::itemDoubleClicked, this,
-          [this] { openRow(m_lvFavorites->itemAt(m_lastMouseDown)); });
   fill();
   m_lvFavorites->setFocus();
 }
@@ -110,8 +108,15 @@ void frmOrgFav::deleteSelected() {
 }
 
 bool frmOrgFav::eventFilter(QObject* watched, QEvent* event) {
-  if (watched == m_lvFavorites->viewport() && event->type() == QEvent::MouseButtonPress)
+  if (watched == m_lvFavorites->viewport() &&
+      (event->type() == QEvent::MouseButtonPress || event->type() == QEvent::MouseButtonDblClick)) {
     m_lastMouseDown = static_cast<QMouseEvent*>(event)->position().toPoint();
+    // A double click below the last row closes the window too, so it is taken here and not from the rows.
+    if (event->type() == QEvent::MouseButtonDblClick) {
+      openRow(m_lvFavorites->itemAt(m_lastMouseDown));
+      return true;
+    }
+  }
   if (watched == m_lvFavorites && event->type() == QEvent::KeyPress) {
     const int key = static_cast<QKeyEvent*>(event)->key();
     if (key == Qt::Key_Delete) {
