@@ -44,6 +44,7 @@ frmOrgFav::frmOrgFav(CFavorites& favorites, QWidget* parent)
   layout->addWidget(m_lvFavorites);
   resize(460, 280);
   fill();
+  setFocusProxy(m_lvFavorites);
   m_lvFavorites->setFocus();
 }
 

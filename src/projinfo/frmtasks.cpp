@@ -73,6 +73,8 @@ frmTasks::frmTasks(CTaskList& list, QWidget* parent)
   connect(m_cmdClose, &QPushButton::clicked, this, &frmTasks::cmdClose_Click);
 
   Initialize();
+  // The window's focus rests on its list, also when it comes back from the task dialog.
+  setFocusProxy(m_lvTasks);
   m_lvTasks->setFocus();
 }
 
