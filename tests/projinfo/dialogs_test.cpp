@@ -179,14 +179,14 @@ TEST(AddInEvents, AClosedProjectKeepsItsFavouritesAndASavedOneCarriesItsFileAlon
   host::test::ExampleCopy copy;
   auto vbe = host::VbeImpl::create();
   auto addIn = std::make_shared<addin::test::FakeAddIn>(vbe);
+  // A project open when the add-in starts gets its module and file then.
+  const QString vbp = copy.path(u"Loja/Loja.vbp"_qs);
+  auto project = vbe->openProject(vbp);
   addin::Connect connection{addin::Environment{}};
   QVariantList custom;
   connection.OnConnection(vbe, ide::ConnectMode::AfterStartup, addIn, custom);
   int componentsRemoved = 0;
   auto removed = vbe->events().components->ItemRemoved.connect([&](auto&) { ++componentsRemoved; });
-
-  const QString vbp = copy.path(u"Loja/Loja.vbp"_qs);
-  auto project = vbe->openProject(vbp);
   auto identity = FindProjectId(project);
   ASSERT_TRUE(identity) << "the add-in gave the project its module";
   const QString file = copy.path(u"Loja/"_qs) + infoFileTitle(identity->id);

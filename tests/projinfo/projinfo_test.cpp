@@ -83,12 +83,25 @@ TEST(LifeCycle, ANewProjectGetsAModuleAndAFileThatFollowItsSaves) {
   EXPECT_EQ(again->components().size(), 1u) << "no second module";
   EXPECT_EQ(scene.tasks(again).Tasks.Count(), 2);
 
-  // A project closed without ever being saved leaves no file.
+  // A project closed without ever being saved leaves no file; nor does one whose new module was not saved.
   auto unsaved = scene.newProject();
   EXPECT_TRUE(QFile::exists(scene.path(u"tmp/qm000002.qmi"_qs)));
   scene.close(unsaved);
   EXPECT_FALSE(QFile::exists(scene.path(u"tmp/qm000002.qmi"_qs)));
+  auto old = scene.open(scene.writeProject(u"Antigo"_qs, {{u"modA"_qs, u"Option Explicit\r\n"_qs}}));
+  EXPECT_TRUE(QFile::exists(scene.path(u"Antigo/qm000003.qmi"_qs)));
+  scene.close(old);
+  EXPECT_FALSE(QFile::exists(scene.path(u"Antigo/qm000003.qmi"_qs)));
   EXPECT_TRUE(scene.takeMessages().isEmpty());
+
+  // The module removed: the tie is lost, the file closed and kept.
+  auto identity = scene.info(again).basProjInfo;
+  scene.infos->componentRemoved(identity);
+  again->Remove(identity);
+  EXPECT_FALSE(scene.info(again).isOpen());
+  EXPECT_EQ(scene.takeMessages().size(), 1);
+  scene.close(again);
+  EXPECT_TRUE(QFile::exists(moved));
 }
 
 TEST(Records, ValuesComeBackWhateverTheyHoldAndOldRecordsReadAsBefore) {
