@@ -175,19 +175,23 @@ auto recorded(Call call) -> decltype(call()) {
 }
 }  // namespace
 
+std::shared_ptr<Element> Storage::createOrOpen(const QString& name, ElementKind kind) {
+  if (find(name) == element().children.end()) {
+    checkWritable();
+    if (!isValidElementName(name)) fail(stg::InvalidName, name);
+    auto created = std::make_shared<Element>();
+    created->name = name;
+    created->kind = kind;
+    element().children.emplace(ElementKey(name), created);
+    handle().file->touch();
+  }
+  // There already (or just made): opened with the same mode.
+  return child(name, kind);
+}
+
 std::shared_ptr<Storage> Storage::CreateStorage(const QString& name, qint32 mode) {
   return recorded([&] {
-    if (find(name) == element().children.end()) {
-      checkWritable();
-      if (!isValidElementName(name)) fail(stg::InvalidName, name);
-      auto created = std::make_shared<Element>();
-      created->name = name;
-      created->kind = ElementKind::Storage;
-      element().children.emplace(ElementKey(name), created);
-      handle().file->touch();
-    }
-    // There already (or just made): opened with the same mode.
-    auto storage = bind({handle().file, child(name, ElementKind::Storage)}, mode);
+    auto storage = bind({handle().file, createOrOpen(name, ElementKind::Storage)}, mode);
     storage->Parent = shared_from_this();
     return storage;
   });
@@ -195,16 +199,7 @@ std::shared_ptr<Storage> Storage::CreateStorage(const QString& name, qint32 mode
 
 std::shared_ptr<Stream> Storage::CreateStream(const QString& name, qint32 mode) {
   return recorded([&] {
-    if (find(name) == element().children.end()) {
-      checkWritable();
-      if (!isValidElementName(name)) fail(stg::InvalidName, name);
-      auto created = std::make_shared<Element>();
-      created->name = name;
-      created->kind = ElementKind::Stream;
-      element().children.emplace(ElementKey(name), created);
-      handle().file->touch();
-    }
-    auto stream = Stream::bind({handle().file, child(name, ElementKind::Stream)}, mode);
+    auto stream = Stream::bind({handle().file, createOrOpen(name, ElementKind::Stream)}, mode);
     stream->Parent = shared_from_this();
     return stream;
   });

@@ -171,6 +171,7 @@ class Storage : public std::enable_shared_from_this<Storage> {
   void checkWritable() const;
   ElementMap::iterator find(const QString& name) const;
   std::shared_ptr<Element> child(const QString& name, ElementKind kind) const;
+  std::shared_ptr<Element> createOrOpen(const QString& name, ElementKind kind);
 
   ElementHandle m_handle;
   qint32 m_mode = 0;
