@@ -9,7 +9,7 @@ packages=(
   qt6-base-dev
   xvfb xauth fonts-dejavu-core
   libsqlcipher-dev sqlcipher
-  libgsf-1-dev
+  libgsf-1-dev python3-olefile
   libgtest-dev libgmock-dev libbenchmark-dev
   libcli11-dev
 )

@@ -389,6 +389,9 @@ struct ScriptRunner::Commands {
       if (found.isEmpty()) fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], value));
       view->setCurrentIndex(found.front());
       view->scrollTo(found.front());
+      // As a click on the item: its window active and the list focused, so that keys go to the list.
+      view->activateWindow();
+      view->setFocus();
     } else {
       fail(QStringLiteral("cannot set a value on \"%1\" (%2)")
                .arg(args[0], QLatin1StringView(widget->metaObject()->className())));

@@ -70,6 +70,19 @@ int runUnnumber(const TransformOptions& options);
 int runIndent(const TransformOptions& options);
 int runNumIndent(const TransformOptions& options);
 
+/// What `tasks` and `favorites` take: the project, and for tasks what to change (empty: list them).
+struct TaskOptions {
+  QString project;
+  /// "add", "done", "undone", "remove" or empty.
+  QString action;
+  QString name;
+  QString text;
+  qint32 id = 0;
+};
+
+int runTasks(const TaskOptions& options);
+int runFavorites(const TaskOptions& options);
+
 /// Writes a line to standard output / standard error, in the terminal's encoding.
 void printLine(const QString& text);
 void printError(const QString& text);

@@ -60,6 +60,12 @@ struct CommandLine {
   bool remove = false;
   bool check = false;
   bool diff = false;
+  // tasks and favorites.
+  std::string project;
+  std::string taskAction;
+  std::string taskName;
+  std::string taskText;
+  qint32 taskId = 0;
   // Which of the numeric options the user gave.
   bool startGiven = false;
   bool intervalGiven = false;
@@ -89,6 +95,11 @@ struct CommandLine {
     options.diff = diff;
     return options;
   }
+
+  TaskOptions taskOptions() const {
+    return {QString::fromLocal8Bit(project), QString::fromLocal8Bit(taskAction),
+            QString::fromLocal8Bit(taskName), QString::fromLocal8Bit(taskText), taskId};
+  }
 };
 
 // The option groups a command takes.
@@ -99,6 +110,8 @@ enum Takes : unsigned {
   kIndentation = 8,  // --tabs, --spaces
   kRemove = 16,      // --remove
   kOutput = 32,      // --check, --diff
+  kProject = 64,     // one project file instead of files
+  kTaskActions = 128,
 };
 
 struct Command {
@@ -129,9 +142,35 @@ const Command kCommands[] = {
      "own.",
      kTransform | kNumbering | kIndentation | kRemove,
      [](const CommandLine& c) { return runNumIndent(c.transformOptions()); }},
+    {"tasks",
+     "List the project's tasks, or change them: add NAME [--text TEXT], done ID, undone ID, remove ID "
+     "(the info file the add-in keeps beside the project).",
+     kProject | kTaskActions, [](const CommandLine& c) { return runTasks(c.taskOptions()); }},
+    {"favorites", "List the project's favorites: module, procedure and line.", kProject,
+     [](const CommandLine& c) { return runFavorites(c.taskOptions()); }},
 };
 
+void addTaskActions(CLI::App& app, CommandLine& line) {
+  app.require_subcommand(0, 1);
+  auto* add = app.add_subcommand("add", "Add a task");
+  add->add_option("name", line.taskName, "The task's name")->required();
+  add->add_option("--text", line.taskText, "Its description");
+  add->callback([&line] { line.taskAction = "add"; });
+  const std::pair<const char*, const char*> kActions[] = {
+      {"done", "Tick a task off"}, {"undone", "Mark a task as not done"}, {"remove", "Remove a task"}};
+  for (const auto& [action, description] : kActions) {
+    auto* sub = app.add_subcommand(action, description);
+    sub->add_option("id", line.taskId, "The task's number, as the list shows it")->required();
+    sub->callback([&line, action] { line.taskAction = action; });
+  }
+}
+
 void addOptions(CLI::App& app, unsigned takes, CommandLine& line) {
+  if (takes & kProject) {
+    app.add_option("project", line.project, "Project file (.vbp)")->required();
+    if (takes & kTaskActions) addTaskActions(app, line);
+    return;
+  }
   app.add_option("files", line.files, "Group (.vbg), project (.vbp) or module files")->required();
   if (takes & kTsv)
     app.add_flag("--tsv", line.tsv, "One tab-separated row per component and per procedure, for scripts");

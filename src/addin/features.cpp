@@ -1,12 +1,20 @@
 // SPDX-License-Identifier: MIT
 // The one place that says what each feature area does today. Numbering and indentation open their dialogs;
-// the keyboard macros and the copy buffers open theirs and take their hotkeys. Every other area is not part
-// of the add-in yet: its command and its events are connected and arrive here, and do nothing until the
-// area lands; no stand-in dialog pretends to be the feature meanwhile.
+// the keyboard macros and the copy buffers open theirs and take their hotkeys; the project info objects keep
+// every project's tasks and favourites. Every other area is not part of the add-in yet: its command and its
+// events are connected and arrive here, and do nothing until the area lands; no stand-in dialog pretends to
+// be the feature meanwhile.
 #include "addin/features.h"
 
+#include "addin/texts.h"
 #include "addin/texttools.h"
+#include "common/errors.h"
 #include "common/settings.h"
+#include "common/strings.h"
+#include "navigation/favorites.h"
+#include "navigation/frmorgfav.h"
+#include "projinfo/frmtasks.h"
+#include "projinfo/projinfos.h"
 #include "transform/dialogs.h"
 
 #include <QWidget>
@@ -17,15 +25,48 @@ namespace {
 class AddInFeatures final : public Features {
  public:
   explicit AddInFeatures(const FeatureServices& services)
-      : m_vbe(services.vbe), m_settings(services.settings), m_textTools(services) {}
+      : m_vbe(services.vbe),
+        m_settings(services.settings),
+        m_textTools(services),
+        m_projInfos(projInfoServices(services)) {
+    // The projects open when the add-in starts get their info objects now; one that fails is told and
+    // the others (and the add-in) go on.
+    for (const auto& project : m_vbe->VBProjects()->items()) {
+      try {
+        m_projInfos.projectAdded(project);
+      } catch (const std::exception& failure) {
+        common::recordError(failure, QStringLiteral("Features"), QStringLiteral("Startup"), __LINE__);
+        common::logLastError();
+        m_vbe->Platform().ui().MsgBox(QString::fromUtf16(kUndeterminedError), ide::mb::Critical,
+                                      common::title());
+      }
+    }
+  }
 
   void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
   void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
 
-  // Not there yet: the favourites.
-  void showFavorites() override {}
-  void addFavorite(const FavoritePlace&) override {}
-  void componentRenamed(const ide::Ref<ide::VBComponent>&, const QString&) override {}
+  // Favourites and tasks, of the active project.
+  void showFavorites() override {
+    if (projinfo::CProjInfo* info = activeInfo())
+      if (auto* favorites = dynamic_cast<navigation::CFavorites*>(info->Favorites())) favorites->Show();
+  }
+  void showTaskList() override {
+    if (projinfo::CProjInfo* info = activeInfo())
+      if (projinfo::CTaskList* tasks = info->TaskList()) tasks->Show();
+  }
+  void addFavorite(const FavoritePlace& place) override {
+    ide::Ref<ide::VBProject> project = place.project;
+    try {
+      if (place.component) project = place.component->Collection()->Parent();
+    } catch (const std::exception&) {
+    }
+    projinfo::CProjInfo* info = project ? m_projInfos.item(project) : nullptr;
+    if (info && !info->isOpen()) return tell(info->unavailable());
+    auto* favorites = info ? dynamic_cast<navigation::CFavorites*>(info->Favorites()) : nullptr;
+    if (!favorites) return tell(common::LoadResString(kAddFavoriteFailed), ide::mb::Information);
+    favorites->AddPlace(place.component, place.procName, place.procKind, place.line);
+  }
   void showMacros() override { m_textTools.showMacros(); }
   void showCopyBuffers() override { m_textTools.showCopyBuffers(); }
   HotKeyClient* copyBuffers() override { return m_textTools.copyBuffers(); }
@@ -34,8 +75,6 @@ class AddInFeatures final : public Features {
   void showExtendedFind() override {}
   void findWindowProjectRemoved(const ide::Ref<ide::VBProject>&) override {}
   void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>&) override {}
-  // Not there yet: the task list.
-  void showTaskList() override {}
   // Not there yet: the new-procedure wizard.
   void showNewProcedure() override {}
   // Not there yet: the options dialog and the designer actions.
@@ -43,21 +82,62 @@ class AddInFeatures final : public Features {
   void componentAdded(const ide::Ref<ide::VBComponent>&) override {}
   void controlAdded(const ide::Ref<ide::VBControl>&) override {}
   void controlRenamed(const ide::Ref<ide::VBControl>&, const QString&, int) override {}
-  // Not there yet: the project identity and info files (which also hold the favourites).
-  void projectAdded(const ide::Ref<ide::VBProject>&) override {}
-  void projectRemoved(const ide::Ref<ide::VBProject>&) override {}
+  // The project identity and info files. A project's entry follows the project object, so a rename
+  // changes nothing.
+  void projectAdded(const ide::Ref<ide::VBProject>& project) override { m_projInfos.projectAdded(project); }
+  void projectRemoved(const ide::Ref<ide::VBProject>& project) override {
+    m_projInfos.projectRemoved(project);
+  }
   void projectRenamed(const ide::Ref<ide::VBProject>&, const QString&) override {}
-  void projectFileMoved(const ide::Ref<ide::VBProject>&, const QString&, const QString&) override {}
-  bool isIdentityModule(const ide::Ref<ide::VBComponent>&) override { return false; }
-  void allProjectsClosed() override {}
-  void componentRemoved(const ide::Ref<ide::VBComponent>&) override {}
+  void projectFileMoved(const ide::Ref<ide::VBProject>& project, const QString& newName,
+                        const QString&) override {
+    m_projInfos.projectFileMoved(project, newName);
+  }
+  bool isIdentityModule(const ide::Ref<ide::VBComponent>& component) override {
+    return m_projInfos.isIdentityModule(component);
+  }
+  void allProjectsClosed() override { m_projInfos.closeAll(); }
+  void componentRemoved(const ide::Ref<ide::VBComponent>& component) override {
+    m_projInfos.componentRemoved(component);
+  }
+  void componentRenamed(const ide::Ref<ide::VBComponent>& component, const QString&) override {
+    m_projInfos.componentRenamed(component);
+  }
 
  private:
+  static constexpr int kAddFavoriteFailed = 5084;
+
+  static projinfo::ProjInfoServices projInfoServices(const FeatureServices& services) {
+    projinfo::ProjInfoServices result;
+    result.vbe = services.vbe.get();
+    result.appInfo = services.appInfo;
+    result.appInfoUnavailable = services.appInfoUnavailable;
+    result.createFavorites = [](projinfo::CProjInfo& info) -> std::unique_ptr<projinfo::InfoRecordList> {
+      return std::make_unique<navigation::CFavorites>(
+          info, [](navigation::CFavorites& favorites) { navigation::showFavorites(favorites); });
+    };
+    result.showTasks = [](projinfo::CTaskList& tasks) { projinfo::showTaskList(tasks); };
+    return result;
+  }
+
   QWidget* dialogParent() const { return qobject_cast<QWidget*>(m_vbe->Platform().ui().dialogParent()); }
+  /// The info object of the active project, when its file is open; else the user is told why not.
+  projinfo::CProjInfo* activeInfo() {
+    projinfo::CProjInfo* info = m_projInfos.item(m_vbe->ActiveVBProject());
+    if (info && !info->isOpen()) {
+      tell(info->unavailable());
+      return nullptr;
+    }
+    return info;
+  }
+  void tell(const QString& text, int icon = ide::mb::Exclamation) {
+    if (!text.isEmpty()) m_vbe->Platform().ui().MsgBox(text, icon, common::title());
+  }
 
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
   TextTools m_textTools;
+  projinfo::ProjInfos m_projInfos;
 };
 
 }  // namespace

@@ -330,10 +330,8 @@ void CVBEvents::EvProjectsHandler_ItemRemoved(const ide::Ref<ide::VBProject>& pr
   try {
     Features& features = m_globals.features();
     features.findWindowProjectRemoved(project);
-    if (auto selected = m_vbe.SelectedVBComponent()) {
-      if (selected->Type() != ide::ComponentType::RelatedDocument && !features.isIdentityModule(selected))
-        componentRemoved(selected);
-    }
+    // Closing a project removes none of its components: their favourites stay in its info file (and the
+    // history goes as a whole below).
     features.projectRemoved(project);
     m_globals.Histories().ClearHistories(navigation::CA_TOTAL);
     // The IDE announces the removal while the project is still listed.

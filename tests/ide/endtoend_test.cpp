@@ -169,8 +169,11 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
   for (auto it = before.cbegin(); it != before.cend(); ++it)
     if (after.value(it.key()) != it.value()) changed << it.key();
   if (hasAddIn()) {
-    EXPECT_EQ(changed,
-              (QStringList{QStringLiteral("Loja/Loja.vbp"), QStringLiteral("Loja/modPrincipal.bas")}));
+    // The add-in gave each project its identifier module, saved with it.
+    EXPECT_EQ(changed, (QStringList{QStringLiteral("Loja/Loja.vbp"), QStringLiteral("Loja/modPrincipal.bas"),
+                                    QStringLiteral("Utilitarios/Utilitarios.vbp")}));
+    EXPECT_TRUE(after.contains(QStringLiteral("Loja/basQMInf000001.bas")));
+    EXPECT_TRUE(after.contains(QStringLiteral("Utilitarios/basQMInf000002.bas")));
     const QStringList lines = QString::fromLatin1(after.value(QStringLiteral("Loja/modPrincipal.bas")))
                                   .split(QStringLiteral("\r\n"));
     // Indenting renumbers too (numbering and indenting run as one command by default), from 10000 in steps
@@ -213,6 +216,69 @@ TEST(EndToEnd, AScriptMistakeIsReportedWithItsLineBeforeAnythingRuns) {
   EXPECT_EQ(session.exitCode, 2);
   EXPECT_TRUE(session.err.contains(scriptPath + QStringLiteral(":2: \"press\" takes 1 argument, not 0")))
       << session.err.toStdString();
+}
+
+TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
+  if (!hasAddIn()) GTEST_SKIP() << "the add-in is not built";
+  ExampleCopy copy;
+  QTemporaryDir work;
+  QProcessEnvironment environment;
+  environment.insert(QStringLiteral("DEMO"), QDir(copy.path(QStringLiteral("."))).absolutePath());
+  environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), work.filePath(QStringLiteral("config")));
+  environment.insert(QStringLiteral("QUIMBEL_DATA_DIR"), work.filePath(QStringLiteral("data")));
+  environment.insert(QStringLiteral("TMPDIR"), work.path());
+  QDir(work.path()).mkpath(QStringLiteral("install"));
+  writeBytes(work.filePath(QStringLiteral("quimbel.conf")),
+             "InstallationPath=" + work.filePath(QStringLiteral("install")).toUtf8() + "\n");
+  environment.insert(QStringLiteral("QUIMBEL_MACHINE_CONFIG"), work.filePath(QStringLiteral("quimbel.conf")));
+  auto session = [&](const QByteArray& script) {
+    const QString path = work.filePath(QStringLiteral("session.qis"));
+    writeBytes(path, script);
+    const Session run =
+        runIde(path, environment, {QStringLiteral("--addin"), QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
+    EXPECT_EQ(run.exitCode, 0) << run.out.toStdString() << run.err.toStdString();
+    return run;
+  };
+  // A task and a favourite; the project closed (and saved) and opened again; the favourite opened.
+  session(
+      "open \"${DEMO}/Loja/Loja.vbp\"\n"
+      "click \"Quimbel 2.2\" \"Lista de Tarefas\"\n"
+      "press cmdAdd\n"
+      "set txtName \"Conferir o frete (urgente)\"\n"
+      "press cmdOK\n"
+      "press cmdClose\n"
+      "wait closed\n"
+      "code Loja.modPrincipal\n"
+      "caret 31 1\n"
+      "wait 300\n"
+      "click \"Code Window\" \"Adicionar aos Favoritos\"\n"
+      "answer Yes\n"
+      "click \"Menu Bar\" File \"Remove Project\"\n"
+      "expect projects 0\n"
+      "open \"${DEMO}/Loja/Loja.vbp\"\n"
+      "click \"Quimbel 2.2\" Favoritos\n"
+      "set lvFavorites Main\n"
+      "key Return\n"
+      "wait closed\n"
+      "saveas \"${DEMO}/Copia/Loja.vbp\"\n");
+  EXPECT_TRUE(QFileInfo::exists(copy.path(QStringLiteral("Copia/qm000001.qmi"))));
+  EXPECT_FALSE(QFileInfo::exists(copy.path(QStringLiteral("Loja/qm000001.qmi"))));
+  // The next session, and the command-line tool, find both beside the saved copy.
+  session(
+      "open \"${DEMO}/Copia/Loja.vbp\"\n"
+      "click \"Quimbel 2.2\" \"Lista de Tarefas\"\n"
+      "set lvTasks \"Conferir o frete (urgente)\"\n"
+      "press cmdClose\n"
+      "wait closed\n"
+      "click \"Quimbel 2.2\" Favoritos\n"
+      "set lvFavorites Main\n"
+      "key Escape\n");
+  QProcess tool;
+  tool.start(QStringLiteral(QUIMBEL_BINARY),
+             {QStringLiteral("tasks"), copy.path(QStringLiteral("Copia/Loja.vbp"))});
+  ASSERT_TRUE(tool.waitForFinished(60000));
+  EXPECT_TRUE(QString::fromUtf8(tool.readAllStandardOutput())
+                  .contains(QStringLiteral("[ ]  Conferir o frete (urgente)")));
 }
 
 }  // namespace

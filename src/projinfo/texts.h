@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: MIT
+// Messages about project info files that have no number in the string table. Brazilian Portuguese, as
+// every text the user reads.
+#pragma once
+
+namespace projinfo {
+
+/// %1 the project, %2 the file, %3 the reason.
+inline constexpr char16_t kCannotOpenInfoFile[] =
+    u"Não foi possível abrir o arquivo de informações do projeto %1, %2: %3.\n\nO arquivo foi deixado "
+    u"como está; as tarefas e os favoritos deste projeto ficam indisponíveis nesta sessão.";
+inline constexpr char16_t kCannotWriteInfoFile[] =
+    u"Não foi possível gravar o arquivo de informações do projeto %1, %2: %3.\n\nAs tarefas e os "
+    u"favoritos continuam disponíveis enquanto o projeto estiver aberto, mas as mudanças não serão "
+    u"guardadas.";
+/// %1 the project, %2 the old place, %3 the new one, %4 the reason.
+inline constexpr char16_t kCannotMoveInfoFile[] =
+    u"Não foi possível levar o arquivo de informações do projeto %1 de %2 para %3: %4.\n\nO arquivo "
+    u"continua onde estava.";
+/// %1 the module, %2 the project, %3 the file.
+inline constexpr char16_t kTieLost[] =
+    u"O módulo %1, que liga o projeto %2 ao seu arquivo de informações (%3), foi removido ou renomeado. "
+    u"O arquivo foi fechado e mantido; as tarefas e os favoritos voltam quando o módulo voltar ao "
+    u"projeto.";
+
+// Reasons.
+inline constexpr char16_t kInUse[] = u"ele está em uso por outro programa (%1)";
+inline constexpr char16_t kNotAnInfoFile[] = u"ele não é um arquivo de informações do Quimbel";
+inline constexpr char16_t kDamaged[] = u"ele está danificado ou incompleto (%1)";
+inline constexpr char16_t kNoAccess[] = u"sem permissão de acesso ao arquivo ou à sua pasta";
+inline constexpr char16_t kExists[] = u"já existe um arquivo com esse nome lá";
+inline constexpr char16_t kOtherFailure[] = u"%1";
+
+}  // namespace projinfo

@@ -1,0 +1,312 @@
+// SPDX-License-Identifier: MIT
+// The compound-file layer: the typed stream layout byte for byte, storages and their elements, files that
+// are damaged or held by another program, independent readers (olefile, libgsf) and a writer killed in
+// the middle of its commits.
+#include "gsforacle.h"
+#include "printers.h"
+#include "projinfo/records.h"
+#include "projinfo/storage/mdlstorage.h"
+#include "testproject.h"
+
+#include <gtest/gtest.h>
+
+#include <QDir>
+#include <QFile>
+#include <QProcess>
+#include <QRandomGenerator>
+#include <QTemporaryDir>
+#include <QThread>
+
+#include <csignal>
+
+namespace projinfo {
+namespace {
+
+using host::test::readBytes;
+using host::test::writeBytes;
+
+/// The failure number of `action` (0 when it does not fail).
+long failure(const std::function<void()>& action, QString* description = nullptr) {
+  return host::test::errorNumberOf(action, description);
+}
+
+std::shared_ptr<Storage> createFile(const QString& path) {
+  bool isNew = true;
+  return OpenOrCreateDocFile(path, isNew, true, false);
+}
+
+/// A file with two task records, committed.
+void writeSample(const QString& path) {
+  auto root = createFile(path);
+  auto tasks = root->CreateStorage(QStringLiteral("TaskList"), kElementMode);
+  for (int id : {1, 2})
+    tasks->CreateStream(QStringLiteral("Task%1").arg(id), kElementMode)
+        ->WriteData(TaskRecord{QStringLiteral("Revisar cálculo %1").arg(id), {}, id == 2, id}.toText());
+  root->CreateStream(QStringLiteral("LastTaskId"), kElementMode)->WriteData(2);
+  root->Commit(0);
+}
+
+TEST(StreamLayout, EachTypeIsWrittenByteForByteAndReadBack) {
+  QTemporaryDir dir;
+  auto root = createFile(dir.filePath(QStringLiteral("a.qmi")));
+  const struct {
+    QVariant value;
+    qint32 code;
+    QByteArray bytes;
+  } kCases[] = {
+      {QVariant::fromValue(qint16(-2)), vbInteger, "\xFE\xFF"},
+      {QVariant::fromValue(qint32(0x01020304)), vbLong, "\x04\x03\x02\x01"},
+      {QVariant::fromValue(1.0f), vbSingle, QByteArray("\x00\x00\x80\x3F", 4)},
+      {QVariant::fromValue(1.5), vbDouble, QByteArray("\x00\x00\x00\x00\x00\x00\xF8\x3F", 8)},
+      {QVariant::fromValue(Currency{12345}), vbCurrency, QByteArray("\x39\x30\x00\x00\x00\x00\x00\x00", 8)},
+      {QVariant::fromValue(dateFromAutomation(2.5)), vbDate,
+       QByteArray("\x00\x00\x00\x00\x00\x00\x04\x40", 8)},
+      {QVariant::fromValue(dateFromAutomation(-1.25)), vbDate,
+       QByteArray("\x00\x00\x00\x00\x00\x00\xF4\xBF", 8)},
+      {QVariant::fromValue(QString()), vbString, QByteArray(4, '\0')},
+      {QVariant::fromValue(u"abc"_qs), vbString, QByteArray("\x03\x00\x00\x00\x61\x00\x62\x00\x63\x00", 10)},
+      {QVariant::fromValue(u"é😀"_qs), vbString, QByteArray("\x03\x00\x00\x00\xE9\x00\x3D\xD8\x00\xDE", 10)},
+      {QVariant::fromValue(true), vbBoolean, "\xFF\xFF"},
+      {QVariant::fromValue(false), vbBoolean, QByteArray(2, '\0')},
+  };
+  for (const auto& c : kCases) {
+    auto stream = root->CreateStream(QStringLiteral("Value"), kElementMode);
+    stream->SetSize(0);
+    EXPECT_GT(stream->WriteData(c.value), 0) << c.value.typeName();
+    EXPECT_EQ(stream->StreamInterface().element->data.toHex(' '), c.bytes.toHex(' ')) << c.value.typeName();
+    stream->SSeek(0);
+    EXPECT_EQ(stream->ReadData(c.code), c.value);
+  }
+  // Bytes are written but not read; types without a layout write nothing; 01 00 is true.
+  auto stream = root->CreateStream(QStringLiteral("Other"), kElementMode);
+  EXPECT_EQ(stream->WriteData(QVariant::fromValue(uchar(7))), 1);
+  EXPECT_EQ(stream->WriteData(QVariant::fromValue(qint64(7))), 0);
+  EXPECT_EQ(stream->WriteBuf(QByteArray("\x01\x00", 2)), 2);
+  stream->SSeek(0);
+  EXPECT_FALSE(stream->ReadData(vbByte).isValid());
+  EXPECT_EQ(stream->position(), 0);
+  stream->SSeek(1);
+  EXPECT_EQ(stream->ReadData(vbBoolean), QVariant(true));
+}
+
+TEST(StreamLayout, AStringCountTheStreamCannotHoldIsDamage) {
+  QTemporaryDir dir;
+  auto root = createFile(dir.filePath(QStringLiteral("a.qmi")));
+  const QByteArray kBad[] = {
+      QByteArray("\xFF\xFF\xFF\xFF", 4),                  // negative
+      QByteArray("\x05\x00\x00\x00\x61\x00", 6),          // five characters, one there
+      QByteArray("\xFF\xFF\xFF\x7F\x61\x00\x62\x00", 8),  // far more than the stream
+      QByteArray("\x02\x00", 2),                          // the count itself cut short
+  };
+  for (const QByteArray& bytes : kBad) {
+    auto stream = root->CreateStream(QStringLiteral("Bad"), kElementMode);
+    stream->SetSize(0);
+    stream->WriteBuf(bytes);
+    stream->SSeek(0);
+    EXPECT_EQ(failure([&] { stream->ReadData(vbString); }), stg::ReadFault) << bytes.toHex().constData();
+    EXPECT_EQ(stream->position(), 0);
+  }
+}
+
+TEST(Storages, ElementsAreCreatedOpenedListedMovedAndDestroyed) {
+  QTemporaryDir dir;
+  auto root = createFile(dir.filePath(QStringLiteral("a.qmi")));
+  auto list = root->CreateStorage(QStringLiteral("TaskList"), kElementMode);
+  EXPECT_EQ(list->Elements().Count(), 0);
+  EXPECT_EQ(list->Parent, root);
+  for (const char* name : {"Task10", "Task2", "Task1"})
+    list->CreateStream(QLatin1StringView(name), kElementMode)->WriteData(u"longer text"_qs);
+  // An existing stream opens at its start; writing overwrites from there.
+  auto again = list->CreateStream(QStringLiteral("TASK2"), kElementMode);
+  EXPECT_EQ(again->position(), 0);
+  again->WriteData(u"x"_qs);
+  again->SSeek(0);
+  EXPECT_EQ(again->ReadData(vbString), QVariant(u"x"_qs));
+  QStringList names;
+  for (const VBSTATSTG& element : list->Elements())
+    names << element.Name();
+  EXPECT_EQ(names, (QStringList{u"Task1"_qs, u"Task2"_qs, u"Task10"_qs})) << "shorter names first";
+  EXPECT_EQ(list->Stat().StorageType(), 1);
+  EXPECT_EQ(list->Elements().Item(1).StorageType(), 2);
+  EXPECT_EQ(failure([&] { list->Elements().Item(4); }), ide::err::SubscriptOutOfRange);
+
+  list->RenameElement(QStringLiteral("Task10"), QStringLiteral("Task3"));
+  list->MoveElementTo(QStringLiteral("Task3"), root, QStringLiteral("Copy"), STGMOVE_COPY);
+  list->MoveElementTo(QStringLiteral("Task1"), root, QStringLiteral("Moved"), STGMOVE_MOVE);
+  list->DestroyElement(QStringLiteral("Task2"));
+  EXPECT_EQ(failure([&] { again->ReadData(vbString); }), stg::Reverted) << "its element was destroyed";
+  EXPECT_EQ(failure([&] { list->OpenStream(QStringLiteral("Task1"), kElementMode); }), stg::FileNotFound);
+  EXPECT_EQ(failure([&] { root->CreateStream(QStringLiteral("TaskList"), kElementMode); }),
+            stg::FileAlreadyExists);
+  EXPECT_EQ(failure([&] { root->CreateStream(QStringLiteral("a/b"), kElementMode); }), stg::InvalidName);
+  EXPECT_EQ(failure([&] { list->MoveElementTo(QStringLiteral("Task3"), list, QStringLiteral("Task3"), 0); }),
+            stg::FileAlreadyExists);
+  EXPECT_EQ(root->OpenStream(QStringLiteral("Copy"), kElementMode)->ReadData(vbString),
+            QVariant(u"longer text"_qs));
+
+  // A revert goes back to the last commit.
+  root->Commit(0);
+  root->CreateStream(QStringLiteral("Later"), kElementMode);
+  root->Revert();
+  EXPECT_EQ(failure([&] { root->OpenStream(QStringLiteral("Later"), kElementMode); }), stg::FileNotFound);
+  EXPECT_EQ(failure([&] { list->Elements(); }), stg::Reverted);
+  EXPECT_EQ(root->OpenStorage(QStringLiteral("TaskList"), kElementMode)->Elements().Count(), 1);
+}
+
+TEST(DocFiles, AnExistingFileIsOpenedAsItIsAndHeldByItsFirstWriter) {
+  QTemporaryDir dir;
+  const QString path = dir.filePath(QStringLiteral("qm000001.qmi"));
+  writeSample(path);
+  const QByteArray before = readBytes(path);
+  bool isNew = true;
+  auto root = OpenOrCreateDocFile(path, isNew, true, false);
+  EXPECT_FALSE(isNew);
+  QString why;
+  bool secondIsNew = true;
+  auto second = OpenOrCreateDocFile(path, secondIsNew, true, false);
+  EXPECT_EQ(failure([&] { second->Elements(); }, &why), stg::LockViolation);
+  EXPECT_TRUE(why.contains(path) && why.contains(QStringLiteral("in use by"))) << why.toStdString();
+  // A reader sees the last commit while the writer works.
+  auto tasks = root->OpenStorage(QStringLiteral("TaskList"), kElementMode);
+  tasks->DestroyElement(QStringLiteral("Task1"));
+  EXPECT_EQ(OpenDocFileForReading(path)->OpenStorage(QStringLiteral("TaskList"), 0)->Elements().Count(), 2);
+  tasks.reset();  // destroying a storage commits
+  EXPECT_NE(readBytes(path), before);
+  EXPECT_EQ(OpenDocFileForReading(path)->OpenStorage(QStringLiteral("TaskList"), 0)->Elements().Count(), 1);
+  EXPECT_TRUE(QFile::exists(dir.filePath(QStringLiteral(".qm000001.qmi.lock"))));
+  root.reset();
+  EXPECT_FALSE(QFile::exists(dir.filePath(QStringLiteral(".qm000001.qmi.lock"))));
+}
+
+TEST(DocFiles, DamagedFilesAreRefusedWithAReasonAndLeftAsTheyAre) {
+  QTemporaryDir dir;
+  const QString good = dir.filePath(QStringLiteral("good.qmi"));
+  writeSample(good);
+  const QByteArray sample = readBytes(good);
+  auto patched = [&](int offset, QByteArray bytes) {
+    return QByteArray(sample).replace(offset, bytes.size(), bytes);
+  };
+  const struct {
+    const char* what;
+    QByteArray bytes;
+    long number;
+  } kCases[] = {
+      {"empty", {}, stg::InvalidHeader},
+      {"text", "Type=Exe\r\nName=\"Loja\"\r\n", stg::InvalidHeader},
+      {"cut in the header", sample.left(300), stg::DocFileCorrupt},
+      {"cut after the header", sample.left(512), stg::DocFileCorrupt},
+      {"cut in the data", sample.left(sample.size() - 700), stg::DocFileCorrupt},
+      {"unknown version", patched(0x1A, QByteArray("\x07\x00", 2)), stg::DocFileCorrupt},
+      {"directory sector out of the file", patched(0x30, QByteArray("\x00\x01\x00\x00", 4)),
+       stg::DocFileCorrupt},
+      {"directory chain in a circle", patched(512 + 4 * 1, QByteArray("\x01\x00\x00\x00", 4)),
+       stg::DocFileCorrupt},
+  };
+  for (const auto& c : kCases) {
+    const QString path = dir.filePath(QStringLiteral("bad.qmi"));
+    writeBytes(path, c.bytes);
+    QString why;
+    bool isNew = true;
+    auto root = OpenOrCreateDocFile(path, isNew, true, false);
+    EXPECT_EQ(failure([&] { root->CreateStorage(QStringLiteral("TaskList"), kElementMode); }, &why), c.number)
+        << c.what << ": " << why.toStdString();
+    EXPECT_TRUE(why.contains(path)) << c.what;
+    root.reset();
+    EXPECT_EQ(readBytes(path), c.bytes) << c.what;
+  }
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Independent readers and writers
+
+/// Runs a Python program with Debian's olefile; empty when it is not installed.
+std::optional<QString> olefile(const QString& program, const QStringList& arguments) {
+  QProcess python;
+  python.start(QStringLiteral("/usr/bin/python3"), QStringList{QStringLiteral("-c"), program} + arguments);
+  if (!python.waitForFinished(30000) || python.exitCode() == 3) return std::nullopt;
+  EXPECT_EQ(python.exitCode(), 0) << python.readAllStandardError().toStdString();
+  return QString::fromUtf8(python.readAllStandardOutput());
+}
+
+constexpr char kOlefileProgram[] = R"(
+import struct, sys
+try:
+    import olefile
+except ImportError:
+    sys.exit(3)
+path = sys.argv[1]
+ole = olefile.OleFileIO(path, raise_defects=olefile.DEFECT_INCORRECT)
+for entry in ole.listdir(streams=True, storages=True):
+    print('/'.join(entry))
+data = ole.openstream('TaskList/Task2').read()
+count = struct.unpack('<i', data[:4])[0]
+print(data[4:4 + 2 * count].decode('utf-16-le'))
+print('codepage', ole.get_metadata().codepage)
+ole.close()
+if len(sys.argv) > 2:
+    ole = olefile.OleFileIO(path, write_mode=True)
+    ole.write_stream('TaskList/Task2', data.replace('Revisar'.encode('utf-16-le'), 'Conferi'.encode('utf-16-le')))
+    ole.close()
+)";
+
+TEST(Interop, OlefileReadsWhatWeWriteAndWeReadWhatItRewrote) {
+  QTemporaryDir dir;
+  const QString path = dir.filePath(QStringLiteral("qm000001.qmi"));
+  writeSample(path);
+  const auto listing = olefile(QString::fromLatin1(kOlefileProgram), {path, QStringLiteral("rewrite")});
+  if (!listing) GTEST_SKIP() << "python3-olefile is not installed";
+  EXPECT_EQ(listing->split(u'\n', Qt::SkipEmptyParts),
+            (QStringList{u"\x05"
+                         "DocumentSummaryInformation"_qs,
+                         u"\x05SummaryInformation"_qs, u"LastTaskId"_qs, u"TaskList"_qs, u"TaskList/Task1"_qs,
+                         u"TaskList/Task2"_qs, TaskRecord{u"Revisar cálculo 2"_qs, {}, true, 2}.toText(),
+                         u"codepage 1252"_qs}));
+  auto tasks = OpenDocFileForReading(path)->OpenStorage(QStringLiteral("TaskList"), 0);
+  EXPECT_EQ(
+      TaskRecord::fromText(tasks->OpenStream(QStringLiteral("Task2"), 0)->ReadData(vbString).toString()).Name,
+      u"Conferi cálculo 2"_qs);
+}
+
+TEST(Interop, LibgsfReadsWhatWeWriteAndWeReadWhatItWrites) {
+  QTemporaryDir dir;
+  const QString ours = dir.filePath(QStringLiteral("ours.qmi"));
+  writeSample(ours);
+  EXPECT_EQ(test::gsfTree(QFile::encodeName(ours).toStdString()),
+            (std::vector<std::string>{"\x05"
+                                      "DocumentSummaryInformation 116",
+                                      "\x05SummaryInformation 72", "LastTaskId 4", "TaskList/",
+                                      "TaskList/Task1 134", "TaskList/Task2 136"}));
+  const QString theirs = dir.filePath(QStringLiteral("theirs.qmi"));
+  ASSERT_TRUE(test::gsfWriteTasks(QFile::encodeName(theirs).toStdString(), 300));
+  auto tasks = OpenDocFileForReading(theirs)->OpenStorage(QStringLiteral("TaskList"), 0);
+  EXPECT_EQ(tasks->Elements().Count(), 300);
+  EXPECT_EQ(tasks->OpenStream(QStringLiteral("Task299"), 0)->ReadData(vbString),
+            QVariant(u"[Name](Tarefa 299)"_qs));
+  EXPECT_EQ(tasks->OpenStream(QStringLiteral("Task7"), 0)->Stat().size(), 5000)
+      << "a stream of its own sectors";
+}
+
+TEST(Commits, AWriterKilledAtAnyMomentLeavesTheOldOrTheNewFile) {
+  QTemporaryDir dir;
+  const QString path = dir.filePath(QStringLiteral("qm000001.qmi"));
+  for (int round = 0; round < 6; ++round) {
+    QProcess worker;
+    worker.start(QStringLiteral(QUIMBEL_PROJINFO_WORKER), {path, QStringLiteral("100000")});
+    ASSERT_TRUE(worker.waitForReadyRead(20000)) << worker.readAllStandardError().toStdString();
+    QThread::msleep(QRandomGenerator::global()->bounded(5, 60));
+    ::kill(static_cast<pid_t>(worker.processId()), SIGKILL);
+    worker.waitForFinished();
+    // Every task the counter promises is there and readable; nothing else is.
+    auto root = OpenDocFileForReading(path);
+    const qint32 last = root->OpenStream(QStringLiteral("LastTaskId"), 0)->ReadData(vbLong).toInt();
+    auto tasks = root->OpenStorage(QStringLiteral("TaskList"), 0);
+    ASSERT_EQ(tasks->Elements().Count(), last) << "round " << round;
+    EXPECT_EQ(TaskRecord::fromText(
+                  tasks->OpenStream(QStringLiteral("Task%1").arg(last), 0)->ReadData(vbString).toString())
+                  .ItemId,
+              last);
+  }
+}
+
+}  // namespace
+}  // namespace projinfo
