@@ -83,6 +83,33 @@ constexpr Entry kStrings[] = {
     {5147, u"Posição do Cursor {C}"},
     {5148, u"Inserir Data {Date}"},
     {5149, u"Inserir Hora {Time}"},
+
+    // Extended find.
+    {5003, u"Localizar Estendido"},
+    {5004, u"Localizar em:"},
+    {5005, u"Localizar texto:"},
+    {5006, u"&Tudo"},
+    {5007, u"&Projeto Ativo"},
+    {5008, u"&Módulo Ativo"},
+    {5009, u"Pala&vras Inteiras"},
+    {5010, u"Dife&renciar maiúsculas de minúsculas"},
+    {5011, u"Usar caracteres cur&inga"},
+    {5012, u"Parar Pe&squisa"},
+    {5013, u"&Localizar"},
+    {5014, u"&Fechar"},
+    {5015, u"Resultados:"},
+    {5064, u"Projeto"},
+    {5065, u"Módulo"},
+    {5066, u"Procedimento"},
+    {5067, u"Texto Localizado"},
+    {5110, u"Erro na localização de texto."},
+    {5111, u"O item seleciondado pertence a um projeto não localizado."},
+    {5112, u"Não foi possível abrir a janela de código de"},
+    {5113, u"no projeto ativo."},
+    {5131, u"Pesquisando ..."},
+    {5132, u"Resultados da pesquisa em"},
+    {5133, u"Pesquisa completada ..."},
+    {5134, u"linhas localizadas"},
 };
 // clang-format on
 
