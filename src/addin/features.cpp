@@ -1,12 +1,16 @@
 // SPDX-License-Identifier: MIT
-// The one place that says what each feature area does today. Numbering and indentation open their dialogs.
-// Every other area is not part of the add-in yet: its command and its events are connected and arrive
-// here, and do nothing until the area lands; no stand-in dialog pretends to be the feature meanwhile.
+// The one place that says what each feature area does today. Numbering and indentation open their dialogs;
+// the extended find shows its window, which lives until the add-in shuts down. Every other area is not part
+// of the add-in yet: its command and its events are connected and arrive here, and do nothing until the area
+// lands; no stand-in dialog pretends to be the feature meanwhile.
 #include "addin/features.h"
 
+#include "addin/envutils.h"
 #include "common/settings.h"
+#include "find/frmfind.h"
 #include "transform/dialogs.h"
 
+#include <QPointer>
 #include <QWidget>
 
 namespace addin {
@@ -16,6 +20,8 @@ class AddInFeatures final : public Features {
  public:
   explicit AddInFeatures(const FeatureServices& services)
       : m_vbe(services.vbe), m_settings(services.settings) {}
+  // The find window is a child of the IDE's window when there is one, which may have deleted it already.
+  ~AddInFeatures() override { delete m_findForm.data(); }
 
   void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
   void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
@@ -29,10 +35,13 @@ class AddInFeatures final : public Features {
   void showCopyBuffers() override {}
   HotKeyClient* copyBuffers() override { return nullptr; }
   HotKeyClient* macros() override { return nullptr; }
-  // Not there yet: the extended find.
-  void showExtendedFind() override {}
-  void findWindowProjectRemoved(const ide::Ref<ide::VBProject>&) override {}
-  void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>&) override {}
+  void showExtendedFind() override;
+  void findWindowProjectRemoved(const ide::Ref<ide::VBProject>& project) override {
+    if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfProject(project->Name());
+  }
+  void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>& component) override {
+    if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfComponent(component->Name());
+  }
   // Not there yet: the task list.
   void showTaskList() override {}
   // Not there yet: the new-procedure wizard.
@@ -56,7 +65,19 @@ class AddInFeatures final : public Features {
 
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
+  QPointer<find::frmFind> m_findForm;
 };
+
+void AddInFeatures::showExtendedFind() {
+  if (!m_findForm) m_findForm = new find::frmFind(m_vbe, dialogParent());
+  // The code window's selection is the text to look for.
+  QString selected;
+  try {
+    selected = CEnvUtils(*m_vbe).GetSelectedText();
+  } catch (const std::exception&) {
+  }
+  m_findForm->Show(selected);
+}
 
 }  // namespace
 
