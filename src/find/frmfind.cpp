@@ -38,7 +38,10 @@ QString text(int id) {
 }  // namespace
 
 struct frmFind::Run {
-  explicit Run(ide::EventLoop& loop) : context(QStringLiteral("frmFind"), &loop, nullptr) {}
+  explicit Run(ide::EventLoop& loop) : context(QStringLiteral("frmFind"), &loop, nullptr) {
+    // The IDE's loop decides how often it runs: every yield is offered to it.
+    context.setYieldInterval({});
+  }
   transform::WalkContext context;
   /// The window was destroyed: the search must not touch it again.
   bool windowGone = false;
@@ -208,8 +211,8 @@ void frmFind::cmdFind_Click() {
     vbe->Platform().ui().MsgBox(
         text(kSearchFailed) + u'\n' + QString::number(error.number()) + u' ' + error.description(),
         ide::mb::Exclamation, common::title());
-    if (run->windowGone) return;
   }
+  if (run->windowGone) return;
   m_cmdCancel->setEnabled(false);
   m_cmdFind->setEnabled(true);
   if (!run->closed)
