@@ -125,9 +125,9 @@ frmFind::frmFind(ide::Ref<ide::VBE> vbe, QWidget* parent)
   m_lvList->setEditTriggers(QAbstractItemView::NoEditTriggers);
   m_lvList->setAllColumnsShowFocus(true);
   m_lvList->header()->setStretchLastSection(true);
-  m_lvList->setColumnWidth(0, 110);
-  m_lvList->setColumnWidth(1, 130);
-  m_lvList->setColumnWidth(2, 150);
+  m_lvList->setColumnWidth(0, 100);
+  m_lvList->setColumnWidth(1, 120);
+  m_lvList->setColumnWidth(2, 140);
   m_lvList->viewport()->installEventFilter(this);
   m_sbStatus->setSizeGripEnabled(false);
   m_sbStatus->addWidget(m_statusPanel, 1);
@@ -137,7 +137,7 @@ frmFind::frmFind(ide::Ref<ide::VBE> vbe, QWidget* parent)
   layout->addWidget(m_lblResults);
   layout->addWidget(m_lvList, 1);
   layout->addWidget(m_sbStatus);
-  resize(720, 460);
+  resize(880, 480);
   SetTopMost(*this, true);
 
   connect(m_cmdFind, &QPushButton::clicked, this, &frmFind::cmdFind_Click);
