@@ -4,6 +4,8 @@
 #include "host/code/linesyntax.h"
 #include "ide/error.h"
 
+#include <algorithm>
+
 namespace host {
 namespace {
 
@@ -11,6 +13,12 @@ inline constexpr long kInvalidPattern = 93;
 
 QChar fold(QChar c) {
   return c.toCaseFolded();
+}
+
+/// Simple case folding, with the letters of ASCII (nearly every character of code) done inline.
+inline char16_t foldUnit(char16_t c) {
+  if (c < 0x80) return c >= u'A' && c <= u'Z' ? char16_t(c + 0x20) : c;
+  return QChar(c).toCaseFolded().unicode();
 }
 
 [[noreturn]] void invalidPattern() {
@@ -25,6 +33,17 @@ FindMatcher::FindMatcher(QStringView target, bool wholeWord, bool matchCase, boo
       m_case(matchCase ? Qt::CaseSensitive : Qt::CaseInsensitive) {
   if (!patternSearch) {
     m_text = target.toString();
+    // A text with surrogate pairs is left to QString, which folds pairs as a whole.
+    const bool surrogates =
+        std::any_of(m_text.cbegin(), m_text.cend(), [](QChar c) { return c.isSurrogate(); });
+    if (m_case == Qt::CaseInsensitive && !surrogates && m_text.size() <= 255) {
+      for (const QChar c : m_text)
+        m_folded.append(QChar(foldUnit(c.unicode())));
+      const qsizetype m = m_folded.size();
+      m_skip.fill(quint8(m));
+      for (qsizetype k = 0; k + 1 < m; ++k)
+        m_skip[m_folded[k].unicode() & 0xFF] = quint8(m - 1 - k);
+    }
     return;
   }
   for (qsizetype i = 0; i < target.size(); ++i) {
@@ -71,6 +90,27 @@ FindMatcher::FindMatcher(QStringView target, bool wholeWord, bool matchCase, boo
     }
     m_tokens.push_back(std::move(token));
   }
+}
+
+// Horspool's search over folded characters: lines of code are short and the text is mostly ASCII, where
+// QString's case-insensitive search folds every character through its tables.
+qsizetype FindMatcher::indexOfFolded(QStringView line, qsizetype from) const {
+  const qsizetype m = m_folded.size();
+  const auto* needle = reinterpret_cast<const char16_t*>(m_folded.utf16());
+  const char16_t* text = line.utf16();
+  const char16_t last = needle[m - 1];
+  for (qsizetype i = from + m - 1; i < line.size();) {
+    const char16_t c = foldUnit(text[i]);
+    if (c == last) {
+      const char16_t* start = text + i - (m - 1);
+      qsizetype k = m - 2;
+      while (k >= 0 && foldUnit(start[k]) == needle[k])
+        --k;
+      if (k < 0) return i - (m - 1);
+    }
+    i += m_skip[c & 0xFF];
+  }
+  return -1;
 }
 
 bool FindMatcher::charsEqual(QChar a, QChar b) const {
@@ -177,7 +217,7 @@ std::optional<std::pair<qsizetype, qsizetype>> FindMatcher::findIn(QStringView l
   if (!m_pattern) {
     if (m_text.isEmpty()) return std::nullopt;
     for (qsizetype at = from;;) {
-      const qsizetype found = line.indexOf(m_text, at, m_case);
+      const qsizetype found = m_folded.isEmpty() ? line.indexOf(m_text, at, m_case) : indexOfFolded(line, at);
       if (found < 0 || found + m_text.size() > limit) return std::nullopt;
       const qsizetype end = found + m_text.size();
       if (startAllowed(line, found) && endAllowed(line, end)) return std::pair(found, end);

@@ -8,6 +8,7 @@
 #include <QString>
 #include <QStringView>
 
+#include <array>
 #include <optional>
 #include <utility>
 #include <vector>
@@ -36,6 +37,8 @@ class FindMatcher {
     std::vector<std::pair<QChar, QChar>> ranges;  // [list]: single characters are ranges of one
   };
 
+  /// The next occurrence of the plain text at or after `from`, letter case folded; -1 when there is none.
+  qsizetype indexOfFolded(QStringView line, qsizetype from) const;
   bool tokenMatches(const Token& token, QChar c) const;
   bool charsEqual(QChar a, QChar b) const;
   bool startAllowed(QStringView line, qsizetype start) const;
@@ -43,7 +46,10 @@ class FindMatcher {
   std::optional<std::pair<qsizetype, qsizetype>> findPattern(QStringView line, qsizetype from,
                                                              qsizetype limit) const;
 
-  QString m_text;  // plain search
+  QString m_text;    // plain search
+  QString m_folded;  // the plain text folded, when letter case is ignored
+  /// Horspool's shifts by the low byte of a folded character (shared bytes take the smaller shift).
+  std::array<quint8, 256> m_skip{};
   std::vector<Token> m_tokens;
   bool m_pattern = false;
   bool m_wholeWord = false;
