@@ -29,6 +29,7 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QHash>
+#include <QStringBuilder>
 
 #include <algorithm>
 #include <array>
@@ -175,6 +176,7 @@ struct Occurrence {
 struct ScannedModule {
   QString name;
   std::vector<Occurrence> occurrences;
+  QByteArray rows;  // as printed
 };
 
 /// One line of a file: where its text's bytes are (without the line end), the line end, its number.
@@ -403,28 +405,37 @@ KeptLines keptLines(const QByteArray& bytes, const QString& path, const Search& 
   std::vector<LineSpan> statement;
   std::vector<bool> statementCandidates;
   bool structural = false;
+  bool anyCandidate = false;
+  const auto keep = [&](const LineSpan& line, bool holdsCandidate, bool first) {
+    QString text = decode(line);
+    if (first && declarations && host::classifyStatement(text) == host::LineClass::ProcHeader)
+      declarations = false;
+    kept.add(std::move(text), line.end, line.number, holdsCandidate);
+  };
   const auto take = [&](const LineSpan& line) {
     bool holdsCandidate = false;
     if (candidate >= 0 && candidate < line.start + line.length) {
       holdsCandidate = true;
       candidate = search.needle->indexIn(data, bytes.size(), line.start + line.length);
     }
-    if (statement.empty()) structural = mayBeStructural(data + line.start, line.length);
-    statement.push_back(line);
-    statementCandidates.push_back(holdsCandidate);
-    if (continuesBytes(data + line.start, line.length)) return;
-    const bool anyCandidate =
-        std::find(statementCandidates.begin(), statementCandidates.end(), true) != statementCandidates.end();
-    if (declarations || structural || anyCandidate) {
-      for (size_t i = 0; i < statement.size(); ++i) {
-        QString text = decode(statement[i]);
-        if (i == 0 && declarations && host::classifyStatement(text) == host::LineClass::ProcHeader)
-          declarations = false;
-        kept.add(std::move(text), statement[i].end, statement[i].number, statementCandidates[i]);
+    const bool continues = continuesBytes(data + line.start, line.length);
+    if (statement.empty()) {
+      structural = mayBeStructural(data + line.start, line.length);
+      if (!continues) {  // a statement of one line, as nearly all are
+        if (declarations || structural || holdsCandidate) keep(line, holdsCandidate, true);
+        return;
       }
     }
+    statement.push_back(line);
+    statementCandidates.push_back(holdsCandidate);
+    anyCandidate = anyCandidate || holdsCandidate;
+    if (continues) return;
+    if (declarations || structural || anyCandidate)
+      for (size_t i = 0; i < statement.size(); ++i)
+        keep(statement[i], statementCandidates[i], i == 0);
     statement.clear();
     statementCandidates.clear();
+    anyCandidate = false;
   };
   for (size_t i = headerEnd; i < start.size(); ++i)
     take(start[i]);
@@ -447,7 +458,9 @@ qsizetype countByte(QByteArrayView bytes, char value) {
     quint64 word;
     std::memcpy(&word, bytes.data() + i, 8);
     const quint64 x = word ^ pattern;  // a zero byte where `value` was
-    count += qPopulationCount(~(((x & kLow7) + kLow7) | x | kLow7));
+    // 0x80 where a byte of x is zero; the bytes' low bits added up by one multiplication.
+    const quint64 zeros = ~(((x & kLow7) + kLow7) | x | kLow7);
+    count += qsizetype(((zeros >> 7) * 0x0101010101010101ULL) >> 56);
   }
   for (; i < bytes.size(); ++i)
     count += bytes[i] == value;
@@ -466,7 +479,7 @@ KeptLines keptLines(const QByteArray& bytes, const QString& path, const Search& 
 /// The file's bytes in `buffer`, which keeps its memory from one file to the next.
 const QByteArray& readInto(QByteArray& buffer, const QString& path) {
   QFile file(path);
-  if (QFileInfo(path).isFile() && file.open(QIODevice::ReadOnly)) {
+  if (QFileInfo(path).isFile() && file.open(QIODevice::ReadOnly | QIODevice::Unbuffered)) {
     const qint64 size = file.size();
     buffer.resize(size);
     if (file.read(buffer.data(), size) == size) return buffer;
@@ -517,9 +530,21 @@ ScannedModule scanModule(const QString& path, const Search& search) {
   return result;
 }
 
-/// The text column of a tab-separated row holds no tabs.
-QString tsvField(QString text) {
-  return text.replace(u'\t', u' ');
+/// The module's rows, as they are printed: "path:line:column: text", or tab-separated (project, module,
+/// procedure, line:column in the code module, text without tabs).
+QByteArray formatRows(const ModuleEntry& module, const ScannedModule& scanned, bool tsv) {
+  QString rows;
+  for (const Occurrence& hit : scanned.occurrences) {
+    if (tsv) {
+      rows += module.project % u'\t' % scanned.name % u'\t' % hit.procedure % u'\t' %
+              QString::number(hit.line) % u':' % QString::number(hit.column) % u'\t' %
+              QString(hit.text).replace(u'\t', u' ') % u'\n';
+    } else {
+      rows += module.shownPath % u':' % QString::number(hit.fileLine) % u':' % QString::number(hit.column) %
+              QLatin1StringView(": ") % hit.text % u'\n';
+    }
+  }
+  return rows.toLocal8Bit();
 }
 
 }  // namespace
@@ -543,7 +568,12 @@ int runFind(const FindCommandOptions& options) {
   std::vector<ScannedModule> scanned(modules.size());
   std::vector<std::exception_ptr> failures;
   host::parallelFor(
-      modules.size(), [&](size_t i) { scanned[i] = scanModule(modules[i].path, *search); }, failures);
+      modules.size(),
+      [&](size_t i) {
+        scanned[i] = scanModule(modules[i].path, *search);
+        scanned[i].rows = formatRows(modules[i], scanned[i], options.tsv);
+      },
+      failures);
   for (const std::exception_ptr& failure : failures)
     if (failure) std::rethrow_exception(failure);
 
@@ -555,21 +585,8 @@ int runFind(const FindCommandOptions& options) {
       if (scanned[i].name.compare(options.module, Qt::CaseInsensitive) != 0) continue;
       moduleFound = true;
     }
-    for (const Occurrence& hit : scanned[i].occurrences) {
-      const QString row = options.tsv ? QStringLiteral("%1\t%2\t%3\t%4:%5\t%6")
-                                            .arg(modules[i].project, scanned[i].name, hit.procedure)
-                                            .arg(hit.line)
-                                            .arg(hit.column)
-                                            .arg(tsvField(hit.text))
-                                      : QStringLiteral("%1:%2:%3: %4")
-                                            .arg(modules[i].shownPath)
-                                            .arg(hit.fileLine)
-                                            .arg(hit.column)
-                                            .arg(hit.text);
-      out += row.toLocal8Bit();
-      out += '\n';
-      ++rows;
-    }
+    out += scanned[i].rows;
+    rows += int(scanned[i].occurrences.size());
   }
   if (!moduleFound) {
     printError(QStringLiteral("no module '%1' in the files given").arg(options.module));
