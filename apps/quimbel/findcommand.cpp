@@ -47,56 +47,81 @@ struct ModuleEntry {
   QString shownPath;  // as given for module files, else relative to the current directory
 };
 
-/// Where the files given put their module files, in the order the IDE would list them.
-std::vector<ModuleEntry> modulesOf(const QStringList& files) {
+/// The module files of the files given, in the order the IDE lists them once it has opened the files.
+struct Inputs {
   std::vector<ModuleEntry> modules;
   QStringList projectNames;
-  const QDir here = QDir::current();
-  const auto addProject = [&](const QString& projectFile) {
-    const host::ProjectFile project = host::ProjectFile::parse(host::readFileBytes(projectFile), projectFile);
-    QString name = project.name();
-    if (name.isEmpty()) name = QFileInfo(projectFile).completeBaseName();
-    projectNames << name;
-    const QString directory = QFileInfo(projectFile).absolutePath();
-    for (const host::ProjectComponent& component : project.components()) {
-      const QString path = host::resolveProjectPath(directory, component.path);
-      if (!QFileInfo::exists(path))
-        ide::raise(ide::err::FileNotFound,
-                   QStringLiteral("%1: file not found: %2").arg(projectFile, component.path));
-      if (component.kind == host::ComponentKind::RelatedDocument ||
-          component.kind == host::ComponentKind::ResourceFile)
-        continue;  // no code
-      modules.push_back({name, path, here.relativeFilePath(path)});
-    }
-  };
-  for (const QString& file : files) {
+  /// A group or project lists a file that is missing (named on standard error as it was met).
+  bool missing = false;
+
+  /// Reads a group, project or module file given on the command line; throws what cannot be read.
+  void add(const QString& file) {
     const QString absolute = QFileInfo(file).absoluteFilePath();
     const QString suffix = QFileInfo(file).suffix().toLower();
     if (suffix == QLatin1StringView("vbg")) {
       const host::GroupFile group = host::GroupFile::parse(host::readFileBytes(absolute), file);
       const QString directory = QFileInfo(absolute).absolutePath();
-      for (const host::GroupProject& entry : group.projects()) {
-        const QString projectFile = host::resolveProjectPath(directory, entry.path);
-        if (!QFileInfo::exists(projectFile))
-          ide::raise(ide::err::FileNotFound,
-                     QStringLiteral("%1: project file not found: %2").arg(file, entry.path));
+      const std::vector<host::GroupProject> projects = group.projects();
+      for (size_t i = 0; i < projects.size(); ++i) {
+        const QString projectFile = host::resolveProjectPath(directory, projects[i].path);
+        // As in the IDE, the group opens without a project that is missing.
+        if (!QFileInfo::exists(projectFile)) {
+          nameMissing(absolute, group.projectLine(int(i)), projects[i].path);
+          continue;
+        }
         addProject(projectFile);
       }
-    } else if (suffix == QLatin1StringView("vbp")) {
-      addProject(absolute);
-    } else {
-      // A module file on its own goes into a new project, named as the IDE names new projects.
-      QString name = QStringLiteral("Project1");
-      for (int n = 2; projectNames.contains(name, Qt::CaseInsensitive); ++n)
-        name = QStringLiteral("Project%1").arg(n);
-      projectNames << name;
-      if (!QFileInfo::exists(absolute))
-        ide::raise(ide::err::FileNotFound, QStringLiteral("File not found: %1").arg(file));
-      modules.push_back({name, absolute, file});
+      return;
+    }
+    if (suffix == QLatin1StringView("vbp")) return addProject(absolute);
+    static const QStringList kModuleSuffixes = {
+        QStringLiteral("bas"), QStringLiteral("cls"), QStringLiteral("frm"), QStringLiteral("ctl"),
+        QStringLiteral("pag"), QStringLiteral("dob"), QStringLiteral("dsr")};
+    if (!kModuleSuffixes.contains(suffix))
+      ide::raise(ide::err::InvalidFileFormat,
+                 QStringLiteral("not a project group, project or module file (.vbg, .vbp, .%1)")
+                     .arg(kModuleSuffixes.join(QStringLiteral(", ."))));
+    if (!QFileInfo::exists(absolute)) ide::raise(ide::err::FileNotFound, QStringLiteral("file not found"));
+    // A module file on its own goes into a new project, named as the IDE names new projects.
+    QString name = QStringLiteral("Project1");
+    for (int n = 2; projectNames.contains(name, Qt::CaseInsensitive); ++n)
+      name = QStringLiteral("Project%1").arg(n);
+    projectNames << name;
+    modules.push_back({name, absolute, file});
+  }
+
+ private:
+  void addProject(const QString& projectFile) {
+    const host::ProjectFile project = host::ProjectFile::parse(host::readFileBytes(projectFile), projectFile);
+    QString name = project.name();
+    if (name.isEmpty()) name = QFileInfo(projectFile).completeBaseName();
+    projectNames << name;
+    const QString directory = QFileInfo(projectFile).absolutePath();
+    const QDir here = QDir::current();
+    const std::vector<host::ProjectComponent> components = project.components();
+    for (size_t i = 0; i < components.size(); ++i) {
+      const QString path = host::resolveProjectPath(directory, components[i].path);
+      // As in the IDE, the project opens without a file that is missing; its entry stays.
+      if (!QFileInfo::exists(path)) {
+        nameMissing(projectFile, project.componentLine(int(i)), components[i].path);
+        continue;
+      }
+      if (components[i].kind == host::ComponentKind::RelatedDocument ||
+          components[i].kind == host::ComponentKind::ResourceFile)
+        continue;  // no code
+      modules.push_back({name, path, here.relativeFilePath(path)});
     }
   }
-  return modules;
-}
+
+  /// As the other commands name a missing file: the group or project file from here, the entry's line.
+  void nameMissing(const QString& listedIn, size_t lineIndex, const QString& entry) {
+    printError(QStringLiteral("%1, line %2: file not found: %3")
+                   .arg(QDir::current().relativeFilePath(listedIn))
+                   .arg(lineIndex + 1)
+                   .arg(entry));
+    missing = true;
+  }
+};
 
 /// The search text as Windows-1252 bytes, each standing for every byte of the same letter in the other
 /// case (unless case matters): the lines that can hold an occurrence are found without decoding the file.
@@ -564,7 +589,16 @@ int runFind(const FindCommandOptions& options) {
   }
   if (!options.pattern) search->needle.emplace(options.text, options.matchCase);
 
-  std::vector<ModuleEntry> modules = modulesOf(options.files);
+  Inputs inputs;
+  for (const QString& file : options.files) {
+    try {
+      inputs.add(file);
+    } catch (const ide::Error& error) {
+      printError(QStringLiteral("%1: %2").arg(file, error.description()));
+      return kInputError;
+    }
+  }
+  const std::vector<ModuleEntry>& modules = inputs.modules;
   std::vector<ScannedModule> scanned(modules.size());
   std::vector<std::exception_ptr> failures;
   host::parallelFor(
@@ -574,8 +608,15 @@ int runFind(const FindCommandOptions& options) {
         scanned[i].rows = formatRows(modules[i], scanned[i], options.tsv);
       },
       failures);
-  for (const std::exception_ptr& failure : failures)
-    if (failure) std::rethrow_exception(failure);
+  for (const std::exception_ptr& failure : failures) {
+    if (!failure) continue;
+    try {
+      std::rethrow_exception(failure);
+    } catch (const ide::Error& error) {
+      printError(error.description());  // it names the file, and the line where there is one
+      return kInputError;
+    }
+  }
 
   bool moduleFound = options.module.isEmpty();
   int rows = 0;
@@ -599,7 +640,7 @@ int runFind(const FindCommandOptions& options) {
                               common::LoadResString(5134) + u'\n')
                                  .toLocal8Bit();
   std::fwrite(summary.constData(), 1, size_t(summary.size()), stderr);
-  return rows > 0 ? kSuccess : kNothingFound;
+  return withMissingFiles(rows > 0 ? kSuccess : kNothingFound, inputs.missing);
 }
 
 }  // namespace cli

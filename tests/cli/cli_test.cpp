@@ -627,6 +627,24 @@ TEST(FindCommand, RowsPointAtTheLineAndColumnInTheFile) {
   EXPECT_TRUE(result.out.contains(QStringLiteral("Loja/frmCliente.frm:"))) << result.out.toStdString();
 }
 
+TEST(FindCommand, AMissingFileIsNamedAndTheRestIsSearched) {
+  ExampleCopy example;
+  QFile::remove(example.path(QStringLiteral("Loja/clsPedido.cls")));
+  QFile::remove(example.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
+  Tool tool;
+  const find::FindOptions search{QStringLiteral("pedido")};
+  const Result result =
+      tool.run({QStringLiteral("find"), QStringLiteral("--tsv"), search.text, QStringLiteral("Demo.vbg")},
+               example.path({}));
+  EXPECT_EQ(result.code, 5);
+  EXPECT_EQ(lines(result.out), modelRows(example.groupFile(), search));
+  EXPECT_TRUE(
+      result.err.contains(QStringLiteral("Demo.vbg, line 3: file not found: Utilitarios\\Utilitarios.vbp")))
+      << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Loja/Loja.vbp, line 9: file not found: clsPedido.cls")))
+      << result.err.toStdString();
+}
+
 TEST(FindCommand, BadSearchesAndBadInput) {
   Workspace work;
   Tool tool;
