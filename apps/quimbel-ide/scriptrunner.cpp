@@ -28,7 +28,6 @@
 #include <QKeySequence>
 #include <QLineEdit>
 #include <QListWidget>
-#include <QMenu>
 #include <QMessageBox>
 #include <QPlainTextEdit>
 #include <QProcessEnvironment>
@@ -398,6 +397,26 @@ struct ScriptRunner::Commands {
     }
   }
 
+  static void doubleClick(ScriptRunner& runner, const QStringList& args) {
+    QWidget* widget = runner.findWidget(args[0]);
+    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[0])};
+    auto* view = qobject_cast<QAbstractItemView*>(widget);
+    if (!view) fail(QStringLiteral("\"%1\" is not a list").arg(args[0]));
+    QAbstractItemModel* model = view->model();
+    QModelIndex found;
+    for (int column = 0; model && column < model->columnCount() && !found.isValid(); ++column) {
+      const QModelIndexList matches = model->match(model->index(0, column), Qt::DisplayRole, args[1], 1,
+                                                   Qt::MatchFixedString | Qt::MatchRecursive);
+      if (!matches.isEmpty()) found = matches.front();
+    }
+    if (!found.isValid()) fail(QStringLiteral("\"%1\" has no item \"%2\"").arg(args[0], args[1]));
+    view->scrollTo(found);
+    const QPoint at = view->visualRect(found).center();
+    // As a mouse does it: a click, then the press that makes it a double-click.
+    QTest::mouseClick(view->viewport(), Qt::LeftButton, {}, at);
+    QTest::mouseDClick(view->viewport(), Qt::LeftButton, {}, at);
+  }
+
   static void press(ScriptRunner& runner, const QStringList& args) {
     QAbstractButton* found = nullptr;
     std::vector<QWidget*> tops = runner.dialogs();
@@ -604,6 +623,7 @@ std::span<const ScriptRunner::Commands::Entry> ScriptRunner::Commands::table() {
       {"property", 2, 2, kBlocked, nullptr, &property},
       {"set", 2, 2, kAlways, nullptr, &set},
       {"press", 1, 1, kAlways, nullptr, &press},
+      {"doubleclick", 2, 2, kBlocked, nullptr, &doubleClick},
       {"answer", 1, 1, kAlways, &checkAnswer, &answer},
       {"save", 0, 0, kBlocked, nullptr, &save},
       {"saveas", 1, 1, kBlocked, nullptr, &saveAs},
@@ -809,11 +829,14 @@ bool ScriptRunner::eventFilter(QObject* watched, QEvent* event) {
 std::vector<QWidget*> ScriptRunner::dialogs() const {
   std::vector<QWidget*> result;
   if (QWidget* modal = QApplication::activeModalWidget()) result.push_back(modal);
-  for (QWidget* top : QApplication::topLevelWidgets())
+  // Windows of their own (an add-in's modeless window too), not splash screens, menus or tooltips.
+  for (QWidget* top : QApplication::topLevelWidgets()) {
+    const Qt::WindowType type = top->windowType();
     if (top->isVisible() && top != &m_window &&
-        std::find(result.begin(), result.end(), top) == result.end() &&
-        !(top->windowFlags() & Qt::SplashScreen) && !qobject_cast<QMenu*>(top))
+        std::find(result.begin(), result.end(), top) == result.end() && type != Qt::SplashScreen &&
+        type != Qt::Popup && type != Qt::ToolTip)
       result.push_back(top);
+  }
   return result;
 }
 

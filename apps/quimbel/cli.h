@@ -19,6 +19,7 @@ namespace cli {
 enum ExitCode : int {
   kSuccess = 0,
   kWouldChange = 1,    // --check found something to change
+  kNothingFound = 1,   // find found no occurrence
   kUsageError = 2,     // bad command line
   kInputError = 3,     // a file could not be read or is not a valid VB6 file
   kOutputError = 4,    // a file could not be written (nothing on disk was damaged), or standard output
@@ -82,6 +83,20 @@ struct TaskOptions {
 
 int runTasks(const TaskOptions& options);
 int runFavorites(const TaskOptions& options);
+
+/// What `quimbel find` takes.
+struct FindCommandOptions {
+  QString text;
+  QStringList files;
+  bool wholeWord = false;
+  bool matchCase = false;
+  bool pattern = false;
+  bool tsv = false;
+  /// Only the modules (components) of this name.
+  QString module;
+};
+
+int runFind(const FindCommandOptions& options);
 
 /// Writes a line to standard output / standard error, in the terminal's encoding.
 void printLine(const QString& text);

@@ -50,6 +50,10 @@ QStringList toQStrings(const std::vector<std::string>& values) {
 // Everything any command can be given; each command reads the part it declared.
 struct CommandLine {
   std::vector<std::string> files;
+  std::string text;
+  bool wholeWord = false;
+  bool matchCase = false;
+  bool pattern = false;
   bool tsv = false;
   std::string module;
   std::string procedure;
@@ -112,6 +116,7 @@ enum Takes : unsigned {
   kOutput = 32,      // --check, --diff
   kProject = 64,     // one project file instead of files
   kTaskActions = 128,
+  kSearch = 256,  // TEXT, --whole-word, --match-case, --pattern, --module
 };
 
 struct Command {
@@ -130,6 +135,15 @@ const Command kCommands[] = {
      kTsv,
      [](const CommandLine& c) {
        return runList({toQStrings(c.files), c.tsv});
+     }},
+    {"find",
+     "List every occurrence of TEXT in the code, as the add-in's extended find does: one "
+     "\"path:line:column: text\" row each (or tab-separated rows with --tsv). Exit 0 when something "
+     "was found, 1 when nothing was.",
+     kTsv | kSearch,
+     [](const CommandLine& c) {
+       return runFind({QString::fromLocal8Bit(c.text), toQStrings(c.files), c.wholeWord, c.matchCase,
+                       c.pattern, c.tsv, QString::fromLocal8Bit(c.module)});
      }},
     {"number", "Add line numbers to the executable lines of every procedure, restarting in each.",
      kTransform | kNumbering, [](const CommandLine& c) { return runNumber(c.transformOptions()); }},
@@ -171,9 +185,20 @@ void addOptions(CLI::App& app, unsigned takes, CommandLine& line) {
     if (takes & kTaskActions) addTaskActions(app, line);
     return;
   }
+  if (takes & kSearch) {
+    app.add_option("text", line.text, "The text to look for")->required();
+    app.add_flag("--whole-word", line.wholeWord, "Only whole words");
+    auto* matchCase = app.add_flag("--match-case", line.matchCase, "Letter case must match");
+    app.add_flag("--pattern", line.pattern, "TEXT holds wildcards: ? * # [list] [!list]")
+        ->excludes(matchCase);
+    app.add_option("--module", line.module, "Only the module (component) of this name");
+  }
   app.add_option("files", line.files, "Group (.vbg), project (.vbp) or module files")->required();
   if (takes & kTsv)
-    app.add_flag("--tsv", line.tsv, "One tab-separated row per component and per procedure, for scripts");
+    app.add_flag("--tsv", line.tsv,
+                 (takes & kSearch) ? "One tab-separated row per occurrence: project, module, procedure, "
+                                     "line:column, text"
+                                   : "One tab-separated row per component and per procedure, for scripts");
   if (takes & kScope) {
     auto* module = app.add_option("--module", line.module, "Only the module (component) of this name");
     auto* procedure = app.add_option("--procedure", line.procedure, "Only this procedure, as MODULE.NAME")
@@ -240,7 +265,8 @@ static int runTool(int argc, char** argv) {
       "quimbel: the Quimbel add-in's batch features for VB6 projects.\n\n"
       "Files are rewritten in place, and only where a line changed. Options left out take the values\n"
       "last chosen in the numbering and indentation dialogs.\n\n"
-      "Exit codes: 0 done, 1 --check found changes, 2 bad command line, 3 unreadable or invalid\n"
+      "Exit codes: 0 done, 1 --check found changes (find: nothing found), 2 bad command line, 3 unreadable "
+      "or invalid\n"
       "input, or code the command cannot rewrite (nothing is written then), 4 a file could not be\n"
       "written, is read-only or was changed by another program since it was read (what was on disk is\n"
       "kept) or standard output failed, 5 files that a group or project lists are missing (each is\n"

@@ -1,22 +1,25 @@
 // SPDX-License-Identifier: MIT
 // The one place that says what each feature area does today. Numbering and indentation open their dialogs;
 // the keyboard macros and the copy buffers open theirs and take their hotkeys; the project info objects keep
-// every project's tasks and favourites. Every other area is not part of the add-in yet: its command and its
-// events are connected and arrive here, and do nothing until the area lands; no stand-in dialog pretends to
-// be the feature meanwhile.
+// every project's tasks and favourites; the extended find shows its window, which lives until the add-in
+// shuts down. Every other area is not part of the add-in yet: its command and its events are connected and
+// arrive here, and do nothing until the area lands; no stand-in dialog pretends to be the feature meanwhile.
 #include "addin/features.h"
 
+#include "addin/envutils.h"
 #include "addin/texts.h"
 #include "addin/texttools.h"
 #include "common/errors.h"
 #include "common/settings.h"
 #include "common/strings.h"
+#include "find/frmfind.h"
 #include "navigation/favorites.h"
 #include "navigation/frmorgfav.h"
 #include "projinfo/frmtasks.h"
 #include "projinfo/projinfos.h"
 #include "transform/dialogs.h"
 
+#include <QPointer>
 #include <QWidget>
 
 namespace addin {
@@ -42,6 +45,8 @@ class AddInFeatures final : public Features {
       }
     }
   }
+  // The find window is a child of the IDE's window when there is one, which may have deleted it already.
+  ~AddInFeatures() override { delete m_findForm.data(); }
 
   void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
   void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
@@ -71,10 +76,13 @@ class AddInFeatures final : public Features {
   void showCopyBuffers() override { m_textTools.showCopyBuffers(); }
   HotKeyClient* copyBuffers() override { return m_textTools.copyBuffers(); }
   HotKeyClient* macros() override { return m_textTools.macros(); }
-  // Not there yet: the extended find.
-  void showExtendedFind() override {}
-  void findWindowProjectRemoved(const ide::Ref<ide::VBProject>&) override {}
-  void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>&) override {}
+  void showExtendedFind() override;
+  void findWindowProjectRemoved(const ide::Ref<ide::VBProject>& project) override {
+    if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfProject(project->Name());
+  }
+  void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>& component) override {
+    if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfComponent(component->Name());
+  }
   // Not there yet: the new-procedure wizard.
   void showNewProcedure() override {}
   // Not there yet: the options dialog and the designer actions.
@@ -138,7 +146,19 @@ class AddInFeatures final : public Features {
   common::SettingsStore& m_settings;
   TextTools m_textTools;
   projinfo::ProjInfos m_projInfos;
+  QPointer<find::frmFind> m_findForm;
 };
+
+void AddInFeatures::showExtendedFind() {
+  if (!m_findForm) m_findForm = new find::frmFind(m_vbe, dialogParent());
+  // The code window's selection is the text to look for.
+  QString selected;
+  try {
+    selected = CEnvUtils(*m_vbe).GetSelectedText();
+  } catch (const std::exception&) {
+  }
+  m_findForm->Show(selected);
+}
 
 }  // namespace
 

@@ -71,7 +71,7 @@ class Features {
   virtual void controlRenamed(const ide::Ref<ide::VBControl>& control, const QString& oldName,
                               int oldIndex) = 0;
 
-  // The extended find window, when it is visible.
+  // A project or component left the IDE: the extended find window, when it is visible, drops its rows.
   virtual void findWindowProjectRemoved(const ide::Ref<ide::VBProject>& project) = 0;
   virtual void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>& component) = 0;
 

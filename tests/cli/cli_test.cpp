@@ -2,7 +2,10 @@
 // The command-line tool end to end: the built binary, run on copies of the example group and on small
 // modules, with settings of its own. Bytes on disk, standard output and error, and exit codes.
 #include "common/settings.h"
+#include "find/findwalk.h"
 #include "generator.h"
+#include "host/files/ansi.h"
+#include "host/model/vbe.h"
 #include "printers.h"
 #include "testproject.h"
 
@@ -541,6 +544,137 @@ TEST(ProgressBar, ALongRunOnATerminalShowsABarOnStandardErrorAndClearsIt) {
   EXPECT_TRUE(result.out.contains(QStringLiteral("%"))) << result.out.toStdString();
   // The last thing written takes the bar off the line again.
   EXPECT_TRUE(result.out.endsWith(u'\r')) << result.out.toStdString();
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Find
+
+/// What the add-in's search lists over the IDE model, as `find --tsv` rows.
+QStringList modelRows(const QString& file, const find::FindOptions& options) {
+  struct Rows final : find::FindReport {
+    QStringList rows;
+    void status(const QString&) override {}
+    void resultsLabel(const QString&) override {}
+    void found(find::FoundRow row) override {
+      rows << QStringLiteral("%1\t%2\t%3\t%4:%5\t%6")
+                  .arg(row.project, row.module, row.procedure)
+                  .arg(row.item.startline)
+                  .arg(row.item.startcol)
+                  .arg(row.text.replace(u'\t', u' '));
+    }
+  } report;
+  auto vbe = host::VbeImpl::create();
+  vbe->open(file);
+  transform::WalkContext context(QStringLiteral("test"), nullptr, nullptr);
+  find::FindWalk(context, *vbe, report).Search(find::SearchScope::AllProjects, options);
+  return report.rows;
+}
+
+QStringList lines(const QString& output) {
+  return output.split(u'\n', Qt::SkipEmptyParts);
+}
+
+TEST(FindCommand, ListsWhatTheAddInListsInTheSameOrder) {
+  ExampleCopy example;
+  QTemporaryDir generated;
+  gen::GeneratorOptions big;
+  big.codeLines = 6000;
+  big.components = 8;
+  big.projects = 2;
+  const QString group = gen::generateProjects(generated.path(), big).groupFile;
+  const find::FindOptions searches[] = {
+      {QStringLiteral("cliente"), true, false, false}, {QStringLiteral("Nome"), false, true, false},
+      {QStringLiteral("aa"), false, false, false},     {QStringLiteral("Valor*"), true, false, true},
+      {QStringLiteral("ação"), false, false, false},   {QStringLiteral("Boolean"), true, false, false},
+      {QStringLiteral("End Sub"), false, false, false}};
+  // Line feeds, a lone carriage return, a hidden attribute, labels and line numbers.
+  const QString mixed = generated.filePath(QStringLiteral("Misto.bas"));
+  writeBytes(mixed,
+             "Attribute VB_Name = \"Misto\"\nOption Explicit\nPublic Function Nome() As String\r"
+             "Attribute Nome.VB_UserMemId = 0\r\n10 Nome = \"A\xE7\xE3o\" ' Nome\n20 GoTo Fim\n"
+             "Fim:\nEnd Function\n' Nome no fim");
+  Tool tool;
+  for (const QString& file : {example.groupFile(), group, mixed}) {
+    for (const find::FindOptions& search : searches) {
+      QStringList arguments{QStringLiteral("find"), QStringLiteral("--tsv"), search.text, file};
+      if (search.wholeWord) arguments << QStringLiteral("--whole-word");
+      if (search.matchCase) arguments << QStringLiteral("--match-case");
+      if (search.patternSearch) arguments << QStringLiteral("--pattern");
+      const Result result = tool.run(arguments);
+      const QStringList expected = modelRows(file, search);
+      EXPECT_EQ(lines(result.out), expected) << arguments.join(u' ').toStdString();
+      EXPECT_EQ(result.code, expected.isEmpty() ? 1 : 0);
+      EXPECT_EQ(result.err,
+                QStringLiteral("Pesquisa completada ... %1 linhas localizadas\n").arg(expected.size()));
+    }
+  }
+}
+
+TEST(FindCommand, RowsPointAtTheLineAndColumnInTheFile) {
+  ExampleCopy example;
+  Tool tool;
+  const Result result = tool.run(
+      {QStringLiteral("find"), QStringLiteral("cliente"), QStringLiteral("Demo.vbg")}, example.path({}));
+  ASSERT_EQ(result.code, 0);
+  for (const QString& row : lines(result.out)) {
+    // path:line:column: text, the line counted in the file (headers and hidden attributes included)
+    const QStringList place = row.section(QStringLiteral(": "), 0, 0).split(u':');
+    ASSERT_EQ(place.size(), 3) << row.toStdString();
+    const QString line =
+        host::decodeAnsi(readBytes(example.path(place[0])).split('\n').value(place[1].toInt() - 1))
+            .chopped(1);
+    EXPECT_EQ(line.trimmed(), row.section(QStringLiteral(": "), 1)) << row.toStdString();
+    EXPECT_EQ(line.mid(place[2].toInt() - 1, 7).toLower(), QStringLiteral("cliente")) << row.toStdString();
+  }
+  EXPECT_TRUE(result.out.contains(QStringLiteral("Loja/frmCliente.frm:"))) << result.out.toStdString();
+}
+
+TEST(FindCommand, AMissingFileIsNamedAndTheRestIsSearched) {
+  ExampleCopy example;
+  QFile::remove(example.path(QStringLiteral("Loja/clsPedido.cls")));
+  QFile::remove(example.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
+  Tool tool;
+  const find::FindOptions search{QStringLiteral("pedido")};
+  const Result result =
+      tool.run({QStringLiteral("find"), QStringLiteral("--tsv"), search.text, QStringLiteral("Demo.vbg")},
+               example.path({}));
+  EXPECT_EQ(result.code, 5);
+  EXPECT_EQ(lines(result.out), modelRows(example.groupFile(), search));
+  EXPECT_TRUE(
+      result.err.contains(QStringLiteral("Demo.vbg, line 3: file not found: Utilitarios\\Utilitarios.vbp")))
+      << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Loja/Loja.vbp, line 9: file not found: clsPedido.cls")))
+      << result.err.toStdString();
+}
+
+TEST(FindCommand, BadSearchesAndBadInput) {
+  Workspace work;
+  Tool tool;
+  const QString find = QStringLiteral("find");
+  Result result = tool.run({find, QStringLiteral("Nada"), work.file});
+  EXPECT_EQ(result.code, 1);
+  EXPECT_EQ(result.err, QStringLiteral("Pesquisa completada ... 0 linhas localizadas\n"));
+  for (const QStringList& arguments :
+       {QStringList{find, QStringLiteral("--pattern"), QStringLiteral("--match-case"), QStringLiteral("P*"),
+                    work.file},
+        QStringList{find, QString(), work.file},
+        QStringList{find, QStringLiteral("--pattern"), QStringLiteral("[abc"), work.file},
+        QStringList{find, QStringLiteral("--module"), QStringLiteral("Nada"), QStringLiteral("x"),
+                    work.file}}) {
+    result = tool.run(arguments);
+    EXPECT_EQ(result.code, 2) << arguments.join(u' ').toStdString();
+    EXPECT_TRUE(result.err.startsWith(QStringLiteral("quimbel: "))) << result.err.toStdString();
+  }
+  EXPECT_TRUE(tool.run({find, QStringLiteral("--pattern"), QStringLiteral("[abc"), work.file})
+                  .err.contains(QStringLiteral("Invalid pattern string")));
+
+  const QString binary = work.dir.filePath(QStringLiteral("Binario.bas"));
+  writeBytes(binary, QByteArray("Attribute VB_Name = \"B\"\r\nSub A()\r\n\0\1\2", 37));
+  result = tool.run({find, QStringLiteral("Preco"), work.file, binary});
+  EXPECT_EQ(result.code, 3);
+  EXPECT_TRUE(result.err.contains(QStringLiteral("Binario.bas, line 3: not a text file")))
+      << result.err.toStdString();
+  EXPECT_TRUE(result.out.isEmpty());
 }
 
 }  // namespace

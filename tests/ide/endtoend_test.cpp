@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 // The program itself in script mode, as a user would run it: under Xvfb when it is installed (else on the
 // offscreen platform), on a copy of the example group. The session opens the group, is refused a broken
-// project, adds and types a module, uses the add-in's toolbar and popup menu when the add-in is built, and
-// saves; the test then reads the files.
+// project, adds and types a module, uses the add-in's toolbar and popup menu (numbering, indentation, the
+// extended find) when the add-in is built, and saves; the test then reads the files.
 #include "testproject.h"
 
 #include <gtest/gtest.h>
@@ -118,7 +118,18 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
         "wait 300\n"
         "key Ctrl+Alt+D\n"
         "type Revisado\n"
-        "expect line 1 \"' modPrincipal: Revisado\"\n");
+        "expect line 1 \"' modPrincipal: Revisado\"\n"
+
+        "# Its extended find lists the new module's lines too, and opens the code window at one of them.\n"
+        "click \"Menu Bar\" Quimbel \"Localizar Estendido\"\n"
+        "wait dialog\n"
+        "set txtSearch Dobro\n"
+        "press cmdFind\n"
+        "wait 300\n"
+        "screenshot dialog \"${OUT}/find.png\"\n"
+        "doubleclick lvList \"Dobro = n * 2\"\n"
+        "expect line 2 \"    Dobro = n * 2\"\n"
+        "press cmdClose\n");
   else
     script += QStringLiteral("expect no-control \"Menu Bar\" Quimbel\n");
   script += QStringLiteral(
@@ -182,6 +193,7 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
     EXPECT_FALSE(lines.filter(QRegularExpression(QStringLiteral("^10005 \\t\\S"))).isEmpty());
     EXPECT_EQ(lines[1], QStringLiteral("' modPrincipal: Revisado"));
     EXPECT_TRUE(QFileInfo::exists(work.filePath(QStringLiteral("shots/numbering.png"))));
+    EXPECT_TRUE(QFileInfo::exists(work.filePath(QStringLiteral("shots/find.png"))));
   } else {
     EXPECT_EQ(changed, QStringList{QStringLiteral("Loja/Loja.vbp")});
   }

@@ -45,9 +45,10 @@ class GroupFile {
   /// Adds "Project=<path>" after the last project line.
   void addProject(const QString& path);
   void removeProject(int index);
+  /// The line index of the project with the given index among projects(); throws when out of range.
+  std::size_t projectLine(int index) const;
 
  private:
-  std::size_t projectLine(int index) const;
 
   std::vector<SourceLine> m_lines;
 };

@@ -89,12 +89,13 @@ class ProjectFile {
   /// Replaces the key's line in the section, or appends it to the section, or appends the section.
   void setSectionValue(const QString& section, const QString& key, const QString& rawValue);
 
+  /// The line index of the component with the given index among components(); throws when out of range.
+  std::size_t componentLine(int index) const;
+
  private:
   /// The index of the first line of the first section (the end of the main part).
   std::size_t mainPartEnd() const;
   std::optional<std::size_t> findKey(QStringView key, std::size_t from, std::size_t to) const;
-  /// The line index of the component with the given index among components(); throws when out of range.
-  std::size_t componentLine(int index) const;
   std::size_t referenceLine(int index) const;
   /// After the last line of the main part that is not blank.
   std::size_t endOfMainEntries() const;

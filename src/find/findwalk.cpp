@@ -1,0 +1,106 @@
+// SPDX-License-Identifier: MIT
+#include "find/findwalk.h"
+
+#include "common/strings.h"
+#include "transform/linetext.h"
+
+#include <algorithm>
+
+namespace find {
+namespace {
+
+// "Pesquisando ...", "Resultados da pesquisa em".
+constexpr int kSearching = 5131;
+constexpr int kResultsIn = 5132;
+
+QString text(int id) {
+  return common::LoadResString(id);
+}
+
+}  // namespace
+
+QString declarationsText() {
+  return QStringLiteral("(Declarations)");
+}
+
+void FindWalk::Search(SearchScope scope, const FindOptions& options) {
+  m_rows = 0;
+  switch (scope) {
+    case SearchScope::AllProjects:
+      for (const auto& project : m_vbe.VBProjects()->items()) {
+        if (m_context.cancelled()) return;
+        m_report.status(text(kSearching));
+        m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+        searchProject(project, options);
+      }
+      return;
+    case SearchScope::ActiveProject: {
+      const auto project = transform::activeProject(m_vbe);
+      m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+      searchProject(project, options);
+      return;
+    }
+    case SearchScope::ActiveModule: {
+      const auto project = transform::activeProject(m_vbe);
+      if (m_context.yieldAndCheck()) return;
+      ide::Ref<ide::CodeModule> module;
+      try {
+        // No selected component, or one without code (a related document), is nothing to search.
+        const auto component = m_vbe.SelectedVBComponent();
+        if (component && component->Type() != ide::ComponentType::RelatedDocument)
+          module = component->CodeModule();
+      } catch (const std::exception&) {
+      }
+      if (module) searchModule(project, module, options);
+      m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+      return;
+    }
+  }
+}
+
+void FindWalk::searchProject(const ide::Ref<ide::VBProject>& project, const FindOptions& options) {
+  transform::forEachCodeModule(m_context, *project, [&](const ide::Ref<ide::CodeModule>& module) {
+    searchModule(project, module, options);
+  });
+}
+
+bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::Ref<ide::CodeModule>& module,
+                            const FindOptions& options) {
+  const auto component = module->Parent();
+  const QString projectName = project->Name();
+  const QString moduleName = component->Name();
+  m_report.status(text(kSearching) + u' ' + moduleName);
+  int line = 1;
+  int column = 1;
+  for (;;) {
+    const int count = module->CountOfLines();
+    if (line > count) return true;
+    const int stretchEnd = std::min(count, line + (kStretchLines - 1));
+    int startLine = line;
+    int startColumn = column;
+    int endLine = stretchEnd;
+    int endColumn = -1;
+    if (!module->Find(options.text, startLine, startColumn, endLine, endColumn, options.wholeWord,
+                      options.matchCase, options.patternSearch)) {
+      if (stretchEnd >= count) return true;
+      line = stretchEnd + 1;
+      column = 1;
+      if (m_context.yieldAndCheck()) return false;
+      continue;
+    }
+    if (m_context.yieldAndCheck()) return false;
+    ide::ProcKind kind = ide::ProcKind::Proc;
+    QString procedure = module->ProcOfLine(startLine, kind);
+    if (procedure.isEmpty()) procedure = declarationsText();
+    const QString lineText = module->Lines(startLine, 1);
+    m_report.found(FoundRow{projectName, moduleName, std::move(procedure),
+                            transform::trimmedView(lineText).toString(),
+                            CItemFound{project, component, startLine, startColumn, endLine, endColumn}});
+    ++m_rows;
+    // One character after the start of this occurrence, so that overlapping ones are listed too.
+    line = startLine;
+    column = startColumn + 1;
+  }
+}
+
+}  // namespace find
