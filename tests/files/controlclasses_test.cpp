@@ -72,9 +72,10 @@ TEST(ControlClassesTest, TablesAreConsistent) {
       if (!property.defaultValue.isValid()) continue;
       if (property.type == PropertyType::Untyped) continue;
       EXPECT_EQ(property.defaultValue.typeId(), typeIds.at(property.type)) << where;
-      if (property.type == PropertyType::Enumerated)
+      if (property.type == PropertyType::Enumerated) {
         EXPECT_FALSE(valueName(property, property.defaultValue.toInt()).isEmpty())
             << "default not listed: " << where;
+      }
     }
   }
 }
