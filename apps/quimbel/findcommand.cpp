@@ -20,8 +20,8 @@
 #include "host/files/fileio.h"
 #include "host/files/groupfile.h"
 #include "host/files/modulefile.h"
+#include "host/files/parallel.h"
 #include "host/files/projectfile.h"
-#include "host/model/parallel.h"
 #include "ide/error.h"
 #include "transform/linetext.h"
 
