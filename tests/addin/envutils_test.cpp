@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 // CEnvUtils: the selected text, the kinds of property procedures, menu items and the IDE's mode.
 #include "addin/envutils.h"
-#include "addin/pictures.h"
 #include "addinfixture.h"
 #include "common/uiutils.h"
 #include "host/model/objects.h"
@@ -74,14 +73,6 @@ TEST(AddMenuItem, AppendsOrInsertsATemporaryButtonWithItsPicture) {
     first->Delete();
   }
   EXPECT_EQ(menu->Controls()->Count(), before) << "released items leave the menu";
-}
-
-TEST(Pictures, EveryCommandHasA16By16Picture) {
-  for (const int number : {2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 15}) {
-    const QImage image = QImage::fromData(pictureData(number));
-    EXPECT_EQ(image.size(), QSize(16, 16)) << number;
-  }
-  EXPECT_TRUE(pictureData(14).isEmpty());
 }
 
 TEST(IdeMode, ReadFromTheStandardBarsContinueAndEnd) {

@@ -51,51 +51,37 @@ TEST(LifeCycle, StartUpPutsTheCommandsIntoTheIdeAndShutDownTakesThemAllAway) {
   EXPECT_EQ(popup->Type(), ide::ControlType::Popup);
   EXPECT_TRUE(popup->Temporary());
   EXPECT_EQ(menuBar->Item(12)->Caption(), QStringLiteral("&Add-Ins"));
-  const QStringList expectedItems{u"Voltar"_qs,
-                                  u"Avançar"_qs,
-                                  u"Favoritos"_qs,
-                                  u"Definir Macros de Teclado"_qs,
-                                  u"Memórias Adicionais Para Cópias"_qs,
-                                  u"Numerar Linhas"_qs,
-                                  u"Indentar Código"_qs,
-                                  u"Fechar Janelas"_qs,
-                                  u"Localizar Estendido"_qs,
-                                  u"Lista de Tarefas"_qs,
-                                  u"Novo Procedimento"_qs,
-                                  u"Opções"_qs,
-                                  u"Ajuda"_qs};
+  // Every command has its menu item and, but for help, its toolbar button with the same caption and
+  // picture: a 16 by 16 image.
   auto items = popup->CommandBar()->Controls();
   ASSERT_EQ(items->Count(), 13);
   for (int i = 1; i <= 13; ++i) {
     auto item = items->Item(i);
-    EXPECT_EQ(item->Caption(), expectedItems[i - 1]);
     EXPECT_EQ(item->Style(), ide::ButtonStyle::IconAndCaption);
     EXPECT_TRUE(item->Temporary());
     EXPECT_TRUE(item->Enabled());
-    EXPECT_FALSE(item->Face().isEmpty()) << i;
+    EXPECT_FALSE(QImage::fromData(item->Face()).isNull()) << i;
   }
+  EXPECT_EQ(items->Item(13)->Caption(), u"Ajuda"_qs);
 
   auto toolbar = ide.vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2"));
   EXPECT_TRUE(toolbar->Visible());
   EXPECT_EQ(toolbar->Position(), ide::BarPosition::Top);
-  const QStringList tags{u"MVBackward"_qs,    u"MVForward"_qs,      u"MVDirectAccess"_qs,
-                         u"MVMacros"_qs,      u"MVCopyBuffers"_qs,  u"MVLinesNumbering"_qs,
-                         u"MVIndentation"_qs, u"MVCloseWindows"_qs, u"MVExtendedFind"_qs,
-                         u"MVNotes"_qs,       u"MVNewProcedure"_qs, u"MVOptions"_qs};
   auto buttons = toolbar->Controls();
   ASSERT_EQ(buttons->Count(), 12);
+  QStringList tags;
   for (int i = 1; i <= 12; ++i) {
     auto button = buttons->Item(i);
-    EXPECT_EQ(button->Tag(), tags[i - 1]);
-    EXPECT_EQ(button->TooltipText(), expectedItems[i - 1]);
+    tags << button->Tag();
+    EXPECT_EQ(button->TooltipText(), items->Item(i)->Caption());
     EXPECT_TRUE(button->Temporary());
     EXPECT_TRUE(button->Visible());
-    // Each picture is a 16 by 16 image; the toolbar's picture of a command is its menu item's picture.
-    const QImage image = QImage::fromData(button->Face());
-    EXPECT_EQ(image.size(), QSize(16, 16)) << i;
+    EXPECT_EQ(QImage::fromData(button->Face()).size(), QSize(16, 16)) << i;
     EXPECT_EQ(button->Face(), items->Item(i)->Face());
   }
-  EXPECT_FALSE(QImage::fromData(items->Item(13)->Face()).isNull());
+  EXPECT_EQ(tags.join(u' '),
+            u"MVBackward MVForward MVDirectAccess MVMacros MVCopyBuffers MVLinesNumbering "
+            u"MVIndentation MVCloseWindows MVExtendedFind MVNotes MVNewProcedure MVOptions");
 
   for (const char* name : {"Code Window", "Code Window (Break)"}) {
     auto first = ide.vbe->CommandBars()->Item(QLatin1StringView(name))->Controls()->Item(1);

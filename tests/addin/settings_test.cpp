@@ -141,25 +141,12 @@ TEST(ErrorConvention, TheCancelCodesEndSilently) {
 // ---------------------------------------------------------------------------------------------------
 // Help
 
-TEST(Help, TheBuildHasAPageForEveryCommandAndHelpContext) {
+TEST(Help, TheBuildHasAPageForEveryHelpContext) {
   const QString share = QStringLiteral(QUIMBEL_BUILD_SHARE_DIR) + u'/';
   for (const int context : {0, 4, 5, 11, 16})
     EXPECT_TRUE(QFileInfo(helpPagePath(share, context)).isFile()) << context;
   EXPECT_EQ(helpPagePath(share, 99), QString());
-  QFile index(helpPagePath(share));
-  ASSERT_TRUE(index.open(QIODevice::ReadOnly));
-  const QString contents = QString::fromUtf8(index.readAll());
-  // The contents page links a page for each command, and each linked page is there.
-  const QStringList commands{u"voltar.html"_qs,   u"avancar.html"_qs,           u"favoritos.html"_qs,
-                             u"macros.html"_qs,   u"memorias.html"_qs,          u"numerar-linhas.html"_qs,
-                             u"indentar.html"_qs, u"fechar-janelas.html"_qs,    u"localizar.html"_qs,
-                             u"tarefas.html"_qs,  u"novo-procedimento.html"_qs, u"opcoes.html"_qs};
-  for (const QString& page : commands) {
-    EXPECT_TRUE(contents.contains(u"href=\""_qs + page)) << page.toStdString();
-    EXPECT_TRUE(QFileInfo(share + u"help/"_qs + page).isFile()) << page.toStdString();
-  }
-  EXPECT_TRUE(
-      QFileInfo(QStringLiteral(QUIMBEL_BUILD_SHARE_DIR) + u"/../../etc/quimbel/quimbel.conf"_qs).isFile());
+  EXPECT_TRUE(QFileInfo(helpPagePath(share)).isFile());
 }
 
 TEST(Help, APageThatIsMissingOrCannotBeOpenedIsReported) {

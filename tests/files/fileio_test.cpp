@@ -3,7 +3,7 @@
 // of each failure, and that a failed write leaves the old file as it was.
 #include "host/files/fileio.h"
 
-#include "ide/error.h"
+#include "testtext.h"
 
 #include <gtest/gtest.h>
 
@@ -23,16 +23,7 @@
 namespace host {
 namespace {
 
-template <typename Action>
-ide::Error expectError(Action&& action) {
-  try {
-    action();
-  } catch (const ide::Error& error) {
-    return error;
-  }
-  ADD_FAILURE() << "no ide::Error thrown";
-  return ide::Error(0, {});
-}
+using testing::expectError;
 
 void writePlainFile(const QString& path, const QByteArray& bytes) {
   QFile file(path);
@@ -64,26 +55,26 @@ TEST_F(FileIoTest, ReadsTheBytesAsTheyAre) {
   const QByteArray bytes("Attribute VB_Name = \"Module1\"\r\n\xE7\xE3o\r\n\x81\x00\xFF", 39);
   writePlainFile(path("Module1.bas"), bytes);
   EXPECT_EQ(readFileBytes(path("Module1.bas")), bytes);
-}
-
-TEST_F(FileIoTest, ReadsAnEmptyFile) {
   writePlainFile(path("empty.bas"), {});
   EXPECT_TRUE(readFileBytes(path("empty.bas")).isEmpty());
 }
 
-TEST_F(FileIoTest, MissingFileIsFileNotFound) {
+TEST_F(FileIoTest, FailuresNameThePathAndTheReason) {
+  ASSERT_TRUE(QDir(m_directory.path()).mkdir(QStringLiteral("Forms")));
   const QString missing = path("Missing.bas");
-  const ide::Error error = expectError([&] { readFileBytes(missing); });
+  ide::Error error = expectError([&] { readFileBytes(missing); });
   EXPECT_EQ(error.number(), ide::err::FileNotFound);
   EXPECT_EQ(error.description(), QStringLiteral("File not found: ") + missing);
-}
 
-TEST_F(FileIoTest, DirectoryIsUnreadable) {
-  ASSERT_TRUE(QDir(m_directory.path()).mkdir(QStringLiteral("Forms")));
-  const ide::Error error = expectError([&] { readFileBytes(path("Forms")); });
+  error = expectError([&] { readFileBytes(path("Forms")); });
   EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
-  EXPECT_TRUE(
-      error.description().startsWith(QStringLiteral("Cannot read ") + path("Forms") + QStringLiteral(": ")))
+  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot read %1: ").arg(path("Forms"))))
+      << error.what();
+
+  const QString target = path("NoSuchFolder/Module1.bas");
+  error = expectError([&] { writeFileAtomically(target, "x"); });
+  EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
+  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot write %1: ").arg(target)))
       << error.what();
 }
 
@@ -101,16 +92,14 @@ TEST_F(FileIoTest, UnreadableFileIsAccessError) {
       << "the reason is given";
 }
 
-TEST_F(FileIoTest, WriteCreatesAFile) {
+TEST_F(FileIoTest, WriteCreatesOrReplacesAFileAndLeavesNoTemporaryFile) {
   writeFileAtomically(path("New.bas"), "Attribute VB_Name = \"New\"\r\n");
   EXPECT_EQ(readPlainFile(path("New.bas")), QByteArray("Attribute VB_Name = \"New\"\r\n"));
-}
-
-TEST_F(FileIoTest, WriteReplacesTheContentAndLeavesNoTemporaryFile) {
   writePlainFile(path("Class1.cls"), "old content that is longer than the new one\r\n");
   writeFileAtomically(path("Class1.cls"), "new\r\n");
   EXPECT_EQ(readPlainFile(path("Class1.cls")), QByteArray("new\r\n"));
-  EXPECT_EQ(QDir(m_directory.path()).entryList(QDir::Files), QStringList{QStringLiteral("Class1.cls")});
+  EXPECT_EQ(QDir(m_directory.path()).entryList(QDir::Files),
+            (QStringList{QStringLiteral("Class1.cls"), QStringLiteral("New.bas")}));
 }
 
 TEST_F(FileIoTest, WriteIntoReadOnlyDirectoryFailsAndKeepsTheOldFile) {
@@ -136,61 +125,41 @@ TEST_F(FileIoTest, WriteIntoReadOnlyDirectoryFailsAndKeepsTheOldFile) {
   EXPECT_EQ(QDir(subdirectory).entryList(QDir::Files), QStringList{QStringLiteral("Form1.frm")});
 }
 
-TEST_F(FileIoTest, WriteIntoMissingDirectoryFails) {
-  const QString target = path("NoSuchFolder/Module1.bas");
-  const ide::Error error = expectError([&] { writeFileAtomically(target, "x"); });
-  EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
-  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot write ") + target + QStringLiteral(": ")))
-      << error.what();
-}
-
-TEST(FileWriteBatchTest, ReplacesEveryFileOnCommitAndLeavesNoTemporaries) {
-  QTemporaryDir dir;
-  const QString a = dir.filePath(QStringLiteral("a.bas"));
-  const QString b = dir.filePath(QStringLiteral("b.bas"));
-  writePlainFile(a, "old a");
-  {
-    FileWriteBatch batch;
-    batch.add({a, "new a", {}});
-    batch.add({b, "new b", {}});
-    EXPECT_EQ(readPlainFile(a), QByteArray("old a"));  // nothing is in place before the commit
-    EXPECT_FALSE(QFile::exists(b));
-    batch.commit();
-  }
-  EXPECT_EQ(readPlainFile(a), QByteArray("new a"));
-  EXPECT_EQ(readPlainFile(b), QByteArray("new b"));
-  EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 2);
-}
-
 TEST(FileWriteBatchTest, FilesAddedTogetherAreAllOrNothing) {
   QTemporaryDir dir;
   std::vector<FileWriteBatch::File> files;
   for (int i = 0; i < 12; ++i) {
     const QString path = dir.filePath(QStringLiteral("m%1.bas").arg(i));
-    writePlainFile(path, "old");
+    if (i > 0) writePlainFile(path, "old");  // m0.bas is new
     files.push_back({path, QByteArray("new ") + QByteArray::number(i), {}});
   }
+  const auto expectOld = [&](const char* when) {
+    EXPECT_FALSE(QFile::exists(files[0].path)) << when;
+    for (std::size_t i = 1; i < files.size(); ++i)
+      EXPECT_EQ(readPlainFile(files[i].path), QByteArray("old")) << when;
+    EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 11) << "a temporary is left";
+  };
   ASSERT_TRUE(QDir().mkpath(dir.filePath(QStringLiteral("in-the-way.bas"))));
-  files.insert(files.begin() + 5, {dir.filePath(QStringLiteral("in-the-way.bas")), "x", {}});
+  std::vector<FileWriteBatch::File> withDirectory = files;
+  withDirectory.insert(withDirectory.begin() + 5, {dir.filePath(QStringLiteral("in-the-way.bas")), "x", {}});
   FileWriteBatch failing;
-  const ide::Error error = expectError([&] { failing.addAll(files); });
+  const ide::Error error = expectError([&] { failing.addAll(withDirectory); });
   EXPECT_TRUE(error.description().contains(QStringLiteral("in-the-way.bas")));
   EXPECT_TRUE(failing.empty());
-  files.erase(files.begin() + 5);
+  expectOld("after a failed add");
   {
     FileWriteBatch abandoned;
     abandoned.addAll(files);
   }
-  for (int i = 0; i < 12; ++i)
-    EXPECT_EQ(readPlainFile(dir.filePath(QStringLiteral("m%1.bas").arg(i))), QByteArray("old"));
-  EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 12);  // no temporary left
+  expectOld("after an abandoned batch");
 
   FileWriteBatch batch;
   batch.addAll(files);
+  expectOld("before the commit");
   batch.commit();
-  for (int i = 0; i < 12; ++i)
-    EXPECT_EQ(readPlainFile(dir.filePath(QStringLiteral("m%1.bas").arg(i))),
-              QByteArray("new ") + QByteArray::number(i));
+  for (const FileWriteBatch::File& file : files)
+    EXPECT_EQ(readPlainFile(file.path), file.bytes);
+  EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 12);
 }
 
 QStringList hiddenFiles(const QString& directory) {

@@ -146,7 +146,9 @@ constexpr std::size_t kBeginIndex = 2;
 
 class FormDescriptionTest : public ::testing::Test {
  protected:
-  void SetUp() override {
+  void SetUp() override { read(); }
+
+  void read() {
     m_bytes = windowsFile(kCustomerForm);
     m_lines = readSourceLines(m_bytes, QStringLiteral("frmCliente.frm"));
     std::size_t position = kBeginIndex;
@@ -310,42 +312,55 @@ TEST(FormDescriptionReadTest, KeepsBlankLinesAndUnusualSpacing) {
 
 // --- Property edits --------------------------------------------------------------------------------------
 
-TEST_F(FormDescriptionTest, ReplacingAValueRewritesOnlyItsLine) {
-  node("txtCampo", 1).setProperty(QStringLiteral("MaxLength"), QStringLiteral("80"));
-  EXPECT_EQ(asText(writtenFile()), asText(replacedOnce(m_bytes, "         MaxLength       =   60\n",
-                                                       "         MaxLength       =   80\n")));
-  EXPECT_EQ(node("txtCampo", 1).property(u"MaxLength"), u"80");
-}
-
-TEST_F(FormDescriptionTest, ReplacingWithTheSameValueChangesNothing) {
-  m_form->root().setProperty(QStringLiteral("StartUpPosition"), QStringLiteral("1"),
-                             QStringLiteral("'CenterOwner"));
-  m_form->root().setProperty(QStringLiteral("caption"),
-                             QString::fromUtf8("\"Cadastro de clientes – edição\""));
-  EXPECT_EQ(asText(writtenFile()), asText(m_bytes));
-}
-
-TEST_F(FormDescriptionTest, ReplacingKeepsTheFilesSpellingOfTheName) {
-  m_form->root().setProperty(QStringLiteral("startupposition"), QStringLiteral("2"),
-                             QStringLiteral("'CenterScreen"));
-  EXPECT_EQ(asText(writtenFile()), asText(replacedOnce(m_bytes, "   StartUpPosition =   1  'CenterOwner\n",
-                                                       "   StartUpPosition =   2  'CenterScreen\n")));
-}
-
-TEST_F(FormDescriptionTest, BooleansLineUpTheirComments) {
-  m_form->root().setProperty(QStringLiteral("KeyPreview"), QStringLiteral("0"), QStringLiteral("'False"));
-  m_form->root().setProperty(QStringLiteral("MaxButton"), QStringLiteral("-1"), QStringLiteral("'True"));
-  QByteArray expected =
-      replacedOnce(m_bytes, "   KeyPreview      =   -1  'True\n", "   KeyPreview      =   0   'False\n");
-  expected =
-      replacedOnce(expected, "   MaxButton       =   0   'False\n", "   MaxButton       =   -1  'True\n");
-  EXPECT_EQ(asText(writtenFile()), asText(expected));
-}
-
-TEST_F(FormDescriptionTest, RemovingAValueDropsTheComment) {
-  m_form->root().setProperty(QStringLiteral("BorderStyle"), QStringLiteral("1"));
-  EXPECT_EQ(asText(writtenFile()), asText(replacedOnce(m_bytes, "   BorderStyle     =   3  'Fixed Dialog\n",
-                                                       "   BorderStyle     =   1\n")));
+// One property set on a freshly read form: only its line changes (or one is inserted), in the IDE's layout.
+TEST_F(FormDescriptionTest, SettingAPropertyRewritesOnlyItsLine) {
+  struct Case {
+    const char* node;  // null: the form
+    int index;
+    const char* property;
+    const char* value;
+    const char* comment;
+    const char* from;  // null: nothing changes
+    const char* to;
+  };
+  const std::vector<Case> cases = {
+      {"txtCampo", 1, "MaxLength", "80", "", "         MaxLength       =   60\n",
+       "         MaxLength       =   80\n"},
+      {nullptr, -1, "StartUpPosition", "1", "'CenterOwner", nullptr, nullptr},
+      {nullptr, -1, "caption", "\"Cadastro de clientes – edição\"", "", nullptr, nullptr},
+      // The file's spelling of the name stays.
+      {nullptr, -1, "startupposition", "2", "'CenterScreen", "   StartUpPosition =   1  'CenterOwner\n",
+       "   StartUpPosition =   2  'CenterScreen\n"},
+      // Boolean comments line up one column further than enumerated ones.
+      {nullptr, -1, "KeyPreview", "0", "'False", "   KeyPreview      =   -1  'True\n",
+       "   KeyPreview      =   0   'False\n"},
+      {nullptr, -1, "MaxButton", "-1", "'True", "   MaxButton       =   0   'False\n",
+       "   MaxButton       =   -1  'True\n"},
+      {nullptr, -1, "BorderStyle", "1", "", "   BorderStyle     =   3  'Fixed Dialog\n",
+       "   BorderStyle     =   1\n"},
+      {"txtObservacao", -1, "ScrollBars", "3", "Both", "      ScrollBars      =   2  'Vertical\n",
+       "      ScrollBars      =   3  'Both\n"},
+      {"lvwContatos", -1, "HideColumnHeaders", "0", "'False", "      HideColumnHeaders=   -1  'True\n",
+       "      HideColumnHeaders=   0   'False\n"},
+      // A new property goes in alphabetical order counting the Font group ("ForeColor" follows it)...
+      {nullptr, -1, "ForeColor", "&H00FF0000&", "", "   EndProperty\n   Icon ",
+       "   EndProperty\n   ForeColor       =   &H00FF0000&\n   Icon "},
+      // ... and one after the last goes before the first control.
+      {nullptr, -1, "WindowState", "2", "'Maximized",
+       "   StartUpPosition =   1  'CenterOwner\n   Begin VB.Frame",
+       "   StartUpPosition =   1  'CenterOwner\n   WindowState     =   2  'Maximized\n   Begin VB.Frame"},
+  };
+  for (const Case& sample : cases) {
+    SCOPED_TRACE(sample.property);
+    read();
+    FormNode& target = sample.node ? node(sample.node, sample.index) : m_form->root();
+    target.setProperty(QString::fromUtf8(sample.property), QString::fromUtf8(sample.value),
+                       QString::fromUtf8(sample.comment));
+    EXPECT_EQ(asText(writtenFile()),
+              asText(sample.from ? replacedOnce(m_bytes, sample.from, sample.to) : m_bytes));
+    EXPECT_EQ(target.property(QString::fromUtf8(sample.property)), QString::fromUtf8(sample.value));
+  }
+  EXPECT_EQ(m_form->root().propertyNames().last(), u"WindowState");
 }
 
 TEST_F(FormDescriptionTest, NewPropertiesGoInAlphabeticalOrderInTheIdesLayout) {
@@ -378,39 +393,15 @@ TEST_F(FormDescriptionTest, NewPropertiesGoInAlphabeticalOrderInTheIdesLayout) {
 )")));
 }
 
-TEST_F(FormDescriptionTest, NewPropertiesCountPropertyGroupsAndStayBeforeControls) {
-  FormNode& root = m_form->root();
-  // "Font" sorts between ClientWidth and Icon, so ForeColor follows the group (and FillColor would precede
-  // it); a property after the last one goes before the first control.
-  root.setProperty(QStringLiteral("ForeColor"), QStringLiteral("&H00FF0000&"));
-  root.setProperty(QStringLiteral("WindowState"), QStringLiteral("2"), QStringLiteral("'Maximized"));
-  QByteArray expected = replacedOnce(m_bytes, "   EndProperty\n   Icon ",
-                                     "   EndProperty\n   ForeColor       =   &H00FF0000&\n   Icon ");
-  expected = replacedOnce(expected, "   StartUpPosition =   1  'CenterOwner\n   Begin VB.Frame",
-                          "   StartUpPosition =   1  'CenterOwner\n   WindowState     =   2  'Maximized\n"
-                          "   Begin VB.Frame");
-  EXPECT_EQ(asText(writtenFile()), asText(expected));
-  EXPECT_EQ(root.propertyNames().last(), u"WindowState");
-}
-
-TEST_F(FormDescriptionTest, LongNamesAndObjectNamesUseTheIdesPadding) {
-  FormNode& list = node("lvwContatos");
-  list.setProperty(QStringLiteral("HideColumnHeaders"), QStringLiteral("0"), QStringLiteral("'False"));
-  list.propertyBlock(u"ColumnHeader(1)")
+TEST_F(FormDescriptionTest, ObjectNamesInPropertyGroupsUseTheIdesPadding) {
+  node("lvwContatos")
+      .propertyBlock(u"ColumnHeader(1)")
       ->setProperty(QStringLiteral("Object.Tag"), QStringLiteral("\"nome\""));
-  QByteArray expected = replacedOnce(m_bytes, "      HideColumnHeaders=   -1  'True\n",
-                                     "      HideColumnHeaders=   0   'False\n");
   // The control's own order is not alphabetical; a new line still goes before the first name after it.
-  expected =
-      replacedOnce(expected, "         Text            =   \"Nome\"\n",
-                   "         Object.Tag             =   \"nome\"\n         Text            =   \"Nome\"\n");
-  EXPECT_EQ(asText(writtenFile()), asText(expected));
-}
-
-TEST_F(FormDescriptionTest, AddsTheCommentApostropheWhenMissing) {
-  node("txtObservacao")
-      .setProperty(QStringLiteral("ScrollBars"), QStringLiteral("3"), QStringLiteral("Both"));
-  EXPECT_EQ(node("txtObservacao").propertyComment(u"ScrollBars"), u"'Both");
+  EXPECT_EQ(asText(writtenFile()),
+            asText(replacedOnce(
+                m_bytes, "         Text            =   \"Nome\"\n",
+                "         Object.Tag             =   \"nome\"\n         Text            =   \"Nome\"\n")));
 }
 
 TEST_F(FormDescriptionTest, RemovesProperties) {

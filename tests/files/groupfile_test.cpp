@@ -30,11 +30,8 @@ class GroupFileTest : public ::testing::Test {
   GroupFile m_group = GroupFile::parse(windowsFile(kGroup), QStringLiteral("Demo.vbg"));
 };
 
-TEST_F(GroupFileTest, WritesBackByteForByte) {
+TEST_F(GroupFileTest, ListsProjectsAndTheStartupProjectAndWritesBackByteForByte) {
   EXPECT_EQ(asText(written()), asText(m_bytes));
-}
-
-TEST_F(GroupFileTest, ListsProjectsAndTheStartupProject) {
   const std::vector<GroupProject> expected = {{QString::fromUtf8("Utilitários\\Utilitarios.vbp"), false},
                                               {QStringLiteral("Loja\\Loja.vbp"), true},
                                               {QStringLiteral("..\\Comum\\Relatorios.vbp"), false}};

@@ -132,23 +132,21 @@ TEST(ModuleFileTest, ClassKeepsItsBeginBlockAndHidesMemberAttributes) {
   ASSERT_EQ(module.moduleAttributes.size(), 6u);
   EXPECT_EQ(module.moduleAttributes[5].text, u"Attribute VB_Ext_KEY = \"SavedWithClassBuilder6\" ,\"Yes\"");
 
-  const std::vector<QString> code = texts(module.code);
-  ASSERT_EQ(code.size(), 13u);
-  EXPECT_EQ(code[0], u"Option Explicit");
-  EXPECT_EQ(code[3], u"Private WithEvents mRelogio As clsRelogio");
-  EXPECT_EQ(code[6], u"Public Property Get Item(ByVal Chave As Variant) As clsPedido");
-  EXPECT_EQ(code[7], u"    Set Item = mCol(Chave)");
-  EXPECT_EQ(code[10], u"Public Function NewEnum() As IUnknown");
-  EXPECT_EQ(code[11], u"    Set NewEnum = mCol.[_NewEnum]");
-
-  ASSERT_EQ(module.memberAttributes.size(), 5u);
-  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 4);
-  EXPECT_EQ(module.memberAttributes[0].line.text, u"Attribute mRelogio.VB_VarHelpID = -1");
-  EXPECT_EQ(module.memberAttributes[1].afterCodeLine, 7);
-  EXPECT_EQ(module.memberAttributes[1].line.text, u"Attribute Item.VB_UserMemId = 0");
-  EXPECT_EQ(module.memberAttributes[2].afterCodeLine, 7);
-  EXPECT_EQ(module.memberAttributes[3].afterCodeLine, 11);
-  EXPECT_EQ(module.memberAttributes[4].line.text, u"Attribute NewEnum.VB_MemberFlags = \"40\"");
+  // The code lines are what the code window shows: no attribute lines among them.
+  ASSERT_EQ(module.code.size(), 13u);
+  EXPECT_EQ(module.code[0].text, u"Option Explicit");
+  EXPECT_EQ(module.code[6].text, u"Public Property Get Item(ByVal Chave As Variant) As clsPedido");
+  EXPECT_EQ(module.code[7].text, u"    Set Item = mCol(Chave)");
+  std::vector<std::pair<int, QString>> attributes;
+  for (const MemberAttributeLine& attribute : module.memberAttributes)
+    attributes.emplace_back(attribute.afterCodeLine, attribute.line.text);
+  EXPECT_EQ(attributes, (std::vector<std::pair<int, QString>>{
+                            {4, "Attribute mRelogio.VB_VarHelpID = -1"},
+                            {7, "Attribute Item.VB_UserMemId = 0"},
+                            {7, QString::fromUtf8("Attribute Item.VB_Description = \"Devolve um pedido pela "
+                                                  "posição ou pela chave.\"")},
+                            {11, "Attribute NewEnum.VB_UserMemId = -4"},
+                            {11, "Attribute NewEnum.VB_MemberFlags = \"40\""}}));
 
   EXPECT_EQ(moduleName(module), u"clsPedidos");
   EXPECT_EQ(asText(writeModule(module, QStringLiteral("clsPedidos.cls"))), asText(bytes));
@@ -171,15 +169,67 @@ TEST(ModuleFileTest, FormHasObjectLinesAndADescription) {
   EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(bytes));
 }
 
-TEST(ModuleFileTest, KeepsUnixAndMixedLineEndsAndAMissingFinalEnd) {
-  for (const QByteArray& bytes :
-       {QByteArray(
-            "Attribute VB_Name = \"m\"\nOption Explicit\nPublic Sub A()\nAttribute A.VB_Description = \"x\"\n"
-            "End Sub"),
-        QByteArray("VERSION 1.0 CLASS\r\nBEGIN\n  MultiUse = -1  'True\rEND\r\nAttribute VB_Name = \"c\"\n"),
-        QByteArray("Attribute VB_Name = \"m\"\r\nAttribute Foo.VB_UserMemId = 0")}) {
-    const ModuleSource module = parseModule(bytes, QStringLiteral("m.bas"));
-    EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))), asText(bytes));
+// Each case turns on one rule of where attribute lines belong; every one writes back byte for byte.
+TEST(ModuleFileTest, SplitsAttributeLinesByRule) {
+  struct Case {
+    const char* rule;
+    QByteArray bytes;
+    const char* name;
+    std::vector<int> memberAttributesAfter;  // code lines before each member attribute
+    std::size_t codeLines;
+  };
+  const std::vector<Case> cases = {
+      {"Unix line ends and no final line end",
+       "Attribute VB_Name = \"m\"\nOption Explicit\nPublic Sub A()\nAttribute A.VB_Description = \"x\"\n"
+       "End Sub",
+       "m",
+       {2},
+       3},
+      {"mixed line ends in a class header",
+       "VERSION 1.0 CLASS\r\nBEGIN\n  MultiUse = -1  'True\rEND\r\nAttribute VB_Name = \"c\"\n",
+       "c",
+       {},
+       0},
+      {"a member attribute as the last line, without its end",
+       "Attribute VB_Name = \"m\"\r\nAttribute Foo.VB_UserMemId = 0",
+       "m",
+       {0},
+       0},
+      {"the word matched case-insensitively and whole",
+       windowsFile("attribute vb_name = \"modX\"\nPublic Sub Total()\n  ATTRIBUTE Total.VB_Description = "
+                   "\"soma\"\n    Attributes = 1\nEnd Sub\n"),
+       "modX",
+       {1},
+       3},
+      {"continued lines are never attributes",
+       windowsFile(
+           "Attribute VB_Name = \"modApi\"\nPrivate Declare Function GetTickCount Lib \"kernel32\" _\n"
+           "    Attribute _\n    () As Long\n' comentário que continua _\nAttribute na linha seguinte\n"),
+       "modApi",
+       {},
+       5},
+      {"a module attribute after the first code line is a member attribute",
+       windowsFile("Attribute VB_Name = \"m\"\nOption Explicit\nAttribute VB_Creatable = False\n"),
+       "m",
+       {1},
+       1},
+      {"member attributes before the first code line stay there",
+       windowsFile("Attribute VB_Name = \"m\"\nAttribute Foo.VB_UserMemId = 0\nOption Explicit\n"),
+       "m",
+       {0},
+       1},
+  };
+  for (const Case& sample : cases) {
+    SCOPED_TRACE(sample.rule);
+    const ModuleSource module = parseModule(sample.bytes, QStringLiteral("m.bas"));
+    EXPECT_EQ(moduleName(module), QString::fromLatin1(sample.name));
+    EXPECT_EQ(module.moduleAttributes.size(), 1u);
+    std::vector<int> after;
+    for (const MemberAttributeLine& attribute : module.memberAttributes)
+      after.push_back(attribute.afterCodeLine);
+    EXPECT_EQ(after, sample.memberAttributesAfter);
+    EXPECT_EQ(module.code.size(), sample.codeLines);
+    EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))), asText(sample.bytes));
   }
 }
 
@@ -190,56 +240,6 @@ TEST(ModuleFileTest, EmptyFileHasNoParts) {
   EXPECT_TRUE(module.code.empty());
   EXPECT_EQ(moduleName(module), u"");
   EXPECT_TRUE(writeModule(module, QStringLiteral("Module1.bas")).isEmpty());
-}
-
-TEST(ModuleFileTest, AttributeWordsAreMatchedCaseInsensitivelyAndAsWholeWords) {
-  const QByteArray bytes = windowsFile(R"(attribute vb_name = "modX"
-Public Sub Total()
-  ATTRIBUTE Total.VB_Description = "soma"
-    Attributes = 1
-End Sub
-)");
-  const ModuleSource module = parseModule(bytes, QStringLiteral("modX.bas"));
-  ASSERT_EQ(module.moduleAttributes.size(), 1u);
-  EXPECT_EQ(moduleName(module), u"modX");
-  ASSERT_EQ(module.memberAttributes.size(), 1u);
-  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 1);
-  EXPECT_EQ(module.code.size(), 3u) << "\"Attributes = 1\" is code";
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("modX.bas"))), asText(bytes));
-}
-
-TEST(ModuleFileTest, ContinuedLinesAreNeverAttributes) {
-  const QByteArray bytes = windowsFile(R"(Attribute VB_Name = "modApi"
-Private Declare Function GetTickCount Lib "kernel32" _
-    Attribute _
-    () As Long
-' comentário que continua _
-Attribute na linha seguinte
-)");
-  const ModuleSource module = parseModule(bytes, QStringLiteral("modApi.bas"));
-  EXPECT_TRUE(module.memberAttributes.empty());
-  EXPECT_EQ(module.code.size(), 5u);
-}
-
-TEST(ModuleFileTest, HeaderAttributesOnlyStartTheFile) {
-  // A module attribute after the first code line is a member attribute like any other.
-  const ModuleSource module = parseModule(windowsFile(R"(Attribute VB_Name = "m"
-Option Explicit
-Attribute VB_Creatable = False
-)"),
-                                          QStringLiteral("m.bas"));
-  EXPECT_EQ(module.moduleAttributes.size(), 1u);
-  ASSERT_EQ(module.memberAttributes.size(), 1u);
-  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 1);
-}
-
-TEST(ModuleFileTest, AttributesBeforeTheFirstCodeLineStayThere) {
-  const QByteArray bytes =
-      windowsFile("Attribute VB_Name = \"m\"\nAttribute Foo.VB_UserMemId = 0\nOption Explicit\n");
-  const ModuleSource module = parseModule(bytes, QStringLiteral("m.bas"));
-  ASSERT_EQ(module.memberAttributes.size(), 1u);
-  EXPECT_EQ(module.memberAttributes[0].afterCodeLine, 0);
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))), asText(bytes));
 }
 
 // --- Writing after edits ---------------------------------------------------------------------------------
@@ -289,40 +289,31 @@ TEST(ModuleFileTest, WritingNamesTheFileLineOfAnUnwritableCharacter) {
 
 // --- Names and header attributes -------------------------------------------------------------------------
 
-TEST(ModuleFileTest, RenamingAFormRewritesTheNameLineAndTheBeginLine) {
-  const QByteArray bytes = windowsFile(kForm);
-  ModuleSource module = parseModule(bytes, QStringLiteral("frmSobre.frm"));
+TEST(ModuleFileTest, RenamingRewritesTheNameLinesOrAddsOne) {
+  const QByteArray form = windowsFile(kForm);
+  ModuleSource module = parseModule(form, QStringLiteral("frmSobre.frm"));
   setModuleName(module, QStringLiteral("frmCreditos"));
   EXPECT_EQ(moduleName(module), u"frmCreditos");
-  QByteArray expected = replacedOnce(bytes, "Begin VB.Form frmSobre \n", "Begin VB.Form frmCreditos \n");
+  QByteArray expected = replacedOnce(form, "Begin VB.Form frmSobre \n", "Begin VB.Form frmCreditos \n");
   expected =
       replacedOnce(expected, "Attribute VB_Name = \"frmSobre\"\n", "Attribute VB_Name = \"frmCreditos\"\n");
   EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmCreditos.frm"))), asText(expected));
-}
 
-TEST(ModuleFileTest, RenamingAClassRewritesOnlyTheNameLine) {
-  const QByteArray bytes = windowsFile(kCollectionClass);
-  ModuleSource module = parseModule(bytes, QStringLiteral("clsPedidos.cls"));
-  setModuleName(module, QStringLiteral("clsEncomendas"));
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("clsPedidos.cls"))),
-            asText(replacedOnce(bytes, "Attribute VB_Name = \"clsPedidos\"",
-                                "Attribute VB_Name = \"clsEncomendas\"")));
-}
-
-TEST(ModuleFileTest, RenamingAModuleWithoutNameLineAddsOne) {
-  ModuleSource module = parseModule("Option Explicit\nDim x\n", QStringLiteral("sem nome.bas"));
-  EXPECT_EQ(moduleName(module), u"");
-  setModuleName(module, QStringLiteral("modNovo"));
-  EXPECT_EQ(writeModule(module, QStringLiteral("modNovo.bas")),
+  ModuleSource withoutName = parseModule("Option Explicit\nDim x\n", QStringLiteral("sem nome.bas"));
+  EXPECT_EQ(moduleName(withoutName), u"");
+  setModuleName(withoutName, QStringLiteral("modNovo"));
+  EXPECT_EQ(writeModule(withoutName, QStringLiteral("modNovo.bas")),
             QByteArray("Attribute VB_Name = \"modNovo\"\nOption Explicit\nDim x\n"));
 
+  // A class's name line goes after its BEGIN block, before the other attributes.
   ModuleSource classWithoutName = parseModule(
       windowsFile("VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nEND\nAttribute VB_Exposed = False\n"),
       QStringLiteral("c.cls"));
-  setModuleName(classWithoutName, QStringLiteral("clsNovo"));
+  setModuleName(classWithoutName, QStringLiteral("a\"b"));
+  EXPECT_EQ(moduleName(classWithoutName), u"a\"b");
   EXPECT_EQ(asText(writeModule(classWithoutName, QStringLiteral("c.cls"))),
             asText(windowsFile("VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nEND\n"
-                               "Attribute VB_Name = \"clsNovo\"\nAttribute VB_Exposed = False\n")));
+                               "Attribute VB_Name = \"a\"\"b\"\nAttribute VB_Exposed = False\n")));
 }
 
 TEST(ModuleFileTest, ReadsAndWritesHeaderAttributes) {
@@ -344,62 +335,34 @@ TEST(ModuleFileTest, ReadsAndWritesHeaderAttributes) {
   EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(expected));
 }
 
-TEST(ModuleFileTest, NameWithQuotesIsQuotedAndUnquoted) {
-  ModuleSource module;
-  setModuleName(module, QStringLiteral("a\"b"));
-  EXPECT_EQ(module.moduleAttributes[0].text, u"Attribute VB_Name = \"a\"\"b\"");
-  EXPECT_EQ(moduleName(module), u"a\"b");
-}
-
-TEST(ModuleFileTest, CopiesOfAFormModuleAreIndependent) {
-  const ModuleSource module = parseModule(windowsFile(kForm), QStringLiteral("frmSobre.frm"));
-  ModuleSource copy = module;
-  setModuleName(copy, QStringLiteral("frmOutro"));
-  EXPECT_EQ(module.form->root().name(), u"frmSobre");
-  EXPECT_EQ(copy.form->root().name(), u"frmOutro");
-}
-
 // --- Errors ----------------------------------------------------------------------------------------------
 
-struct MalformedModule {
-  const char* fileName;
-  const char* text;
-  const char* description;
-};
-
-class ModuleFileErrorTest : public ::testing::TestWithParam<MalformedModule> {};
-
-TEST_P(ModuleFileErrorTest, NamesTheFileAndTheLine) {
-  const MalformedModule& sample = GetParam();
-  const QString fileName = QString::fromLatin1(sample.fileName);
-  const ide::Error error = expectError([&] { parseModule(windowsFile(sample.text), fileName); });
-  EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
-  EXPECT_EQ(error.description(), QString::fromUtf8(sample.description));
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    Malformed, ModuleFileErrorTest,
-    ::testing::Values(
-        MalformedModule{"clsX.cls",
-                        "VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nAttribute VB_Name = \"clsX\"\n",
-                        "clsX.cls, line 2: BEGIN without END"},
-        MalformedModule{
-            "frmX.frm",
-            "VERSION 5.00\nObject = \"{0}#1.0#0\"; \"x.ocx\"\nBegin VB.Form frmX \n   Caption = \"x\"\n"
-            "Attribute VB_Name = \"frmX\"\n",
-            "frmX.frm, line 5: unexpected text in the form description: Attribute VB_Name = \"frmX\""},
-        MalformedModule{"frmX.frm", "VERSION 5.00\nBegin VB.Form frmX \n   Caption = \"x\"\n",
-                        "frmX.frm, line 2: Begin VB.Form frmX has no matching End"},
-        MalformedModule{"frmX.frm", "VERSION 5.00\nBegin VB.Form frmX \n   ação sem sentido\nEnd\n",
-                        "frmX.frm, line 3: unexpected text in the form description: ação sem sentido"},
-        MalformedModule{"ctlX.ctl", "VERSION 5.00\nBegin VB.UserControl ctlX \n   BeginProperty Font \nEnd\n",
-                        "ctlX.ctl, line 4: End where EndProperty was expected"}));
-
-TEST(ModuleFileErrorTest, PassesOnLineErrors) {
-  const ide::Error error = expectError(
-      [] { parseModule(QByteArray("Attribute VB_Name = \"m\"\r\nx\0y\r\n", 30), QStringLiteral("m.bas")); });
-  EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
-  EXPECT_EQ(error.description(), u"m.bas, line 2: not a text file");
+TEST(ModuleFileTest, ErrorsNameTheFileAndTheLine) {
+  struct Case {
+    const char* fileName;
+    QByteArray bytes;
+    const char* description;
+  };
+  const std::vector<Case> cases = {
+      {"clsX.cls",
+       windowsFile("VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nAttribute VB_Name = \"clsX\"\n"),
+       "clsX.cls, line 2: BEGIN without END"},
+      // The form description's errors count the lines before it.
+      {"frmX.frm",
+       windowsFile(
+           "VERSION 5.00\nObject = \"{0}#1.0#0\"; \"x.ocx\"\nBegin VB.Form frmX \n   Caption = \"x\"\n"
+           "Attribute VB_Name = \"frmX\"\n"),
+       "frmX.frm, line 5: unexpected text in the form description: Attribute VB_Name = \"frmX\""},
+      {"frmX.frm", windowsFile("VERSION 5.00\nBegin VB.Form frmX \n   ação sem sentido\nEnd\n"),
+       "frmX.frm, line 3: unexpected text in the form description: ação sem sentido"},
+      {"m.bas", QByteArray("Attribute VB_Name = \"m\"\r\nx\0y\r\n", 30), "m.bas, line 2: not a text file"},
+  };
+  for (const Case& sample : cases) {
+    const ide::Error error =
+        expectError([&] { parseModule(sample.bytes, QString::fromLatin1(sample.fileName)); });
+    EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
+    EXPECT_EQ(error.description(), QString::fromUtf8(sample.description));
+  }
 }
 
 }  // namespace

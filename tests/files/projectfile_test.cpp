@@ -96,35 +96,20 @@ TEST_F(ProjectFileTest, ListsComponentsInFileOrder) {
   EXPECT_EQ(m_project.components(), expected);
 }
 
-TEST_F(ProjectFileTest, ComponentKeys) {
-  EXPECT_EQ(componentKey(ComponentKind::Module), u"Module");
-  EXPECT_EQ(componentKey(ComponentKind::PropertyPage), u"PropertyPage");
-  EXPECT_EQ(componentKey(ComponentKind::UserDocument), u"UserDocument");
-  EXPECT_EQ(componentKey(ComponentKind::Designer), u"Designer");
-  EXPECT_EQ(componentKey(ComponentKind::RelatedDocument), u"RelatedDoc");
-  EXPECT_EQ(componentKey(ComponentKind::ResourceFile), u"ResFile32");
-}
-
-TEST_F(ProjectFileTest, SetValueReplacesTheLineOrAppendsToTheMainPart) {
+TEST_F(ProjectFileTest, EditsOfTheMainPartRewriteOnlyTheirLines) {
   m_project.setValue(QStringLiteral("MinorVer"), QStringLiteral("5"));
   m_project.setValue(QStringLiteral("Type"), QStringLiteral("Exe"));  // unchanged
   m_project.setValue(QStringLiteral("NoAliasing"), QStringLiteral("0"));
-  QByteArray expected = replacedOnce(m_bytes, "MinorVer=4\n", "MinorVer=5\n");
-  expected = replacedOnce(expected, "CompilationType=0\n", "CompilationType=0\nNoAliasing=0\n");
-  EXPECT_EQ(asText(written()), asText(expected));
-  EXPECT_EQ(m_project.value(u"NoAliasing"), u"0");
-}
-
-TEST_F(ProjectFileTest, RemovesValues) {
   EXPECT_TRUE(m_project.removeValue(u"helpfile"));
   EXPECT_FALSE(m_project.removeValue(u"HelpFile"));
-  EXPECT_EQ(asText(written()), asText(replacedOnce(m_bytes, "HelpFile=\"\"\n", "")));
-}
-
-TEST_F(ProjectFileTest, RenamesTheProject) {
   m_project.setName(QStringLiteral("LojaNova"));
+  QByteArray expected = replacedOnce(m_bytes, "MinorVer=4\n", "MinorVer=5\n");
+  expected = replacedOnce(expected, "CompilationType=0\n", "CompilationType=0\nNoAliasing=0\n");
+  expected = replacedOnce(expected, "HelpFile=\"\"\n", "");
+  expected = replacedOnce(expected, "Name=\"Loja\"\n", "Name=\"LojaNova\"\n");
+  EXPECT_EQ(asText(written()), asText(expected));
+  EXPECT_EQ(m_project.value(u"NoAliasing"), u"0");
   EXPECT_EQ(m_project.name(), u"LojaNova");
-  EXPECT_EQ(asText(written()), asText(replacedOnce(m_bytes, "Name=\"Loja\"\n", "Name=\"LojaNova\"\n")));
 }
 
 TEST_F(ProjectFileTest, AddsComponentsAfterTheLastEntry) {
@@ -133,11 +118,12 @@ TEST_F(ProjectFileTest, AddsComponentsAfterTheLastEntry) {
   m_project.addComponent({ComponentKind::PropertyPage, {}, QStringLiteral("ppgData.pag")});
   m_project.addComponent({ComponentKind::UserDocument, {}, QStringLiteral("docLoja.dob")});
   m_project.addComponent({ComponentKind::Designer, {}, QStringLiteral("deDados.Dsr")});
+  m_project.addComponent({ComponentKind::RelatedDocument, {}, QStringLiteral("Notas.txt")});
   EXPECT_EQ(asText(written()), asText(replacedOnce(m_bytes, "ResFile32=\"Loja.RES\"\n",
                                                    "ResFile32=\"Loja.RES\"\nClass=clsPedido; clsPedido.cls\n"
                                                    "PropertyPage=ppgData.pag\nUserDocument=docLoja.dob\n"
-                                                   "Designer=deDados.Dsr\n")));
-  EXPECT_EQ(m_project.components().size(), 11u);
+                                                   "Designer=deDados.Dsr\nRelatedDoc=Notas.txt\n")));
+  EXPECT_EQ(m_project.components().size(), 12u);
   EXPECT_EQ(m_project.components()[8].kind, ComponentKind::PropertyPage);
 }
 
@@ -279,24 +265,24 @@ class ProjectPathTest : public ::testing::Test {
   QTemporaryDir m_directory;
 };
 
-TEST_F(ProjectPathTest, ResolvesRelativeBackslashPaths) {
-  const QString project = local("Loja");
-  EXPECT_EQ(resolveProjectPath(project, QStringLiteral("modPrincipal.bas")), local("Loja/modPrincipal.bas"));
-  EXPECT_EQ(resolveProjectPath(project, QStringLiteral("Classes\\clsCliente.cls")),
-            local("Loja/Classes/clsCliente.cls"));
-  EXPECT_EQ(resolveProjectPath(project, QStringLiteral("..\\Utilitarios\\Utilitarios.vbp")),
-            local("Utilitarios/Utilitarios.vbp"));
-  EXPECT_EQ(resolveProjectPath(project, QStringLiteral(".\\Classes\\..\\modPrincipal.bas")),
-            local("Loja/modPrincipal.bas"));
-}
-
-TEST_F(ProjectPathTest, MatchesNamesCaseInsensitivelyWhenTheExactCaseIsMissing) {
-  const QString project = local("Loja");
-  EXPECT_EQ(resolveProjectPath(project, QStringLiteral("MODPRINCIPAL.BAS")), local("Loja/modPrincipal.bas"));
-  EXPECT_EQ(resolveProjectPath(project, QStringLiteral("classes\\CLSCLIENTE.cls")),
-            local("Loja/Classes/clsCliente.cls"));
-  EXPECT_EQ(resolveProjectPath(project, QStringLiteral("..\\utilitarios\\utilitarios.VBP")),
-            local("Utilitarios/Utilitarios.vbp"));
+TEST_F(ProjectPathTest, ResolvesBackslashPathsMatchingNamesCaseInsensitively) {
+  const std::pair<const char*, QString> cases[] = {
+      {"modPrincipal.bas", local("Loja/modPrincipal.bas")},
+      {"Classes\\clsCliente.cls", local("Loja/Classes/clsCliente.cls")},
+      {"..\\Utilitarios\\Utilitarios.vbp", local("Utilitarios/Utilitarios.vbp")},
+      {".\\Classes\\..\\modPrincipal.bas", local("Loja/modPrincipal.bas")},
+      // Another letter case where the exact one is missing.
+      {"MODPRINCIPAL.BAS", local("Loja/modPrincipal.bas")},
+      {"classes\\CLSCLIENTE.cls", local("Loja/Classes/clsCliente.cls")},
+      {"..\\utilitarios\\utilitarios.VBP", local("Utilitarios/Utilitarios.vbp")},
+      // Missing files come back as written; drive and network paths cannot be resolved.
+      {"Novo\\frmNovo.frm", local("Loja/Novo/frmNovo.frm")},
+      {"CLASSES\\clsNovo.cls", local("Loja/CLASSES/clsNovo.cls")},
+      {"C:\\Windows\\System32\\MSCOMCTL.OCX", QStringLiteral("C:/Windows/System32/MSCOMCTL.OCX")},
+      {"\\\\servidor\\fontes\\a.bas", QStringLiteral("//servidor/fontes/a.bas")},
+  };
+  for (const auto& [written, expected] : cases)
+    EXPECT_EQ(resolveProjectPath(local("Loja"), QString::fromLatin1(written)), expected) << written;
 }
 
 TEST_F(ProjectPathTest, PrefersTheExactCase) {
@@ -306,20 +292,6 @@ TEST_F(ProjectPathTest, PrefersTheExactCase) {
             local("Loja/MODPRINCIPAL.BAS"));
   EXPECT_EQ(resolveProjectPath(local("Loja"), QStringLiteral("modPrincipal.bas")),
             local("Loja/modPrincipal.bas"));
-}
-
-TEST_F(ProjectPathTest, MissingFilesComeBackAsWritten) {
-  EXPECT_EQ(resolveProjectPath(local("Loja"), QStringLiteral("Novo\\frmNovo.frm")),
-            local("Loja/Novo/frmNovo.frm"));
-  EXPECT_EQ(resolveProjectPath(local("Loja"), QStringLiteral("CLASSES\\clsNovo.cls")),
-            local("Loja/CLASSES/clsNovo.cls"));
-}
-
-TEST_F(ProjectPathTest, DrivePathsCannotBeResolved) {
-  EXPECT_EQ(resolveProjectPath(local("Loja"), QStringLiteral("C:\\Windows\\System32\\MSCOMCTL.OCX")),
-            u"C:/Windows/System32/MSCOMCTL.OCX");
-  EXPECT_EQ(resolveProjectPath(local("Loja"), QStringLiteral("\\\\servidor\\fontes\\a.bas")),
-            u"//servidor/fontes/a.bas");
 }
 
 TEST_F(ProjectPathTest, WritesPathsRelativeWithBackslashes) {

@@ -4,7 +4,7 @@
 // read and a write byte for byte.
 #include "host/files/sourcelines.h"
 
-#include "ide/error.h"
+#include "testtext.h"
 
 #include <gtest/gtest.h>
 
@@ -13,113 +13,61 @@
 namespace host {
 namespace {
 
-/// Runs `action`, expecting an ide::Error; returns it.
-template <typename Action>
-ide::Error expectError(Action&& action) {
-  try {
-    action();
-  } catch (const ide::Error& error) {
-    return error;
-  }
-  ADD_FAILURE() << "no ide::Error thrown";
-  return ide::Error(0, {});
-}
+using testing::expectError;
 
+// Each line keeps its own end, and the lines write back as the bytes they were read from.
 TEST(SourceLinesTest, KeepsEachLinesOwnEnd) {
-  const QByteArray bytes("Option Explicit\r\nDim a\nDim b\rDim c\r\n\r\nlast");
-  const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("Module1.bas"));
-  ASSERT_EQ(lines.size(), 6u);
-  EXPECT_EQ(lines[0].text, u"Option Explicit");
-  EXPECT_EQ(lines[0].end, LineEnd::CRLF);
-  EXPECT_EQ(lines[1].text, u"Dim a");
-  EXPECT_EQ(lines[1].end, LineEnd::LF);
-  EXPECT_EQ(lines[2].text, u"Dim b");
-  EXPECT_EQ(lines[2].end, LineEnd::CR);
-  EXPECT_EQ(lines[3].text, u"Dim c");
-  EXPECT_EQ(lines[3].end, LineEnd::CRLF);
-  EXPECT_EQ(lines[4].text, u"");
-  EXPECT_EQ(lines[4].end, LineEnd::CRLF);
-  EXPECT_EQ(lines[5].text, u"last");
-  EXPECT_EQ(lines[5].end, LineEnd::None);
-  EXPECT_EQ(writeSourceLines(lines, QStringLiteral("Module1.bas")), bytes);
+  using Lines = std::vector<std::pair<QString, LineEnd>>;
+  const std::pair<QByteArray, Lines> cases[] = {
+      {"Option Explicit\r\nDim a\nDim b\rDim c\r\n\r\nlast",
+       {{"Option Explicit", LineEnd::CRLF},
+        {"Dim a", LineEnd::LF},
+        {"Dim b", LineEnd::CR},
+        {"Dim c", LineEnd::CRLF},
+        {"", LineEnd::CRLF},
+        {"last", LineEnd::None}}},
+      // LF CR is two line ends (LF, then an empty line ended by CR); CR CR LF is CR then CRLF.
+      {"a\n\rb\r\r\nc\r",
+       {{"a", LineEnd::LF}, {"", LineEnd::CR}, {"b", LineEnd::CR}, {"", LineEnd::CRLF}, {"c", LineEnd::CR}}},
+      // A final line end does not start another line.
+      {"Dim x\r\n", {{"Dim x", LineEnd::CRLF}}},
+      {"", {}},
+      {"' Rotina de impress\xE3o \x96 cabe\xE7\x61lho\r\n",
+       {{QString::fromUtf8("' Rotina de impressão – cabeçalho"), LineEnd::CRLF}}},
+  };
+  for (const auto& [bytes, expected] : cases) {
+    SCOPED_TRACE(bytes.toStdString());
+    const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("Module1.bas"));
+    Lines read;
+    for (const SourceLine& line : lines)
+      read.emplace_back(line.text, line.end);
+    EXPECT_EQ(read, expected);
+    EXPECT_EQ(writeSourceLines(lines, QStringLiteral("Module1.bas")), bytes);
+  }
 }
 
-TEST(SourceLinesTest, ReadsLineEndsThatFollowEachOther) {
-  // LF CR is two line ends (LF, then an empty line ended by CR); CR CR LF is CR then CRLF.
-  const QByteArray bytes("a\n\rb\r\r\nc\r");
-  const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("x.bas"));
-  ASSERT_EQ(lines.size(), 5u);
-  EXPECT_EQ(lines[0].end, LineEnd::LF);
-  EXPECT_EQ(lines[1].text, u"");
-  EXPECT_EQ(lines[1].end, LineEnd::CR);
-  EXPECT_EQ(lines[2].text, u"b");
-  EXPECT_EQ(lines[2].end, LineEnd::CR);
-  EXPECT_EQ(lines[3].text, u"");
-  EXPECT_EQ(lines[3].end, LineEnd::CRLF);
-  EXPECT_EQ(lines[4].text, u"c");
-  EXPECT_EQ(lines[4].end, LineEnd::CR);
-  EXPECT_EQ(writeSourceLines(lines, QStringLiteral("x.bas")), bytes);
-}
-
-TEST(SourceLinesTest, LastLineWithoutEnd) {
-  const std::vector<SourceLine> lines = readSourceLines("Dim x\r\nx = 1", QStringLiteral("a.bas"));
-  ASSERT_EQ(lines.size(), 2u);
-  EXPECT_EQ(lines[1].text, u"x = 1");
-  EXPECT_EQ(lines[1].end, LineEnd::None);
-
-  const std::vector<SourceLine> ended = readSourceLines("Dim x\r\n", QStringLiteral("a.bas"));
-  ASSERT_EQ(ended.size(), 1u) << "a final line end does not start another line";
-  EXPECT_EQ(ended[0].end, LineEnd::CRLF);
-}
-
-TEST(SourceLinesTest, EmptyFileHasNoLines) {
-  EXPECT_TRUE(readSourceLines(QByteArrayView(), QStringLiteral("empty.bas")).empty());
-  EXPECT_EQ(writeSourceLines({}, QStringLiteral("empty.bas")), QByteArray());
-}
-
-TEST(SourceLinesTest, DecodesAnsiText) {
+TEST(SourceLinesTest, AcceptsTheLongestLineWhateverItsEnd) {
+  const QByteArray longest(kMaxLineLength, 'y');
   const std::vector<SourceLine> lines =
-      readSourceLines("' Rotina de impress\xE3o \x96 cabe\xE7\x61lho\r\n", QStringLiteral("a.bas"));
-  ASSERT_EQ(lines.size(), 1u);
-  EXPECT_EQ(lines[0].text, QString::fromUtf8("' Rotina de impressão – cabeçalho"));
+      readSourceLines(longest + "\r\n" + longest + "\r" + longest, QStringLiteral("a.bas"));
+  ASSERT_EQ(lines.size(), 3u);
+  EXPECT_EQ(lines[2].text.size(), 1023);
 }
 
-TEST(SourceLinesTest, AcceptsTheLongestLineAndRefusesOneMore) {
-  const QByteArray longest(kMaxLineLength, 'x');
-  const QByteArray bytes = "Option Explicit\r\n" + longest + "\r\n";
-  const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("Module1.bas"));
-  ASSERT_EQ(lines.size(), 2u);
-  EXPECT_EQ(lines[1].text.size(), 1023);
-
-  const QByteArray tooLong = "Option Explicit\r\n" + QByteArray(kMaxLineLength + 1, 'x') + "\r\nEnd";
-  const ide::Error error = expectError([&] { readSourceLines(tooLong, QStringLiteral("Module1.bas")); });
-  EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
-  EXPECT_EQ(error.description(), u"Module1.bas, line 2: line longer than 1023 characters");
-}
-
-TEST(SourceLinesTest, LengthExcludesTheLineEnd) {
-  // 1023 characters followed by CR LF, a lone CR and no end at all.
-  const QByteArray text(kMaxLineLength, 'y');
-  EXPECT_EQ(readSourceLines(text + "\r\n" + text + "\r" + text, QStringLiteral("a.bas")).size(), 3u);
-}
-
-TEST(SourceLinesTest, RefusesAnOverlongLastLineWithoutEnd) {
-  const ide::Error error =
-      expectError([] { readSourceLines("a\nb\n" + QByteArray(2000, 'z'), QStringLiteral("Form1.frm")); });
-  EXPECT_EQ(error.description(), u"Form1.frm, line 3: line longer than 1023 characters");
-}
-
-TEST(SourceLinesTest, RefusesBinaryContent) {
-  static const char data[] = "VERSION 5.00\r\nBegin VB.Form Form1\r\n\x01\x02\0\x03\r\n";
-  const QByteArray bytes(data, sizeof(data) - 1);
-  const ide::Error error = expectError([&] { readSourceLines(bytes, QStringLiteral("Form1.frm")); });
-  EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
-  EXPECT_EQ(error.description(), u"Form1.frm, line 3: not a text file");
-}
-
-TEST(SourceLinesTest, RefusesANulInTheFirstLine) {
-  const ide::Error error = expectError([] { readSourceLines(QByteArray("\0", 1), QStringLiteral("b.cls")); });
-  EXPECT_EQ(error.description(), u"b.cls, line 1: not a text file");
+TEST(SourceLinesTest, RefusesOverlongLinesAndBinaryContentNamingTheFileAndLine) {
+  const std::pair<QByteArray, const char*> cases[] = {
+      {"Option Explicit\r\n" + QByteArray(kMaxLineLength + 1, 'x') + "\r\nEnd",
+       "Module1.bas, line 2: line longer than 1023 characters"},
+      {"a\nb\n" + QByteArray(2000, 'z'), "Module1.bas, line 3: line longer than 1023 characters"},
+      {QByteArray("VERSION 5.00\r\nBegin VB.Form Form1\r\n\x01\x02\0\x03\r\n", 41),
+       "Module1.bas, line 3: not a text file"},
+      {QByteArray("\0", 1), "Module1.bas, line 1: not a text file"},
+  };
+  for (const auto& [bytes, description] : cases) {
+    const ide::Error error = expectError([&] { readSourceLines(bytes, QStringLiteral("Module1.bas")); });
+    EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
+    EXPECT_EQ(error.description(), QString::fromUtf8(description));
+  }
 }
 
 TEST(SourceLinesTest, WritingRefusesCharactersWithoutAnsiCode) {
@@ -140,13 +88,6 @@ TEST(SourceLinesTest, AppendNumbersTheLineAsTold) {
     appendSourceLine(out, {QString(QChar(0x0100)), LineEnd::CRLF}, QStringLiteral("a.bas"), 7);
   });
   EXPECT_TRUE(error.description().startsWith(u"a.bas, line 7: the character U+0100 in column 1"));
-}
-
-TEST(SourceLinesTest, LineEndBytes) {
-  EXPECT_EQ(lineEndBytes(LineEnd::CRLF), QByteArrayView("\r\n"));
-  EXPECT_EQ(lineEndBytes(LineEnd::LF), QByteArrayView("\n"));
-  EXPECT_EQ(lineEndBytes(LineEnd::CR), QByteArrayView("\r"));
-  EXPECT_TRUE(lineEndBytes(LineEnd::None).isEmpty());
 }
 
 TEST(SourceLinesTest, RandomTextRoundTripsByteForByte) {

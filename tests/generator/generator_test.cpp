@@ -347,14 +347,4 @@ TEST_F(GeneratorTest, UnwritableDirectoryThrowsNamingThePath) {
   }
 }
 
-TEST_F(GeneratorTest, DefaultOptionsWriteAMillionLines) {
-  const auto group = generate(gen::GeneratorOptions{});
-  EXPECT_EQ(group.codeLines, 1'000'000);
-  EXPECT_EQ(group.components, 200);
-  qint64 counted = 0;
-  for (const auto& [path, bytes] : filesUnder(m_root))
-    counted += codeOf(path, bytes).size();
-  EXPECT_EQ(counted, 1'000'000);
-}
-
 }  // namespace

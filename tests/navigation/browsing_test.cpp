@@ -80,19 +80,6 @@ TEST(Browsing, ScrollingWithinAProcedureOnlyMovesTheCurrentPlacesTopLine) {
   EXPECT_EQ(ide.histories().entry(1).TopLine, topOf(1) + 10);
 }
 
-TEST(Browsing, TheEleventhPlaceDropsTheOldest) {
-  Browsing ide;
-  for (int procedure = 1; procedure <= 12; ++procedure) {
-    ide.go(ide.one, procedure);
-    ide.stay(3000);
-  }
-  ide.go(ide.two, 1);
-  ide.stay(600);
-  ASSERT_EQ(ide.histories().HistoryCount(), 10);
-  EXPECT_EQ(ide.places().front(), u"modUm.Proc3"_qs);
-  EXPECT_EQ(ide.places().back(), u"modUm.Proc12"_qs);
-}
-
 TEST(Browsing, BackAndForwardThroughTheButtons) {
   Browsing ide;
   ide.go(ide.one, 1);

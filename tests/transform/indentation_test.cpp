@@ -28,72 +28,66 @@ QStringList numberedAndIndented(const QStringList& lines, IndentMode mode, qint3
   return indented(numberProcedure(lines), mode, spaces);
 }
 
-// --- CIndenter ---
-
-TEST(CIndenterRecord, CopyIsIndependent) {
-  CIndenter level{IT_RELATIVE, 6};
-  CIndenter copy = level.Copy();
-  level.Indentation = 9;
-  level.iType = IT_ABSOLUTE;
-  EXPECT_EQ(copy.iType, IT_RELATIVE);
-  EXPECT_EQ(copy.Indentation, 6);
-}
-
-TEST(CIndenterRecord, TypeBitsHaveTheirPublicValues) {
-  EXPECT_EQ(IT_ABSOLUTE, 1);
-  EXPECT_EQ(IT_RELATIVE, 2);
-  EXPECT_EQ(IT_META, 4);
-  EXPECT_EQ(IT_IFLINE, 8);
-  EXPECT_EQ(IT_CASELINE, 16);
+// The lines with their leading blanks taken away: what a careless author typed.
+QStringList flattened(QStringList lines) {
+  for (QString& line : lines) {
+    qsizetype blanks = 0;
+    while (blanks < line.size() && line[blanks].isSpace())
+      ++blanks;
+    line.remove(0, blanks);
+  }
+  return lines;
 }
 
 // --- Block If or single-line If ---
 
-TEST(IsBlockIfRule, ThenAtTheEndOrBeforeACommentOpensABlock) {
-  for (const char16_t* t : {u"If a Then", u"If a > 0 Then ' comentário", u"If a Then 'c", u"If a Then\t' c",
-                            u"ElseIf b Then", u"#If DEBUG Then", u"If a = ThenValue Then"}) {
-    EXPECT_TRUE(IsBlockIf(t)) << QString::fromUtf16(t).toStdString();
-  }
+TEST(IfRules, IsBlockIfDecidesOnTheCodeBeforeTheComment) {
+  const std::pair<const char16_t*, bool> cases[] = {
+      {u"If a Then", true},
+      {u"If a > 0 Then ' comentário", true},
+      {u"If a Then 'c", true},
+      {u"If a Then\t' c", true},
+      {u"ElseIf b Then", true},
+      {u"#If DEBUG Then", true},
+      {u"If a = ThenValue Then", true},
+      {u"If a > 0 And _", true},  // continued: a block until the header ends
+      {u"If a Then x = 1 + _", true},
+      {u"If s = \"'\" Then", true},  // quotes inside string literals are not comment marks
+      {u"If s = \"x ' Then y\" Then ' nota", true},
+      {u"If s = \"a\"\"'\" Then", true},
+      {u"If a Then b = 1", false},
+      {u"If a Then b = 1 ' nota", false},
+      {u"If a Then Exit Sub", false},
+      {u"If a ' Then", false},
+      {u"If a = ThenValue", false},
+      {u"If a Then: b = 1", false},
+      {u"If a Then MsgBox \"it's\"", false},
+      {u"If a Then s = \"'\"", false},
+      {u"If s = \"' Then\" Then b = 1", false},
+  };
+  for (const auto& [text, block] : cases)
+    EXPECT_EQ(IsBlockIf(text), block) << QString::fromUtf16(text).toStdString();
 }
 
-TEST(IsBlockIfRule, ContinuedHeaderIsTreatedAsABlockUntilItEnds) {
-  EXPECT_TRUE(IsBlockIf(u"If a > 0 And _"));
-  EXPECT_TRUE(IsBlockIf(u"If a Then x = 1 + _"));
-}
-
-TEST(IsBlockIfRule, StatementAfterThenMakesASingleLineIf) {
-  for (const char16_t* t : {u"If a Then b = 1", u"If a Then b = 1 ' nota", u"If a Then Exit Sub",
-                            u"If a ' Then", u"If a = ThenValue", u"If a Then: b = 1"}) {
-    EXPECT_FALSE(IsBlockIf(t)) << QString::fromUtf16(t).toStdString();
-  }
-}
-
-TEST(IsBlockIfRule, QuotesInsideStringLiteralsAreNotCommentMarks) {
-  EXPECT_TRUE(IsBlockIf(u"If s = \"'\" Then"));
-  EXPECT_TRUE(IsBlockIf(u"If s = \"x ' Then y\" Then ' nota"));
-  EXPECT_TRUE(IsBlockIf(u"If s = \"a\"\"'\" Then"));
-  EXPECT_FALSE(IsBlockIf(u"If a Then MsgBox \"it's\""));
-  EXPECT_FALSE(IsBlockIf(u"If a Then s = \"'\""));
-  EXPECT_FALSE(IsBlockIf(u"If s = \"' Then\" Then b = 1"));
-}
-
-TEST(IfEndsSingleLineRule, ThenAtTheEndKeepsTheBlock) {
-  for (const char16_t* t : {u"b > 0 Then", u"Then", u"Then ' nota", u"b > 0 Then ' nota", u"b Then\t' nota",
-                            u"s = \"it's\" Then"}) {
-    EXPECT_FALSE(IfEndsSingleLine(t)) << QString::fromUtf16(t).toStdString();
-  }
-}
-
-TEST(IfEndsSingleLineRule, CodeAfterThenOrNoThenEndsASingleLineIf) {
-  for (const char16_t* t : {u"b > 0 Then c = 1", u"b > 0", u"Then c = 1", u"b Then c = 1 ' nota",
-                            u"s = \"Then\"", u"b Then MsgBox \"it's\""}) {
-    EXPECT_TRUE(IfEndsSingleLine(t)) << QString::fromUtf16(t).toStdString();
-  }
-}
-
-TEST(IfEndsSingleLineRule, LineThatIsItselfContinuedDoesNotEndTheHeader) {
-  EXPECT_FALSE(IfEndsSingleLine(u"b > 0 And _"));
-  EXPECT_FALSE(IfEndsSingleLine(u"b Then c = 1 + _"));
+TEST(IfRules, IfEndsSingleLineWhenCodeFollowsThenOrThereIsNone) {
+  const std::pair<const char16_t*, bool> cases[] = {
+      {u"b > 0 Then", false},
+      {u"Then", false},
+      {u"Then ' nota", false},
+      {u"b > 0 Then ' nota", false},
+      {u"b Then\t' nota", false},
+      {u"s = \"it's\" Then", false},
+      {u"b > 0 And _", false},  // itself continued: the header goes on
+      {u"b Then c = 1 + _", false},
+      {u"b > 0 Then c = 1", true},
+      {u"b > 0", true},
+      {u"Then c = 1", true},
+      {u"b Then c = 1 ' nota", true},
+      {u"s = \"Then\"", true},
+      {u"b Then MsgBox \"it's\"", true},
+  };
+  for (const auto& [text, single] : cases)
+    EXPECT_EQ(IfEndsSingleLine(text), single) << QString::fromUtf16(text).toStdString();
 }
 
 // --- The level stack ---
@@ -121,49 +115,30 @@ TEST_F(IndenterStack, OpenersAndContinuationsPushLevels) {
   EXPECT_EQ(indenter.stack()[1].iType, IT_RELATIVE);
   EXPECT_EQ(indenter.stack()[1].Indentation, 9);
   EXPECT_EQ(indenter.current().Indentation, 9);
+  EXPECT_EQ(indenter.current().iType, 0) << "cleared after every line";
   EXPECT_TRUE(continued);
 }
 
-TEST_F(IndenterStack, CurrentTypeIsClearedAfterEveryLine) {
-  openForAndContinuation();
-  EXPECT_EQ(indenter.current().iType, 0);
-}
-
-TEST_F(IndenterStack, PopAbsoluteClosesTheContinuationAndTheBlock) {
-  openForAndContinuation();
-  indenter.PopBlock(IT_ABSOLUTE);
-  EXPECT_TRUE(indenter.stack().empty());
-  EXPECT_EQ(indenter.current().Indentation, 3);
-}
-
-TEST_F(IndenterStack, PopRelativeStopsAtTheContinuation) {
-  openForAndContinuation();
-  indenter.PopBlock(IT_RELATIVE);
-  ASSERT_EQ(indenter.stack().size(), 1u);
-  EXPECT_EQ(indenter.stack()[0].iType, IT_ABSOLUTE);
-  EXPECT_EQ(indenter.current().Indentation, 6);
-}
-
-TEST_F(IndenterStack, PopWithoutAMatchEmptiesTheStack) {
-  openForAndContinuation();
-  indenter.PopBlock(IT_RELATIVE);
-  indenter.PopBlock(IT_RELATIVE);
-  EXPECT_TRUE(indenter.stack().empty());
-  EXPECT_EQ(indenter.current().Indentation, 3);
-}
-
-TEST_F(IndenterStack, MaskWithBothBitsClosesOneLevel) {
-  openForAndContinuation();
-  indenter.PopBlock(IT_ABSOLUTE | IT_RELATIVE);
-  EXPECT_EQ(indenter.stack().size(), 1u);
-  EXPECT_EQ(indenter.current().Indentation, 6);
-}
-
-TEST_F(IndenterStack, PopOnAnEmptyStackChangesNothing) {
-  indenter.beginProcedure();
-  indenter.PopBlock(IT_ABSOLUTE);
-  EXPECT_TRUE(indenter.stack().empty());
-  EXPECT_EQ(indenter.current().Indentation, 3);
+TEST_F(IndenterStack, PopClosesLevelsUpToTheFirstOfTheMask) {
+  struct Case {
+    std::vector<qint32> masks;
+    std::size_t levelsLeft;
+    qint32 indentation;
+  };
+  const std::vector<Case> cases = {
+      {{IT_ABSOLUTE}, 0, 3},                // closes the continuation and the block
+      {{IT_RELATIVE}, 1, 6},                // stops at the continuation
+      {{IT_RELATIVE, IT_RELATIVE}, 0, 3},   // no match: empties the stack
+      {{IT_ABSOLUTE | IT_RELATIVE}, 1, 6},  // either bit: one level
+      {{IT_ABSOLUTE, IT_ABSOLUTE}, 0, 3},   // nothing left to close: no change
+  };
+  for (const Case& sample : cases) {
+    openForAndContinuation();
+    for (qint32 mask : sample.masks)
+      indenter.PopBlock(mask);
+    EXPECT_EQ(indenter.stack().size(), sample.levelsLeft);
+    EXPECT_EQ(indenter.current().Indentation, sample.indentation);
+  }
 }
 
 TEST_F(IndenterStack, IndentationNeverGoesBelowZero) {
@@ -209,318 +184,195 @@ TEST(IndenterConstruction, SpaceModeNeedsAtLeastOneSpace) {
 
 // --- Blocks in procedures ---
 
-TEST(IndentProcedureBlocks, BlockIfWithThreeSpaces) {
-  const QStringList expected = {
-      QStringLiteral("Sub Teste()"), QStringLiteral("   x = 1"), QStringLiteral("   If x > 0 Then"),
-      QStringLiteral("      y = 1"), QStringLiteral("   Else"),  QStringLiteral("      y = 2"),
-      QStringLiteral("   End If"),   QStringLiteral("End Sub"),
+// Each procedure is indented as written (three spaces a level) from a copy with no indentation at all, and
+// indenting it as written changes nothing.
+TEST(IndentProcedureBlocks, IndentsEachBlockKind) {
+  const char* const procedures[] = {
+      "Sub Teste()\n   x = 1\n   If x > 0 Then\n      y = 1\n   Else\n      y = 2\n   End If\nEnd Sub",
+      // Case lines one unit in and their bodies two; a continued Case line keeps its body level.
+      R"(Sub T()
+   For i = 1 To 2
+      Select Case i
+         Case 1, _
+            2
+            a = 1
+         Case Else
+            a = 2
+      End Select
+      b = 1
+   Next
+End Sub)",
+      // A single-line If opens no level, a comment after Then does.
+      R"(Sub T()
+   If a Then b = 1
+   c = 1
+   If a Then ' comentário
+      d = 1
+   End If
+   If s = "'" Then
+      e = 1
+   End If
+   If a Then MsgBox "it's"
+   f = 1
+End Sub)",
+      // A continued If header opens a level when it ends in Then, and closes it when a statement follows.
+      R"(Sub T()
+   If a > 0 And _
+      b > 0 Then
+      c = 1
+   End If
+   If a > 0 And _
+      b > 0 And _
+      c > 0 Then d = 1
+   e = 1
+End Sub)",
+      "Sub T()\n   x = 1 + _\n      2 + _\n      3\n   y = 4\nEnd Sub",
+      // The header's continuation lines sit at the body level.
+      "Private Sub Foo(ByVal a As Long, _\n   ByVal b As Long, _\n   ByVal c As Long)\n   x = a\nEnd Sub",
+      // Look-alike names are ordinary lines.
+      R"(Sub T()
+   DoEvents
+   Nextx = 1
+   Elsewhere = 2
+   Loops = 3
+   Wending = 4
+   Formatar x
+   Withdraw
+   Cases = 5
+End Sub)",
+      // Loop keywords with conditions, counters and comments.
+      R"(Sub T()
+   Do While a < 3
+      a = a + 1
+   Loop
+   Do ' sempre
+      For i = 1 To 3
+         b = i
+      Next i
+   Loop Until b > 5
+   While c
+      With obj
+         .Nome = 1
+      End With
+   Wend	' fim (a tab before the comment)
+   Do
+   Loop
+End Sub)",
+      // ElseIf and the directives close and reopen their level.
+      R"(Sub P()
+   #If DEBUG Then
+      Debug.Print 1
+   #ElseIf TESTE Then
+      Debug.Print 2
+   #Else
+      Debug.Print 3
+   #End If
+   If a Then
+      x = 1
+   ElseIf b Then
+      y = 1
+   Else ' resto
+      z = 1
+   End If
+End Sub)",
+      // Unbalanced closers do not leave the body.
+      "Sub U()\n   If a Then\n   End If\n   End If\n   Next\n   End Select\n   x = 1\nEnd Sub",
   };
-  EXPECT_EQ(indented({QStringLiteral("Sub Teste()"), QStringLiteral("x = 1"), QStringLiteral("If x > 0 Then"),
-                      QStringLiteral("y = 1"), QStringLiteral("Else"), QStringLiteral("y = 2"),
-                      QStringLiteral("End If"), QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, SelectCaseLinesOneUnitInAndBodiesTwo) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),
-      QStringLiteral("   For i = 1 To 2"),
-      QStringLiteral("      Select Case i"),
-      QStringLiteral("         Case 1"),
-      QStringLiteral("            a = 1"),
-      QStringLiteral("         Case Else"),
-      QStringLiteral("            a = 2"),
-      QStringLiteral("      End Select"),
-      QStringLiteral("      b = 1"),
-      QStringLiteral("   Next"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Sub T()"), QStringLiteral("For i = 1 To 2"),
-                      QStringLiteral("Select Case i"), QStringLiteral("Case 1"), QStringLiteral("a = 1"),
-                      QStringLiteral("Case Else"), QStringLiteral("a = 2"), QStringLiteral("End Select"),
-                      QStringLiteral("b = 1"), QStringLiteral("Next"), QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, ContinuedCaseLineKeepsItsBodyLevel) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),    QStringLiteral("   Select Case x"), QStringLiteral("      Case 1, _"),
-      QStringLiteral("         2"), QStringLiteral("         y = 1"),   QStringLiteral("   End Select"),
-      QStringLiteral("   z = 1"),   QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Sub T()"), QStringLiteral("Select Case x"), QStringLiteral("Case 1, _"),
-                      QStringLiteral("2"), QStringLiteral("y = 1"), QStringLiteral("End Select"),
-                      QStringLiteral("z = 1"), QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, SingleLineIfOpensNoLevelButCommentAfterThenDoes) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),
-      QStringLiteral("   If a Then b = 1"),
-      QStringLiteral("   c = 1"),
-      QStringLiteral("   If a Then ' comentário"),
-      QStringLiteral("      d = 1"),
-      QStringLiteral("   End If"),
-      QStringLiteral("   If s = \"'\" Then"),
-      QStringLiteral("      e = 1"),
-      QStringLiteral("   End If"),
-      QStringLiteral("   If a Then MsgBox \"it's\""),
-      QStringLiteral("   f = 1"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Sub T()"), QStringLiteral("If a Then b = 1"), QStringLiteral("c = 1"),
-                      QStringLiteral("If a Then ' comentário"), QStringLiteral("d = 1"),
-                      QStringLiteral("End If"), QStringLiteral("If s = \"'\" Then"), QStringLiteral("e = 1"),
-                      QStringLiteral("End If"), QStringLiteral("If a Then MsgBox \"it's\""),
-                      QStringLiteral("f = 1"), QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, ContinuedIfHeaderEndingInThenOpensALevel) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),     QStringLiteral("   If a > 0 And _"), QStringLiteral("      b > 0 Then"),
-      QStringLiteral("      c = 1"), QStringLiteral("   End If"),         QStringLiteral("   d = 1"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Sub T()"), QStringLiteral("If a > 0 And _"),
-                      QStringLiteral("b > 0 Then"), QStringLiteral("c = 1"), QStringLiteral("End If"),
-                      QStringLiteral("d = 1"), QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, ContinuedIfHeaderWithStatementAfterThenClosesItsLevel) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),           QStringLiteral("   If a > 0 And _"),
-      QStringLiteral("      b > 0 And _"), QStringLiteral("      c > 0 Then d = 1"),
-      QStringLiteral("   e = 1"),          QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(
-      indented({QStringLiteral("Sub T()"), QStringLiteral("If a > 0 And _"), QStringLiteral("b > 0 And _"),
-                QStringLiteral("c > 0 Then d = 1"), QStringLiteral("e = 1"), QStringLiteral("End Sub")}),
-      expected);
-}
-
-TEST(IndentProcedureBlocks, StatementOverThreeLinesIndentsItsContinuationLines) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"), QStringLiteral("   x = 1 + _"), QStringLiteral("      2 + _"),
-      QStringLiteral("      3"), QStringLiteral("   y = 4"),     QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Sub T()"), QStringLiteral("x = 1 + _"), QStringLiteral("   2 + _"),
-                      QStringLiteral("\t3"), QStringLiteral("        y = 4"), QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, HeaderContinuationLinesSitAtTheBodyLevel) {
-  const QStringList expected = {
-      QStringLiteral("Private Sub Foo(ByVal a As Long, _"),
-      QStringLiteral("   ByVal b As Long, _"),
-      QStringLiteral("   ByVal c As Long)"),
-      QStringLiteral("   x = a"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Private Sub Foo(ByVal a As Long, _"),
-                      QStringLiteral("                ByVal b As Long, _"),
-                      QStringLiteral("                ByVal c As Long)"), QStringLiteral("x = a"),
-                      QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, LookAlikeNamesAreOrdinaryLines) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),          QStringLiteral("   DoEvents"),  QStringLiteral("   Nextx = 1"),
-      QStringLiteral("   Elsewhere = 2"), QStringLiteral("   Loops = 3"), QStringLiteral("   Wending = 4"),
-      QStringLiteral("   Formatar x"),    QStringLiteral("   Withdraw"),  QStringLiteral("   Cases = 5"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Sub T()"), QStringLiteral("DoEvents"), QStringLiteral("Nextx = 1"),
-                      QStringLiteral("Elsewhere = 2"), QStringLiteral("Loops = 3"),
-                      QStringLiteral("Wending = 4"), QStringLiteral("Formatar x"), QStringLiteral("Withdraw"),
-                      QStringLiteral("Cases = 5"), QStringLiteral("End Sub")}),
-            expected);
-}
-
-TEST(IndentProcedureBlocks, LoopKeywordsWithConditionsCountersAndCommentsAreBlockLines) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),
-      QStringLiteral("   Do While a < 3"),
-      QStringLiteral("      a = a + 1"),
-      QStringLiteral("   Loop"),
-      QStringLiteral("   Do ' sempre"),
-      QStringLiteral("      For i = 1 To 3"),
-      QStringLiteral("         b = i"),
-      QStringLiteral("      Next i"),
-      QStringLiteral("   Loop Until b > 5"),
-      QStringLiteral("   While c"),
-      QStringLiteral("      With obj"),
-      QStringLiteral("         .Nome = 1"),
-      QStringLiteral("      End With"),
-      QStringLiteral("   Wend\t' fim"),
-      QStringLiteral("   Do"),
-      QStringLiteral("   Loop"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(
-      indented({QStringLiteral("Sub T()"), QStringLiteral("Do While a < 3"), QStringLiteral("a = a + 1"),
-                QStringLiteral("Loop"), QStringLiteral("Do ' sempre"), QStringLiteral("For i = 1 To 3"),
-                QStringLiteral("b = i"), QStringLiteral("Next i"), QStringLiteral("Loop Until b > 5"),
-                QStringLiteral("While c"), QStringLiteral("With obj"), QStringLiteral(".Nome = 1"),
-                QStringLiteral("End With"), QStringLiteral("Wend\t' fim"), QStringLiteral("Do"),
-                QStringLiteral("Loop"), QStringLiteral("End Sub")}),
-      expected);
-}
-
-TEST(IndentProcedureBlocks, ElseIfAndDirectivesCloseAndReopenTheirLevel) {
-  const QStringList expected = {
-      QStringLiteral("Sub P()"),
-      QStringLiteral("   #If DEBUG Then"),
-      QStringLiteral("      Debug.Print 1"),
-      QStringLiteral("   #ElseIf TESTE Then"),
-      QStringLiteral("      Debug.Print 2"),
-      QStringLiteral("   #Else"),
-      QStringLiteral("      Debug.Print 3"),
-      QStringLiteral("   #End If"),
-      QStringLiteral("   If a Then"),
-      QStringLiteral("      x = 1"),
-      QStringLiteral("   ElseIf b Then"),
-      QStringLiteral("      y = 1"),
-      QStringLiteral("   Else ' resto"),
-      QStringLiteral("      z = 1"),
-      QStringLiteral("   End If"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(
-      indented({QStringLiteral("Sub P()"), QStringLiteral("#If DEBUG Then"), QStringLiteral("Debug.Print 1"),
-                QStringLiteral("#ElseIf TESTE Then"), QStringLiteral("Debug.Print 2"),
-                QStringLiteral("#Else"), QStringLiteral("Debug.Print 3"), QStringLiteral("#End If"),
-                QStringLiteral("If a Then"), QStringLiteral("x = 1"), QStringLiteral("ElseIf b Then"),
-                QStringLiteral("y = 1"), QStringLiteral("Else ' resto"), QStringLiteral("z = 1"),
-                QStringLiteral("End If"), QStringLiteral("End Sub")}),
-      expected);
-}
-
-TEST(IndentProcedureBlocks, UnbalancedClosersDoNotLeaveTheBody) {
-  const QStringList expected = {
-      QStringLiteral("Sub U()"),   QStringLiteral("   If a Then"), QStringLiteral("   End If"),
-      QStringLiteral("   End If"), QStringLiteral("   Next"),      QStringLiteral("   End Select"),
-      QStringLiteral("   x = 1"),  QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(indented({QStringLiteral("Sub U()"), QStringLiteral("If a Then"), QStringLiteral("End If"),
-                      QStringLiteral("End If"), QStringLiteral("Next"), QStringLiteral("End Select"),
-                      QStringLiteral("x = 1"), QStringLiteral("End Sub")}),
-            expected);
+  for (const char* procedure : procedures) {
+    const QStringList expected = linesOf(procedure);
+    EXPECT_EQ(indented(flattened(expected)), expected);
+    EXPECT_EQ(indented(expected), expected);
+  }
 }
 
 TEST(IndentProcedureBlocks, TabModeWritesOneTabPerLevelWhateverTheSpaceCount) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),       QStringLiteral("\tx = 1"), QStringLiteral("\tIf a Then"),
-      QStringLiteral("\t\ty = 1 + _"), QStringLiteral("\t\t\t2"), QStringLiteral("\tEnd If"),
-      QStringLiteral("End Sub"),
-  };
-  const QStringList input = {QStringLiteral("Sub T()"),   QStringLiteral("    x = 1"),
-                             QStringLiteral("If a Then"), QStringLiteral("y = 1 + _"),
-                             QStringLiteral("2"),         QStringLiteral("  End If"),
-                             QStringLiteral("End Sub")};
+  const QStringList expected =
+      linesOf("Sub T()\n\tx = 1\n\tIf a Then\n\t\ty = 1 + _\n\t\t\t2\n\tEnd If\nEnd Sub");
+  const QStringList input = linesOf("Sub T()\n    x = 1\nIf a Then\ny = 1 + _\n2\n  End If\nEnd Sub");
   EXPECT_EQ(indented(input, IndentMode::Tabs, 1), expected);
   EXPECT_EQ(indented(input, IndentMode::Tabs, 8), expected);
 }
 
 // --- The number column ---
 
-TEST(NumberColumn, WidestPrefixGivesTheColumn) {
-  const QStringList lines = {QStringLiteral("10000 x = 1"), QStringLiteral("y = 2"),
-                             QStringLiteral("10: z = 3")};
-  EXPECT_EQ(NumberColumnWidth(lines), QStringLiteral("      "));
-}
-
 TEST(NumberColumn, PrefixFormsAreMeasuredAsTheyAreWritten) {
-  EXPECT_EQ(numberPrefixLength(u"10: x"), 3);
-  EXPECT_EQ(numberPrefixLength(u"10 : x"), 4);
-  EXPECT_EQ(numberPrefixLength(u"10 ' nota"), 3);
-  EXPECT_EQ(numberPrefixLength(u"10' nota"), 3);
-  EXPECT_EQ(numberPrefixLength(u"    10 x"), 3);
-  EXPECT_EQ(numberPrefixLength(u"1.5 x"), 4);
-  EXPECT_EQ(numberPrefixLength(u"-10 x"), 4);
+  const std::pair<const char16_t*, qsizetype> cases[] = {
+      {u"10: x", 3},
+      {u"10 : x", 4},
+      {u"10 ' nota", 3},
+      {u"10' nota", 3},
+      {u"    10 x", 3},
+      {u"1.5 x", 4},
+      {u"-10 x", 4},
+      // Blanks after the number, tabs too, belong to the indentation.
+      {u"10000 \t\tx = 1", 6},
+      {u"10000\tx = 1", 6},
+      {u"30    \t' nota", 3},
+      {u"20:   \tz = 1", 3},
+      // The ":" and "'" of a string literal are passed over.
+      {u"10 MsgBox \"a:b\" ' nota", 3},
+      {u"MsgBox \"10: x\"", 0},
+      // No usable number.
+      {u"", 0},
+      {u"   ", 0},
+      {u"x = 1", 0},
+      {u"10000", 0},
+      {u"10. x", 0},
+      {u"10, x", 0},
+      {u"Erro: x", 0},
+      {u"' 10 x", 0},
+  };
+  for (const auto& [line, length] : cases)
+    EXPECT_EQ(numberPrefixLength(line), length) << QString::fromUtf16(line).toStdString();
 }
 
-TEST(NumberColumn, LinesWithoutAUsableNumberHaveNoPrefix) {
-  for (const char16_t* line : {u"", u"   ", u"x = 1", u"10000", u"10. x", u"10, x", u"Erro: x", u"' 10 x"}) {
-    EXPECT_EQ(numberPrefixLength(line), 0) << QString::fromUtf16(line).toStdString();
-  }
-  EXPECT_EQ(NumberColumnWidth(QStringList{QStringLiteral("x"), QStringLiteral("y")}), QString());
-}
-
-TEST(NumberColumn, ContinuationLinesBeginningWithANumberAreNotMeasured) {
-  EXPECT_EQ(NumberColumnWidth(QStringList{QStringLiteral("x = 1 + _"), QStringLiteral("  200000 + _"),
-                                          QString(), QStringLiteral("300000 * y"), QStringLiteral("z = 1")}),
-            QString());
-  EXPECT_EQ(NumberColumnWidth(QStringList{QStringLiteral("10 x = _"), QStringLiteral("200000 + 1"),
-                                          QStringLiteral("' nota _"), QStringLiteral("40000 palavras")}),
+TEST(NumberColumn, WidestPrefixOfAStatementGivesTheColumn) {
+  EXPECT_EQ(NumberColumnWidth(linesOf("10000 x = 1\ny = 2\n10: z = 3")), QStringLiteral("      "));
+  EXPECT_EQ(NumberColumnWidth(linesOf("x\ny")), QString());
+  // Continuation lines beginning with a number carry an operand, not a label.
+  EXPECT_EQ(NumberColumnWidth(linesOf("x = 1 + _\n  200000 + _\n\n300000 * y\nz = 1")), QString());
+  EXPECT_EQ(NumberColumnWidth(linesOf("10 x = _\n200000 + 1\n' nota _\n40000 palavras")),
             QStringLiteral("   "));
 }
 
 TEST(NumberColumn, ContinuationLinesBeginningWithANumberAreIndentedAsCode) {
-  const QStringList expected = {
-      QStringLiteral("Sub T()"),           QStringLiteral("10000    x = a + _"),
-      QStringLiteral("            2 * b"), QStringLiteral("10005    For i = 1 To _"),
-      QStringLiteral("            10"),    QStringLiteral("10010       y = i"),
-      QStringLiteral("10015    Next"),     QStringLiteral("End Sub"),
-  };
-  const QStringList once =
-      numberedAndIndented({QStringLiteral("Sub T()"), QStringLiteral("x = a + _"), QStringLiteral("2 * b"),
-                           QStringLiteral("For i = 1 To _"), QStringLiteral("10"), QStringLiteral("y = i"),
-                           QStringLiteral("Next"), QStringLiteral("End Sub")},
-                          IndentMode::Spaces, 3);
+  const QStringList expected = linesOf(R"(Sub T()
+10000    x = a + _
+            2 * b
+10005    For i = 1 To _
+            10
+10010       y = i
+10015    Next
+End Sub)");
+  const QStringList once = numberedAndIndented(
+      linesOf("Sub T()\nx = a + _\n2 * b\nFor i = 1 To _\n10\ny = i\nNext\nEnd Sub"), IndentMode::Spaces, 3);
   EXPECT_EQ(once, expected);
   EXPECT_EQ(numberedAndIndented(once, IndentMode::Spaces, 3), expected);
 }
 
-TEST(NumberColumn, ColonsAndQuotesInsideStringsDoNotMakeAPrefix) {
-  // The ":" and "'" of the string literal are passed over; the number before the first blank counts.
-  EXPECT_EQ(numberPrefixLength(u"10 MsgBox \"a:b\" ' nota"), 3);
-  EXPECT_EQ(numberPrefixLength(u"MsgBox \"10: x\""), 0);
-}
-
-TEST(NumberColumn, BlanksAfterTheNumberBelongToTheIndentation) {
-  EXPECT_EQ(numberPrefixLength(u"10000 \t\tx = 1"), 6);
-  EXPECT_EQ(numberPrefixLength(u"10000\tx = 1"), 6);
-  EXPECT_EQ(numberPrefixLength(u"30    \t' nota"), 3);
-  EXPECT_EQ(numberPrefixLength(u"20:   \tz = 1"), 3);
-}
-
 TEST(NumberColumn, NumberedProcedureIsAlignedInASixCharacterColumn) {
-  const QStringList expected = {
-      QStringLiteral("Sub Foo()"),
-      QStringLiteral("10000    x = 1"),
-      QStringLiteral("10005    If a Then"),
-      QStringLiteral("10010       b = 1"),
-      QStringLiteral("10015    End If"),
-      QStringLiteral("         Erro:"),
-      QStringLiteral("5        y = 1"),
-      QStringLiteral("20:      z = 1"),
-      QStringLiteral("30       ' nota"),
-      QStringLiteral("10020    MsgBox \"a:b\""),
-      QStringLiteral("End Sub"),
-  };
-  const QStringList input = {
-      QStringLiteral("Sub Foo()"),       QStringLiteral("10000 x = 1"),
-      QStringLiteral("10005 If a Then"), QStringLiteral("10010 b = 1"),
-      QStringLiteral("10015 End If"),    QStringLiteral("Erro:"),
-      QStringLiteral("5 y = 1"),         QStringLiteral("20: z = 1"),
-      QStringLiteral("30 ' nota"),       QStringLiteral("10020 MsgBox \"a:b\""),
-      QStringLiteral("End Sub"),
-  };
+  const QStringList expected = linesOf(R"(Sub Foo()
+10000    x = 1
+10005    If a Then
+10010       b = 1
+10015    End If
+         Erro:
+5        y = 1
+20:      z = 1
+30       ' nota
+10020    MsgBox "a:b"
+End Sub)");
+  const QStringList input = linesOf(
+      "Sub Foo()\n10000 x = 1\n10005 If a Then\n10010 b = 1\n10015 End If\nErro:\n5 y = 1\n20: z = 1\n"
+      "30 ' nota\n10020 MsgBox \"a:b\"\nEnd Sub");
   EXPECT_EQ(indented(input), expected);
 }
 
 TEST(NumberColumn, ColumnIsStableAcrossRunsInTabMode) {
-  QStringList lines = {QStringLiteral("Sub Foo()"), QStringLiteral("10000 x = 1"),
-                       QStringLiteral("30   ' nota"), QStringLiteral("y = 2"), QStringLiteral("End Sub")};
+  QStringList lines = linesOf("Sub Foo()\n10000 x = 1\n30   ' nota\ny = 2\nEnd Sub");
   Indenter indenter(IndentMode::Tabs, 1);
   indentProcedure(lines, indenter);
-  const QStringList expected = {QStringLiteral("Sub Foo()"), QStringLiteral("10000 \tx = 1"),
-                                QStringLiteral("30    \t' nota"), QStringLiteral("      \ty = 2"),
-                                QStringLiteral("End Sub")};
+  const QStringList expected = linesOf("Sub Foo()\n10000 \tx = 1\n30    \t' nota\n      \ty = 2\nEnd Sub");
   EXPECT_EQ(lines, expected);
   EXPECT_EQ(indentProcedure(lines, indenter), 0);
   EXPECT_EQ(lines, expected);
@@ -529,86 +381,53 @@ TEST(NumberColumn, ColumnIsStableAcrossRunsInTabMode) {
 
 // --- Declarations ---
 
-TEST(IndentDeclarations, TypeAndEnumMembersAreOneUnitIn) {
-  const QStringList expected = {
-      QStringLiteral("Option Explicit"), QStringLiteral("Private Type TPonto"),
-      QStringLiteral("   X As Long"),    QStringLiteral("   Y As Long"),
-      QStringLiteral("End Type"),        QStringLiteral("Public Enum ECor"),
-      QStringLiteral("   Vermelho = 1"), QStringLiteral("   Azul = 2"),
-      QStringLiteral("End Enum"),        QStringLiteral("Type TSimples"),
-      QStringLiteral("   A As Integer"), QStringLiteral("End Type"),
-      QStringLiteral("Enum ETamanho"),   QStringLiteral("   Pequeno"),
-      QStringLiteral("End Enum"),        QStringLiteral("Dim m_x As Long"),
+TEST(IndentDeclarations, IndentsTypesEnumsAndDirectives) {
+  const char* const sections[] = {
+      R"(Option Explicit
+Private Type TPonto
+   X As Long
+   Y As Long
+End Type
+Public Enum ECor
+   Vermelho = 1
+   Azul = 2
+End Enum
+Type TSimples
+   A As Integer
+End Type
+Enum ETamanho
+   Pequeno
+End Enum
+Dim m_x As Long)",
+      R"(#If Win32 Then
+   Private Declare Function GetTickCount Lib "kernel32" () As Long
+#Else
+   Private Declare Function Foo Lib "x" _
+      (ByVal a As Long) As Long
+#End If
+Public Const A = 1)",
+      // Numbers are not a column; unbalanced closers stay at the margin.
+      "End Type\n10 Dim x\nEnd Enum\nDim y",
   };
-  EXPECT_EQ(declarationsIndented(
-                {QStringLiteral("   Option Explicit"), QStringLiteral("Private Type TPonto"),
-                 QStringLiteral("X As Long"), QStringLiteral("\t\tY As Long"), QStringLiteral("  End Type"),
-                 QStringLiteral("Public Enum ECor"), QStringLiteral("Vermelho = 1"),
-                 QStringLiteral("Azul = 2"), QStringLiteral("End Enum"), QStringLiteral("Type TSimples"),
-                 QStringLiteral("A As Integer"), QStringLiteral("End Type"), QStringLiteral("Enum ETamanho"),
-                 QStringLiteral("Pequeno"), QStringLiteral("End Enum"), QStringLiteral("Dim m_x As Long")}),
-            expected);
-}
-
-TEST(IndentDeclarations, DirectivesAndContinuedDeclarations) {
-  const QStringList expected = {
-      QStringLiteral("#If Win32 Then"),
-      QStringLiteral("   Private Declare Function GetTickCount Lib \"kernel32\" () As Long"),
-      QStringLiteral("#Else"),
-      QStringLiteral("   Private Declare Function Foo Lib \"x\" _"),
-      QStringLiteral("      (ByVal a As Long) As Long"),
-      QStringLiteral("#End If"),
-      QStringLiteral("Public Const A = 1"),
-  };
-  EXPECT_EQ(declarationsIndented(
-                {QStringLiteral("#If Win32 Then"),
-                 QStringLiteral("Private Declare Function GetTickCount Lib \"kernel32\" () As Long"),
-                 QStringLiteral("#Else"), QStringLiteral("Private Declare Function Foo Lib \"x\" _"),
-                 QStringLiteral("(ByVal a As Long) As Long"), QStringLiteral("#End If"),
-                 QStringLiteral("Public Const A = 1")}),
-            expected);
-}
-
-TEST(IndentDeclarations, NumbersAreNotAColumnAndUnbalancedClosersStayAtTheMargin) {
-  const QStringList expected = {QStringLiteral("End Type"), QStringLiteral("10 Dim x"),
-                                QStringLiteral("End Enum"), QStringLiteral("Dim y")};
-  EXPECT_EQ(declarationsIndented({QStringLiteral("  End Type"), QStringLiteral("10 Dim x"),
-                                  QStringLiteral("End Enum"), QStringLiteral("   Dim y")}),
-            expected);
-}
-
-TEST(IndentDeclarations, TabModeUsesOneTab) {
-  const QStringList expected = {QStringLiteral("Private Enum E"), QStringLiteral("\tA"),
-                                QStringLiteral("End Enum")};
-  EXPECT_EQ(declarationsIndented(
-                {QStringLiteral("Private Enum E"), QStringLiteral("    A"), QStringLiteral("End Enum")},
-                IndentMode::Tabs, 4),
-            expected);
+  for (const char* section : sections) {
+    const QStringList expected = linesOf(section);
+    EXPECT_EQ(declarationsIndented(flattened(expected)), expected);
+    EXPECT_EQ(declarationsIndented(expected), expected);
+  }
+  EXPECT_EQ(declarationsIndented(linesOf("Private Enum E\n    A\nEnd Enum"), IndentMode::Tabs, 4),
+            linesOf("Private Enum E\n\tA\nEnd Enum"));
 }
 
 // --- Only changed lines are reported ---
 
-TEST(IndentChanges, AlreadyIndentedProcedureReportsNoChange) {
-  QStringList lines = {QStringLiteral("Sub T()"),     QStringLiteral("   If a Then"),
-                       QStringLiteral("      b = 1"), QString(),
-                       QStringLiteral("   End If"),   QStringLiteral("End Sub")};
-  const QStringList before = lines;
-  Indenter indenter(IndentMode::Spaces, 3);
-  EXPECT_EQ(indentProcedure(lines, indenter), 0);
-  EXPECT_EQ(lines, before);
-}
-
 TEST(IndentChanges, OnlyLinesWhoseTextDiffersAreReported) {
-  QStringList lines = {QStringLiteral("Sub T()"), QStringLiteral("   a = 1"),  QStringLiteral("   b = 2   "),
-                       QStringLiteral("\tc = 3"), QStringLiteral("    d = 4"), QStringLiteral("   e = 5"),
-                       QStringLiteral("   "),     QStringLiteral("End Sub")};
+  QStringList lines = linesOf("Sub T()\n   a = 1\n\n   b = 2   \n\tc = 3\n    d = 4\n   e = 5\n   \nEnd Sub");
   Indenter indenter(IndentMode::Spaces, 3);
   EXPECT_EQ(indentProcedure(lines, indenter), 3);
-  const QStringList expected = {QStringLiteral("Sub T()"),  QStringLiteral("   a = 1"),
-                                QStringLiteral("   b = 2"), QStringLiteral("   c = 3"),
-                                QStringLiteral("   d = 4"), QStringLiteral("   e = 5"),
-                                QStringLiteral("   "),      QStringLiteral("End Sub")};
+  const QStringList expected =
+      linesOf("Sub T()\n   a = 1\n\n   b = 2\n   c = 3\n   d = 4\n   e = 5\n   \nEnd Sub");
   EXPECT_EQ(lines, expected);
+  EXPECT_EQ(indentProcedure(lines, indenter), 0);
 }
 
 TEST(IndentChanges, NumberColumnPaddingIsComparedToo) {
@@ -627,180 +446,102 @@ TEST(IndentChanges, NumberColumnPaddingIsComparedToo) {
 
 // --- Idempotence and the number-and-indent route ---
 
-const QStringList kMessy = {
-    QStringLiteral("Function Maior(a As Long, _"),
-    QStringLiteral("  b As Long) As Long"),
-    QStringLiteral("\t\tIf a > b Then   "),
-    QStringLiteral("  Maior = a"),
-    QStringLiteral("\tElseIf a = b Then"),
-    QStringLiteral("Maior = a ' iguais"),
-    QStringLiteral(" Else"),
-    QStringLiteral("            Maior = b"),
-    QStringLiteral("End If"),
-    QStringLiteral("  Do While a > 0"),
-    QStringLiteral("a = a - 1: DoEvents"),
-    QStringLiteral("   Loop"),
-    QStringLiteral("End Function"),
-};
-
-TEST(IndentIdempotence, IndentingTwiceInTabModeEqualsOnce) {
-  const QStringList expected = {
-      QStringLiteral("Function Maior(a As Long, _"),
-      QStringLiteral("\tb As Long) As Long"),
-      QStringLiteral("\tIf a > b Then"),
-      QStringLiteral("\t\tMaior = a"),
-      QStringLiteral("\tElseIf a = b Then"),
-      QStringLiteral("\t\tMaior = a ' iguais"),
-      QStringLiteral("\tElse"),
-      QStringLiteral("\t\tMaior = b"),
-      QStringLiteral("\tEnd If"),
-      QStringLiteral("\tDo While a > 0"),
-      QStringLiteral("\t\ta = a - 1: DoEvents"),
-      QStringLiteral("\tLoop"),
-      QStringLiteral("End Function"),
-  };
-  QStringList lines = kMessy;
-  Indenter indenter(IndentMode::Tabs, 1);
-  indentProcedure(lines, indenter);
-  EXPECT_EQ(lines, expected);
-  EXPECT_EQ(indentProcedure(lines, indenter), 0);
-  EXPECT_EQ(lines, expected);
+// `pattern` with each "|" made one level in `mode`.
+QStringList inMode(const char* pattern, IndentMode mode, qint32 spaces) {
+  QString text = QString::fromUtf8(pattern);
+  text.replace(u'|', mode == IndentMode::Tabs ? QStringLiteral("\t") : QString(spaces, u' '));
+  return text.split(u'\n');
 }
 
-TEST(IndentIdempotence, IndentingTwiceInSpaceModeEqualsOnce) {
-  const QStringList expected = {
-      QStringLiteral("Function Maior(a As Long, _"),
-      QStringLiteral("    b As Long) As Long"),
-      QStringLiteral("    If a > b Then"),
-      QStringLiteral("        Maior = a"),
-      QStringLiteral("    ElseIf a = b Then"),
-      QStringLiteral("        Maior = a ' iguais"),
-      QStringLiteral("    Else"),
-      QStringLiteral("        Maior = b"),
-      QStringLiteral("    End If"),
-      QStringLiteral("    Do While a > 0"),
-      QStringLiteral("        a = a - 1: DoEvents"),
-      QStringLiteral("    Loop"),
-      QStringLiteral("End Function"),
-  };
-  QStringList lines = kMessy;
-  Indenter indenter(IndentMode::Spaces, 4);
-  indentProcedure(lines, indenter);
-  EXPECT_EQ(lines, expected);
-  EXPECT_EQ(indentProcedure(lines, indenter), 0);
-  EXPECT_EQ(lines, expected);
+TEST(IndentIdempotence, IndentingTwiceEqualsOnceInEitherMode) {
+  const QStringList messy = linesOf(
+      "Function Maior(a As Long, _\n  b As Long) As Long\n\t\tIf a > b Then   \n  Maior = a\n\tElseIf a = b "
+      "Then\n"
+      "Maior = a ' iguais\n Else\n            Maior = b\nEnd If\n  Do While a > 0\na = a - 1: DoEvents\n"
+      "   Loop\nEnd Function");
+  const char* const expected = R"(Function Maior(a As Long, _
+|b As Long) As Long
+|If a > b Then
+||Maior = a
+|ElseIf a = b Then
+||Maior = a ' iguais
+|Else
+||Maior = b
+|End If
+|Do While a > 0
+||a = a - 1: DoEvents
+|Loop
+End Function)";
+  for (const auto& [mode, spaces] : {std::pair(IndentMode::Tabs, 1), std::pair(IndentMode::Spaces, 4)}) {
+    QStringList lines = messy;
+    Indenter indenter(mode, spaces);
+    indentProcedure(lines, indenter);
+    EXPECT_EQ(lines, inMode(expected, mode, spaces));
+    EXPECT_EQ(indentProcedure(lines, indenter), 0);
+  }
 }
 
-const QStringList kCalcular = {
-    QStringLiteral("Private Sub Calcular(ByVal n As Long)"),
-    QStringLiteral("    Dim i As Long"),
-    QStringLiteral("    On Error GoTo Erro"),
-    QString(),
-    QStringLiteral("    If n > 0 Then"),
-    QStringLiteral("        For i = 1 To n"),
-    QStringLiteral("            Total = Total + _"),
-    QStringLiteral("                i"),
-    QStringLiteral("        Next i"),
-    QStringLiteral("    Else"),
-    QStringLiteral("        Select Case n"),
-    QStringLiteral("            Case 0"),
-    QStringLiteral("                MsgBox \"zero\""),
-    QStringLiteral("            Case Else"),
-    QStringLiteral("                MsgBox \"negativo\""),
-    QStringLiteral("        End Select"),
-    QStringLiteral("    End If"),
-    QStringLiteral("    ' fim"),
-    QStringLiteral("    Exit Sub"),
-    QStringLiteral("Erro:"),
-    QStringLiteral("    MsgBox Err.Description"),
-    QStringLiteral("End Sub"),
-};
+const QStringList kCalcular = linesOf(R"(Private Sub Calcular(ByVal n As Long)
+    Dim i As Long
+    On Error GoTo Erro
 
-TEST(NumberAndIndent, NumberingDialogRouteAlignsNumbersAndIndentsWithTabs) {
-  const QStringList expected = {
-      QStringLiteral("Private Sub Calcular(ByVal n As Long)"),
-      QStringLiteral("10000 \tDim i As Long"),
-      QStringLiteral("10005 \tOn Error GoTo Erro"),
-      QString(),
-      QStringLiteral("10010 \tIf n > 0 Then"),
-      QStringLiteral("10015 \t\tFor i = 1 To n"),
-      QStringLiteral("10020 \t\t\tTotal = Total + _"),
-      QStringLiteral("      \t\t\t\ti"),
-      QStringLiteral("10025 \t\tNext i"),
-      QStringLiteral("10030 \tElse"),
-      QStringLiteral("10035 \t\tSelect Case n"),
-      QStringLiteral("      \t\t\tCase 0"),
-      QStringLiteral("10040 \t\t\t\tMsgBox \"zero\""),
-      QStringLiteral("      \t\t\tCase Else"),
-      QStringLiteral("10045 \t\t\t\tMsgBox \"negativo\""),
-      QStringLiteral("10050 \t\tEnd Select"),
-      QStringLiteral("10055 \tEnd If"),
-      QStringLiteral("      \t' fim"),
-      QStringLiteral("10060 \tExit Sub"),
-      QStringLiteral("      \tErro:"),
-      QStringLiteral("10065 \tMsgBox Err.Description"),
-      QStringLiteral("End Sub"),
-  };
-  const QStringList once = numberedAndIndented(kCalcular, IndentMode::Tabs, 1);
-  EXPECT_EQ(once, expected);
-  EXPECT_EQ(numberedAndIndented(once, IndentMode::Tabs, 1), expected);
+    If n > 0 Then
+        For i = 1 To n
+            Total = Total + _
+                i
+        Next i
+    Else
+        Select Case n
+            Case 0
+                MsgBox "zero"
+            Case Else
+                MsgBox "negativo"
+        End Select
+    End If
+    ' fim
+    Exit Sub
+Erro:
+    MsgBox Err.Description
+End Sub)");
+
+// Numbers in a column of six, then the levels: the numbering dialog's route indents with tabs, the
+// indentation dialog's with spaces.
+constexpr const char* kCalcularNumbered = R"(Private Sub Calcular(ByVal n As Long)
+10000 |Dim i As Long
+10005 |On Error GoTo Erro
+
+10010 |If n > 0 Then
+10015 ||For i = 1 To n
+10020 |||Total = Total + _
+      ||||i
+10025 ||Next i
+10030 |Else
+10035 ||Select Case n
+      |||Case 0
+10040 ||||MsgBox "zero"
+      |||Case Else
+10045 ||||MsgBox "negativo"
+10050 ||End Select
+10055 |End If
+      |' fim
+10060 |Exit Sub
+      |Erro:
+10065 |MsgBox Err.Description
+End Sub)";
+
+TEST(NumberAndIndent, NumbersAlignInAColumnAndRunningAgainChangesNothing) {
+  for (const auto& [mode, spaces] : {std::pair(IndentMode::Tabs, 1), std::pair(IndentMode::Spaces, 3)}) {
+    const QStringList once = numberedAndIndented(kCalcular, mode, spaces);
+    EXPECT_EQ(once, inMode(kCalcularNumbered, mode, spaces));
+    EXPECT_EQ(numberedAndIndented(once, mode, spaces), once);
+  }
 }
 
-TEST(NumberAndIndent, IndentationDialogRouteAlignsNumbersAndIndentsWithSpaces) {
-  const QStringList expected = {
-      QStringLiteral("Private Sub Calcular(ByVal n As Long)"),
-      QStringLiteral("10000    Dim i As Long"),
-      QStringLiteral("10005    On Error GoTo Erro"),
-      QString(),
-      QStringLiteral("10010    If n > 0 Then"),
-      QStringLiteral("10015       For i = 1 To n"),
-      QStringLiteral("10020          Total = Total + _"),
-      QStringLiteral("                  i"),
-      QStringLiteral("10025       Next i"),
-      QStringLiteral("10030    Else"),
-      QStringLiteral("10035       Select Case n"),
-      QStringLiteral("               Case 0"),
-      QStringLiteral("10040             MsgBox \"zero\""),
-      QStringLiteral("               Case Else"),
-      QStringLiteral("10045             MsgBox \"negativo\""),
-      QStringLiteral("10050       End Select"),
-      QStringLiteral("10055    End If"),
-      QStringLiteral("         ' fim"),
-      QStringLiteral("10060    Exit Sub"),
-      QStringLiteral("         Erro:"),
-      QStringLiteral("10065    MsgBox Err.Description"),
-      QStringLiteral("End Sub"),
-  };
-  const QStringList once = numberedAndIndented(kCalcular, IndentMode::Spaces, 3);
-  EXPECT_EQ(once, expected);
-  EXPECT_EQ(numberedAndIndented(once, IndentMode::Spaces, 3), expected);
-}
-
-TEST(NumberAndIndent, RemovingNumbersThenIndentingLeavesAnEmptyColumn) {
-  const QStringList expected = {
-      QStringLiteral("Private Sub Calcular(ByVal n As Long)"),
-      QStringLiteral("   Dim i As Long"),
-      QStringLiteral("   On Error GoTo Erro"),
-      QString(),
-      QStringLiteral("   If n > 0 Then"),
-      QStringLiteral("      For i = 1 To n"),
-      QStringLiteral("         Total = Total + _"),
-      QStringLiteral("            i"),
-      QStringLiteral("      Next i"),
-      QStringLiteral("   Else"),
-      QStringLiteral("      Select Case n"),
-      QStringLiteral("         Case 0"),
-      QStringLiteral("            MsgBox \"zero\""),
-      QStringLiteral("         Case Else"),
-      QStringLiteral("            MsgBox \"negativo\""),
-      QStringLiteral("      End Select"),
-      QStringLiteral("   End If"),
-      QStringLiteral("   ' fim"),
-      QStringLiteral("   Exit Sub"),
-      QStringLiteral("   Erro:"),
-      QStringLiteral("   MsgBox Err.Description"),
-      QStringLiteral("End Sub"),
-  };
+TEST(NumberAndIndent, RemovingNumbersThenIndentingLeavesNoColumn) {
+  // The numbered layout without its column.
+  QStringList expected = inMode(kCalcularNumbered, IndentMode::Spaces, 3);
+  for (qsizetype i = 1; i + 1 < expected.size(); ++i)
+    expected[i] = expected[i].mid(6);
   const QStringList numbered = numberedAndIndented(kCalcular, IndentMode::Spaces, 3);
   EXPECT_EQ(indented(unnumberProcedure(numbered), IndentMode::Spaces, 3), expected);
 }

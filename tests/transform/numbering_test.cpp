@@ -37,68 +37,98 @@ QString unnumbered(const QString& text, bool expectChange) {
   return line;
 }
 
-// --- Lines that never get a number ---
+// --- One line ---
 
-TEST(NumberLineSkips, BlankLinesAreUnchangedAndEndAContinuation) {
-  for (const QString& text :
-       {QString(), QStringLiteral("    "), QStringLiteral("\t"), QStringLiteral(" \t ")}) {
-    const Numbered n = numberOne(text, 9995, true);
-    EXPECT_FALSE(n.changed);
-    EXPECT_EQ(n.line, text);
-    EXPECT_EQ(n.number, 9995);
-    EXPECT_FALSE(n.continuation);
+TEST(NumberLineRules, EachKindOfLineIsNumberedOrLeftAsItIs) {
+  struct Case {
+    const char16_t* text;
+    const char16_t* numbered;  // null: unchanged
+    bool takesNumber;
+    bool continuedAfter = false;
+    bool afterContinuedLine = false;
+  };
+  const Case cases[] = {
+      // Blank and comment lines end a continuation, unless the comment itself goes on.
+      {u"", nullptr, false, false, true},
+      {u"    ", nullptr, false, false, true},
+      {u"\t", nullptr, false, false, true},
+      {u" \t ", nullptr, false, false, true},
+      {u"' nota", nullptr, false, false, true},
+      {u"    ' nota", nullptr, false, false, true},
+      {u"\t' nota", nullptr, false, false, true},
+      {u"'x _", nullptr, false, true, true},
+      // Declarations, directives, Case lines, procedure headers and ends get no number.
+      {u"Private Const A = 1", nullptr, false},
+      {u"    Public X As Long", nullptr, false},
+      {u"Friend Function F() As Long", nullptr, false},
+      {u"        Case 1", nullptr, false},
+      {u"Case Else", nullptr, false},
+      {u"Event Changed()", nullptr, false},
+      {u"Sub Foo()", nullptr, false},
+      {u"Function Bar() As Long", nullptr, false},
+      {u"Property Get Nome() As String", nullptr, false},
+      {u"#If DEBUG Then", nullptr, false},
+      {u"\t#End If", nullptr, false},
+      {u"End Sub", nullptr, false},
+      {u"End Function", nullptr, false},
+      {u"End Property", nullptr, false},
+      {u"Private Declare Function GetTickCount Lib \"kernel32\" _", nullptr, false, true},
+      {u"        Case 1, 2, _", nullptr, false, true},
+      // Keywords are case-sensitive and whole words.
+      {u"private_x = 1", u"10000 private_x = 1", true},
+      {u"Cases = 2", u"10000 Cases = 2", true},
+      // The number, a space and the line's indentation; two spaces before a one-word line.
+      {u"    x = 1", u"10000     x = 1", true},
+      {u"End If", u"10000 End If", true},
+      {u"End Select", u"10000 End Select", true},
+      {u"Else", u"10000  Else", true},
+      {u"    Loop", u"10000      Loop", true},
+      {u"x = 1 + _", u"10000 x = 1 + _", true, true},
+      {u"x = 1 + _\t", u"10000 x = 1 + _\t", true, true},  // a trailing tab hides no continuation mark
+      // Leading tabs are kept exactly.
+      {u"\tx = 1", u"10000 \tx = 1", true},
+      {u"\t\tElse", u"10000  \t\tElse", true},
+      {u" \tx = 1\t", u"10000  \tx = 1\t", true},
+      // A number in front of a comment is dropped, a line holding only a number is emptied.
+      {u"10 ' nota", u"' nota", false},
+      {u"    10' nota", u"    ' nota", false},
+      {u"10", u"", false},
+      {u"   10  ", u"", false},
+      {u"\t-5", u"", false},
+      {u"1.5", u"", false},
+      // Text ending in a point or a comma is not a number; colons and quotes in code are no label or comment.
+      {u"10.", u"10000  10.", true},
+      {u"10. x", u"10000 10. x", true},
+      {u"10, x", u"10000 10, x", true},
+      {u"10.: x", u"10000 10.: x", true},
+      {u"x = a: y = b", u"10000 x = a: y = b", true},
+      {u"MsgBox \"it's\"", u"10000 MsgBox \"it's\"", true},
+      // A line beginning with a label is never numbered; a keyword with a colon is a statement.
+      {u"ErrorHandler:", nullptr, false},
+      {u"Erro: x = 1", nullptr, false},
+      {u"    Saida:", nullptr, false},
+      {u"Ação:", nullptr, false},
+      {u"Label_1: ' nota", nullptr, false},
+      {u"\tFim:", nullptr, false},
+      {u"Else:", u"10000  Else:", true},
+      {u"    Else: x = 1", u"10000     Else: x = 1", true},
+      {u"End:", u"10000  End:", true},
+      {u"Resume: x = 1", u"10000 Resume: x = 1", true},
+      {u"else:", u"10000  else:", true},
+      {u"Foo x:=1", u"10000 Foo x:=1", true},
+      {u"1Erro: x", u"10000 1Erro: x", true},
+  };
+  for (const Case& sample : cases) {
+    const QString text = QString::fromUtf16(sample.text);
+    SCOPED_TRACE(text.toStdString());
+    const Numbered n = numberOne(text, 9995, sample.afterContinuedLine);
+    EXPECT_EQ(n.changed, sample.numbered != nullptr);
+    EXPECT_EQ(n.line, sample.numbered ? QString::fromUtf16(sample.numbered) : text);
+    EXPECT_EQ(n.number, sample.takesNumber ? 10000 : 9995);
+    EXPECT_EQ(n.continuation, sample.continuedAfter);
   }
-}
-
-TEST(NumberLineSkips, CommentLinesAreUnchangedAndEndAContinuation) {
-  for (const QString& text : {QStringLiteral("' nota"), QStringLiteral("    ' nota"),
-                              QStringLiteral("\t' nota"), QStringLiteral("'x _")}) {
-    const Numbered n = numberOne(text, 9995, true);
-    EXPECT_FALSE(n.changed) << text.toStdString();
-    EXPECT_EQ(n.line, text);
-    EXPECT_EQ(n.number, 9995);
-    // Unless the comment itself goes on over the next line.
-    EXPECT_EQ(n.continuation, text.endsWith(u'_'));
-  }
-}
-
-TEST(NumberLineSkips, DeclarationsDirectivesCaseLinesAndProcedureEndsGetNoNumber) {
-  for (const QString& text : {
-           QStringLiteral("Private Const A = 1"),
-           QStringLiteral("    Public X As Long"),
-           QStringLiteral("Friend Function F() As Long"),
-           QStringLiteral("        Case 1"),
-           QStringLiteral("Case Else"),
-           QStringLiteral("Event Changed()"),
-           QStringLiteral("Sub Foo()"),
-           QStringLiteral("Function Bar() As Long"),
-           QStringLiteral("Property Get Nome() As String"),
-           QStringLiteral("#If DEBUG Then"),
-           QStringLiteral("\t#End If"),
-           QStringLiteral("End Sub"),
-           QStringLiteral("End Function"),
-           QStringLiteral("End Property"),
-       }) {
-    const Numbered n = numberOne(text);
-    EXPECT_FALSE(n.changed) << text.toStdString();
-    EXPECT_EQ(n.line, text);
-    EXPECT_EQ(n.number, 9995);
-    EXPECT_FALSE(n.continuation);
-  }
-}
-
-TEST(NumberLineSkips, ContinuedDeclarationOrCaseMarksTheNextLineAsContinuation) {
-  Numbered n = numberOne(QStringLiteral("Private Declare Function GetTickCount Lib \"kernel32\" _"));
-  EXPECT_FALSE(n.changed);
-  EXPECT_TRUE(n.continuation);
-  n = numberOne(QStringLiteral("        Case 1, 2, _"));
-  EXPECT_FALSE(n.changed);
-  EXPECT_TRUE(n.continuation);
-}
-
-TEST(NumberLineSkips, KeywordsAreCaseSensitive) {
-  EXPECT_EQ(numberOne(QStringLiteral("private_x = 1")).line, QStringLiteral("10000 private_x = 1"));
-  EXPECT_EQ(numberOne(QStringLiteral("Cases = 2")).line, QStringLiteral("10000 Cases = 2"));
+  const Numbered negative = numberOne(QStringLiteral("x = 1"), -15, false, 5);
+  EXPECT_EQ(negative.line, QStringLiteral("-10 x = 1"));
 }
 
 // --- Continued statements get one number, on their first line ---
@@ -125,58 +155,16 @@ TEST(NumberLineContinuation, StatementOverThreeLinesIsNumberedOnItsFirstLineOnly
   EXPECT_EQ(number, 10005);
 }
 
-TEST(NumberLineContinuation, BlankOrCommentLineEndsTheContinuation) {
-  const QStringList walked = numberProcedure({
-      QStringLiteral("Sub A()"),
-      QStringLiteral("x = 1 + _"),
-      QString(),
-      QStringLiteral("y = 2"),
-      QStringLiteral("z = 3 + _"),
-      QStringLiteral("\t' nota"),
-      QStringLiteral("w = 4"),
-      QStringLiteral("' nota longa _"),
-      QStringLiteral("    que continua"),
-      QStringLiteral("End Sub"),
-  });
-  const QStringList expected = {
-      QStringLiteral("Sub A()"),     QStringLiteral("10000 x = 1 + _"), QString(),
-      QStringLiteral("10005 y = 2"), QStringLiteral("10010 z = 3 + _"), QStringLiteral("\t' nota"),
-      QStringLiteral("10015 w = 4"), QStringLiteral("' nota longa _"),  QStringLiteral("    que continua"),
-      QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(walked, expected);
+TEST(NumberLineContinuation, BlankCommentOrLabelLinesEndOrCarryTheContinuation) {
+  // A blank or comment line ends a continuation; a continued statement after a label stays unnumbered.
+  EXPECT_EQ(
+      numberProcedure(linesOf("Sub A()\nx = 1 + _\n\ny = 2\nz = 3 + _\n\t' nota\nw = 4\n"
+                              "' nota longa _\n    que continua\nErro: x = 1 + _\n    2\ny = 3\nEnd Sub")),
+      linesOf("Sub A()\n10000 x = 1 + _\n\n10005 y = 2\n10010 z = 3 + _\n\t' nota\n10015 w = 4\n"
+              "' nota longa _\n    que continua\nErro: x = 1 + _\n    2\n10020 y = 3\nEnd Sub"));
 }
 
 // --- How a number goes in ---
-
-TEST(NumberLineRules, IndentedStatementGetsNumberSpaceAndItsIndentation) {
-  const Numbered n = numberOne(QStringLiteral("    x = 1"));
-  EXPECT_TRUE(n.changed);
-  EXPECT_EQ(n.line, QStringLiteral("10000     x = 1"));
-  EXPECT_EQ(n.number, 10000);
-  EXPECT_FALSE(n.continuation);
-}
-
-TEST(NumberLineRules, OneWordLineGetsTwoSpaces) {
-  EXPECT_EQ(numberOne(QStringLiteral("Else")).line, QStringLiteral("10000  Else"));
-  EXPECT_EQ(numberOne(QStringLiteral("    Loop")).line, QStringLiteral("10000      Loop"));
-  EXPECT_EQ(numberOne(QStringLiteral("Next")).number, 10000);
-}
-
-TEST(NumberLineRules, EachNumberedLineAddsTheInterval) {
-  qint32 number = 9995;
-  bool continuation = false;
-  QString a = QStringLiteral("Dim i As Long");
-  QString b = QStringLiteral("End If");
-  QString c = QStringLiteral("End Select");
-  NumberLine(a, number, continuation, 5);
-  NumberLine(b, number, continuation, 5);
-  NumberLine(c, number, continuation, 5);
-  EXPECT_EQ(a, QStringLiteral("10000 Dim i As Long"));
-  EXPECT_EQ(b, QStringLiteral("10005 End If"));
-  EXPECT_EQ(c, QStringLiteral("10010 End Select"));
-  EXPECT_EQ(number, 10010);
-}
 
 TEST(NumberLineRules, AnOldNumberGivesWayToTheNewOneWithItsSeparator) {
   // The new number takes the old one's place and its blank (or colon and blank), the indentation before
@@ -202,91 +190,6 @@ TEST(NumberLineRules, AnOldNumberGivesWayToTheNewOneWithItsSeparator) {
   }
 }
 
-TEST(NumberLineRules, NumberInFrontOfACommentIsDroppedAndTakesNoNumber) {
-  Numbered n = numberOne(QStringLiteral("10 ' nota"));
-  EXPECT_TRUE(n.changed);
-  EXPECT_EQ(n.line, QStringLiteral("' nota"));
-  EXPECT_EQ(n.number, 9995);
-  n = numberOne(QStringLiteral("    10' nota"));
-  EXPECT_EQ(n.line, QStringLiteral("    ' nota"));
-  EXPECT_EQ(n.number, 9995);
-}
-
-TEST(NumberLineRules, LineHoldingOnlyANumberIsEmptied) {
-  for (const QString& text :
-       {QStringLiteral("10"), QStringLiteral("   10  "), QStringLiteral("\t-5"), QStringLiteral("1.5")}) {
-    const Numbered n = numberOne(text);
-    EXPECT_TRUE(n.changed) << text.toStdString();
-    EXPECT_EQ(n.line, QString());
-    EXPECT_EQ(n.number, 9995);
-  }
-}
-
-TEST(NumberLineRules, TextEndingInPointOrCommaIsNotANumber) {
-  EXPECT_EQ(numberOne(QStringLiteral("10.")).line, QStringLiteral("10000  10."));
-  EXPECT_EQ(numberOne(QStringLiteral("10. x")).line, QStringLiteral("10000 10. x"));
-  EXPECT_EQ(numberOne(QStringLiteral("10, x")).line, QStringLiteral("10000 10, x"));
-  EXPECT_EQ(numberOne(QStringLiteral("10.: x")).line, QStringLiteral("10000 10.: x"));
-}
-
-TEST(NumberLineRules, ColonsAndQuotesInsideCodeAreNotLabelsOrComments) {
-  EXPECT_EQ(numberOne(QStringLiteral("x = a: y = b")).line, QStringLiteral("10000 x = a: y = b"));
-  EXPECT_EQ(numberOne(QStringLiteral("MsgBox \"it's\"")).line, QStringLiteral("10000 MsgBox \"it's\""));
-}
-
-TEST(NumberLineRules, NegativeNumbersAreWrittenWithAMinus) {
-  const Numbered n = numberOne(QStringLiteral("x = 1"), -15, false, 5);
-  EXPECT_EQ(n.line, QStringLiteral("-10 x = 1"));
-  EXPECT_EQ(n.number, -10);
-}
-
-TEST(NumberLineRules, ContinuedStatementSetsTheFlag) {
-  const Numbered n = numberOne(QStringLiteral("x = 1 + _"));
-  EXPECT_EQ(n.line, QStringLiteral("10000 x = 1 + _"));
-  EXPECT_TRUE(n.continuation);
-}
-
-// --- Alphanumeric labels ---
-
-TEST(NumberLineLabels, LineBeginningWithALabelIsNeverNumbered) {
-  for (const QString& text :
-       {QStringLiteral("ErrorHandler:"), QStringLiteral("Erro: x = 1"), QStringLiteral("    Saida:"),
-        QStringLiteral("Ação:"), QStringLiteral("Label_1: ' nota"), QStringLiteral("\tFim:")}) {
-    const Numbered n = numberOne(text);
-    EXPECT_FALSE(n.changed) << text.toStdString();
-    EXPECT_EQ(n.line, text);
-    EXPECT_EQ(n.number, 9995);
-  }
-}
-
-TEST(NumberLineLabels, KeywordFollowedByColonIsAStatement) {
-  EXPECT_EQ(numberOne(QStringLiteral("Else:")).line, QStringLiteral("10000  Else:"));
-  EXPECT_EQ(numberOne(QStringLiteral("    Else: x = 1")).line, QStringLiteral("10000     Else: x = 1"));
-  EXPECT_EQ(numberOne(QStringLiteral("End:")).line, QStringLiteral("10000  End:"));
-  EXPECT_EQ(numberOne(QStringLiteral("Resume: x = 1")).line, QStringLiteral("10000 Resume: x = 1"));
-  EXPECT_EQ(numberOne(QStringLiteral("else:")).line, QStringLiteral("10000  else:"));
-}
-
-TEST(NumberLineLabels, LabelWithSpaceBeforeTheColonOrNameCallIsNumbered) {
-  EXPECT_EQ(numberOne(QStringLiteral("Foo x:=1")).line, QStringLiteral("10000 Foo x:=1"));
-  EXPECT_EQ(numberOne(QStringLiteral("1Erro: x")).line, QStringLiteral("10000 1Erro: x"));
-}
-
-TEST(NumberLineLabels, ContinuedStatementAfterALabelKeepsItsContinuationUnnumbered) {
-  const QStringList walked = numberProcedure({
-      QStringLiteral("Sub A()"),
-      QStringLiteral("Erro: x = 1 + _"),
-      QStringLiteral("    2"),
-      QStringLiteral("y = 3"),
-      QStringLiteral("End Sub"),
-  });
-  const QStringList expected = {
-      QStringLiteral("Sub A()"),     QStringLiteral("Erro: x = 1 + _"), QStringLiteral("    2"),
-      QStringLiteral("10000 y = 3"), QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(walked, expected);
-}
-
 // --- Running numbers never wrap ---
 
 TEST(NumberLineOverflow, LastRepresentableNumberIsWritten) {
@@ -295,35 +198,27 @@ TEST(NumberLineOverflow, LastRepresentableNumberIsWritten) {
   EXPECT_EQ(n.number, kMax);
 }
 
-TEST(NumberLineOverflow, PassingTheLargestNumberThrowsAndChangesNothing) {
-  QString line = QStringLiteral("    x = 1 + _");
-  qint32 number = kMax - 4;
-  bool continuation = false;
-  EXPECT_THROW(NumberLine(line, number, continuation, 5), LineNumberOverflow);
-  EXPECT_EQ(line, QStringLiteral("    x = 1 + _"));
-  EXPECT_EQ(number, kMax - 4);
-  EXPECT_FALSE(continuation);
-}
-
-TEST(NumberLineOverflow, PassingTheSmallestNumberThrows) {
-  QString line = QStringLiteral("Else");
-  qint32 number = kMin + 2;
-  bool continuation = false;
-  EXPECT_THROW(NumberLine(line, number, continuation, -5), LineNumberOverflow);
-  EXPECT_EQ(line, QStringLiteral("Else"));
-  EXPECT_EQ(number, kMin + 2);
-}
-
-TEST(NumberLineOverflow, OverflowIsAnObjectModelErrorNumberSix) {
-  QString line = QStringLiteral("10: x = 1");
-  qint32 number = kMax;
-  bool continuation = false;
-  try {
-    NumberLine(line, number, continuation, 1);
-    FAIL() << "no overflow reported";
-  } catch (const ide::Error& error) {
-    EXPECT_EQ(error.number(), 6);
-    EXPECT_EQ(error.description(), QStringLiteral("Overflow"));
+TEST(NumberLineOverflow, PassingEitherLimitThrowsAnObjectModelOverflowAndChangesNothing) {
+  struct Case {
+    const char* text;
+    qint32 number;
+    qint32 interval;
+  };
+  for (const Case& sample :
+       {Case{"    x = 1 + _", kMax - 4, 5}, Case{"Else", kMin + 2, -5}, Case{"10: x = 1", kMax, 1}}) {
+    QString line = QString::fromUtf8(sample.text);
+    qint32 number = sample.number;
+    bool continuation = false;
+    try {
+      NumberLine(line, number, continuation, sample.interval);
+      ADD_FAILURE() << "no overflow reported: " << sample.text;
+    } catch (const LineNumberOverflow& error) {
+      EXPECT_EQ(error.number(), 6);
+      EXPECT_EQ(error.description(), QStringLiteral("Overflow"));
+    }
+    EXPECT_EQ(line, QString::fromUtf8(sample.text));
+    EXPECT_EQ(number, sample.number);
+    EXPECT_FALSE(continuation);
   }
 }
 
@@ -335,19 +230,6 @@ TEST(NumberLineOverflow, LinesThatTakeNoNumberDoNotOverflow) {
   n = numberOne(QStringLiteral("10"), kMax);
   EXPECT_EQ(n.line, QString());
   EXPECT_EQ(n.number, kMax);
-}
-
-// --- Tabs are blanks ---
-
-TEST(NumberLineTabs, LeadingTabsAreKeptExactly) {
-  EXPECT_EQ(numberOne(QStringLiteral("\tx = 1")).line, QStringLiteral("10000 \tx = 1"));
-  EXPECT_EQ(numberOne(QStringLiteral("\t\tElse")).line, QStringLiteral("10000  \t\tElse"));
-  EXPECT_EQ(numberOne(QStringLiteral(" \tx = 1\t")).line, QStringLiteral("10000  \tx = 1\t"));
-}
-
-TEST(NumberLineTabs, TrailingTabDoesNotHideTheContinuationMark) {
-  const Numbered n = numberOne(QStringLiteral("x = 1 + _\t"));
-  EXPECT_TRUE(n.continuation);
 }
 
 // --- Removing numbers ---
@@ -404,7 +286,7 @@ TEST(UnnumberLineContinuation, ContinuationLinesKeepTheirLeadingNumber) {
   EXPECT_EQ(next, QStringLiteral("y = 1"));
 }
 
-TEST(UnnumberLineContinuation, BlankLineEndsTheContinuation) {
+TEST(UnnumberLineContinuation, BlankLineEndsTheContinuationAndTheSingleLineRuleTakesAnyNumber) {
   bool continuation = true;
   QString blank;
   QString numbered = QStringLiteral("10 x");
@@ -412,62 +294,26 @@ TEST(UnnumberLineContinuation, BlankLineEndsTheContinuation) {
   EXPECT_FALSE(continuation);
   EXPECT_TRUE(UnnumberLine(numbered, continuation));
   EXPECT_EQ(numbered, QStringLiteral("x"));
-}
-
-TEST(UnnumberLineContinuation, SingleLineRuleAloneTakesAnyLeadingNumber) {
   EXPECT_EQ(unnumbered(QStringLiteral("    2 * b"), true), QStringLiteral("    * b"));
 }
 
 // --- Whole procedures ---
 
-TEST(NumberProcedureWalk, NumberingStartsAfterAThreeLineHeader) {
-  const QStringList walked = numberProcedure({
-      QStringLiteral("Private Function Soma(ByVal a As Long, _"),
-      QStringLiteral("                      ByVal b As Long, _"),
-      QStringLiteral("                      ByVal c As Long) As Long"),
-      QStringLiteral("    Soma = a + b + c"),
-      QStringLiteral("End Function"),
-  });
-  const QStringList expected = {
-      QStringLiteral("Private Function Soma(ByVal a As Long, _"),
-      QStringLiteral("                      ByVal b As Long, _"),
-      QStringLiteral("                      ByVal c As Long) As Long"),
-      QStringLiteral("10000     Soma = a + b + c"),
-      QStringLiteral("End Function"),
-  };
-  EXPECT_EQ(walked, expected);
-}
-
-TEST(NumberProcedureWalk, TrailingBlankLinesAndTheEndLineAreLeftAlone) {
-  const QStringList walked = numberProcedure({
-      QStringLiteral("Public Sub Limpar()"),
-      QStringLiteral("    x = 0"),
-      QStringLiteral("    Else"),
-      QStringLiteral("End Sub"),
-      QString(),
-      QStringLiteral("   "),
-  });
-  const QStringList expected = {
-      QStringLiteral("Public Sub Limpar()"),
-      QStringLiteral("10000     x = 0"),
-      QStringLiteral("10005      Else"),
-      QStringLiteral("End Sub"),
-      QString(),
-      QStringLiteral("   "),
-  };
-  EXPECT_EQ(walked, expected);
+TEST(NumberProcedureWalk, NumbersTheBodyBetweenAContinuedHeaderAndTheEndLine) {
+  // Trailing blank lines and the End line are left alone.
+  EXPECT_EQ(
+      numberProcedure(
+          linesOf("Private Function Soma(ByVal a As Long, _\n    ByVal b As Long, _\n"
+                  "    ByVal c As Long) As Long\n    Soma = a + b + c\n    Else\nEnd Function\n\n   ")),
+      linesOf(
+          "Private Function Soma(ByVal a As Long, _\n    ByVal b As Long, _\n    ByVal c As Long) As Long\n"
+          "10000     Soma = a + b + c\n10005      Else\nEnd Function\n\n   "));
 }
 
 TEST(NumberProcedureWalk, RenumberingReplacesOldNumbersAndRestartsPerProcedure) {
-  const QStringList first = numberProcedure({QStringLiteral("Sub A()"), QStringLiteral("10 x = 1"),
-                                             QStringLiteral("20: y = 2"), QStringLiteral("End Sub")},
-                                            100, 10);
-  const QStringList expected = {QStringLiteral("Sub A()"), QStringLiteral("100 x = 1"),
-                                QStringLiteral("110 y = 2"), QStringLiteral("End Sub")};
-  EXPECT_EQ(first, expected);
-  const QStringList second = numberProcedure(
-      {QStringLiteral("Sub B()"), QStringLiteral("z = 3"), QStringLiteral("End Sub")}, 100, 10);
-  EXPECT_EQ(second[1], QStringLiteral("100 z = 3"));
+  EXPECT_EQ(numberProcedure(linesOf("Sub A()\n10 x = 1\n20: y = 2\nEnd Sub"), 100, 10),
+            linesOf("Sub A()\n100 x = 1\n110 y = 2\nEnd Sub"));
+  EXPECT_EQ(numberProcedure(linesOf("Sub B()\nz = 3\nEnd Sub"), 100, 10)[1], QStringLiteral("100 z = 3"));
 }
 
 TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
@@ -515,19 +361,9 @@ TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
 }
 
 TEST(NumberProcedureWalk, RemovingNumbersRestoresTheCode) {
-  const QStringList numbered = numberProcedure({
-      QStringLiteral("Sub A()"),
-      QStringLiteral("    If x Then"),
-      QStringLiteral("        y = 1 + _"),
-      QStringLiteral("            2"),
-      QStringLiteral("    End If"),
-      QStringLiteral("End Sub"),
-  });
-  const QStringList expected = {
-      QStringLiteral("Sub A()"),       QStringLiteral("    If x Then"), QStringLiteral("        y = 1 + _"),
-      QStringLiteral("            2"), QStringLiteral("    End If"),    QStringLiteral("End Sub"),
-  };
-  EXPECT_EQ(unnumberProcedure(numbered), expected);
+  const QStringList code =
+      linesOf("Sub A()\n    If x Then\n        y = 1 + _\n            2\n    End If\nEnd Sub");
+  EXPECT_EQ(unnumberProcedure(numberProcedure(code)), code);
 }
 
 }  // namespace

@@ -81,21 +81,17 @@ TEST(CNumIndent, RemovesNumbersWithSpacesOverTheActiveProject) {
   EXPECT_EQ(linesOf(*s.second), (QStringList{kSecond[0], QStringLiteral("   z = 2"), kSecond[2]}));
 }
 
-TEST(CNumIndent, TheProcedureAtTheCaretAloneChanges) {
-  Scene s;
-  Ide::placeCaret(s.first, 4);
-  s.command.DoIt(PROG_PROCEDURE, &s.bar, 10000, 5, false, 1, true);
-  EXPECT_EQ(linesOf(*s.first), kFirstDone);
-  EXPECT_EQ(linesOf(*s.second), kSecond);
-}
-
-TEST(CNumIndent, ASelectionOutsideEveryProcedureFillsTheBarAndChangesNothing) {
+TEST(CNumIndent, TheProcedureAtTheCaretAloneChangesAndACaretOutsideEveryProcedureChangesNothing) {
   Scene s;
   Ide::placeCaret(s.first, 1);
   s.command.DoIt(PROG_PROCEDURE, &s.bar, 10000, 5, false, 1, true);
   EXPECT_EQ(linesOf(*s.first), kFirst);
-  EXPECT_EQ(s.bar.value(), s.bar.maximum());
+  EXPECT_EQ(s.bar.value(), s.bar.maximum()) << "the bar is still filled";
   EXPECT_EQ(s.events.seen.back(), QStringLiteral("Finished"));
+  Ide::placeCaret(s.first, 4);
+  s.command.DoIt(PROG_PROCEDURE, &s.bar, 10000, 5, false, 1, true);
+  EXPECT_EQ(linesOf(*s.first), kFirstDone);
+  EXPECT_EQ(linesOf(*s.second), kSecond);
 }
 
 TEST(CNumIndent, CancelDuringAProjectRunHidesTheBarAndRaisesNoFinished) {

@@ -19,6 +19,11 @@ struct ProcedureBounds {
   qsizetype last = 0;
 };
 
+/// The lines of a text written with "\n".
+inline QStringList linesOf(const char* utf8) {
+  return QString::fromUtf8(utf8).split(u'\n');
+}
+
 inline ProcedureBounds procedureBounds(const QStringList& lines) {
   ProcedureBounds bounds;
   bounds.last = lines.size() - 1;

@@ -38,38 +38,25 @@ class ProgressScaleTest : public ::testing::Test {
   ProgressScale progress{bar};
 };
 
-TEST_F(ProgressScaleTest, SmallRunTakesOneStepPerUnit) {
+TEST_F(ProgressScaleTest, RangesAboveTheLargestStepCountAreScaled) {
+  struct Case {
+    qint32 units;
+    int maximum;
+    double scale;
+  };
+  for (const Case& c : {Case{250, 250, 1.0}, Case{32767, 32767, 1.0}, Case{0, 1, 1.0}, Case{-5, 1, 1.0},
+                        Case{32768, 32767, 32768.0 / 32767.0}}) {
+    progress.SetProgressRange(c.units);
+    EXPECT_EQ(bar.minimum(), 0) << c.units;
+    EXPECT_EQ(bar.maximum(), c.maximum) << c.units;
+    EXPECT_EQ(bar.value(), 0) << c.units;
+    EXPECT_DOUBLE_EQ(progress.scale(), c.scale) << c.units;
+  }
   progress.SetProgressRange(250);
-  EXPECT_EQ(bar.minimum(), 0);
-  EXPECT_EQ(bar.maximum(), 250);
-  EXPECT_EQ(bar.value(), 0);
-  EXPECT_EQ(progress.scale(), 1.0);
   EXPECT_EQ(progress.totalUnits(), 250);
   progress.AdvanceProgress(1);
   progress.AdvanceProgress(40);
   EXPECT_EQ(bar.value(), 41);
-}
-
-TEST_F(ProgressScaleTest, RangeUpTo32767IsNotScaled) {
-  progress.SetProgressRange(32767);
-  EXPECT_EQ(bar.maximum(), 32767);
-  EXPECT_EQ(progress.scale(), 1.0);
-}
-
-TEST_F(ProgressScaleTest, EmptyOrNegativeRunGivesAOneStepBar) {
-  progress.SetProgressRange(0);
-  EXPECT_EQ(bar.maximum(), 1);
-  EXPECT_EQ(progress.scale(), 1.0);
-  progress.SetProgressRange(-5);
-  EXPECT_EQ(bar.minimum(), 0);
-  EXPECT_EQ(bar.maximum(), 1);
-  EXPECT_EQ(progress.scale(), 1.0);
-}
-
-TEST_F(ProgressScaleTest, LargerRunIsScaledTo32767Steps) {
-  progress.SetProgressRange(32768);
-  EXPECT_EQ(bar.maximum(), 32767);
-  EXPECT_DOUBLE_EQ(progress.scale(), 32768.0 / 32767.0);
 }
 
 TEST_F(ProgressScaleTest, FortyThousandMembersFillTheBarBeforeTheLastOne) {
@@ -88,22 +75,16 @@ TEST_F(ProgressScaleTest, FortyThousandMembersFillTheBarBeforeTheLastOne) {
   EXPECT_EQ(bar.valueWrites, writes);  // a full bar is left alone
 }
 
-TEST_F(ProgressScaleTest, StepsAreRounded) {
+TEST_F(ProgressScaleTest, StepsAreRoundedHalfUp) {
   progress.SetProgressRange(3 * 32767);  // three units per step
-  progress.AdvanceProgress(1);
-  EXPECT_EQ(bar.value(), 0);
-  progress.AdvanceProgress(2);
-  EXPECT_EQ(bar.value(), 1);
-  progress.AdvanceProgress(4);
-  EXPECT_EQ(bar.value(), 2);
-  progress.AdvanceProgress(3000);
-  EXPECT_EQ(bar.value(), 1002);
-}
-
-TEST_F(ProgressScaleTest, HalfStepRoundsUp) {
+  for (const auto& [units, value] :
+       {std::pair(1, 0), std::pair(2, 1), std::pair(4, 2), std::pair(3000, 1002)}) {
+    progress.AdvanceProgress(units);
+    EXPECT_EQ(bar.value(), value) << units;
+  }
   progress.SetProgressRange(2 * 32767);
   progress.AdvanceProgress(1);
-  EXPECT_EQ(bar.value(), 1);
+  EXPECT_EQ(bar.value(), 1) << "half a step";
 }
 
 TEST_F(ProgressScaleTest, NeverPastTheMaximum) {
@@ -116,14 +97,6 @@ TEST_F(ProgressScaleTest, NeverPastTheMaximum) {
   EXPECT_EQ(bar.value(), 100);
 }
 
-TEST_F(ProgressScaleTest, ZeroUnitsMoveNothing) {
-  progress.SetProgressRange(10);
-  const int writes = bar.valueWrites;
-  progress.AdvanceProgress(0);
-  EXPECT_EQ(bar.value(), 0);
-  EXPECT_EQ(bar.valueWrites, writes);
-}
-
 TEST_F(ProgressScaleTest, NewRangeStartsAnEmptyBarAndLeavesVisibilityToTheCaller) {
   progress.SetProgressRange(10);
   progress.AdvanceProgress(4);
@@ -131,6 +104,10 @@ TEST_F(ProgressScaleTest, NewRangeStartsAnEmptyBarAndLeavesVisibilityToTheCaller
   progress.SetProgressRange(20);
   EXPECT_EQ(bar.value(), 0);
   EXPECT_TRUE(bar.isVisible());
+  const int writes = bar.valueWrites;
+  progress.AdvanceProgress(0);
+  EXPECT_EQ(bar.value(), 0);
+  EXPECT_EQ(bar.valueWrites, writes) << "zero units move nothing";
 }
 
 }  // namespace
