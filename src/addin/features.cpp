@@ -1,10 +1,16 @@
 // SPDX-License-Identifier: MIT
-// The one place that says what each feature area does today. Numbering and indentation open their dialogs.
-// Every other area is not part of the add-in yet: its command and its events are connected and arrive
-// here, and do nothing until the area lands; no stand-in dialog pretends to be the feature meanwhile.
+// The one place that says what each feature area does today. Numbering, indentation and the new-procedure
+// wizard open their dialogs. Every other area is not part of the add-in yet: its command and its events are
+// connected and arrive here, and do nothing until the area lands; no stand-in dialog pretends to be the
+// feature meanwhile.
 #include "addin/features.h"
 
+#include "addin/envutils.h"
+#include "addin/help.h"
+#include "addin/texts.h"
 #include "common/settings.h"
+#include "common/strings.h"
+#include "newproc/frmnewproc.h"
 #include "transform/dialogs.h"
 
 #include <QWidget>
@@ -15,7 +21,7 @@ namespace {
 class AddInFeatures final : public Features {
  public:
   explicit AddInFeatures(const FeatureServices& services)
-      : m_vbe(services.vbe), m_settings(services.settings) {}
+      : m_vbe(services.vbe), m_settings(services.settings), m_services(services) {}
 
   void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
   void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
@@ -35,8 +41,7 @@ class AddInFeatures final : public Features {
   void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>&) override {}
   // Not there yet: the task list.
   void showTaskList() override {}
-  // Not there yet: the new-procedure wizard.
-  void showNewProcedure() override {}
+  void showNewProcedure() override;
   // Not there yet: the options dialog and the designer actions.
   void showOptions() override {}
   void componentAdded(const ide::Ref<ide::VBComponent>&) override {}
@@ -56,7 +61,22 @@ class AddInFeatures final : public Features {
 
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
+  FeatureServices m_services;
 };
+
+void AddInFeatures::showNewProcedure() {
+  ide::VBE& vbe = *m_vbe;
+  const QString installDir = m_services.installDir;
+  newproc::showNewProcedureDialog(
+      {m_vbe, m_settings, m_services.appInfo, m_services.appInfoUnavailable, m_services.textInsertion,
+       [&vbe] { return CEnvUtils(vbe).IdeMode() == ide::IdeMode::Run; },
+       [&vbe, installDir] {
+         ide::UserInterface& ui = vbe.Platform().ui();
+         if (!showHelpTopic(ui, installDir, 11))
+           ui.MsgBox(QString::fromUtf16(kHelpNotFound), ide::mb::Information, common::title());
+       }},
+      dialogParent());
+}
 
 }  // namespace
 

@@ -91,6 +91,8 @@ struct FeatureServices {
   QString appInfoUnavailable;
   /// InsertText for macros, copy buffers and templates.
   textins::TextInsertion& textInsertion;
+  /// The installation directory (ending in "/"), where the help pages are.
+  QString installDir;
 };
 
 /// The feature areas as the add-in has them today.

@@ -96,7 +96,7 @@ Globals::Globals(ide::Ref<ide::VBE> vbe, ide::Ref<ide::AddIn> addIn, StartupValu
   // The event object, the utilities and the feature areas.
   m_envUtils.emplace(*m_vbe);
   m_features = environment.createFeatures(
-      {m_vbe, m_settings, AppInfo(), m_appInfo->UnavailableMessage(), *m_textInsertion});
+      {m_vbe, m_settings, AppInfo(), m_appInfo->UnavailableMessage(), *m_textInsertion, m_values.InstallDir});
   m_vbEvents.emplace(*this);
 
   // The toolbar, the menus and the context-menu items, their click sinks, the IDE's event sinks and
