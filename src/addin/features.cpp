@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
-// The one place that says what each feature area does today. Numbering and indentation open their dialogs;
+// The one place that says what each feature area does today. Numbering, indentation and the new-procedure
+// wizard open their dialogs;
 // the keyboard macros and the copy buffers open theirs and take their hotkeys; the project info objects keep
 // every project's tasks and favourites; the extended find shows its window, which lives until the add-in
 // shuts down. Every other area is not part of the add-in yet: its command and its events are connected and
@@ -7,6 +8,7 @@
 #include "addin/features.h"
 
 #include "addin/envutils.h"
+#include "addin/help.h"
 #include "addin/texts.h"
 #include "addin/texttools.h"
 #include "common/errors.h"
@@ -15,6 +17,7 @@
 #include "find/frmfind.h"
 #include "navigation/favorites.h"
 #include "navigation/frmorgfav.h"
+#include "newproc/frmnewproc.h"
 #include "projinfo/frmtasks.h"
 #include "projinfo/projinfos.h"
 #include "transform/dialogs.h"
@@ -30,6 +33,7 @@ class AddInFeatures final : public Features {
   explicit AddInFeatures(const FeatureServices& services)
       : m_vbe(services.vbe),
         m_settings(services.settings),
+        m_services(services),
         m_textTools(services),
         m_projInfos(projInfoServices(services)) {
     // The projects open when the add-in starts get their info objects now; one that fails is told and
@@ -83,8 +87,7 @@ class AddInFeatures final : public Features {
   void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>& component) override {
     if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfComponent(component->Name());
   }
-  // Not there yet: the new-procedure wizard.
-  void showNewProcedure() override {}
+  void showNewProcedure() override;
   // Not there yet: the options dialog and the designer actions.
   void showOptions() override {}
   void componentAdded(const ide::Ref<ide::VBComponent>&) override {}
@@ -144,6 +147,7 @@ class AddInFeatures final : public Features {
 
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
+  FeatureServices m_services;
   TextTools m_textTools;
   projinfo::ProjInfos m_projInfos;
   QPointer<find::frmFind> m_findForm;
@@ -158,6 +162,20 @@ void AddInFeatures::showExtendedFind() {
   } catch (const std::exception&) {
   }
   m_findForm->Show(selected);
+}
+
+void AddInFeatures::showNewProcedure() {
+  ide::VBE& vbe = *m_vbe;
+  const QString installDir = m_services.installDir;
+  newproc::showNewProcedureDialog(
+      {m_vbe, m_settings, m_services.appInfo, m_services.appInfoUnavailable, m_services.textInsertion,
+       [&vbe] { return CEnvUtils(vbe).IdeMode() == ide::IdeMode::Run; },
+       [&vbe, installDir] {
+         ide::UserInterface& ui = vbe.Platform().ui();
+         if (!showHelpTopic(ui, installDir, 11))
+           ui.MsgBox(QString::fromUtf16(kHelpNotFound), ide::mb::Information, common::title());
+       }},
+      dialogParent());
 }
 
 }  // namespace
