@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: MIT
 // The one place that says what each feature area does today. Numbering, indentation and the new-procedure
-// wizard open their dialogs;
-// the keyboard macros and the copy buffers open theirs and take their hotkeys; the project info objects keep
-// every project's tasks and favourites; the extended find shows its window, which lives until the add-in
-// shuts down. Every other area is not part of the add-in yet: its command and its events are connected and
-// arrive here, and do nothing until the area lands; no stand-in dialog pretends to be the feature meanwhile.
+// wizard open their dialogs; the keyboard macros and the copy buffers open theirs and take their hotkeys; the
+// project info objects keep every project's tasks and favourites; the extended find shows its window, which
+// lives until the add-in shuts down. The options dialog and the designer actions are not part of the add-in
+// yet: their command and events are connected and arrive here, and do nothing until they land; no stand-in
+// dialog pretends to be the feature meanwhile.
 #include "addin/features.h"
 
 #include "addin/envutils.h"
