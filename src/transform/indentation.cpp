@@ -126,15 +126,23 @@ Action classifyBodyLine(QStringView t) {
   return Action::Ordinary;
 }
 
-Action classifyDeclaration(QStringView t) {
+// Inside a Type or Enum block every line up to its End is a member, whatever its name ("Type As Byte").
+Action classifyDeclaration(QStringView t, bool& inTypeBlock) {
+  if (t.startsWith(u'#')) return classifyDirective(t);
+  if (t.startsWith(u"End Type") || t.startsWith(u"End Enum")) {
+    inTypeBlock = false;
+    return Action::Close;
+  }
+  if (inTypeBlock) return Action::Ordinary;
   static constexpr QStringView kOpeners[] = {
       u"Type ", u"Enum ", u"Public Type ", u"Public Enum ", u"Private Type ", u"Private Enum ",
   };
   for (QStringView opener : kOpeners) {
-    if (t.startsWith(opener)) return Action::Open;
+    if (t.startsWith(opener)) {
+      inTypeBlock = true;
+      return Action::Open;
+    }
   }
-  if (t.startsWith(u"End Type") || t.startsWith(u"End Enum")) return Action::Close;
-  if (t.startsWith(u'#')) return classifyDirective(t);
   return Action::Ordinary;
 }
 
@@ -177,6 +185,7 @@ void Indenter::beginDeclarations() {
   m_ifContinued = false;
   m_caseContinued = false;
   m_lineContinues = false;
+  m_inTypeBlock = false;
   m_numberColumn.clear();
 }
 
@@ -205,7 +214,7 @@ bool Indenter::indent(QString& line, bool& statementContinued, bool declaration)
   Action action;
   if (declaration) {
     layout.code = t;
-    action = classifyDeclaration(t);
+    action = classifyDeclaration(t, m_inTypeBlock);
   } else {
     const bool continuationLine = statementContinued || m_lineContinues;
     const NumberPrefix prefix = continuationLine ? NumberPrefix{{}, false, t} : splitNumberPrefix(t);

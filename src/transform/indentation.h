@@ -140,6 +140,8 @@ class Indenter {
   bool m_caseContinued = false;
   // The last non-blank line ended with " _", so the next one cannot carry a line number.
   bool m_lineContinues = false;
+  // Between a Type or Enum line and its End in the declarations.
+  bool m_inTypeBlock = false;
   QString m_numberColumn;
 };
 

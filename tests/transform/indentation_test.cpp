@@ -408,6 +408,16 @@ Dim m_x As Long)",
 Public Const A = 1)",
       // Numbers are not a column; unbalanced closers stay at the margin.
       "End Type\n10 Dim x\nEnd Enum\nDim y",
+      // Members named like the block keywords are members, in any letter case.
+      R"(Private Type QSStack
+   Type As Byte
+   sUB As Long
+   Enum As Integer
+End Type
+Public Enum EModo
+   Type = 1
+End Enum
+Dim m_y As Long)",
   };
   for (const char* section : sections) {
     const QStringList expected = linesOf(section);
