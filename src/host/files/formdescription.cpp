@@ -301,6 +301,18 @@ void PropertyGroup::appendBodyLines(std::vector<SourceLine>& out) const {
   }
 }
 
+void PropertyGroup::visitProperties(FormNode& owner, const PropertyVisitor& visit) {
+  for (Item& item : m_items) {
+    if (const auto* property = std::get_if<PropertyLine>(&item)) {
+      visit(*this, owner, property->name(), property->value());
+    } else if (auto* block = std::get_if<std::unique_ptr<PropertyBlock>>(&item)) {
+      (*block)->visitProperties(owner, visit);
+    } else if (auto* child = std::get_if<std::unique_ptr<FormNode>>(&item)) {
+      (*child)->visitProperties(**child, visit);
+    }
+  }
+}
+
 void PropertyGroup::copyBody(const PropertyGroup& from, FormNode* owner) {
   m_items.reserve(from.m_items.size());
   for (const Item& item : from.m_items) {

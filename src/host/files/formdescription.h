@@ -12,6 +12,7 @@
 #include <QStringView>
 
 #include <cstddef>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <variant>
@@ -65,6 +66,11 @@ class PropertyGroup {
   /// The leading blanks of the group's begin line.
   QString indent() const;
 
+  /// Calls `visit` for every property line of the group, of its property blocks and of the controls inside
+  /// it, in file order, with the group holding the line and the control that group belongs to.
+  using PropertyVisitor =
+      std::function<void(PropertyGroup& group, FormNode& owner, QStringView name, QStringView value)>;
+
  protected:
   struct PropertyLine {
     SourceLine line;
@@ -101,6 +107,7 @@ class PropertyGroup {
   std::size_t insertionPosition(QStringView name) const;
 
   void appendBodyLines(std::vector<SourceLine>& out) const;
+  void visitProperties(FormNode& owner, const PropertyVisitor& visit);
   void copyBody(const PropertyGroup& from, FormNode* owner);
   /// Replaces the indentation `from` at the start of every line of the group by `to`.
   void reindent(const QString& from, const QString& to);
@@ -157,6 +164,9 @@ class FormNode final : public PropertyGroup {
 
   /// Inserts a block taken from elsewhere at `position` among the children, re-indenting its lines.
   FormNode& insertChild(std::unique_ptr<FormNode> child, int position = -1);
+
+  /// Visits the property lines of this control and everything inside it (see PropertyVisitor).
+  void forEachProperty(const PropertyVisitor& visit) { visitProperties(*this, visit); }
 
   /// The first node of this subtree (this one included) with the name, and the index unless it is -1.
   FormNode* findNode(QStringView name, int index = -1);

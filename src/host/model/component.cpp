@@ -4,6 +4,7 @@
 #include <cstdio>
 #include "host/files/ansi.h"
 #include "host/files/fileio.h"
+#include "host/files/frxfile.h"
 #include "host/files/parallel.h"
 #include "host/model/designer.h"
 #include "host/model/events.h"
@@ -160,7 +161,63 @@ void ComponentImpl::load() {
   adopt(parseModule(readFileBytes(m_filePath, &stamp), m_filePath));
   m_stamp = std::move(stamp);
   if (m_name.isEmpty()) m_name = QFileInfo(m_filePath).completeBaseName();
+  loadBinary();
   m_changed = false;
+}
+
+namespace {
+
+/// `name` in `directory`, in the letter case the disk has when only that differs.
+QString pathInDirectory(const QString& directory, const QString& name) {
+  const QDir dir(directory);
+  if (dir.exists(name)) return dir.filePath(name);
+  for (const QString& entry : dir.entryList(QDir::Files | QDir::Hidden))
+    if (entry.compare(name, Qt::CaseInsensitive) == 0) return dir.filePath(entry);
+  return dir.filePath(name);
+}
+
+}  // namespace
+
+void ComponentImpl::loadBinary() {
+  if (!m_form || m_filePath.isEmpty()) return;
+  if (frxProperties(m_form->description().root()).empty()) return;
+  const QString path = binaryWritePath();
+  if (!QFileInfo::exists(path)) return;
+  FileStamp stamp;
+  m_form->setBinary(FrxFile(readFileBytes(path, &stamp)));
+  m_binaryStamp = std::move(stamp);
+}
+
+QString ComponentImpl::binaryFileName() {
+  if (!m_source.form) return {};
+  for (const FrxProperty& property : frxProperties(m_source.form->root()))
+    return property.reference.fileName;
+  const QString path = binaryFilePath();
+  if (!path.isEmpty()) return QFileInfo(path).fileName();
+  static const std::pair<ide::ComponentType, const char*> kSuffixes[] = {
+      {ide::ComponentType::UserControl, "ctx"},
+      {ide::ComponentType::PropPage, "pgx"},
+      {ide::ComponentType::DocObject, "dox"}};
+  for (const auto& [type, suffix] : kSuffixes)
+    if (type == m_type) return m_name + u'.' + QLatin1StringView(suffix);
+  return m_name + QStringLiteral(".frx");
+}
+
+QString ComponentImpl::binaryWritePath() {
+  return pathInDirectory(QFileInfo(m_filePath).absolutePath(), binaryFileName());
+}
+
+void ComponentImpl::addBinaryToBatch(SaveBatch& batch) {
+  if (!m_form || !m_form->binaryChanged()) return;
+  const QString path = binaryWritePath();
+  // What is being written is the file as it is now: a change made meanwhile is written next time.
+  const QByteArray written = m_form->binary().bytes();
+  batch.add({path, written, stampFor(m_binaryStamp, path)},
+            [self = shared_from_this(), written](const FileStamp* stamp) {
+              if (!stamp) return;
+              self->m_binaryStamp = *stamp;
+              if (self->m_form->binary().bytes() == written) self->m_form->binarySaved();
+            });
 }
 
 void ComponentImpl::create(const QString& name) {
@@ -208,6 +265,7 @@ std::optional<QByteArray> ComponentImpl::fileContents(bool force) {
 
 void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
   if (auto contents = fileContents(force)) batch.add({m_filePath, *contents, fileStamp()}, whenWritten());
+  addBinaryToBatch(batch);
 }
 
 SaveBatch::Done ComponentImpl::whenWritten() {
@@ -241,6 +299,8 @@ void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImp
     done.push_back(components[i]->whenWritten());
   }
   batch.addAll(std::move(files), std::move(done));
+  for (const auto& component : components)
+    component->addBinaryToBatch(batch);
 }
 
 bool ComponentImpl::IsDirty() {
@@ -307,7 +367,9 @@ void ComponentImpl::SaveAs(const QString& fileName) {
       QFileInfo(fileName).isAbsolute() ? fileName : QDir(project->directory()).absoluteFilePath(fileName);
   target = QFileInfo(target).absoluteFilePath();
   const QString oldPath = m_filePath;
-  const QString oldBinary = FileCount() == 2 ? binaryFilePath() : QString();
+  // A binary file with changed values is written with the form; one without is copied along.
+  const bool binaryWritten = m_form && m_form->binaryChanged();
+  const QString oldBinary = FileCount() == 2 && !binaryWritten ? binaryFilePath() : QString();
   m_filePath = target;
   try {
     save(true);

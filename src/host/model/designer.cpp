@@ -2,10 +2,13 @@
 #include "host/model/designer.h"
 
 #include "host/files/controlclasses.h"
+#include "host/files/vbliteral.h"
 #include "host/model/objects.h"
 #include "host/model/vbe.h"
 
 #include <QStringList>
+
+#include <algorithm>
 
 namespace host {
 namespace {
@@ -195,6 +198,27 @@ ide::Ref<ide::VBControl> ControlImpl::Container() {
   return m_form.lock()->control(node.parent());
 }
 
+ControlFont ControlImpl::font() {
+  ControlFont font;
+  const PropertyBlock* block = nullptr;
+  for (const FormNode* node = &liveNode(); node && !block; node = node->parent())
+    block = node->propertyBlock(u"Font");
+  if (!block) return font;
+  const auto number = [&](QStringView name) {
+    return parsePropertyValue(block->property(name).value_or(QString()), PropertyType::Double);
+  };
+  if (const auto name = unquoteVbString(block->property(u"Name").value_or(QString()))) font.name = *name;
+  if (const QVariant size = number(u"Size"); size.isValid() && size.toDouble() > 0)
+    font.size = size.toDouble();
+  // Weight 700 is bold; files of older versions say Bold instead.
+  if (const QVariant weight = number(u"Weight"); weight.isValid()) font.bold = weight.toDouble() >= 600;
+  if (const QVariant bold = number(u"Bold"); bold.isValid()) font.bold = bold.toDouble() != 0;
+  font.italic = number(u"Italic").toDouble() != 0;
+  font.underline = number(u"Underline").toDouble() != 0;
+  font.strikethrough = number(u"Strikethrough").toDouble() != 0;
+  return font;
+}
+
 QStringList ControlImpl::propertyNames() {
   FormNode& node = liveNode();
   QStringList names;
@@ -226,8 +250,11 @@ QVariant ControlImpl::property(const QString& name) {
   if (!hasProperty(name)) ide::raise(ide::err::SubscriptOutOfRange);
   const PropertyInfo info = propertyInfoOrUntyped(node.className(), name);
   if (const auto text = node.property(name)) {
+    if (const auto reference = parseFrxReference(*text)) {
+      const QVariant value = m_form.lock()->binaryValue(node, name, *reference);
+      return value.isValid() ? value : QVariant(*text);
+    }
     const QVariant value = parsePropertyValue(*text, info.type);
-    // A value stored in the binary .frx reads as its reference.
     return value.isValid() ? value : QVariant(*text);
   }
   return info.defaultValue;
@@ -279,6 +306,7 @@ void ControlImpl::setProperty(const QString& name, const QVariant& value) {
   }
   if (!hasProperty(name)) ide::raise(ide::err::SubscriptOutOfRange);
   const PropertyInfo info = propertyInfoOrUntyped(node.className(), name);
+  if (setBinaryProperty(name, value, info)) return;
   const auto converted = convertPropertyValue(value, info);
   if (!converted) ide::raise(kInvalidPropertyValue, QStringLiteral("Invalid property value"));
   // The IDE leaves properties at their defaults out of the description.
@@ -293,8 +321,118 @@ void ControlImpl::setProperty(const QString& name, const QVariant& value) {
   if (before != node.property(name) || node.propertyComment(name) != formatted.comment) form->changed(this);
 }
 
+bool ControlImpl::setBinaryProperty(const QString& name, const QVariant& value, const PropertyInfo& info) {
+  FormNode& node = liveNode();
+  auto form = m_form.lock();
+  const auto invalid = [] { ide::raise(kInvalidPropertyValue, QStringLiteral("Invalid property value")); };
+  switch (frxRecordKind(node.className(), name)) {
+    case FrxRecordKind::Picture: {
+      if (value.isValid() && value.typeId() != QMetaType::QByteArray) invalid();
+      const QByteArray picture = value.toByteArray();
+      if (picture.isEmpty()) {  // (None)
+        if (node.property(name))
+          form->storeBinary(*this, name, std::nullopt, false, [&] { node.removeProperty(name); });
+      } else {
+        form->storeBinary(*this, name, encodeFrxPicture(picture), false);
+      }
+      return true;
+    }
+    case FrxRecordKind::List: {
+      if (value.isValid() && value.typeId() != QMetaType::QStringList &&
+          value.typeId() != QMetaType::QVariantList)
+        invalid();
+      const QStringList items = value.toStringList();
+      if (items.isEmpty()) {
+        if (node.property(name))
+          form->storeBinary(*this, name, std::nullopt, false, [&] { node.removeProperty(name); });
+        return true;
+      }
+      // A list written again keeps the field after its count.
+      std::optional<quint16> field;
+      if (const auto before = node.property(name))
+        if (const auto reference = parseFrxReference(*before))
+          if (const auto old = form->binary().listSecondField(reference->offset);
+              old && form->binary().list(reference->offset) &&
+              *old != form->binary().list(reference->offset)->size())
+            field = old;
+      const auto record = encodeFrxList(items, field);
+      if (!record) invalid();
+      form->storeBinary(*this, name, record, false);
+      return true;
+    }
+    case FrxRecordKind::Text:
+    case FrxRecordKind::ItemData:
+    case FrxRecordKind::Other:
+      break;
+  }
+  if (info.type != PropertyType::String) return false;
+  const auto converted = convertPropertyValue(value, info);
+  if (!converted) invalid();
+  const QString text = converted->toString();
+  // What a property line cannot hold: a line break or another control character, or more than fits on
+  // one of the IDE's lines.
+  const qsizetype lineLength = node.indent().size() + 3 + kPropertyNameWidth + 4 + quoteVbString(text).size();
+  const bool binary = lineLength > kMaxLineLength ||
+                      std::any_of(text.begin(), text.end(), [](QChar c) { return c < u' ' && c != u'\t'; });
+  if (binary) {
+    const auto record = encodeFrxText(text);
+    if (!record) invalid();
+    form->storeBinary(*this, name, record, true);
+    return true;
+  }
+  const auto before = node.property(name);
+  if (!before || !parseFrxReference(*before)) return false;
+  // Back on its line: the binary file no longer holds it.
+  form->storeBinary(*this, name, std::nullopt, false,
+                    [&] { node.setProperty(info.name.isEmpty() ? name : info.name, quoteVbString(text)); });
+  return true;
+}
+
 // ---------------------------------------------------------------------------------------------------
 // Forms
+
+QVariant FormImpl::binaryValue(const FormNode& owner, QStringView property,
+                               const FrxReference& reference) const {
+  switch (frxRecordKind(owner.className(), property, reference.longText)) {
+    case FrxRecordKind::Text:
+      if (const auto text = m_binary.text(reference)) return *text;
+      break;
+    case FrxRecordKind::List:
+      if (const auto items = m_binary.list(reference.offset)) return *items;
+      break;
+    case FrxRecordKind::ItemData:
+      if (const auto numbers = m_binary.itemData(reference.offset)) {
+        QVariantList values;
+        for (const qint32 number : *numbers)
+          values.append(number);
+        return values;
+      }
+      break;
+    case FrxRecordKind::Picture:
+      if (const auto picture = m_binary.picture(reference.offset)) return *picture;
+      break;
+    case FrxRecordKind::Other:
+      break;
+  }
+  return {};
+}
+
+void FormImpl::storeBinary(ControlImpl& control, const QString& property,
+                           const std::optional<QByteArray>& record, bool longText,
+                           const std::function<void()>& writeLine) {
+  auto component = m_component.lock();
+  FormNode& node = control.liveNode();
+  const QString fileName = component ? component->binaryFileName() : QString();
+  // Where every record ends is read before the line changes, while its reference is still there.
+  const auto ends = frxRecordEnds(m_description.root(), m_binary);
+  if (record) node.setProperty(property, formatFrxReference({fileName, 0, longText}));
+  if (writeLine) writeLine();
+  const QString displayName = component ? component->binaryFilePath() : fileName;
+  m_binary = FrxFile(rebuildFrx(m_description.root(), m_binary, ends, fileName, &node, property,
+                                record.value_or(QByteArray()), displayName));
+  m_binaryChanged = true;
+  changed(&control);
+}
 
 FormImpl::FormImpl(const std::shared_ptr<ComponentImpl>& component, FormDescription& description)
     : m_component(component), m_description(description) {}

@@ -1,23 +1,38 @@
 // SPDX-License-Identifier: MIT
 // Form designers: the form description of a component seen as the form's root control and the controls
-// on it, with their properties read and written through the IDE's property tables. Every control keeps
-// its identity while it stays on the form; renaming, re-indexing, adding and removing fire the control
-// events.
+// on it, with their properties read and written through the IDE's property tables. Values kept in the
+// form's binary file (.frx) read as themselves: texts, lists, pictures. Every control keeps its identity
+// while it stays on the form; renaming, re-indexing, adding and removing fire the control events.
 #pragma once
 
+#include "host/files/controlclasses.h"
 #include "host/files/formdescription.h"
+#include "host/files/frxfile.h"
 #include "ide/vbide.h"
 
 #include <QString>
 
+#include <functional>
 #include <map>
 #include <memory>
+#include <optional>
 #include <vector>
 
 namespace host {
 
 class ComponentImpl;
 class FormImpl;
+
+/// A control's font as its "BeginProperty Font" group describes it.
+struct ControlFont {
+  QString name = QStringLiteral("MS Sans Serif");  // what a form without a Font group uses
+  double size = 8.25;                              // points
+  bool bold = false;
+  bool italic = false;
+  bool underline = false;
+  bool strikethrough = false;
+  bool operator==(const ControlFont&) const = default;
+};
 
 class ControlImpl final : public ide::VBControl, public std::enable_shared_from_this<ControlImpl> {
  public:
@@ -35,17 +50,26 @@ class ControlImpl final : public ide::VBControl, public std::enable_shared_from_
   /// The form description node, or error 91 when the control left the form.
   FormNode& liveNode();
 
-  /// Reads a property: what the form description says, else the class's default. Error 9 for a property
-  /// the control does not have.
+  /// Reads a property: what the form description says, else the class's default. A value kept in the
+  /// binary file reads as a text (QString), a list (QStringList; ItemData a QVariantList of numbers) or a
+  /// picture (QByteArray: the picture file's bytes); when the file does not hold it, as its reference.
+  /// Error 9 for a property the control does not have.
   QVariant property(const QString& name);
   /// Writes a property, converted to its type (error 380 when the value does not fit). Name and Index
-  /// rename the control; the form's Name renames its component.
+  /// rename the control; the form's Name renames its component. A text with a line break (or too long for
+  /// a line), a list (QStringList) and a picture (QByteArray; empty for none) go to the binary file.
   void setProperty(const QString& name, const QVariant& value);
+  /// The control's font: its own Font group, else its container's (the IDE leaves out a Font that is the
+  /// same as the container's), up to the form; a form without one uses MS Sans Serif 8.25.
+  ControlFont font();
   /// The names of the control's properties: its class's, then any others its description holds.
   QStringList propertyNames();
   bool hasProperty(const QString& name);
 
  private:
+  /// Writes a value that belongs in the binary file, or takes one out of it; false for other values.
+  bool setBinaryProperty(const QString& name, const QVariant& value, const PropertyInfo& info);
+
   std::weak_ptr<FormImpl> m_form;
   FormNode* m_node;
 };
@@ -76,6 +100,20 @@ class FormImpl final : public ide::VBForm, public std::enable_shared_from_this<F
 
   std::shared_ptr<ComponentImpl> component() const { return m_component.lock(); }
   FormDescription& description() { return m_description; }
+
+  /// The form's binary file as read, or as rebuilt after a value in it changed.
+  const FrxFile& binary() const { return m_binary; }
+  void setBinary(FrxFile binary) { m_binary = std::move(binary); }
+  /// Whether a value in the binary file changed since it was read or saved; binarySaved() clears it.
+  bool binaryChanged() const { return m_binaryChanged; }
+  void binarySaved() { m_binaryChanged = false; }
+  /// A value the description refers to in the binary file, or an invalid QVariant when the file does not
+  /// hold it (or its layout is the control's own).
+  QVariant binaryValue(const FormNode& owner, QStringView property, const FrxReference& reference) const;
+  /// Puts a value into the binary file, or (with no record) takes it out after `writeLine` wrote the line
+  /// that now holds the value. The file is rebuilt as the IDE writes it; the control changed.
+  void storeBinary(ControlImpl& control, const QString& property, const std::optional<QByteArray>& record,
+                   bool longText, const std::function<void()>& writeLine = {});
   /// Something on the form changed (the component must be saved; a designer view redraws).
   void changed(ControlImpl* control);
   /// Emitted after any change of a control (null: controls were added or removed).
@@ -86,6 +124,8 @@ class FormImpl final : public ide::VBForm, public std::enable_shared_from_this<F
   FormDescription& m_description;
   std::map<const FormNode*, std::shared_ptr<ControlImpl>> m_controls;
   std::vector<std::weak_ptr<ControlImpl>> m_selection;
+  FrxFile m_binary;
+  bool m_binaryChanged = false;
 };
 
 /// The property collection of a control, or of a module component (which has only its Name).

@@ -209,6 +209,8 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   void load();
   /// Sets up a new component of its type, named `name`.
   void create(const QString& name);
+  /// Adds the form's binary file to `batch` when a value in it changed.
+  void addBinaryToBatch(SaveBatch& batch);
   /// Writes the component's file when it changed (or when `force`), to its path.
   void save(bool force = false);
   /// Adds the component's file to `batch` when it changed (or when `force`).
@@ -221,7 +223,10 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   /// The file as it was read or last written (to tell whether another program changed it since).
   std::optional<FileStamp> fileStamp() const { return stampFor(m_stamp, m_filePath); }
   /// The file on disk becomes the one to overwrite, whatever another program did to it.
-  void acceptFileOnDisk(const QStringList& paths) { restampIfListed(m_stamp, paths); }
+  void acceptFileOnDisk(const QStringList& paths) {
+    restampIfListed(m_stamp, paths);
+    restampIfListed(m_binaryStamp, paths);
+  }
   QString filePath() const { return m_filePath; }
   void setFilePath(const QString& path) { m_filePath = path; }
   std::shared_ptr<ProjectImpl> project() const { return m_project.lock(); }
@@ -235,6 +240,9 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   void closeWindows();
   /// The binary file beside a form (.frx ...), whether it exists or not; empty for other components.
   QString binaryFilePath() const;
+  /// The name the form's references give its binary file ("Form1.frx"); for a form that refers to none
+  /// yet, the one the IDE gives it after the form's file (or name).
+  QString binaryFileName();
   bool hasCode() const { return m_module != nullptr; }
   bool hasDesigner() const { return m_source.form.has_value(); }
   void markChanged() { m_changed = true; }
@@ -244,6 +252,10 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
 
  private:
   void adopt(ModuleSource source);
+  /// Reads the binary file the form refers to, when there is one (a missing one leaves the references).
+  void loadBinary();
+  /// Where the binary file is written: beside the form's file, under the name its references give it.
+  QString binaryWritePath();
 
   std::weak_ptr<ProjectImpl> m_project;
   ide::ComponentType m_type;
@@ -256,6 +268,7 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   quint64 m_savedChangeCount = 0;
   bool m_changed = false;  // header, form or name changed since the last save
   std::optional<FileStamp> m_stamp;
+  std::optional<FileStamp> m_binaryStamp;  // the form's binary file as read or last written
 };
 
 /// Adds the files of several components to `batch`, put together side by side.

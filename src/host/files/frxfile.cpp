@@ -1,0 +1,308 @@
+// SPDX-License-Identifier: MIT
+// Reading the records of a binary file by the layout of the property that refers to them, and rebuilding the
+// file in the description's order when one of them changes.
+#include "host/files/frxfile.h"
+
+#include "host/files/ansi.h"
+#include "host/files/controlclasses.h"
+
+#include "ide/error.h"
+
+#include <algorithm>
+#include <cstring>
+#include <limits>
+#include <set>
+
+namespace host {
+namespace {
+
+constexpr char kPictureSignature[] = {'l', 't', '\0', '\0'};
+constexpr qsizetype kPictureHeader = 12;
+constexpr qsizetype kListHeader = 4;
+
+bool isPictureProperty(QStringView name) {
+  for (const char* picture :
+       {"Picture", "Icon", "MouseIcon", "DragIcon", "DownPicture", "DisabledPicture", "Palette"}) {
+    if (name.compare(QLatin1StringView(picture), Qt::CaseInsensitive) == 0) return true;
+  }
+  return false;
+}
+
+void appendNumber(QByteArray& out, quint32 value, int size) {
+  for (int i = 0; i < size; ++i)
+    out.append(static_cast<char>((value >> (8 * i)) & 0xFF));
+}
+
+}  // namespace
+
+std::optional<FrxReference> parseFrxReference(QStringView valueText) {
+  QStringView text = valueText.trimmed();
+  FrxReference reference;
+  if (text.startsWith(u'$')) {
+    reference.longText = true;
+    text = text.mid(1);
+  }
+  // "<file>":<hex digits>; the file name holds no quote.
+  if (!text.startsWith(u'"')) return std::nullopt;
+  const qsizetype close = text.indexOf(u'"', 1);
+  if (close < 2 || close + 2 >= text.size() || text[close + 1] != u':') return std::nullopt;
+  const QStringView digits = text.mid(close + 2);
+  bool valid = false;
+  const qulonglong offset = digits.toULongLong(&valid, 16);
+  if (!valid || offset > std::numeric_limits<quint32>::max()) return std::nullopt;
+  reference.fileName = text.mid(1, close - 1).toString();
+  reference.offset = static_cast<quint32>(offset);
+  return reference;
+}
+
+QString formatFrxReference(const FrxReference& reference) {
+  QString offset = QString::number(reference.offset, 16).toUpper();
+  if (offset.size() < 4) offset.prepend(QString(4 - offset.size(), u'0'));
+  return (reference.longText ? QStringLiteral("$\"") : QStringLiteral("\"")) + reference.fileName +
+         QStringLiteral("\":") + offset;
+}
+
+FrxRecordKind frxRecordKind(QStringView className, QStringView propertyName, bool longText) {
+  if (longText) return FrxRecordKind::Text;
+  if (propertyName.compare(u"List", Qt::CaseInsensitive) == 0) return FrxRecordKind::List;
+  if (propertyName.compare(u"ItemData", Qt::CaseInsensitive) == 0) return FrxRecordKind::ItemData;
+  if (isPictureProperty(propertyName)) return FrxRecordKind::Picture;
+  const PropertyInfo* info = findPropertyInfo(className, propertyName);
+  if (info && info->type == PropertyType::String) return FrxRecordKind::Text;
+  // The common string properties of controls the tables do not know (an ActiveX control's Caption).
+  for (const char* text : {"Caption", "Text", "ToolTipText", "Tag"}) {
+    if (!info && propertyName.compare(QLatin1StringView(text), Qt::CaseInsensitive) == 0)
+      return FrxRecordKind::Text;
+  }
+  return FrxRecordKind::Other;
+}
+
+QString pictureKind(QByteArrayView picture) {
+  const auto startsWith = [&](std::initializer_list<unsigned char> bytes) {
+    if (picture.size() < static_cast<qsizetype>(bytes.size())) return false;
+    return std::equal(bytes.begin(), bytes.end(), picture.begin(),
+                      [](unsigned char a, char b) { return a == static_cast<unsigned char>(b); });
+  };
+  if (startsWith({0, 0, 1, 0}) || startsWith({0, 0, 2, 0})) return QStringLiteral("Icon");
+  const bool emf =
+      startsWith({1, 0, 0, 0}) && picture.size() > 44 && std::memcmp(picture.data() + 40, " EMF", 4) == 0;
+  if (startsWith({0xD7, 0xCD, 0xC6, 0x9A}) || startsWith({1, 0, 9, 0}) || startsWith({2, 0, 9, 0}) || emf)
+    return QStringLiteral("Metafile");
+  return QStringLiteral("Bitmap");
+}
+
+std::optional<QByteArray> encodeFrxText(QStringView text) {
+  const std::optional<QByteArray> bytes = encodeAnsi(text);
+  if (!bytes) return std::nullopt;
+  QByteArray record;
+  record.reserve(4 + bytes->size());
+  appendNumber(record, static_cast<quint32>(bytes->size()), 4);
+  record.append(*bytes);
+  return record;
+}
+
+std::optional<QByteArray> encodeFrxList(const QStringList& items, std::optional<quint16> secondField) {
+  if (items.size() > 0xFFFF) return std::nullopt;
+  QByteArray record;
+  appendNumber(record, static_cast<quint32>(items.size()), 2);
+  // The field after the count has been seen to repeat it; one read from the file is kept as it was.
+  appendNumber(record, secondField.value_or(static_cast<quint16>(items.size())), 2);
+  for (const QString& item : items) {
+    const std::optional<QByteArray> bytes = encodeAnsi(item);
+    if (!bytes || bytes->size() > 0xFFFF) return std::nullopt;
+    appendNumber(record, static_cast<quint32>(bytes->size()), 2);
+    record.append(*bytes);
+  }
+  return record;
+}
+
+QByteArray encodeFrxPicture(QByteArrayView picture) {
+  QByteArray record;
+  record.reserve(kPictureHeader + picture.size());
+  appendNumber(record, static_cast<quint32>(picture.size() + 8), 4);
+  record.append(kPictureSignature, sizeof kPictureSignature);
+  appendNumber(record, static_cast<quint32>(picture.size()), 4);
+  record.append(picture.data(), picture.size());
+  return record;
+}
+
+// --- FrxFile ---------------------------------------------------------------------------------------------
+
+std::optional<quint32> FrxFile::number(qsizetype at, int size) const {
+  if (at < 0 || at + size > m_bytes.size()) return std::nullopt;
+  quint32 value = 0;
+  for (int i = size - 1; i >= 0; --i)
+    value = (value << 8) | static_cast<unsigned char>(m_bytes[at + i]);
+  return value;
+}
+
+std::optional<QByteArrayView> FrxFile::span(qsizetype at, qsizetype length) const {
+  if (at < 0 || length < 0 || at > m_bytes.size()) return std::nullopt;
+  const qsizetype available = m_bytes.size() - at;
+  if (length > available + 1) return std::nullopt;
+  return QByteArrayView(m_bytes).sliced(at, std::min(length, available));
+}
+
+std::optional<std::pair<qsizetype, qsizetype>> FrxFile::textBounds(const FrxReference& reference) const {
+  const qsizetype at = reference.offset;
+  if (reference.longText) {
+    const auto length = number(at, 4);
+    if (!length) return std::nullopt;
+    return std::pair<qsizetype, qsizetype>(at + 4, *length);
+  }
+  const auto first = number(at, 1);
+  if (!first) return std::nullopt;
+  if (*first != 0xFF) return std::pair<qsizetype, qsizetype>(at + 1, *first);
+  const auto wide = number(at + 1, 2);
+  if (!wide) return std::nullopt;
+  if (*wide != 0xFFFF) return std::pair<qsizetype, qsizetype>(at + 3, *wide);
+  const auto longest = number(at + 3, 4);
+  if (!longest) return std::nullopt;
+  return std::pair<qsizetype, qsizetype>(at + 7, *longest);
+}
+
+std::optional<QString> FrxFile::text(const FrxReference& reference) const {
+  const auto bounds = textBounds(reference);
+  if (!bounds) return std::nullopt;
+  const auto bytes = span(bounds->first, bounds->second);
+  return bytes ? std::optional(decodeAnsi(*bytes)) : std::nullopt;
+}
+
+std::optional<QStringList> FrxFile::list(quint32 offset) const {
+  const auto count = number(offset, 2);
+  if (!count) return std::nullopt;
+  QStringList items;
+  qsizetype at = offset + kListHeader;
+  for (quint32 i = 0; i < *count; ++i) {
+    const auto length = number(at, 2);
+    if (!length || at + 2 + *length > m_bytes.size()) return std::nullopt;
+    items.append(decodeAnsi(QByteArrayView(m_bytes).sliced(at + 2, *length)));
+    at += 2 + *length;
+  }
+  return items;
+}
+
+std::optional<QList<qint32>> FrxFile::itemData(quint32 offset) const {
+  const auto count = number(offset, 2);
+  if (!count || offset + kListHeader + 4 * qsizetype(*count) > m_bytes.size()) return std::nullopt;
+  QList<qint32> values;
+  for (quint32 i = 0; i < *count; ++i)
+    values.append(static_cast<qint32>(*number(offset + kListHeader + 4 * i, 4)));
+  return values;
+}
+
+std::optional<quint16> FrxFile::listSecondField(quint32 offset) const {
+  const auto field = number(qsizetype(offset) + 2, 2);
+  return field ? std::optional(static_cast<quint16>(*field)) : std::nullopt;
+}
+
+std::optional<QByteArray> FrxFile::picture(quint32 offset) const {
+  const auto dataSize = number(qsizetype(offset) + 8, 4);
+  // The size field was read, so the signature before it is in the file.
+  if (!dataSize || std::memcmp(m_bytes.constData() + offset + 4, kPictureSignature, 4) != 0)
+    return std::nullopt;
+  const auto bytes = span(qsizetype(offset) + kPictureHeader, *dataSize);
+  return bytes ? std::optional(bytes->toByteArray()) : std::nullopt;
+}
+
+std::optional<qsizetype> FrxFile::recordLength(const FrxReference& reference, FrxRecordKind kind) const {
+  const quint32 offset = reference.offset;
+  const qsizetype at = offset;
+  std::optional<qsizetype> length;
+  switch (kind) {
+    case FrxRecordKind::Text:
+      if (const auto bounds = textBounds(reference)) length = bounds->first + bounds->second - at;
+      break;
+    case FrxRecordKind::List: {
+      const auto count = number(at, 2);
+      if (!count) break;
+      qsizetype end = at + kListHeader;
+      for (quint32 i = 0; i < *count; ++i) {
+        const auto item = number(end, 2);
+        if (!item) return std::nullopt;
+        end += 2 + *item;
+      }
+      length = end - at;
+      break;
+    }
+    case FrxRecordKind::ItemData:
+      if (const auto count = number(at, 2)) length = kListHeader + 4 * qsizetype(*count);
+      break;
+    case FrxRecordKind::Picture:
+      if (picture(offset))
+        if (const auto size = number(at + 8, 4)) length = kPictureHeader + qsizetype(*size);
+      break;
+    case FrxRecordKind::Other:
+      break;
+  }
+  if (length && at + *length > m_bytes.size()) {
+    if (at + *length - 1 != m_bytes.size()) return std::nullopt;
+    *length -= 1;
+  }
+  return length;
+}
+
+// --- Rebuilding ------------------------------------------------------------------------------------------
+
+std::vector<FrxProperty> frxProperties(FormNode& root) {
+  std::vector<FrxProperty> found;
+  root.forEachProperty([&](PropertyGroup& group, FormNode& owner, QStringView name, QStringView value) {
+    if (auto reference = parseFrxReference(value))
+      found.push_back({&group, &owner, name.toString(), std::move(*reference)});
+  });
+  return found;
+}
+
+std::map<quint32, qsizetype> frxRecordEnds(FormNode& root, const FrxFile& file) {
+  const std::vector<FrxProperty> properties = frxProperties(root);
+  std::set<quint32> starts;
+  for (const FrxProperty& property : properties)
+    starts.insert(property.reference.offset);
+  std::map<quint32, qsizetype> ends;
+  for (const FrxProperty& property : properties) {
+    const quint32 offset = property.reference.offset;
+    if (offset >= file.bytes().size()) continue;
+    const auto next = starts.upper_bound(offset);
+    qsizetype end =
+        next == starts.end() ? file.bytes().size() : std::min<qsizetype>(*next, file.bytes().size());
+    const FrxRecordKind kind =
+        frxRecordKind(property.owner->className(), property.name, property.reference.longText);
+    if (const auto length = file.recordLength(property.reference, kind))
+      end = std::min(end, offset + *length);
+    auto [slot, added] = ends.emplace(offset, end);
+    if (!added) slot->second = std::max(slot->second, end);
+  }
+  return ends;
+}
+
+QByteArray rebuildFrx(FormNode& root, const FrxFile& old, const std::map<quint32, qsizetype>& ends,
+                      const QString& fileName, const PropertyGroup* changedGroup, QStringView changedName,
+                      const QByteArray& changedRecord, const QString& displayName) {
+  std::vector<FrxProperty> properties = frxProperties(root);
+  QByteArray bytes;
+  std::vector<QString> values;
+  values.reserve(properties.size());
+  for (const FrxProperty& property : properties) {
+    const bool changed =
+        property.group == changedGroup && property.name.compare(changedName, Qt::CaseInsensitive) == 0;
+    const quint32 offset = static_cast<quint32>(bytes.size());
+    if (changed) {
+      bytes.append(changedRecord);
+    } else {
+      const auto end = ends.find(property.reference.offset);
+      if (end == ends.end()) {
+        throw ide::Error(ide::err::InvalidFileFormat,
+                         QStringLiteral("%1: the value of %2.%3 at offset %4 is not in the file")
+                             .arg(displayName, property.owner->name(), property.name)
+                             .arg(property.reference.offset, 4, 16, QLatin1Char('0')));
+      }
+      bytes.append(old.bytes().mid(end->first, end->second - end->first));
+    }
+    values.push_back(formatFrxReference({fileName, offset, property.reference.longText}));
+  }
+  for (size_t i = 0; i < properties.size(); ++i)
+    properties[i].group->setProperty(properties[i].name, values[i]);
+  return bytes;
+}
+
+}  // namespace host

@@ -1,0 +1,161 @@
+// SPDX-License-Identifier: MIT
+// Tests of the binary file beside a form: references as the IDE writes them, the records of texts, lists and
+// pictures built here byte by byte, records cut short, and rebuilding the file when one value changes.
+#include "host/files/frxfile.h"
+
+#include "testtext.h"
+
+#include <gtest/gtest.h>
+
+namespace host {
+namespace {
+
+using testing::windowsFile;
+
+QByteArray le(quint32 value, int size) {
+  QByteArray bytes;
+  for (int i = 0; i < size; ++i)
+    bytes.append(static_cast<char>(value >> (8 * i)));
+  return bytes;
+}
+
+TEST(FrxReferences, ReadAndWrittenAsTheIdeWritesThem) {
+  struct Case {
+    const char* text;
+    bool valid;
+    const char* fileName;
+    quint32 offset;
+    bool longText;
+    const char* written;
+  };
+  const Case cases[] = {
+      {R"("frmFotos.frx":0000)", true, "frmFotos.frx", 0, false, R"("frmFotos.frx":0000)"},
+      {R"($"FRMFOTOS.FRX":0a3c)", true, "FRMFOTOS.FRX", 0xA3C, true, R"($"FRMFOTOS.FRX":0A3C)"},
+      {R"("Form1.frx":10A3C)", true, "Form1.frx", 0x10A3C, false, R"("Form1.frx":10A3C)"},
+      {R"("Fotos")", false, "", 0, false, ""},
+      {R"("a.frx":)", false, "", 0, false, ""},
+      {R"("a.frx":00G0)", false, "", 0, false, ""},
+      {"-1  'True", false, "", 0, false, ""},
+  };
+  for (const Case& c : cases) {
+    const auto reference = parseFrxReference(QString::fromLatin1(c.text));
+    ASSERT_EQ(reference.has_value(), c.valid) << c.text;
+    if (!c.valid) continue;
+    EXPECT_EQ(reference->fileName, QLatin1StringView(c.fileName));
+    EXPECT_EQ(reference->offset, c.offset);
+    EXPECT_EQ(reference->longText, c.longText);
+    EXPECT_EQ(formatFrxReference(*reference), QLatin1StringView(c.written));
+  }
+}
+
+TEST(FrxRecords, TextsListsAndPicturesReadBackFromTheirBytes) {
+  const QByteArray notes = windowsFile("Observações:\n1ª linha");
+  const QByteArray icon = QByteArray("\0\0\1\0\1\0", 6) + QByteArray(10, 'i');
+  QByteArray bytes;
+  bytes += le(notes.size(), 4) + notes;                         // 0x00: "$" text
+  bytes += le(5, 1) + "Fotos";                                  // 0x1A: short text
+  bytes += "\xFF" + le(3, 2) + "Ok!";                           // 0x20: 16-bit length
+  bytes += le(2, 2) + le(2, 2) + le(4, 2) + "Casa" + le(0, 2);  // 0x26: two items, one empty
+  bytes += le(2, 2) + le(2, 2) + le(7, 4) + le(0xFFFFFFFF, 4);  // 0x32: item data
+  bytes += le(icon.size() + 8, 4) + QByteArray("lt\0\0", 4) + le(icon.size(), 4) + icon;  // 0x3E
+  const FrxFile file(bytes);
+
+  EXPECT_EQ(file.text({{}, 0x00, true}), QStringLiteral("Observações:\r\n1ª linha"));
+  EXPECT_EQ(file.text({{}, 0x1A, false}), QStringLiteral("Fotos"));
+  EXPECT_EQ(file.text({{}, 0x20, false}), QStringLiteral("Ok!"));
+  EXPECT_EQ(file.list(0x26), (QStringList{QStringLiteral("Casa"), QString()}));
+  EXPECT_EQ(file.itemData(0x32), (QList<qint32>{7, -1}));
+  EXPECT_EQ(file.picture(0x3E), icon);
+  EXPECT_EQ(pictureKind(icon), QStringLiteral("Icon"));
+  EXPECT_EQ(file.recordLength({{}, 0x26, false}, FrxRecordKind::List), 12);
+  EXPECT_EQ(file.recordLength({{}, 0x3E, false}, FrxRecordKind::Picture), 12 + icon.size());
+
+  // A text record is not a picture; offsets past the end and lengths running off the file read nothing,
+  // except a length one byte too long at the very end (the IDE writes such records).
+  EXPECT_FALSE(file.picture(0x00));
+  EXPECT_FALSE(file.list(bytes.size() + 4));
+  EXPECT_FALSE(FrxFile(le(9, 4) + "abc").text({{}, 0, true}));
+  EXPECT_EQ(FrxFile(le(4, 1) + "abc").text({{}, 0, false}), QStringLiteral("abc"));
+  EXPECT_FALSE(FrxFile(le(3, 2) + le(3, 2) + le(5, 2) + "ab").list(0));
+}
+
+TEST(FrxRecords, PicturesAreNamedByTheirFormat) {
+  const std::pair<QByteArray, const char*> cases[] = {
+      {QByteArray("BM\x36\0\0\0", 6), "Bitmap"},
+      {QByteArray("GIF89a"), "Bitmap"},
+      {QByteArray("\xFF\xD8\xFF\xE0", 4), "Bitmap"},
+      {QByteArray("\0\0\2\0\1\0", 6), "Icon"},
+      {QByteArray("\xD7\xCD\xC6\x9A\0\0", 6), "Metafile"},
+      {QByteArray("\1\0\x09\0\0\x03", 6), "Metafile"},
+      {le(1, 4) + QByteArray(36, '\0') + " EMF" + QByteArray(4, '\0'), "Metafile"},
+  };
+  for (const auto& [bytes, kind] : cases)
+    EXPECT_EQ(pictureKind(bytes), QLatin1StringView(kind)) << bytes.toHex().toStdString();
+}
+
+TEST(FrxRecords, EncodedAsTheIdeWritesThem) {
+  EXPECT_EQ(encodeFrxText(u"Olá\r\nmundo"), le(10, 4) + windowsFile("Olá\nmundo"));
+  EXPECT_FALSE(encodeFrxText(u"\u4E2D"));
+  EXPECT_EQ(encodeFrxList({QStringLiteral("A"), QStringLiteral("Bé")}),
+            le(2, 2) + le(2, 2) + le(1, 2) + "A" + le(2, 2) + windowsFile("Bé"));
+  EXPECT_EQ(encodeFrxList({QStringLiteral("A")}, 7), le(1, 2) + le(7, 2) + le(1, 2) + "A");
+  EXPECT_EQ(encodeFrxPicture("GIF"), le(11, 4) + QByteArray("lt\0\0", 4) + le(3, 4) + "GIF");
+}
+
+// A form with an icon, a long text and a list; a label whose caption changes goes between them.
+constexpr const char* kForm = R"(Begin VB.Form frmFotos 
+   Caption         =   "Fotos"
+   Icon            =   "frmFotos.frx":0000
+   Begin VB.Label lblTitulo 
+      Caption         =   "Título"
+   End
+   Begin VB.TextBox txtNotas 
+      Text            =   $"frmFotos.frx":0012
+   End
+   Begin VB.ComboBox cboTipo 
+      List            =   "frmFotos.frx":0019
+   End
+End
+)";
+
+TEST(FrxRebuild, ARecordChangesAndTheOthersKeepTheirBytesInDescriptionOrder) {
+  const QByteArray icon = encodeFrxPicture(QByteArray("\0\0\1\0xx", 6));
+  const QByteArray text = le(3, 4) + "abc";
+  const QByteArray list = le(1, 2) + le(9, 2) + le(1, 2) + "Z";
+  const FrxFile old(icon + text + list);
+  const std::vector<SourceLine> lines = readSourceLines(windowsFile(kForm), QStringLiteral("frmFotos.frm"));
+  std::size_t position = 0;
+  FormDescription form = FormDescription::parse(lines, position, QStringLiteral("frmFotos.frm"));
+  FormNode& label = *form.root().findNode(u"lblTitulo");
+
+  const auto ends = frxRecordEnds(form.root(), old);
+  label.setProperty(QStringLiteral("Caption"), formatFrxReference({QStringLiteral("frmFotos.frx"), 0, true}));
+  const QByteArray caption = *encodeFrxText(u"Título\r\nnovo");
+  const QByteArray rebuilt = rebuildFrx(form.root(), old, ends, QStringLiteral("frmFotos.frx"), &label,
+                                        u"Caption", caption, QStringLiteral("frmFotos.frx"));
+
+  EXPECT_EQ(rebuilt, icon + caption + text + list);
+  EXPECT_EQ(form.root().property(u"Icon"), QStringLiteral("\"frmFotos.frx\":0000"));
+  EXPECT_EQ(label.property(u"Caption"), QStringLiteral("$\"frmFotos.frx\":0012"));
+  const auto moved = [&](qsizetype offset, bool longText) {
+    return formatFrxReference({QStringLiteral("frmFotos.frx"), static_cast<quint32>(offset), longText});
+  };
+  EXPECT_EQ(form.root().findNode(u"txtNotas")->property(u"Text"), moved(0x12 + caption.size(), true));
+  EXPECT_EQ(form.root().findNode(u"cboTipo")->property(u"List"),
+            moved(0x12 + caption.size() + text.size(), false));
+  EXPECT_EQ(FrxFile(rebuilt).list(0x12 + caption.size() + text.size()), QStringList{QStringLiteral("Z")});
+
+  // A record the file does not hold cannot be carried over.
+  const FrxFile cut(icon);
+  const auto cutEnds = frxRecordEnds(form.root(), cut);
+  const ide::Error error = testing::expectError([&] {
+    rebuildFrx(form.root(), cut, cutEnds, QStringLiteral("frmFotos.frx"), nullptr, {}, {},
+               QStringLiteral("/p/frmFotos.frx"));
+  });
+  EXPECT_TRUE(
+      error.description().startsWith(QStringLiteral("/p/frmFotos.frx: the value of lblTitulo.Caption")))
+      << error.description().toStdString();
+}
+
+}  // namespace
+}  // namespace host
