@@ -306,7 +306,7 @@ std::vector<ProjectEntry> projectEntries(const QStringList& vbpLines) {
     const QString value = line.mid(equals + 1);
     if (key == "Module" || key == "Class") {
       entries.push_back({key, value.section(';', 0, 0).trimmed(), value.section(';', 1).trimmed()});
-    } else if (key == "Form") {
+    } else if (key == "Form" || key == "UserControl") {
       entries.push_back({key, QString(), value.trimmed()});
     }
   }
