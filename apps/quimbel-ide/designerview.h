@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: MIT
-// A form designer window: the form drawn with its title, menu strip and controls at their places and sizes
-// (twips to pixels at 15 twips per pixel, on the IDE's 120-twip grid), a selection with grab handles,
-// moving and sizing with the mouse, Delete to remove. Every change goes through the form's controls, so
-// that the model fires the control events.
+// A form designer window: the form drawn as the IDE shows it (FormPainter) with its controls at their
+// places and sizes (FormGeometry: twips to pixels at 15 twips per pixel, on the IDE's 120-twip grid), a
+// selection with grab handles, moving and sizing with the mouse, Delete to remove. Every change goes
+// through the form's controls, so that the model fires the control events.
 #pragma once
 
+#include "formgeometry.h"
+#include "formpainter.h"
 #include "host/model/designer.h"
 #include "host/model/objects.h"
 #include "ide/signal.h"
@@ -18,14 +20,6 @@
 namespace desktop {
 
 class FormCanvas;
-
-/// Pixels of a twips value (15 twips per pixel), and back.
-inline int pixelsOf(double twips) {
-  return static_cast<int>(twips / 15.0 + (twips >= 0 ? 0.5 : -0.5));
-}
-inline int twipsOf(int pixels) {
-  return pixels * 15;
-}
 
 class DesignerWindow final : public QScrollArea {
   Q_OBJECT
@@ -68,6 +62,7 @@ class FormCanvas final : public QWidget {
   QRect rectOf(const std::shared_ptr<host::ControlImpl>& control);
   /// Where the form's client area starts on the canvas.
   QPoint clientOrigin();
+  const FormGeometry& geometry() const { return m_geometry; }
   QSize sizeHint() const override;
   /// Where refusals of the form (a control that cannot go there ...) are told.
   void setErrorReporter(std::function<void(const QString&)> reporter) { m_report = std::move(reporter); }
@@ -89,11 +84,11 @@ class FormCanvas final : public QWidget {
   void relayout();
   std::shared_ptr<host::ControlImpl> controlAt(const QPoint& point);
   int handleAt(const QPoint& point);
-  QPoint containerOrigin(host::FormNode* container);
-  void paintControl(QPainter& painter, const std::shared_ptr<host::ControlImpl>& control, const QRect& rect);
   void report(const ide::Error& error);
 
   std::shared_ptr<host::FormImpl> m_form;
+  FormGeometry m_geometry;
+  PictureCache m_pictures;
   std::weak_ptr<host::ControlImpl> m_selected;
   ide::Connection m_changed;
   Drag m_drag = Drag::None;
@@ -104,8 +99,5 @@ class FormCanvas final : public QWidget {
   QSize m_size;
   std::function<void(const QString&)> m_report;
 };
-
-/// A VB colour value (RGB as &H00BBGGRR&, or a system colour &H800000nn&) as a QColor.
-QColor vbColor(qint32 value);
 
 }  // namespace desktop

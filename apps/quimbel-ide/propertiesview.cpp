@@ -2,6 +2,7 @@
 #include "propertiesview.h"
 
 #include "host/files/controlclasses.h"
+#include "host/files/frxfile.h"
 #include "qtplatform.h"
 
 #include <QComboBox>
@@ -98,6 +99,23 @@ QString PropertiesView::displayText(const QVariant& value, const QString& classN
                                     const QString& property) {
   // A control that is no array element shows an empty Index, as the IDE shows it.
   if (property.compare(QLatin1StringView("Index"), Qt::CaseInsensitive) == 0 && value.toInt() < 0) return {};
+  // Values of the binary file are named by their kind, as the IDE names them: "(Bitmap)", "(Icon)",
+  // "(None)", "(List)".
+  switch (host::frxRecordKind(className, property)) {
+    case host::FrxRecordKind::Picture:
+      if (value.typeId() == QMetaType::QByteArray)
+        return QStringLiteral("(%1)").arg(host::pictureKind(value.toByteArray()));
+      if (!value.isValid()) return QStringLiteral("(None)");
+      break;
+    case host::FrxRecordKind::List:
+    case host::FrxRecordKind::ItemData:
+      if (value.typeId() == QMetaType::QStringList || value.typeId() == QMetaType::QVariantList ||
+          !value.isValid())
+        return QStringLiteral("(List)");
+      break;
+    default:
+      break;
+  }
   const host::PropertyInfo info = host::propertyInfoOrUntyped(className, property);
   switch (info.type) {
     case host::PropertyType::Boolean:
@@ -112,7 +130,8 @@ QString PropertiesView::displayText(const QVariant& value, const QString& classN
           .arg(static_cast<quint32>(value.toInt()), 8, 16, QLatin1Char('0'))
           .toUpper();
     default:
-      return value.toString();
+      // A text of several lines shows on one, its line breaks as pilcrows.
+      return value.toString().replace(QStringLiteral("\r\n"), QStringLiteral("¶"));
   }
 }
 
@@ -175,6 +194,11 @@ void PropertiesView::rebuild() {
     auto* value = new QTableWidgetItem;
     value->setData(PropertyRole, name);
     value->setData(ChoicesRole, choicesOf(host::propertyInfoOrUntyped(className, name)));
+    // Pictures and lists are not typed in; their rows show what the binary file holds.
+    const host::FrxRecordKind kind = host::frxRecordKind(className, name);
+    if (kind == host::FrxRecordKind::Picture || kind == host::FrxRecordKind::List ||
+        kind == host::FrxRecordKind::ItemData)
+      value->setFlags(Qt::ItemIsEnabled | Qt::ItemIsSelectable);
     m_table->setItem(row, 0, key);
     m_table->setItem(row, 1, value);
   }
@@ -191,7 +215,10 @@ void PropertiesView::refreshValues() {
       const QString name = item->data(PropertyRole).toString();
       QString text;
       try {
-        text = displayText(m_control->property(name), className, name);
+        // The Font row names the font, its own or its container's.
+        text = name.compare(QLatin1StringView("Font"), Qt::CaseInsensitive) == 0
+                   ? m_control->font().name
+                   : displayText(m_control->property(name), className, name);
       } catch (const ide::Error& error) {
         // Shown empty, as the IDE shows a value it cannot read.
         qCDebug(lcIde) << "cannot read" << name << "of a" << className << ":" << error.description();
@@ -213,6 +240,8 @@ bool PropertiesView::applyEdit(const QString& property, const QString& text) {
     } else if (m_control && m_control->node()) {
       const host::PropertyInfo info = host::propertyInfoOrUntyped(m_control->node()->className(), property);
       QVariant value = text;
+      if (info.type == host::PropertyType::String)
+        value = QString(text).replace(u'¶', QStringLiteral("\r\n"));
       if (property.compare(QLatin1StringView("Index"), Qt::CaseInsensitive) == 0 &&
           text.trimmed().isEmpty()) {
         value = -1;  // emptied: no longer an array element

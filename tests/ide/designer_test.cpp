@@ -7,6 +7,7 @@
 #include "idefixture.h"
 #include "propertiesview.h"
 #include "toolbox.h"
+#include "vbfonts.h"
 #include "windowmanager.h"
 
 #include <gtest/gtest.h>
@@ -155,6 +156,117 @@ TEST_F(DesignerTest, DeleteRemovesTheSelectedControlAndTheEventFires) {
   EXPECT_FALSE(control(QStringLiteral("cmdEditar")));
   EXPECT_EQ(m_log, QStringList{QStringLiteral("removed cmdEditar")});
   EXPECT_EQ(m_designer->selectedControl(), nullptr);
+}
+
+/// frmSobre: a Fixed Dialog with a user control holding controls, an AutoSize label aligned right, values
+/// of its binary file, and a label with a font of its own.
+class SobreTest : public test::IdeTest {
+ protected:
+  void SetUp() override {
+    IdeTest::SetUp();
+    auto form = component(QStringLiteral("Loja"), QStringLiteral("frmSobre"));
+    ASSERT_TRUE(form);
+    m_ide.vbe->activateWindow(form->designerWindow());
+    settle();
+    m_designer = m_window->windows().activeDesigner();
+    ASSERT_NE(m_designer, nullptr);
+  }
+  std::shared_ptr<host::ControlImpl> control(const QString& name) const {
+    return m_designer->form()->findControl(name);
+  }
+  DesignerWindow* m_designer = nullptr;
+};
+
+TEST_F(SobreTest, ControlsInsideAUserControlAreDrawnAndSelectedInIt) {
+  FormCanvas* canvas = m_designer->canvas();
+  const QPoint origin = canvas->clientOrigin();
+  // ctlPainel1 has no Width or Height: _ExtentX 7832, _ExtentY 2752 HIMETRIC are 4440 by 1560 twips.
+  const QRect panel = canvas->rectOf(control(QStringLiteral("ctlPainel1")));
+  EXPECT_EQ(panel, QRect(origin + QPoint(8, 192), QSize(296, 104)));
+  // cboIdioma at Left 120, Top 480 inside it.
+  const QRect combo = canvas->rectOf(control(QStringLiteral("cboIdioma")));
+  EXPECT_EQ(combo, QRect(panel.topLeft() + QPoint(8, 32), QSize(153, 21)));
+  m_window->show();
+  QTest::mouseClick(canvas, Qt::LeftButton, {}, combo.center());
+  EXPECT_EQ(m_designer->selectedControl(), control(QStringLiteral("cboIdioma")));
+  QTest::keyClick(canvas, Qt::Key_Escape);
+  EXPECT_EQ(m_designer->selectedControl(), control(QStringLiteral("ctlPainel1")))
+      << "Escape selects the container";
+  // A control added while the user control is selected goes inside it.
+  ASSERT_TRUE(m_window->toolbox().click(QStringLiteral("OptionButton")));
+  EXPECT_EQ(control(QStringLiteral("Option1"))->liveNode().parent(),
+            &control(QStringLiteral("ctlPainel1"))->liveNode());
+}
+
+TEST_F(SobreTest, FontsAndAutoSizeLabels) {
+  // Each control's own font, else its container's: lblTitulo is Tahoma 12 bold, cmdOk the form's Tahoma 8.25.
+  const QFont title = vbFont(control(QStringLiteral("lblTitulo"))->font());
+  EXPECT_EQ(title.pixelSize(), 16);
+  EXPECT_TRUE(title.bold());
+  EXPECT_EQ(vbFont(control(QStringLiteral("cmdOk"))->font()).pixelSize(), 11);
+  EXPECT_EQ(control(QStringLiteral("cmdOk"))->font().name, QStringLiteral("Tahoma"));
+  // Stand-ins of the classic fonts (fonts-wine and fonts-liberation are installed with the IDE).
+  const std::pair<const char*, const char*> families[] = {{"MS Sans Serif", "MS Sans Serif"},
+                                                          {"Tahoma", "Tahoma"},
+                                                          {"Arial", "Liberation Sans"},
+                                                          {"Courier New", "Liberation Mono"},
+                                                          {"Fonte Inexistente", "DejaVu Sans"}};
+  for (const auto& [name, family] : families)
+    EXPECT_EQ(fontFamilyFor(QString::fromLatin1(name)), QLatin1StringView(family)) << name;
+  // An AutoSize label aligned right keeps its right edge (Left 4920 + Width 975 twips) and grows to the left.
+  const QRect version = m_designer->canvas()->rectOf(control(QStringLiteral("lblVersao")));
+  EXPECT_EQ(version.right() + 1, m_designer->canvas()->clientOrigin().x() + 393);
+  const int text = QFontMetrics(vbFont(control(QStringLiteral("lblVersao"))->font()))
+                       .horizontalAdvance(QStringLiteral("Versão 1.4.12"));
+  EXPECT_GE(version.width(), text);
+  EXPECT_LE(version.width(), text + 2);
+}
+
+TEST_F(SobreTest, TheFrameFollowsBorderStyleControlBoxMinButtonAndMaxButton) {
+  struct Case {
+    int borderStyle;
+    bool controlBox, minButton, maxButton;
+    int titleHeight;
+    bool icon, close, minMax;
+  };
+  const Case cases[] = {
+      {2, true, true, true, 18, true, true, true},     {1, true, false, true, 18, true, true, true},
+      {3, true, false, false, 18, false, true, false}, {3, true, true, false, 18, false, true, true},
+      {4, true, true, true, 15, false, true, false},   {5, true, true, true, 15, false, true, false},
+      {2, false, true, true, 18, false, false, false}, {0, true, true, true, 0, false, false, false},
+  };
+  auto root = std::static_pointer_cast<host::ControlImpl>(m_designer->form()->Root());
+  for (const Case& c : cases) {
+    root->setProperty(QStringLiteral("BorderStyle"), c.borderStyle);
+    root->setProperty(QStringLiteral("ControlBox"), c.controlBox);
+    root->setProperty(QStringLiteral("MinButton"), c.minButton);
+    root->setProperty(QStringLiteral("MaxButton"), c.maxButton);
+    const FormFrame frame = m_designer->canvas()->geometry().frame();
+    SCOPED_TRACE(c.borderStyle);
+    EXPECT_EQ(frame.titleHeight, c.titleHeight);
+    EXPECT_EQ(frame.icon, c.icon);
+    EXPECT_EQ(frame.closeButton, c.close);
+    EXPECT_EQ(frame.minMaxButtons, c.minMax);
+    EXPECT_EQ(frame.minEnabled, c.minButton);
+  }
+}
+
+TEST_F(SobreTest, ThePropertiesWindowNamesBinaryValuesByTheirKind) {
+  PropertiesView& properties = m_window->properties();
+  m_designer->selectControl(nullptr);
+  settle();
+  EXPECT_EQ(properties.shownValue(QStringLiteral("Icon")), QStringLiteral("(Icon)"));
+  EXPECT_EQ(properties.shownValue(QStringLiteral("Picture")), QStringLiteral("(None)"));
+  m_designer->selectControl(control(QStringLiteral("imgLogo")));
+  settle();
+  EXPECT_EQ(properties.shownValue(QStringLiteral("Picture")), QStringLiteral("(Bitmap)"));
+  m_designer->selectControl(control(QStringLiteral("cboIdioma")));
+  settle();
+  EXPECT_EQ(properties.shownValue(QStringLiteral("List")), QStringLiteral("(List)"));
+  m_designer->selectControl(control(QStringLiteral("txtLicenca")));
+  settle();
+  EXPECT_TRUE(properties.shownValue(QStringLiteral("Text"))
+                  .startsWith(QStringLiteral("Loja - Gestão de Pedidos¶Copyright")));
 }
 
 }  // namespace
