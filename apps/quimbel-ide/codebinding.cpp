@@ -288,7 +288,9 @@ int CodeBinding::visibleLines() const {
   qreal lineHeight = metrics.lineSpacing();
   if (first.isValid() && first.layout() && first.layout()->lineCount() > 0)
     lineHeight = first.layout()->lineAt(0).height();
-  return std::max(1, static_cast<int>(m_editor->viewport()->height() / lineHeight));
+  // The lines start below the document's margin: only those that fit below it count.
+  const int top = first.isValid() ? std::max(0, m_editor->cursorRect(QTextCursor(first)).top()) : 0;
+  return std::max(1, static_cast<int>((m_editor->viewport()->height() - top) / lineHeight));
 }
 
 bool CodeBinding::eventFilter(QObject* watched, QEvent* event) {

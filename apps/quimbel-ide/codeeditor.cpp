@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "codeeditor.h"
 
+#include "codecolours.h"
 #include "host/platform/windowsystem.h"
 #include "keys.h"
+#include "vbfonts.h"
 #include "vbhighlighter.h"
 
 #include <QFontDatabase>
@@ -28,7 +30,8 @@ class MarginBar final : public QWidget {
 
 CodeEditor::CodeEditor(QWidget* parent) : QPlainTextEdit(parent) {
   QFont font = QFontDatabase::systemFont(QFontDatabase::FixedFont);
-  font.setFamily(QStringLiteral("DejaVu Sans Mono"));
+  // The IDE's code font is Courier New; its metric-compatible stand-in when that is not installed.
+  font.setFamily(fontFamilyFor(QStringLiteral("Courier New"), QStringLiteral("DejaVu Sans Mono")));
   font.setStyleHint(QFont::Monospace);
   font.setPointSize(10);
   setFont(font);
@@ -38,6 +41,8 @@ CodeEditor::CodeEditor(QWidget* parent) : QPlainTextEdit(parent) {
   m_margin = new MarginBar(this);
   setViewportMargins(kMarginWidth, 0, 0, 0);
   m_highlighter = new VbHighlighter(this);
+  applyColours();
+  connect(&CodeColours::instance(), &CodeColours::changed, this, &CodeEditor::applyColours);
   connect(verticalScrollBar(), &QScrollBar::valueChanged, this, [this] {
     m_highlighter->colourVisible();
     m_margin->update();
@@ -45,6 +50,18 @@ CodeEditor::CodeEditor(QWidget* parent) : QPlainTextEdit(parent) {
 }
 
 CodeEditor::~CodeEditor() = default;
+
+void CodeEditor::applyColours() {
+  const CodeColours& colours = CodeColours::instance();
+  QPalette colouring = palette();
+  for (const QPalette::ColorGroup group : {QPalette::Active, QPalette::Inactive}) {
+    colouring.setColor(group, QPalette::Text, colours.foreground(CodeText::Normal));
+    colouring.setColor(group, QPalette::Base, colours.background(CodeText::Normal));
+    colouring.setColor(group, QPalette::Highlight, colours.background(CodeText::Selection));
+    colouring.setColor(group, QPalette::HighlightedText, colours.foreground(CodeText::Selection));
+  }
+  setPalette(colouring);
+}
 
 void CodeEditor::setHotKeyTarget(host::WindowSystemImpl* windows, std::function<ide::HWnd()> window) {
   m_windows = windows;

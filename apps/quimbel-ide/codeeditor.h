@@ -32,6 +32,8 @@ class CodeEditor final : public QPlainTextEdit {
   void setBeforeInput(std::function<void()> hook) { m_beforeInput = std::move(hook); }
   VbHighlighter* highlighter() const { return m_highlighter; }
   int marginWidth() const { return kMarginWidth; }
+  /// Takes the normal and selection colours of the code colour scheme.
+  void applyColours();
 
  Q_SIGNALS:
   void contextMenuWanted(const QPoint& globalPosition);

@@ -3,18 +3,26 @@
 
 #include "codebinding.h"
 #include "codeeditor.h"
+#include "host/files/controlevents.h"
+#include "host/model/designer.h"
 
 #include <QComboBox>
 #include <QHBoxLayout>
+#include <QSet>
 #include <QVBoxLayout>
+
+#include <algorithm>
+#include <map>
 
 namespace desktop {
 namespace {
 
-const char* const kKindSuffix[] = {"", " [Let]", " [Set]", " [Get]"};
+const QString kGeneral = QStringLiteral("(General)");
+const QString kDeclarations = QStringLiteral("(Declarations)");
+const char* const kKindSuffix[] = {"", " [PropertyLet]", " [PropertySet]", " [PropertyGet]"};
 
-/// The procedure list shows what the module holds, refilled when it opens so that typing stays cheap.
-class ProcedureBox final : public QComboBox {
+/// A box that is filled when it opens, so that typing stays cheap.
+class ListBox final : public QComboBox {
  public:
   using QComboBox::QComboBox;
   std::function<void()> beforePopup;
@@ -26,12 +34,48 @@ class ProcedureBox final : public QComboBox {
   }
 };
 
+/// The name the module's own object has in the Object box.
+QString rootObjectName(ide::ComponentType type) {
+  switch (type) {
+    case ide::ComponentType::VBMDIForm:
+      return QStringLiteral("MDIForm");
+    case ide::ComponentType::UserControl:
+      return QStringLiteral("UserControl");
+    case ide::ComponentType::PropPage:
+      return QStringLiteral("PropertyPage");
+    case ide::ComponentType::DocObject:
+      return QStringLiteral("UserDocument");
+    default:
+      return QStringLiteral("Form");
+  }
+}
+
+bool lessCaseInsensitive(const QString& a, const QString& b) {
+  return a.compare(b, Qt::CaseInsensitive) < 0;
+}
+
+/// Sets the box's current item to `text`, adding it when the box was not filled yet.
+void showItem(QComboBox* box, const QString& text, const QVariant& data = {}) {
+  int index = box->findText(text, Qt::MatchFixedString | Qt::MatchCaseSensitive);
+  if (index < 0) {
+    box->addItem(text, data);
+    index = box->count() - 1;
+  }
+  box->setCurrentIndex(index);
+}
+
 }  // namespace
 
 CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget* parent)
     : QWidget(parent), m_window(window) {
-  auto* procedures = new ProcedureBox(this);
-  procedures->beforePopup = [this] { fillProcedures(); };
+  auto* objects = new ListBox(this);
+  objects->beforePopup = [this] { fillObjects(); };
+  objects->setObjectName(QStringLiteral("objectList"));
+  objects->setSizeAdjustPolicy(QComboBox::AdjustToContents);
+  objects->setMinimumContentsLength(24);
+  m_objects = objects;
+  auto* procedures = new ListBox(this);
+  procedures->beforePopup = [this] { fillProcedures(m_objects->currentText()); };
   procedures->setObjectName(QStringLiteral("procedureList"));
   procedures->setSizeAdjustPolicy(QComboBox::AdjustToContents);
   procedures->setMinimumContentsLength(28);
@@ -41,6 +85,7 @@ CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget*
 
   auto* top = new QHBoxLayout;
   top->setContentsMargins(2, 2, 2, 2);
+  top->addWidget(m_objects);
   top->addWidget(m_procedures);
   top->addStretch();
   auto* layout = new QVBoxLayout(this);
@@ -64,7 +109,10 @@ CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget*
     else
       m_caretTimer.start();
   });
-  connect(m_procedures, &QComboBox::activated, this, &CodeWindow::jumpToProcedure);
+  connect(m_objects, &QComboBox::activated, this,
+          [this](int index) { chooseObject(m_objects->itemText(index)); });
+  connect(m_procedures, &QComboBox::activated, this,
+          [this](int index) { chooseProcedure(m_procedures->itemText(index)); });
   m_caretTimer.setSingleShot(true);
   m_caretTimer.setInterval(150);
   connect(&m_caretTimer, &QTimer::timeout, this, &CodeWindow::showProcedureOfCaret);
@@ -78,17 +126,101 @@ std::shared_ptr<host::CodePaneImpl> CodeWindow::pane() const {
   return m_binding->pane();
 }
 
-void CodeWindow::fillProcedures() {
-  m_filling = true;
-  m_procedures->clear();
-  m_procedures->addItem(QStringLiteral("(Declarations)"), QVariantList{QString(), 0});
-  auto& text = m_binding->module()->text();
-  for (const host::ProcInfo& proc : text.procedures()) {
-    const int kind = static_cast<int>(proc.kind);
-    m_procedures->addItem(proc.name + QLatin1StringView(kKindSuffix[kind]), QVariantList{proc.name, kind});
+std::vector<CodeObject> CodeWindow::objects() const {
+  std::vector<CodeObject> result;
+  auto component = m_binding->module()->component();
+  if (!component) return result;
+  if (auto form = component->form()) {
+    result.push_back({rootObjectName(component->Type()), form->description().root().className(), false});
+    std::map<QString, CodeObject> controls;  // by lower-case name: an array once
+    for (const auto& control : form->controls()) {
+      const host::FormNode* node = control->node();
+      auto& entry = controls[node->name().toLower()];
+      entry.name = node->name();
+      entry.className = node->className();
+      entry.controlArray = entry.controlArray || node->index() >= 0;
+    }
+    for (auto& [key, object] : controls)
+      result.push_back(std::move(object));
+  } else if (component->Type() == ide::ComponentType::ClassModule) {
+    result.push_back({QStringLiteral("Class"), QStringLiteral("Class"), false});
   }
-  m_filling = false;
+  return result;
+}
+
+std::pair<QString, QString> CodeWindow::ownerOf(const QString& procedure,
+                                                const std::vector<CodeObject>& objects) const {
+  // The longest object name that starts the procedure's name and is followed by one of its events: names
+  // may hold underscores themselves.
+  std::pair<QString, QString> owner;
+  for (const CodeObject& object : objects) {
+    if (object.name.size() <= owner.first.size() || procedure.size() <= object.name.size() + 1 ||
+        !procedure.startsWith(object.name, Qt::CaseInsensitive) || procedure[object.name.size()] != u'_')
+      continue;
+    const QStringView event = QStringView(procedure).mid(object.name.size() + 1);
+    for (const host::EventInfo& info : host::controlEvents(object.className))
+      if (event.compare(QLatin1StringView(info.name), Qt::CaseInsensitive) == 0)
+        owner = {object.name, QString::fromLatin1(info.name)};
+  }
+  return owner;
+}
+
+void CodeWindow::fillLists() {
+  fillObjects();
   showProcedureOfCaret();
+  fillProcedures(m_objects->currentText());
+  showProcedureOfCaret();
+}
+
+void CodeWindow::fillObjects() {
+  m_filling = true;
+  const QString current = m_objects->currentText();
+  m_objects->clear();
+  m_objects->addItem(kGeneral);
+  for (const CodeObject& object : objects())
+    m_objects->addItem(object.name);
+  showItem(m_objects, current.isEmpty() ? kGeneral : current);
+  m_filling = false;
+}
+
+void CodeWindow::fillProcedures(const QString& object) {
+  m_filling = true;
+  const QString current = m_procedures->currentText();
+  m_procedures->clear();
+  m_proceduresOf = object;
+  auto& text = m_binding->module()->text();
+  const std::vector<CodeObject> all = objects();
+  if (object.isEmpty() || object == kGeneral) {
+    m_procedures->addItem(kDeclarations, QVariantList{QString(), 0});
+    std::vector<const host::ProcInfo*> general;
+    for (const host::ProcInfo& proc : text.procedures())
+      if (ownerOf(proc.name, all).first.isEmpty()) general.push_back(&proc);
+    std::stable_sort(general.begin(), general.end(), [](const host::ProcInfo* a, const host::ProcInfo* b) {
+      return lessCaseInsensitive(a->name, b->name);
+    });
+    for (const host::ProcInfo* proc : general) {
+      const int kind = static_cast<int>(proc->kind);
+      m_procedures->addItem(proc->name + QLatin1StringView(kKindSuffix[kind]),
+                            QVariantList{proc->name, kind});
+    }
+  } else if (const auto found =
+                 std::find_if(all.begin(), all.end(), [&](const CodeObject& o) { return o.name == object; });
+             found != all.end()) {
+    QSet<QString> existing;
+    for (const host::ProcInfo& proc : text.procedures())
+      existing.insert(proc.name.toLower());
+    QFont bold = m_procedures->font();
+    bold.setBold(true);
+    for (const host::EventInfo& event : host::controlEvents(found->className)) {
+      const QString name = found->name + u'_' + QLatin1StringView(event.name);
+      m_procedures->addItem(QString::fromLatin1(event.name), QVariantList{name, 0});
+      if (existing.contains(name.toLower()))
+        m_procedures->setItemData(m_procedures->count() - 1, bold, Qt::FontRole);
+    }
+  }
+  const int index = m_procedures->findText(current, Qt::MatchFixedString | Qt::MatchCaseSensitive);
+  if (index >= 0) m_procedures->setCurrentIndex(index);
+  m_filling = false;
 }
 
 void CodeWindow::showProcedureOfCaret() {
@@ -98,31 +230,118 @@ void CodeWindow::showProcedureOfCaret() {
   const int line = pane->selection().startLine;
   ide::ProcKind kind = ide::ProcKind::Proc;
   const QString name = line <= text.countOfLines() ? text.procOfLine(line, kind) : QString();
-  const QString label = name.isEmpty() ? QStringLiteral("(Declarations)")
-                                       : name + QLatin1StringView(kKindSuffix[static_cast<int>(kind)]);
-  int index = m_procedures->findText(label);
-  if (index < 0) {
-    m_procedures->addItem(label, QVariantList{name, static_cast<int>(kind)});
-    index = m_procedures->count() - 1;
-  }
-  m_procedures->setCurrentIndex(index);
-}
-
-void CodeWindow::jumpToProcedure(int index) {
-  if (m_filling) return;
-  const QVariantList data = m_procedures->itemData(index).toList();
-  if (data.size() != 2) return;
-  auto module = m_binding->module();
-  int line = 1;
-  const QString name = data.at(0).toString();
+  QString object = kGeneral;
+  QString item = kDeclarations;
   if (!name.isEmpty()) {
-    try {
-      line = module->ProcBodyLine(name, static_cast<ide::ProcKind>(data.at(1).toInt()));
-    } catch (const ide::Error&) {
-      return;  // edited away meanwhile
+    const auto [owner, event] = ownerOf(name, objects());
+    if (owner.isEmpty()) {
+      item = name + QLatin1StringView(kKindSuffix[static_cast<int>(kind)]);
+    } else {
+      object = owner;
+      item = event;
     }
   }
+  m_filling = true;
+  showItem(m_objects, object);
+  if (m_proceduresOf != object) {
+    // The box held another object's procedures: it is filled again when it opens.
+    m_procedures->clear();
+    m_proceduresOf.clear();
+  }
+  showItem(m_procedures, item, QVariantList{name, static_cast<int>(kind)});
+  m_filling = false;
+}
+
+void CodeWindow::chooseObject(const QString& object) {
+  if (m_filling) return;
+  const std::vector<CodeObject> all = objects();
+  const auto found =
+      std::find_if(all.begin(), all.end(), [&](const CodeObject& o) { return o.name == object; });
+  if (object == kGeneral || found == all.end()) {
+    pane()->SetSelection(1, 1, 1, 1);
+    m_editor->setFocus();
+    fillProcedures(kGeneral);
+    showProcedureOfCaret();
+    return;
+  }
+  // The object's first event procedure, else the procedure of its default event.
+  auto& text = m_binding->module()->text();
+  QString first;
+  for (const host::ProcInfo& proc : text.procedures()) {
+    const auto [owner, event] = ownerOf(proc.name, all);
+    if (owner == object && (first.isEmpty() || lessCaseInsensitive(proc.name, first))) first = proc.name;
+  }
+  if (!first.isEmpty()) {
+    goToProcedure(first, ide::ProcKind::Proc);
+  } else if (const QString event = host::defaultEvent(found->className); !event.isEmpty()) {
+    writeEventProcedure(*found, event);
+  }
+  fillProcedures(object);
+  showProcedureOfCaret();
+}
+
+void CodeWindow::chooseProcedure(const QString& item) {
+  if (m_filling) return;
+  const QString object = m_objects->currentText();
+  if (m_proceduresOf != object) fillProcedures(object);
+  const int index = m_procedures->findText(item, Qt::MatchFixedString | Qt::MatchCaseSensitive);
+  const QVariantList data = index >= 0 ? m_procedures->itemData(index).toList() : QVariantList();
+  if (data.size() != 2) return;
+  const QString name = data.at(0).toString();
+  if (name.isEmpty()) {
+    pane()->SetSelection(1, 1, 1, 1);
+    m_editor->setFocus();
+    return;
+  }
+  const std::vector<CodeObject> all = objects();
+  const auto found =
+      std::find_if(all.begin(), all.end(), [&](const CodeObject& o) { return o.name == object; });
+  bool exists = false;
+  for (const host::ProcInfo& proc : m_binding->module()->text().procedures())
+    exists = exists || proc.name.compare(name, Qt::CaseInsensitive) == 0;
+  if (!exists && found != all.end()) {
+    writeEventProcedure(*found, item);
+    fillProcedures(object);
+  } else {
+    goToProcedure(name, static_cast<ide::ProcKind>(data.at(1).toInt()));
+  }
+  showProcedureOfCaret();
+}
+
+void CodeWindow::goToProcedure(const QString& name, ide::ProcKind kind) {
+  int line = 1;
+  try {
+    line = m_binding->module()->ProcBodyLine(name, kind);
+  } catch (const ide::Error&) {
+    return;  // edited away meanwhile
+  }
   pane()->SetSelection(line, 1, line, 1);
+  m_editor->setFocus();
+}
+
+void CodeWindow::writeEventProcedure(const CodeObject& object, const QString& event) {
+  if (m_editor->isReadOnly()) return;  // the program runs
+  const auto events = host::controlEvents(object.className);
+  const auto info = std::find_if(events.begin(), events.end(), [&](const host::EventInfo& e) {
+    return event.compare(QLatin1StringView(e.name), Qt::CaseInsensitive) == 0;
+  });
+  if (info == events.end()) return;
+  auto module = m_binding->module();
+  const int count = module->CountOfLines();
+  // At the end of the module, a blank line apart from what is above it.
+  QStringList lines;
+  if (count > 0 && !module->Lines(count, 1).trimmed().isEmpty()) lines << QString();
+  lines << host::eventProcedureHeader(object.name, *info, object.controlArray) << QString()
+        << QStringLiteral("End Sub");
+  try {
+    module->InsertLines(count + 1, lines.join(QStringLiteral("\r\n")));
+  } catch (const ide::Error& error) {
+    Q_EMIT editRejected(error.description());
+    return;
+  }
+  m_binding->flush();
+  const int body = count + static_cast<int>(lines.size()) - 1;
+  pane()->SetSelection(body, 1, body, 1);
   m_editor->setFocus();
 }
 

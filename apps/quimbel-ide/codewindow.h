@@ -1,5 +1,11 @@
 // SPDX-License-Identifier: MIT
-// A code window: the procedure list above the editor, the editor bound to the pane of its code module.
+// A code window: the Object and Procedure boxes above the editor, the editor bound to the pane of its code
+// module. The Object box lists "(General)" and the module's objects: the form (or user control, class ...)
+// and its controls, a control array once. The Procedure box lists, for "(General)", "(Declarations)" and
+// the procedures that are no object's event procedures; for an object, its events, those that have a
+// procedure in bold. Choosing an event without a procedure writes its empty procedure at the end of the
+// module and puts the caret in it; choosing an object goes to its first event procedure, or writes the
+// procedure of its default event, as the IDE does. Both boxes show where the caret is.
 #pragma once
 
 #include "host/model/objects.h"
@@ -8,6 +14,7 @@
 #include <QWidget>
 
 #include <memory>
+#include <vector>
 
 class QComboBox;
 
@@ -15,6 +22,13 @@ namespace desktop {
 
 class CodeBinding;
 class CodeEditor;
+
+/// An object of the Object box.
+struct CodeObject {
+  QString name;       // "Form", "cmdOk", "Class"
+  QString className;  // "VB.Form", "VB.CommandButton", "Class"
+  bool controlArray = false;
+};
 
 class CodeWindow final : public QWidget {
   Q_OBJECT
@@ -28,6 +42,17 @@ class CodeWindow final : public QWidget {
   CodeBinding* binding() const { return m_binding; }
   const std::shared_ptr<host::WindowImpl>& window() const { return m_window; }
   std::shared_ptr<host::CodePaneImpl> pane() const;
+  QComboBox* objectList() const { return m_objects; }
+  QComboBox* procedureList() const { return m_procedures; }
+
+  /// The objects of the module, in the Object box's order (without "(General)").
+  std::vector<CodeObject> objects() const;
+  /// Fills both boxes with what the module and its form hold now. They are otherwise filled when they
+  /// open, so that typing stays cheap.
+  void fillLists();
+  /// What choosing an item of each box does.
+  void chooseObject(const QString& object);
+  void chooseProcedure(const QString& item);
 
  Q_SIGNALS:
   void caretMoved(int line, int column);
@@ -35,15 +60,22 @@ class CodeWindow final : public QWidget {
   void editRejected(const QString& message);
 
  private:
-  void fillProcedures();
+  void fillObjects();
+  void fillProcedures(const QString& object);
   void showProcedureOfCaret();
-  void jumpToProcedure(int index);
+  /// The object and event a procedure belongs to; an empty object for a general procedure.
+  std::pair<QString, QString> ownerOf(const QString& procedure, const std::vector<CodeObject>& objects) const;
+  /// Puts the caret at the start of the body of a procedure (an event procedure written first when missing).
+  void goToProcedure(const QString& name, ide::ProcKind kind);
+  void writeEventProcedure(const CodeObject& object, const QString& event);
 
   std::shared_ptr<host::WindowImpl> m_window;
+  QComboBox* m_objects;
   QComboBox* m_procedures;
   CodeEditor* m_editor;
   CodeBinding* m_binding;
   QTimer m_caretTimer;
+  QString m_proceduresOf;  // the object whose procedures the Procedure box holds
   bool m_filling = false;
   int m_shownRevision = -1;
 };

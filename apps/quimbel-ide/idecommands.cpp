@@ -6,6 +6,7 @@
 #include "codeeditor.h"
 #include "codewindow.h"
 #include "mainwindow.h"
+#include "optionsdialog.h"
 #include "projectexplorer.h"
 #include "qtplatform.h"
 #include "windowmanager.h"
@@ -171,6 +172,11 @@ void IdeCommands::run(host::BuiltinCommand command) {
       case B::AddInManager:
         showAddInManager();
         break;
+      case B::Options: {
+        OptionsDialog dialog(m_window.settings(), &m_window);
+        dialog.exec();
+        break;
+      }
       case B::About:
         m_window.ui().MsgBox(
             QStringLiteral("Quimbel IDE %1\n\nA desktop IDE for VB6 projects on Linux, with the "

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "mainwindow.h"
 
+#include "codecolours.h"
 #include "codewindow.h"
 #include "commandbarview.h"
 #include "designerview.h"
@@ -32,6 +33,11 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
   setWindowIcon(icon(Glyph::Project));
   if (!options.settingsPath.isEmpty())
     m_settings = std::make_unique<QSettings>(options.settingsPath, QSettings::IniFormat);
+  // The code colours the user chose; without settings (a script's session) the IDE's own.
+  if (m_settings)
+    CodeColours::instance().load(*m_settings);
+  else
+    CodeColours::instance().resetToDefaults();
   m_ui.setDialogParent(this);
 
   m_mdi = new QMdiArea(this);

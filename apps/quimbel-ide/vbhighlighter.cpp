@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "vbhighlighter.h"
 
+#include "codecolours.h"
+
 #include <QPlainTextEdit>
 #include <QScrollBar>
 #include <QSet>
@@ -67,10 +69,28 @@ void addRange(QList<QTextLayout::FormatRange>* formats, qsizetype start, qsizety
 }  // namespace
 
 VbHighlighter::VbHighlighter(QPlainTextEdit* editor) : QObject(editor), m_editor(editor) {
-  m_keyword.setForeground(QColor(0x00, 0x00, 0x90));
-  m_comment.setForeground(QColor(0x00, 0x80, 0x00));
-  m_string.setForeground(QColor(0x9a, 0x1c, 0x1c));
   connect(editor->document(), &QTextDocument::contentsChange, this, &VbHighlighter::contentsChanged);
+  connect(&CodeColours::instance(), &CodeColours::changed, this, &VbHighlighter::applyColours);
+  applyColours();
+}
+
+void VbHighlighter::applyColours() {
+  const CodeColours& colours = CodeColours::instance();
+  const auto formatOf = [&](CodeText kind) {
+    QTextCharFormat format;
+    format.setForeground(colours.foreground(kind));
+    if (colours.colour(kind).background.isValid()) format.setBackground(colours.colour(kind).background);
+    return format;
+  };
+  m_keyword = formatOf(CodeText::Keyword);
+  m_comment = formatOf(CodeText::Comment);
+  m_error = formatOf(CodeText::SyntaxError);
+  const CodeColour identifier = colours.colour(CodeText::Identifier);
+  m_identifiers = identifier.foreground.isValid() || identifier.background.isValid();
+  m_identifier = formatOf(CodeText::Identifier);
+  for (QTextBlock block = m_editor->document()->firstBlock(); block.isValid(); block = block.next())
+    block.setUserState(kNotColoured);
+  colourVisible();
 }
 
 bool VbHighlighter::isKeyword(QStringView word) {
@@ -162,6 +182,7 @@ bool VbHighlighter::colour(const QString& text, bool inComment,
     addRange(formats, 0, n, m_comment);
     return continues(text);
   }
+  const qsizetype before = formats ? formats->size() : 0;
   bool statementStart = true;
   qsizetype i = 0;
   while (i < n) {
@@ -182,7 +203,14 @@ bool VbHighlighter::colour(const QString& text, bool inComment,
         }
         ++j;
       }
-      addRange(formats, i, std::min(j + 1, n) - i, m_string);
+      if (j >= n) {
+        // A string left open is a syntax error: the whole line takes the error colour.
+        if (formats) {
+          formats->resize(before);
+          addRange(formats, 0, n, m_error);
+        }
+        return false;
+      }
       i = j + 1;
       statementStart = false;
       continue;
@@ -208,7 +236,10 @@ bool VbHighlighter::colour(const QString& text, bool inComment,
       }
       // A member after a dot (obj.Print, rs.Close) is not a keyword.
       const bool afterDot = i > 0 && text.at(i - 1) == u'.';
-      if (!afterDot && isKeyword(word)) addRange(formats, i, j - i, m_keyword);
+      if (!afterDot && isKeyword(word))
+        addRange(formats, i, j - i, m_keyword);
+      else if (m_identifiers)
+        addRange(formats, i, j - i, m_identifier);
       i = j;
       statementStart = false;
       continue;

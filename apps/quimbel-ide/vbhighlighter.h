@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT
-// VB syntax colours for a code window: keywords, comments (also continued with " _"), strings. Only the
-// lines in and around the visible part of the editor are coloured, when they come into view or change, so
-// that a module of a hundred thousand lines opens without colouring it all first.
+// VB syntax colours for a code window, from the code colour scheme (CodeColours): keywords, comments (also
+// continued with " _"), identifiers, and a line with a syntax error (a string left open) in the error
+// colour; strings have no colour of their own. Only the lines in and around the visible part of the editor
+// are coloured, when they come into view or change, so that a module of a hundred thousand lines opens
+// without colouring it all first.
 #pragma once
 
 #include <QList>
@@ -30,6 +32,8 @@ class VbHighlighter final : public QObject {
   void colourVisible();
 
   static bool isKeyword(QStringView word);
+  /// Takes the scheme's colours again and colours the lines anew.
+  void applyColours();
   /// The colours of one line: the format ranges, and whether the line ends inside a continued comment.
   bool colour(const QString& text, bool inComment, QList<QTextLayout::FormatRange>* formats) const;
 
@@ -45,7 +49,9 @@ class VbHighlighter final : public QObject {
   QPlainTextEdit* m_editor;
   QTextCharFormat m_keyword;
   QTextCharFormat m_comment;
-  QTextCharFormat m_string;
+  QTextCharFormat m_error;
+  QTextCharFormat m_identifier;
+  bool m_identifiers = false;  // false while identifiers are drawn as normal text
   bool m_applying = false;
 };
 

@@ -2,12 +2,18 @@
 // VB colours: which parts of a line are keywords, strings and comments (comments continued with " _"
 // included), and that only the lines near the view are coloured, the others when they come into view.
 #include "vbhighlighter.h"
+#include "codecolours.h"
 #include "codeeditor.h"
 #include "idefixture.h"
+#include "optionsdialog.h"
 
 #include <gtest/gtest.h>
 
+#include <QComboBox>
+#include <QListWidget>
 #include <QScrollBar>
+#include <QSettings>
+#include <QTemporaryDir>
 #include <QTest>
 #include <QTextBlock>
 
@@ -16,7 +22,7 @@ namespace {
 
 using test::settle;
 
-/// The ranges of a line as "start+length:kind" with kind k (keyword), s (string) or c (comment).
+/// The ranges of a line as "start+length:kind" with kind k (keyword), c (comment) or e (syntax error).
 QString rangesOf(VbHighlighter& highlighter, const QString& text, bool inComment = false,
                  bool* endsInComment = nullptr) {
   QList<QTextLayout::FormatRange> formats;
@@ -25,7 +31,7 @@ QString rangesOf(VbHighlighter& highlighter, const QString& text, bool inComment
   QStringList parts;
   for (const auto& range : formats) {
     const QColor color = range.format.foreground().color();
-    const char kind = color == QColor(0x00, 0x80, 0x00) ? 'c' : color == QColor(0x00, 0x00, 0x90) ? 'k' : 's';
+    const char kind = color == QColor(0x00, 0x80, 0x00) ? 'c' : color == QColor(0x00, 0x00, 0x80) ? 'k' : 'e';
     parts << QStringLiteral("%1+%2:%3").arg(range.start).arg(range.length).arg(QLatin1Char(kind));
   }
   return parts.join(u' ');
@@ -40,12 +46,36 @@ class Colours : public ::testing::Test {
 TEST_F(Colours, KeywordsStringsAndCommentsOfALine) {
   EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("Dim s As String ' nota")),
             QStringLiteral("0+3:k 6+2:k 9+6:k 16+6:c"));
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("x = \"a\"\"b\" & y")), QStringLiteral("4+6:s"));
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("x = \"a\"\"b\" & y")), QString())
+      << "strings have no colour";
+  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("If x = \"Don't Then")), QStringLiteral("0+18:e"))
+      << "a string left open is a syntax error: the whole line";
   EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("#If Win32 Then")), QStringLiteral("0+3:k 10+4:k"));
   EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("rs.Close: Rem feito")), QStringLiteral("10+9:c"))
       << "a member after a dot is no keyword; Rem after a colon starts a comment";
   EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("10010 Rem numerada")), QStringLiteral("6+12:c"));
   EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("Lembrete = 1")), QString()) << "Rem only as a word";
+}
+
+TEST_F(Colours, TheOptionsChangeTheColoursOfEveryCodeWindowAndRememberThem) {
+  QTemporaryDir dir;
+  QSettings settings(dir.filePath(QStringLiteral("quimbel-ide.ini")), QSettings::IniFormat);
+  OptionsDialog dialog(&settings);
+  dialog.findChild<QListWidget*>(QStringLiteral("codeColorList"))
+      ->setCurrentRow(static_cast<int>(CodeText::Keyword));
+  auto* foreground = dialog.findChild<QComboBox*>(QStringLiteral("foregroundColor"));
+  EXPECT_EQ(foreground->currentData().value<QColor>(), QColor(0x00, 0x00, 0x80)) << "the IDE's dark blue";
+  foreground->setCurrentIndex(foreground->findText(QStringLiteral("#ff0000")));
+  dialog.accept();
+  QList<QTextLayout::FormatRange> formats;
+  highlighter().colour(QStringLiteral("Dim"), false, &formats);
+  ASSERT_EQ(formats.size(), 1);
+  EXPECT_EQ(formats.front().format.foreground().color(), QColor(0xff, 0x00, 0x00));
+  CodeColours::instance().resetToDefaults();
+  CodeColours::instance().load(settings);
+  EXPECT_EQ(CodeColours::instance().colour(CodeText::Keyword).foreground, QColor(0xff, 0x00, 0x00));
+  EXPECT_FALSE(CodeColours::instance().colour(CodeText::Normal).foreground.isValid()) << "Automatic";
+  CodeColours::instance().resetToDefaults();
 }
 
 TEST_F(Colours, ACommentContinuedWithAnUnderscoreGoesOnOnTheNextLine) {

@@ -341,7 +341,7 @@ void CommandBarsImpl::buildStandardBars() {
   menu(menuBar, QStringLiteral("&Query"));
   menu(menuBar, QStringLiteral("D&iagram"));
   auto tools = menu(menuBar, QStringLiteral("&Tools"));
-  item(tools, QStringLiteral("&Options..."))->setEnabled(false);
+  item(tools, QStringLiteral("&Options..."), B::Options);
   auto addIns = menu(menuBar, QStringLiteral("&Add-Ins"));
   item(addIns, QStringLiteral("&Add-In Manager..."), B::AddInManager);
   menu(menuBar, QStringLiteral("&Window"));

@@ -51,6 +51,7 @@ enum class BuiltinCommand : int {
   End,
   AddInManager,
   About,
+  Options,
 };
 
 class CommandBarControlImpl final : public ide::CommandBarControl,
