@@ -42,9 +42,9 @@ TEST_F(MainWindowTest, TheExplorerListsProjectsAndComponentsByType) {
   for (int i = 0; i < loja->childCount(); ++i)
     folders << loja->child(i)->text(0);
   EXPECT_EQ(folders, (QStringList{QStringLiteral("Forms"), QStringLiteral("Modules"),
-                                  QStringLiteral("Class Modules")}));
+                                  QStringLiteral("Class Modules"), QStringLiteral("User Controls")}));
   QTreeWidgetItem* forms = loja->child(0);
-  ASSERT_EQ(forms->childCount(), 3);
+  ASSERT_EQ(forms->childCount(), 4);
   EXPECT_EQ(forms->child(0)->text(0), QStringLiteral("frmPrincipal (frmPrincipal.frm)"));
 }
 
