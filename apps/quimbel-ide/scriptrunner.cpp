@@ -841,6 +841,14 @@ std::vector<QWidget*> ScriptRunner::dialogs() const {
 }
 
 QWidget* ScriptRunner::findWidget(const QString& name) const {
+  // The Object and Procedure boxes are the active code window's, filled with what they offer now.
+  if (CodeWindow* code = dialogs().empty() ? m_window.windows().activeCodeWindow() : nullptr) {
+    for (QComboBox* box : {code->objectList(), code->procedureList()}) {
+      if (box->objectName() != name) continue;
+      code->fillLists();
+      return box;
+    }
+  }
   std::vector<QWidget*> tops = dialogs();
   tops.push_back(&m_window);
   for (QWidget* top : tops) {

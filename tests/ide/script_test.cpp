@@ -94,6 +94,23 @@ TEST_F(ScriptTest, AScriptEditsCodeThroughTheEditor) {
   EXPECT_EQ(code, 0) << m_error.toStdString();
 }
 
+TEST_F(ScriptTest, TheBoxesOfTheActiveCodeWindowAreFilledBeforeUse) {
+  // Two code windows: the boxes are the active one's, and an event not yet listed can be chosen.
+  const int code =
+      run(QStringLiteral("code Loja.modPrincipal\n"
+                         "code Loja.frmSobre\n"
+                         "expect value objectList (General)\n"
+                         "set objectList cmdOk\n"
+                         "expect value procedureList Click\n"
+                         "set procedureList KeyPress\n"
+                         "expect value procedureList KeyPress\n"
+                         "expect value objectList cmdOk\n"));
+  EXPECT_EQ(code, 0) << m_error.toStdString();
+  auto module = component(QStringLiteral("Loja"), QStringLiteral("frmSobre"))->codeModule();
+  EXPECT_EQ(module->Lines(module->CountOfLines() - 2, 1),
+            QStringLiteral("Private Sub cmdOk_KeyPress(KeyAscii As Integer)"));
+}
+
 TEST_F(ScriptTest, AMessyProjectOpensWithoutItsMissingFileAndKeepsItsLineEnds) {
   QTemporaryDir dir;
   const QString project = host::test::writeMessyProject(dir.path());
