@@ -2,6 +2,7 @@
 // Values kept in a form's binary file, through the object model: read as texts, lists and pictures, written
 // back as the IDE writes them, and every byte that no change touches kept as it was.
 #include "host/files/ansi.h"
+#include "host/files/frxfile.h"
 #include "host/model/designer.h"
 #include "host/model/vbe.h"
 #include "testproject.h"
@@ -178,6 +179,60 @@ TEST_F(BinaryValues, AChangedValueIsWrittenAsTheIdeWritesItAndReadsBackTheSame) 
   EXPECT_EQ(value(QStringLiteral("lblPreco"), "Caption"), QVariant(QStringLiteral("Valor:")));
   EXPECT_EQ(m_form->Properties()->Item(QStringLiteral("Icon"))->Value(), QVariant(kIcon));
   EXPECT_TRUE(decodeAnsi(readBytes(path("frmFotos.frm"))).contains(QStringLiteral("\"Valor:\"")));
+}
+
+// The example's About form: its real icon and logo survive a changed list, and a changed caption touches
+// only its own line of the description.
+TEST(ExampleBinaryValues, OneChangedPropertyKeepsEveryOtherByte) {
+  test::ExampleCopy copy;
+  const auto before = copy.snapshot();
+  auto vbe = VbeImpl::create();
+  vbe->open(copy.groupFile());
+  auto sobre = vbe->project(QStringLiteral("Loja"))->component(QStringLiteral("frmSobre"));
+  ASSERT_TRUE(sobre);
+  EXPECT_EQ(pictureKind(sobre->Properties()->Item(QStringLiteral("Icon"))->Value().toByteArray()),
+            QStringLiteral("Icon"));
+  auto form = sobre->form();
+  form->findControl(QStringLiteral("lblVersao"))->setProperty(QStringLiteral("Caption"), "Versão 2.0");
+  vbe->saveAll();
+  auto after = copy.snapshot();
+  const QString frm = QStringLiteral("Loja/frmSobre.frm");
+  for (auto it = before.cbegin(); it != before.cend(); ++it) {
+    if (it.key() == frm) continue;
+    EXPECT_EQ(after.value(it.key()), it.value()) << it.key().toStdString();
+  }
+  EXPECT_EQ(after.value(frm),
+            QByteArray(before.value(frm))
+                .replace(ansi(QStringLiteral("Versão 1.4.12")), ansi(QStringLiteral("Versão 2.0"))));
+
+  // A list changes size: the records before and after it keep their bytes, and the item data stays.
+  const QByteArray frx = before.value(QStringLiteral("Loja/frmSobre.frx"));
+  const qsizetype list = 0x49A;
+  const qsizetype text = 0x4BB;
+  ASSERT_EQ(frx.mid(list, 4), QByteArray("\x03\0\x03\0", 4));
+  form->findControl(QStringLiteral("cboIdioma"))->setProperty(QStringLiteral("List"), QStringList{"Galego"});
+  vbe->saveAll();
+  after = copy.snapshot();
+  const QByteArray galego = *encodeFrxList({QStringLiteral("Galego")});
+  EXPECT_EQ(after.value(QStringLiteral("Loja/frmSobre.frx")), frx.left(list) + galego + frx.mid(text));
+  // In the description only the references to the records after the list move.
+  const auto moved = [&](qsizetype offset) {
+    return "\"frmSobre.frx\":" + QByteArray::number(offset, 16).toUpper().rightJustified(4, '0');
+  };
+  const qsizetype shift = galego.size() - (text - list);
+  EXPECT_EQ(after.value(frm),
+            QByteArray(before.value(frm))
+                .replace(ansi(QStringLiteral("Versão 1.4.12")), ansi(QStringLiteral("Versão 2.0")))
+                .replace(moved(text), moved(text + shift))
+                .replace(moved(0x5D1), moved(0x5D1 + shift)));
+  vbe = VbeImpl::create();
+  vbe->open(copy.groupFile());
+  auto combo = vbe->project(QStringLiteral("Loja"))
+                   ->component(QStringLiteral("frmSobre"))
+                   ->form()
+                   ->findControl(QStringLiteral("cboIdioma"));
+  EXPECT_EQ(combo->property(QStringLiteral("List")), QVariant(QStringList{"Galego"}));
+  EXPECT_EQ(combo->property(QStringLiteral("ItemData")).toList().size(), 3);
 }
 
 }  // namespace

@@ -61,9 +61,9 @@ Begin VB.Form frmSobre
       End
       Begin VB.ComboBox cboIdioma 
          Height          =   315
-         ItemData        =   "frmSobre.frx":20E2
+         ItemData        =   "frmSobre.frx":048A
          Left            =   120
-         List            =   "frmSobre.frx":20F2
+         List            =   "frmSobre.frx":049A
          Style           =   2  'Dropdown List
          TabIndex        =   3
          Top             =   480
@@ -86,7 +86,7 @@ Begin VB.Form frmSobre
       MultiLine       =   -1  'True
       ScrollBars      =   2  'Vertical
       TabIndex        =   1
-      Text            =   $"frmSobre.frx":1FCC
+      Text            =   $"frmSobre.frx":04BB
       Top             =   1320
       Width           =   5775
    End
@@ -121,7 +121,7 @@ Begin VB.Form frmSobre
    Begin VB.Image imgLogo 
       Height          =   720
       Left            =   120
-      Picture         =   "frmSobre.frx":048A
+      Picture         =   "frmSobre.frx":05D1
       Top             =   120
       Width           =   720
    End
