@@ -251,6 +251,43 @@ TEST_F(SobreTest, TheFrameFollowsBorderStyleControlBoxMinButtonAndMaxButton) {
   }
 }
 
+TEST_F(SobreTest, WordWrapScrollBarsAndFlatBorders) {
+  FormCanvas* canvas = m_designer->canvas();
+  // An AutoSize label with WordWrap keeps its width and grows downwards.
+  auto version = control(QStringLiteral("lblVersao"));
+  version->setProperty(QStringLiteral("WordWrap"), true);
+  version->setProperty(QStringLiteral("Caption"), QStringLiteral("Versão 1.4.12 de março"));
+  const QRect wrapped = canvas->rectOf(version);
+  EXPECT_EQ(wrapped.width(), 65);
+  EXPECT_GE(wrapped.height(), 2 * QFontMetrics(vbFont(version->font())).height());
+
+  const auto pixels = [&](const QRect& area, auto&& predicate) {
+    const QImage image = canvas->grab().toImage();
+    int count = 0;
+    for (int y = area.top(); y <= area.bottom(); ++y)
+      for (int x = area.left(); x <= area.right(); ++x)
+        count += predicate(image.pixelColor(x, y)) ? 1 : 0;
+    return count;
+  };
+  const auto black = [](const QColor& c) { return c == Qt::black; };
+  // txtLicenca (ScrollBars 2) has its up arrow inside its 3-D border; without scroll bars that corner is
+  // text.
+  auto licence = control(QStringLiteral("txtLicenca"));
+  const QRect box = canvas->rectOf(licence).adjusted(2, 2, -2, -2);
+  const QRect upButton(box.right() - 15, box.top(), 16, 16);
+  EXPECT_GT(pixels(upButton.adjusted(4, 4, -4, -4), black), 3);
+  licence->setProperty(QStringLiteral("ScrollBars"), 0);
+  EXPECT_EQ(pixels(upButton.adjusted(4, 4, -4, -4), black), 0);
+  // chkDicas is flat (a black square); at Appearance 1 its box is sunken (grey above, white at the right).
+  auto tips = control(QStringLiteral("chkDicas"));
+  const QRect check = canvas->rectOf(tips);
+  const QRect indicator(check.left(), check.center().y() - 6, 13, 13);
+  const auto grey = [](const QColor& c) { return c == QColor(0x80, 0x80, 0x80); };
+  EXPECT_EQ(pixels(QRect(indicator.topLeft(), QSize(13, 1)), black), 13);
+  tips->setProperty(QStringLiteral("Appearance"), 1);
+  EXPECT_EQ(pixels(QRect(indicator.topLeft(), QSize(12, 1)), grey), 12);
+}
+
 TEST_F(SobreTest, ThePropertiesWindowNamesBinaryValuesByTheirKind) {
   PropertiesView& properties = m_window->properties();
   m_designer->selectControl(nullptr);
