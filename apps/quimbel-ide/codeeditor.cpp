@@ -7,7 +7,6 @@
 #include "vbfonts.h"
 #include "vbhighlighter.h"
 
-#include <QFontDatabase>
 #include <QKeyEvent>
 #include <QPainter>
 #include <QScrollBar>
@@ -29,11 +28,7 @@ class MarginBar final : public QWidget {
 };
 
 CodeEditor::CodeEditor(QWidget* parent) : QPlainTextEdit(parent) {
-  QFont font = QFontDatabase::systemFont(QFontDatabase::FixedFont);
-  // The IDE's code font is Courier New; its metric-compatible stand-in when that is not installed.
-  font.setFamily(fontFamilyFor(QStringLiteral("Courier New"), QStringLiteral("DejaVu Sans Mono")));
-  font.setStyleHint(QFont::Monospace);
-  font.setPointSize(10);
+  const QFont font = codeFont();
   setFont(font);
   setLineWrapMode(QPlainTextEdit::NoWrap);
   setTabStopDistance(QFontMetricsF(font).horizontalAdvance(u' ') * 4);

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "optionsdialog.h"
+#include "vbfonts.h"
 
 #include <QComboBox>
 #include <QDialogButtonBox>
@@ -67,6 +68,7 @@ OptionsDialog::OptionsDialog(QSettings* settings, QWidget* parent) : QDialog(par
   auto* sampleBox = new QGroupBox(QStringLiteral("Sample"), page);
   m_sample = new QLabel(QStringLiteral("AaBbCcXxYyZz"), sampleBox);
   m_sample->setObjectName(QStringLiteral("sample"));
+  m_sample->setFont(codeFont());
   m_sample->setAlignment(Qt::AlignCenter);
   m_sample->setAutoFillBackground(true);
   m_sample->setMinimumHeight(40);

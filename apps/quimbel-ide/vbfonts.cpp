@@ -73,4 +73,12 @@ QFont vbFont(const host::ControlFont& font) {
   return result;
 }
 
+QFont codeFont() {
+  QFont font = QFontDatabase::systemFont(QFontDatabase::FixedFont);
+  font.setFamily(fontFamilyFor(QStringLiteral("Courier New"), QStringLiteral("DejaVu Sans Mono")));
+  font.setStyleHint(QFont::Monospace);
+  font.setPointSize(10);
+  return font;
+}
+
 }  // namespace desktop

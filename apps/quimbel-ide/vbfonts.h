@@ -25,4 +25,7 @@ QString fontFamilyFor(const QString& name, const QString& fallback = QStringLite
 /// The font of a control at the designer's 96 pixels per inch (15 twips per pixel).
 QFont vbFont(const host::ControlFont& font);
 
+/// The font of code windows: the IDE's Courier New 10, or its stand-in.
+QFont codeFont();
+
 }  // namespace desktop
