@@ -5,6 +5,7 @@
 #include "codeeditor.h"
 #include "host/files/controlevents.h"
 #include "host/model/designer.h"
+#include "host/model/objects.h"
 
 #include <QComboBox>
 #include <QHBoxLayout>
@@ -33,22 +34,6 @@ class ListBox final : public QComboBox {
     QComboBox::showPopup();
   }
 };
-
-/// The name the module's own object has in the Object box.
-QString rootObjectName(ide::ComponentType type) {
-  switch (type) {
-    case ide::ComponentType::VBMDIForm:
-      return QStringLiteral("MDIForm");
-    case ide::ComponentType::UserControl:
-      return QStringLiteral("UserControl");
-    case ide::ComponentType::PropPage:
-      return QStringLiteral("PropertyPage");
-    case ide::ComponentType::DocObject:
-      return QStringLiteral("UserDocument");
-    default:
-      return QStringLiteral("Form");
-  }
-}
 
 bool lessCaseInsensitive(const QString& a, const QString& b) {
   return a.compare(b, Qt::CaseInsensitive) < 0;
@@ -131,7 +116,9 @@ std::vector<CodeObject> CodeWindow::objects() const {
   auto component = m_binding->module()->component();
   if (!component) return result;
   if (auto form = component->form()) {
-    result.push_back({rootObjectName(component->Type()), form->description().root().className(), false});
+    // The module's own object is named by its kind: Form, MDIForm, UserControl ...
+    result.push_back(
+        {host::componentTypeName(component->Type()), form->description().root().className(), false});
     std::map<QString, CodeObject> controls;  // by lower-case name: an array once
     for (const auto& control : form->controls()) {
       const host::FormNode* node = control->node();
