@@ -181,6 +181,26 @@ TEST_F(BinaryValues, AChangedValueIsWrittenAsTheIdeWritesItAndReadsBackTheSame) 
   EXPECT_TRUE(decodeAnsi(readBytes(path("frmFotos.frm"))).contains(QStringLiteral("\"Valor:\"")));
 }
 
+TEST_F(BinaryValues, SavedUnderANewNameTheFormTakesItsBinaryFileAlong) {
+  // As the IDE does: frmFotos2.frm refers to frmFotos2.frx, and the old pair keeps every byte when the new
+  // form's values change later.
+  m_form->SaveAs(path("frmFotos2.frm"));
+  EXPECT_EQ(readBytes(path("frmFotos2.frx")), m_frx);
+  const QString saved = decodeAnsi(readBytes(path("frmFotos2.frm")));
+  EXPECT_FALSE(saved.contains(QStringLiteral("\"frmFotos.frx\""), Qt::CaseInsensitive));
+  EXPECT_EQ(saved.count(QStringLiteral("\"frmFotos2.frx\":")), 6);
+  EXPECT_EQ(m_form->FileCount(), 2);
+  m_form->form()
+      ->findControl(QStringLiteral("cboTipo"))
+      ->setProperty(QStringLiteral("List"), QStringList{"Sala"});
+  m_vbe->saveAll();
+  EXPECT_EQ(readBytes(path("frmFotos.frx")), m_frx);
+  EXPECT_EQ(readBytes(path("frmFotos.frm")), m_frm);
+  open();  // the project now lists frmFotos2.frm
+  EXPECT_EQ(value(QStringLiteral("cboTipo"), "List"), QVariant(QStringList{"Sala"}));
+  EXPECT_EQ(m_form->Properties()->Item(QStringLiteral("Icon"))->Value(), QVariant(kIcon));
+}
+
 // The example's About form: its real icon and logo survive a changed list, and a changed caption touches
 // only its own line of the description.
 TEST(ExampleBinaryValues, OneChangedPropertyKeepsEveryOtherByte) {

@@ -367,6 +367,23 @@ void ComponentImpl::SaveAs(const QString& fileName) {
       QFileInfo(fileName).isAbsolute() ? fileName : QDir(project->directory()).absoluteFilePath(fileName);
   target = QFileInfo(target).absoluteFilePath();
   const QString oldPath = m_filePath;
+  // Under a new name the form takes its binary file along under that name, as the IDE does (Form2.frm
+  // refers to Form2.frx): the old pair stays as it was, and no longer shares its values with this form.
+  std::vector<std::pair<FrxProperty, QString>> renamed;
+  if (m_form && !m_form->binary().isEmpty() &&
+      QFileInfo(target).completeBaseName().compare(QFileInfo(oldPath).completeBaseName(),
+                                                   Qt::CaseInsensitive) != 0) {
+    const QString name = QFileInfo(target).completeBaseName() + u'.' + QFileInfo(binaryFileName()).suffix();
+    for (FrxProperty& property : frxProperties(m_form->description().root())) {
+      FrxReference reference = property.reference;
+      reference.fileName = name;
+      const QString before = formatFrxReference(property.reference);
+      property.group->setProperty(property.name, formatFrxReference(reference));
+      renamed.emplace_back(std::move(property), before);
+    }
+  }
+  const bool wasChanged = m_form && m_form->binaryChanged();
+  if (!renamed.empty()) m_form->binaryMoved();
   // A binary file with changed values is written with the form; one without is copied along.
   const bool binaryWritten = m_form && m_form->binaryChanged();
   const QString oldBinary = FileCount() == 2 && !binaryWritten ? binaryFilePath() : QString();
@@ -382,6 +399,9 @@ void ComponentImpl::SaveAs(const QString& fileName) {
     }
   } catch (...) {
     m_filePath = oldPath;
+    for (const auto& [property, before] : renamed)
+      property.group->setProperty(property.name, before);
+    if (!renamed.empty() && !wasChanged) m_form->binarySaved();
     throw;
   }
   project->componentEntryChanged(*this, m_name);

@@ -107,6 +107,8 @@ class FormImpl final : public ide::VBForm, public std::enable_shared_from_this<F
   /// Whether a value in the binary file changed since it was read or saved; binarySaved() clears it.
   bool binaryChanged() const { return m_binaryChanged; }
   void binarySaved() { m_binaryChanged = false; }
+  /// The binary file is to be written whole with the description (it moves to a new name).
+  void binaryMoved() { m_binaryChanged = true; }
   /// A value the description refers to in the binary file, or an invalid QVariant when the file does not
   /// hold it (or its layout is the control's own).
   QVariant binaryValue(const FormNode& owner, QStringView property, const FrxReference& reference) const;
