@@ -1,10 +1,9 @@
 // SPDX-License-Identifier: MIT
-// The one place that says what each feature area does today. Numbering, indentation and the new-procedure
-// wizard open their dialogs; the keyboard macros and the copy buffers open theirs and take their hotkeys; the
-// project info objects keep every project's tasks and favourites; the extended find shows its window, which
-// lives until the add-in shuts down. The options dialog and the designer actions are not part of the add-in
-// yet: their command and events are connected and arrive here, and do nothing until they land; no stand-in
-// dialog pretends to be the feature meanwhile.
+// The one place that says what each feature area does. Numbering, indentation, the new-procedure wizard and
+// the options open their dialogs; the keyboard macros and the copy buffers open theirs and take their
+// hotkeys; the project info objects keep every project's tasks and favourites; the extended find shows its
+// window, which lives until the add-in shuts down; the designer actions follow new forms and controls and
+// renamed controls.
 #include "addin/features.h"
 
 #include "addin/envutils.h"
@@ -14,6 +13,8 @@
 #include "common/errors.h"
 #include "common/settings.h"
 #include "common/strings.h"
+#include "designer/actions.h"
+#include "designer/dialogs.h"
 #include "find/frmfind.h"
 #include "navigation/favorites.h"
 #include "navigation/frmorgfav.h"
@@ -34,8 +35,12 @@ class AddInFeatures final : public Features {
       : m_vbe(services.vbe),
         m_settings(services.settings),
         m_services(services),
+        m_options(services.options),
         m_textTools(services),
-        m_projInfos(projInfoServices(services)) {
+        m_projInfos(projInfoServices(services)),
+        m_designer(m_vbe->Platform().ui(), m_options, [this](const ide::Ref<ide::VBControl>& control) {
+          return designer::showPropsDialog(control, m_options, m_vbe->Platform().ui(), dialogParent());
+        }) {
     // The projects open when the add-in starts get their info objects now; one that fails is told and
     // the others (and the add-in) go on.
     for (const auto& project : m_vbe->VBProjects()->items()) {
@@ -52,8 +57,12 @@ class AddInFeatures final : public Features {
   // The find window is a child of the IDE's window when there is one, which may have deleted it already.
   ~AddInFeatures() override { delete m_findForm.data(); }
 
-  void showLineNumbering() override { transform::showLineNumberingDialog(m_vbe, m_settings, dialogParent()); }
-  void showIndentation() override { transform::showIndentationDialog(m_vbe, m_settings, dialogParent()); }
+  void showLineNumbering() override {
+    transform::showLineNumberingDialog(m_vbe, m_settings, m_options, dialogParent());
+  }
+  void showIndentation() override {
+    transform::showIndentationDialog(m_vbe, m_settings, m_options, dialogParent());
+  }
 
   // Favourites and tasks, of the active project.
   void showFavorites() override {
@@ -88,11 +97,18 @@ class AddInFeatures final : public Features {
     if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfComponent(component->Name());
   }
   void showNewProcedure() override;
-  // Not there yet: the options dialog and the designer actions.
-  void showOptions() override {}
-  void componentAdded(const ide::Ref<ide::VBComponent>&) override {}
-  void controlAdded(const ide::Ref<ide::VBControl>&) override {}
-  void controlRenamed(const ide::Ref<ide::VBControl>&, const QString&, int) override {}
+  // The options dialog and the designer actions.
+  void showOptions() override {
+    designer::showOptionsDialog(m_settings, m_options, m_vbe->Platform().ui(), dialogParent());
+  }
+  void componentAdded(const ide::Ref<ide::VBComponent>& component) override {
+    m_designer.FormAdded(component);
+  }
+  void controlAdded(const ide::Ref<ide::VBControl>& control) override { m_designer.ControlAdded(control); }
+  void controlRenamed(const ide::Ref<ide::VBControl>& control, const QString& oldName,
+                      int oldIndex) override {
+    m_designer.ControlRenamed(control, oldName, oldIndex);
+  }
   // The project identity and info files. A project's entry follows the project object, so a rename
   // changes nothing.
   void projectAdded(const ide::Ref<ide::VBProject>& project) override { m_projInfos.projectAdded(project); }
@@ -148,9 +164,11 @@ class AddInFeatures final : public Features {
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
   FeatureServices m_services;
+  common::Options& m_options;
   TextTools m_textTools;
   projinfo::ProjInfos m_projInfos;
   QPointer<find::frmFind> m_findForm;
+  designer::DesignerActions m_designer;
 };
 
 void AddInFeatures::showExtendedFind() {

@@ -14,7 +14,8 @@
 
 namespace common {
 class SettingsStore;
-}
+struct Options;
+}  // namespace common
 namespace appdata {
 class CAppInfoFile;
 }
@@ -84,6 +85,9 @@ class Features {
 struct FeatureServices {
   ide::Ref<ide::VBE> vbe;
   common::SettingsStore& settings;
+  /// The option globals: the options dialog sets them, the designer actions and the numbering and
+  /// indentation dialogs read them.
+  common::Options& options;
   /// The application database (macros, copy buffers, templates, project identifiers); null when it could
   /// not be opened at start-up. A command that needs it then shows `appInfoUnavailable`, which names the
   /// file and says why.

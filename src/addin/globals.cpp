@@ -58,7 +58,7 @@ Globals::Globals(ide::Ref<ide::VBE> vbe, ide::Ref<ide::AddIn> addIn, StartupValu
   ide::Platform& platform = m_vbe->Platform();
 
   // The settings.
-  m_options = GetOptionsFromRegistry(m_settings);
+  m_options = common::GetOptionsFromRegistry(m_settings);
 
   // The message that defers work until the IDE is idle (the hotkey window procedure is made with its keeper
   // below).
@@ -96,7 +96,7 @@ Globals::Globals(ide::Ref<ide::VBE> vbe, ide::Ref<ide::AddIn> addIn, StartupValu
   // The event object, the utilities and the feature areas.
   m_envUtils.emplace(*m_vbe);
   m_features =
-      environment.createFeatures({m_vbe, m_settings, AppInfo(), m_appInfo->UnavailableMessage(),
+      environment.createFeatures({m_vbe, m_settings, m_options, AppInfo(), m_appInfo->UnavailableMessage(),
                                   *m_textInsertion, m_values.InstallDir, m_values.StartDisplayModel});
   m_vbEvents.emplace(*this);
 

@@ -11,10 +11,10 @@
 #include "addin/features.h"
 #include "addin/hotkeys.h"
 #include "addin/machineconfig.h"
-#include "addin/options.h"
 #include "addin/vbevents.h"
 #include "appdata/appinfofile.h"
 #include "common/commandstate.h"
+#include "common/options.h"
 #include "common/settings.h"
 #include "navigation/browsesampler.h"
 #include "navigation/histories.h"
@@ -101,7 +101,8 @@ class Globals {
   const QString& UserName() const { return m_userName; }
   unsigned IdleMessage() const { return m_idleMessage; }
   common::SettingsStore& settings() { return m_settings; }
-  const Options& options() const { return m_options; }
+  /// The option globals (the options dialog sets them).
+  common::Options& options() { return m_options; }
   common::CommandState& CommandState() { return m_commandState; }
   int LastWindowType() const { return m_lastWindowType; }
   /// The application database; null when it could not be opened (the add-in runs on without it).
@@ -130,7 +131,7 @@ class Globals {
   QString m_userName;
   unsigned m_idleMessage = 0;
   common::SettingsStore m_settings;
-  Options m_options;
+  common::Options m_options;
   common::CommandState m_commandState;
   int m_lastWindowType = -1;
 

@@ -20,15 +20,16 @@ QWidget* ownerOf(ide::VBE& vbe, QWidget* parent) {
 }  // namespace
 
 void showLineNumberingDialog(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings,
-                             QWidget* parent) {
-  frmLinNumbers dialog(vbe, settings, ownerOf(*vbe, parent));
+                             const common::Options& options, QWidget* parent) {
+  frmLinNumbers dialog(vbe, settings, options, ownerOf(*vbe, parent));
   dialog.exec();
 }
 
-void showIndentationDialog(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings, QWidget* parent) {
+void showIndentationDialog(const ide::Ref<ide::VBE>& vbe, common::SettingsStore& settings,
+                           const common::Options& options, QWidget* parent) {
   std::optional<frmIndenter> dialog;
   try {
-    dialog.emplace(vbe, settings, ownerOf(*vbe, parent));
+    dialog.emplace(vbe, settings, options, ownerOf(*vbe, parent));
   } catch (const std::exception& failure) {
     common::logFailure(failure, QStringLiteral("frmIndenter"), QStringLiteral("Form_Load"), __LINE__);
     vbe->Platform().ui().MsgBox(common::LoadResString(5127), ide::mb::Exclamation, common::title());

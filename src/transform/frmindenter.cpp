@@ -33,10 +33,12 @@ QString text(int id) {
 
 }  // namespace
 
-frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, QWidget* parent)
+frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings,
+                         const common::Options& options, QWidget* parent)
     : QDialog(parent),
       m_vbe(std::move(vbe)),
       m_settings(settings),
+      m_options(options),
       m_txtSpaces(new NumberBox(this)),
       m_cmdIndent(new QPushButton(this)),
       m_cmdCancel(new QPushButton(this)),
@@ -168,7 +170,7 @@ void frmIndenter::cmdIndent_Click() {
 }
 
 void frmIndenter::walk(PROG_MODE scope, qint32 unit) {
-  if (m_settings.flag(common::setting::OneCommandNumIndent)) {
+  if (m_options.OneCommandNumIndent) {
     m_numIndent = std::make_unique<CNumIndent>(m_vbe);
     m_numIndentError = m_numIndent->Error.connect([this](const QString& strError) {
       m_vbe->Platform().ui().MsgBox(strError, ide::mb::OKOnly, common::title());

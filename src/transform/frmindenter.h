@@ -4,6 +4,7 @@
 // at the same time through number-and-indent.
 #pragma once
 
+#include "common/options.h"
 #include "common/settings.h"
 #include "ide/signal.h"
 #include "ide/vbide.h"
@@ -31,7 +32,9 @@ class frmIndenter final : public QDialog {
   Q_OBJECT
 
  public:
-  frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, QWidget* parent = nullptr);
+  /// `options` are the add-in's option globals: the one-command option is read from them at each run.
+  frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, const common::Options& options,
+              QWidget* parent = nullptr);
   ~frmIndenter() override;
 
   /// 0 project, 1 module, 2 procedure.
@@ -65,6 +68,7 @@ class frmIndenter final : public QDialog {
 
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
+  const common::Options& m_options;
 
   std::array<QRadioButton*, 3> m_opIndent{};
   std::array<QRadioButton*, 2> m_opSpaces{};

@@ -33,10 +33,12 @@ QString text(int id) {
 
 }  // namespace
 
-frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, QWidget* parent)
+frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings,
+                             const common::Options& options, QWidget* parent)
     : QDialog(parent),
       m_vbe(std::move(vbe)),
       m_settings(settings),
+      m_options(options),
       m_txtInitial(new NumberBox(this)),
       m_txtInterval(new NumberBox(this)),
       m_cmdAdd(new QPushButton(this)),
@@ -67,11 +69,11 @@ frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& sett
   m_lblStartNum->setText(text(5031));
   m_lblStartNum->setBuddy(m_txtInitial);
   m_lblInterval->setBuddy(m_txtInterval);
-  auto* options = new QVBoxLayout(m_frOptions);
+  auto* scopes = new QVBoxLayout(m_frOptions);
   for (int i = 0; i < 3; ++i) {
     m_opNumbers[size_t(i)] = new QRadioButton(text(5028 + i), m_frOptions);
     m_opNumbers[size_t(i)]->setObjectName(QStringLiteral("opNumbers%1").arg(i));
-    options->addWidget(m_opNumbers[size_t(i)]);
+    scopes->addWidget(m_opNumbers[size_t(i)]);
   }
   for (QPushButton* button : {m_cmdAdd, m_cmdRemove, m_cmdCancel})
     button->setAutoDefault(false);
@@ -183,7 +185,7 @@ void frmLinNumbers::run(bool add) {
 }
 
 void frmLinNumbers::walk(PROG_MODE scope, bool add) {
-  if (m_settings.flag(common::setting::OneCommandNumIndent)) {
+  if (m_options.OneCommandNumIndent) {
     if (m_context.cancelled()) return;  // Cancel was clicked before the command existed
     m_numIndent = std::make_unique<CNumIndent>(m_vbe);
     m_numIndentError = m_numIndent->Error.connect([this](const QString& strError) {

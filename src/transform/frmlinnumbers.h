@@ -4,6 +4,7 @@
 // number-and-indent.
 #pragma once
 
+#include "common/options.h"
 #include "common/settings.h"
 #include "ide/signal.h"
 #include "ide/vbide.h"
@@ -34,7 +35,9 @@ class frmLinNumbers final : public QDialog {
   Q_OBJECT
 
  public:
-  frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, QWidget* parent = nullptr);
+  /// `options` are the add-in's option globals: the one-command option is read from them at each run.
+  frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings, const common::Options& options,
+                QWidget* parent = nullptr);
   ~frmLinNumbers() override;
 
   // The dialog's controls, by their names.
@@ -77,6 +80,7 @@ class frmLinNumbers final : public QDialog {
 
   ide::Ref<ide::VBE> m_vbe;
   common::SettingsStore& m_settings;
+  const common::Options& m_options;
 
   QLineEdit* m_txtInitial;
   QLineEdit* m_txtInterval;

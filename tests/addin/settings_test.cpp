@@ -2,9 +2,9 @@
 // The options read at start-up, the machine configuration, the error convention and the help pages.
 #include "addin/help.h"
 #include "addin/machineconfig.h"
-#include "addin/options.h"
 #include "addinfixture.h"
 #include "common/errors.h"
+#include "common/options.h"
 
 #include <gtest/gtest.h>
 
@@ -20,7 +20,7 @@ namespace {
 TEST(Options, AFreshUserHasEveryOptionOnButRenamingInCode) {
   AddInEnvironment environment;
   common::SettingsStore store(common::SettingsStore::userStorePath());
-  const Options options = GetOptionsFromRegistry(store);
+  const common::Options options = common::GetOptionsFromRegistry(store);
   EXPECT_TRUE(options.OneCommandNumIndent);
   EXPECT_TRUE(options.ShowProperties);
   EXPECT_EQ(options.ColorOnFocus, QStringLiteral("&HFFFF&"));
@@ -40,8 +40,8 @@ TEST(Options, OnlyZeroTurnsAnOptionOff) {
   store.setValue(u"Settings"_qs, u"FormsBorder"_qs, u"false"_qs);
   store.setValue(u"Settings"_qs, u"AjuCodeOnControlRenamed"_qs, u"1"_qs);
   store.setValue(u"Settings"_qs, u"ColorOnFocus"_qs, u"&HC0FFFF&"_qs);
-  const Options options =
-      GetOptionsFromRegistry(common::SettingsStore(common::SettingsStore::userStorePath()));
+  const common::Options options =
+      common::GetOptionsFromRegistry(common::SettingsStore(common::SettingsStore::userStorePath()));
   EXPECT_FALSE(options.ShowProperties);
   EXPECT_TRUE(options.FormsBorder);
   EXPECT_TRUE(options.RenameInCodeOnControlRenamed);

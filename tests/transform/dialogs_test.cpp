@@ -54,12 +54,13 @@ struct Box {
 struct Scene {
   QTemporaryDir dir;
   common::SettingsStore settings{dir.filePath(QStringLiteral("Quimbel.ini"))};
+  common::Options options;
   Ide ide;
   ide::Ref<ide::CodeModule> first = ide.addModule(kFirst);
   ide::Ref<ide::CodeModule> second = ide.addModule(kSecond);
 
   explicit Scene(bool oneCommand = false) {
-    settings.setFlag(common::setting::OneCommandNumIndent, oneCommand);
+    options.OneCommandNumIndent = oneCommand;
     ide.vbe->setActiveVBProject(ide.project);
     Ide::placeCaret(first, 4);
   }
@@ -92,6 +93,7 @@ void showActive(QWidget& widget) {
 struct RelatedDocumentScene {
   QTemporaryDir dir;
   common::SettingsStore settings{dir.filePath(QStringLiteral("Quimbel.ini"))};
+  common::Options options;
   std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
   std::shared_ptr<host::ProjectImpl> project;
 
@@ -104,7 +106,7 @@ struct RelatedDocumentScene {
     project = vbe->open(dir.filePath(QStringLiteral("P.vbp"))).front();
     vbe->setActiveVBProject(project);
     vbe->selectComponent(project->components()[1]);
-    settings.setFlag(common::setting::OneCommandNumIndent, false);
+    options.OneCommandNumIndent = false;
   }
   QString code() { return project->components()[0]->CodeModule()->Lines(2, 1); }
 };
@@ -114,7 +116,7 @@ struct RelatedDocumentScene {
 
 TEST(LineNumberingDialog, OpensWithItsCaptionsTheStoredNumbersAndTheProcedureScope) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   EXPECT_EQ(dialog.windowTitle(), QStringLiteral("Quimbel - Numerar Linhas"));
   EXPECT_EQ(dialog.cmdAdd()->text(), QStringLiteral("&Adicionar"));
   EXPECT_EQ(dialog.cmdRemove()->text(), QStringLiteral("&Remover"));
@@ -134,7 +136,7 @@ TEST(LineNumberingDialog, OpensWithItsCaptionsTheStoredNumbersAndTheProcedureSco
 
   scene.settings.setValue(common::setting::InitialNumber, QStringLiteral(" 200 "));
   scene.settings.setValue(common::setting::Interval, QStringLiteral("dez"));
-  frmLinNumbers stored(scene.ide.vbe, scene.settings);
+  frmLinNumbers stored(scene.ide.vbe, scene.settings, scene.options);
   EXPECT_EQ(stored.txtInitial()->text(), QStringLiteral("200"));
   EXPECT_EQ(stored.startNumber(), 200);
   EXPECT_EQ(stored.txtInterval()->text(), QStringLiteral("5"));  // not a number: the default
@@ -142,7 +144,7 @@ TEST(LineNumberingDialog, OpensWithItsCaptionsTheStoredNumbersAndTheProcedureSco
 
 TEST(LineNumberingDialog, TheBoxesTakeDigitsOnly) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
   QLineEdit* box = dialog.txtInitial();
   box->clear();
@@ -168,7 +170,7 @@ TEST(LineNumberingDialog, TheBoxesTakeDigitsOnly) {
 
 TEST(LineNumberingDialog, ABoxSelectsItsWholeTextWhenItGetsTheFocus) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
   dialog.txtInitial()->setFocus(Qt::OtherFocusReason);
   EXPECT_EQ(dialog.txtInitial()->selectedText(), QStringLiteral("10000"));
@@ -180,7 +182,7 @@ TEST(LineNumberingDialog, ABoxSelectsItsWholeTextWhenItGetsTheFocus) {
 
 TEST(LineNumberingDialog, ANonNumericBoxIsRefusedWithItsMessageAndGetsTheFocus) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
   dialog.txtInitial()->setText(QStringLiteral("12a"));
   dialog.cmdAdd()->click();
@@ -201,7 +203,7 @@ TEST(LineNumberingDialog, ANonNumericBoxIsRefusedWithItsMessageAndGetsTheFocus) 
 
 TEST(LineNumberingDialog, NumbersTheCurrentProcedureThenClosesASecondLater) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
   dialog.txtInitial()->setText(QStringLiteral("100"));
   dialog.txtInterval()->setText(QStringLiteral("10"));
@@ -236,7 +238,7 @@ TEST(LineNumberingDialog, RemovesTheNumbersOfTheSelectedModuleOrTheProject) {
       {QStringLiteral("Sub Tres()"), QStringLiteral("10 a = 1"), QStringLiteral("End Sub")});
   scene.select(numbered);
   {
-    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
     dialog.opNumbers(1)->setChecked(true);
     dialog.cmdRemove()->click();
     scene.loop().advance(1000);
@@ -244,7 +246,7 @@ TEST(LineNumberingDialog, RemovesTheNumbersOfTheSelectedModuleOrTheProject) {
   EXPECT_EQ(linesOf(*numbered)[1], QStringLiteral("a = 1"));
   EXPECT_EQ(linesOf(*scene.first), kFirst);
 
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.opNumbers(0)->setChecked(true);
   dialog.cmdAdd()->click();
   EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("10000 If x Then"));
@@ -254,7 +256,7 @@ TEST(LineNumberingDialog, RemovesTheNumbersOfTheSelectedModuleOrTheProject) {
 
 TEST(LineNumberingDialog, WithTheOneCommandOptionNumbersAndIndentsWithTabs) {
   Scene scene(true);
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.txtInitial()->setText(QStringLiteral("100"));
   dialog.txtInterval()->setText(QStringLiteral("10"));
   dialog.cmdAdd()->click();
@@ -263,7 +265,7 @@ TEST(LineNumberingDialog, WithTheOneCommandOptionNumbersAndIndentsWithTabs) {
                          QStringLiteral("110 \t\ty = 1"), QStringLiteral("120 \tEnd If"), kFirst[5]}));
 
   // Removing re-indents too; the number column is empty then.
-  frmLinNumbers again(scene.ide.vbe, scene.settings);
+  frmLinNumbers again(scene.ide.vbe, scene.settings, scene.options);
   again.cmdRemove()->click();
   EXPECT_EQ(linesOf(*scene.first),
             (QStringList{kFirst[0], kFirst[1], QStringLiteral("\tIf x Then"), QStringLiteral("\t\ty = 1"),
@@ -273,7 +275,7 @@ TEST(LineNumberingDialog, WithTheOneCommandOptionNumbersAndIndentsWithTabs) {
 TEST(LineNumberingDialog, AnErrorEventOfTheOneCommandRouteIsShownPlainAndEndsTheRun) {
   Scene scene(true);
   scene.first->CodePane()->Window()->Close();  // no code window: no current procedure
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.cmdAdd()->click();
   EXPECT_EQ(scene.boxes(),
@@ -286,7 +288,7 @@ TEST(LineNumberingDialog, AnErrorEventOfTheOneCommandRouteIsShownPlainAndEndsThe
 
 TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScope) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.txtInitial()->setText(QStringLiteral("2147483647"));
   dialog.cmdAdd()->click();
   EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5123), ide::mb::Exclamation}}));
@@ -296,7 +298,7 @@ TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScope) {
 
 TEST(LineNumberingDialog, ARelatedDocumentAsTheModuleChangesNothingAndLeavesTheDialogIdle) {
   RelatedDocumentScene scene;
-  frmLinNumbers dialog(scene.vbe, scene.settings);
+  frmLinNumbers dialog(scene.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opNumbers(1)->setChecked(true);
   dialog.cmdAdd()->click();
@@ -315,7 +317,7 @@ TEST(LineNumberingDialog, ARelatedDocumentAsTheModuleChangesNothingAndLeavesTheD
 
 TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opNumbers(0)->setChecked(true);
   // The user clicks Cancel when the bar first moves: the first module's only member is done.
@@ -332,7 +334,7 @@ TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
 
 TEST(LineNumberingDialog, ACancelClickedAsTheRunStartsStopsTheOneCommandRouteToo) {
   Scene scene(true);
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opNumbers(0)->setChecked(true);
   scene.loop().post([&] { dialog.cmdCancel()->click(); });  // runs in the yield before the walk
@@ -344,7 +346,7 @@ TEST(LineNumberingDialog, ACancelClickedAsTheRunStartsStopsTheOneCommandRouteToo
 
 TEST(LineNumberingDialog, ClosingTheWindowDuringARunCancelsIt) {
   Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opNumbers(0)->setChecked(true);
   scene.loop().post([&] { dialog.close(); });  // runs in the run's first yield
@@ -357,7 +359,7 @@ TEST(LineNumberingDialog, ClosingTheWindowDuringARunCancelsIt) {
 TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
   Scene scene;
   {
-    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
     dialog.show();
     dialog.txtInitial()->setText(QStringLiteral("500"));
     dialog.txtInterval()->setText(QStringLiteral("50"));
@@ -366,7 +368,7 @@ TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
   EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), QStringLiteral("500"));
   EXPECT_EQ(scene.settings.value(common::setting::Interval), QStringLiteral("50"));
   {
-    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
     dialog.show();
     dialog.txtInitial()->clear();
     dialog.txtInterval()->setText(QStringLiteral("x"));
@@ -376,7 +378,7 @@ TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
   EXPECT_EQ(scene.settings.value(common::setting::Interval), QStringLiteral("50"));
   {
     // The values a run used are kept too.
-    frmLinNumbers dialog(scene.ide.vbe, scene.settings);
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
     dialog.show();
     dialog.txtInitial()->setText(QStringLiteral("700"));
     dialog.cmdAdd()->click();
@@ -391,7 +393,7 @@ TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
 
 TEST(IndentationDialog, OpensWithItsCaptionsAndTheStoredUnit) {
   Scene scene;
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   EXPECT_EQ(dialog.windowTitle(), QStringLiteral("Quimbel - Indentar Código"));
   EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
   EXPECT_EQ(dialog.cmdIndent()->text(), QStringLiteral("&Indentar"));
@@ -409,7 +411,7 @@ TEST(IndentationDialog, OpensWithItsCaptionsAndTheStoredUnit) {
 
   for (const auto& [use, spaces] : {std::pair{"1", true}, std::pair{"", false}, std::pair{"0", false}}) {
     scene.settings.setValue(common::setting::UseOption, QString::fromLatin1(use));
-    frmIndenter stored(scene.ide.vbe, scene.settings);
+    frmIndenter stored(scene.ide.vbe, scene.settings, scene.options);
     EXPECT_EQ(stored.spaceMode(), spaces) << use;
     EXPECT_EQ(stored.opSpaces(1)->isChecked(), spaces) << use;
   }
@@ -417,7 +419,7 @@ TEST(IndentationDialog, OpensWithItsCaptionsAndTheStoredUnit) {
 
 TEST(IndentationDialog, ChoosingSpacesMovesTheFocusIntoTheSpacesBox) {
   Scene scene;
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
   dialog.opIndent(0)->setFocus();
   QTest::mouseClick(dialog.opSpaces(1), Qt::LeftButton);
@@ -427,7 +429,7 @@ TEST(IndentationDialog, ChoosingSpacesMovesTheFocusIntoTheSpacesBox) {
 
 TEST(IndentationDialog, AMissingOrInvalidSpaceCountIsRefused) {
   Scene scene;
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
   dialog.opSpaces(1)->setChecked(true);
   const std::pair<const char*, int> cases[] = {{" ", 5125}, {"0", 5124}, {"x", 5124}, {"99999999999", 5124}};
@@ -450,7 +452,7 @@ TEST(IndentationDialog, AMissingOrInvalidSpaceCountIsRefused) {
 TEST(IndentationDialog, IndentsTheSelectedModuleWithSpacesClosesAndRemembersTheUnit) {
   Scene scene;
   scene.select(scene.second);
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opIndent(1)->setChecked(true);
   dialog.opSpaces(1)->setChecked(true);
@@ -468,7 +470,7 @@ TEST(IndentationDialog, ClosingWithTabsRemembersTabsAndLeavesTheUnit) {
   Scene scene;
   scene.settings.setValue(common::setting::Indentation, QStringLiteral("4"));
   scene.settings.setValue(common::setting::UseOption, QStringLiteral("1"));
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opSpaces(0)->setChecked(true);
   dialog.txtSpaces()->setText(QStringLiteral("8"));
@@ -481,7 +483,7 @@ TEST(IndentationDialog, ClosingWithTabsRemembersTabsAndLeavesTheUnit) {
 TEST(IndentationDialog, WithTheOneCommandOptionNumbersFrom10000InStepsOf5) {
   Scene scene(true);
   scene.settings.setValue(common::setting::InitialNumber, QStringLiteral("1"));  // not the numbering's
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.opSpaces(1)->setChecked(true);
   dialog.txtSpaces()->setText(QStringLiteral("3"));
   dialog.cmdIndent()->click();
@@ -492,7 +494,7 @@ TEST(IndentationDialog, WithTheOneCommandOptionNumbersFrom10000InStepsOf5) {
 
 TEST(IndentationDialog, CancelDuringARunEndsTheWalkAndTheDialog) {
   Scene scene;
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opIndent(0)->setChecked(true);
   QString caption;
@@ -511,7 +513,7 @@ TEST(IndentationDialog, CancelDuringARunEndsTheWalkAndTheDialog) {
 TEST(IndentationDialog, AFailedRunShowsItsMessageAndStaysOpen) {
   Scene scene;
   scene.ide.vbe->selectComponent(nullptr);
-  frmIndenter dialog(scene.ide.vbe, scene.settings);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opIndent(1)->setChecked(true);
   dialog.cmdIndent()->click();
@@ -523,7 +525,7 @@ TEST(IndentationDialog, AFailedRunShowsItsMessageAndStaysOpen) {
 
 TEST(IndentationDialog, AModuleWalkFailureShowsTheModuleMessage) {
   RelatedDocumentScene scene;
-  frmIndenter dialog(scene.vbe, scene.settings);
+  frmIndenter dialog(scene.vbe, scene.settings, scene.options);
   dialog.opIndent(1)->setChecked(true);
   dialog.cmdIndent()->click();
   ASSERT_EQ(scene.vbe->headlessUi()->messageBoxes().size(), 1u);
@@ -546,9 +548,9 @@ TEST(OpeningTheDialogs, EachOpensModallyAndReturnsWhenClosed) {
     });
   };
   closeModal();
-  showLineNumberingDialog(scene.ide.vbe, scene.settings, nullptr);
+  showLineNumberingDialog(scene.ide.vbe, scene.settings, scene.options, nullptr);
   closeModal();
-  showIndentationDialog(scene.ide.vbe, scene.settings, nullptr);
+  showIndentationDialog(scene.ide.vbe, scene.settings, scene.options, nullptr);
   EXPECT_EQ(titles, (QStringList{QStringLiteral("Quimbel - Numerar Linhas"),
                                  QStringLiteral("Quimbel - Indentar Código")}));
   // Closing wrote the indenter's choice.

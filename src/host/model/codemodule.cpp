@@ -120,23 +120,32 @@ void CodeModuleImpl::checkEditable() {
   if (!component || !component->attached()) ide::raise(ide::err::ObjectVariableNotSet);
 }
 
-void CodeModuleImpl::InsertLines(int line, const QString& text) {
+void CodeModuleImpl::checkWritable() {
   checkEditable();
+  auto component = m_component.lock();
+  // While the program runs its code is read-only, for add-ins as in the code window.
+  auto project = component->project();
+  if (auto vbe = project ? project->vbe() : nullptr; vbe && vbe->mode() == ide::IdeMode::Run)
+    ide::raise(ide::err::CannotEdit);
+}
+
+void CodeModuleImpl::InsertLines(int line, const QString& text) {
+  checkWritable();
   m_text.insertLines(line, text);
 }
 
 void CodeModuleImpl::DeleteLines(int startLine, int count) {
-  checkEditable();
+  checkWritable();
   m_text.deleteLines(startLine, count);
 }
 
 void CodeModuleImpl::ReplaceLine(int line, const QString& text) {
-  checkEditable();
+  checkWritable();
   m_text.replaceLine(line, text);
 }
 
 void CodeModuleImpl::AddFromString(const QString& text) {
-  checkEditable();
+  checkWritable();
   m_text.addFromString(text);
 }
 

@@ -174,6 +174,8 @@ class CodeModuleImpl final : public ide::CodeModule,
  private:
   void linesChanged(int firstLine, int removed, int inserted) override;
   void checkEditable();
+  /// As checkEditable, and error 40198 while the program runs.
+  void checkWritable();
 
   std::weak_ptr<ComponentImpl> m_component;
   CodeText m_text;

@@ -1,13 +1,14 @@
 // SPDX-License-Identifier: MIT
-// The options of the "Settings" section, read once at start-up into the add-in's option globals (the
-// options dialog writes them back and sets them at the same time).
+// The options of the "Settings" section, read at start-up into the add-in's option globals and again
+// after the options dialog saved them. The designer actions and the numbering and indentation dialogs read
+// these globals, not the settings.
 #pragma once
 
 #include "common/settings.h"
 
 #include <QString>
 
-namespace addin {
+namespace common {
 
 struct Options {
   bool OneCommandNumIndent = true;
@@ -24,6 +25,6 @@ struct Options {
 
 /// Reads the "Settings" section with its defaults and the Boolean rule (true unless "0"). A failure is
 /// raised with this procedure's location.
-Options GetOptionsFromRegistry(const common::SettingsStore& settings);
+Options GetOptionsFromRegistry(const SettingsStore& settings);
 
-}  // namespace addin
+}  // namespace common

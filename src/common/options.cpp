@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include "addin/options.h"
+#include "common/options.h"
 
 #include "common/errors.h"
 
-namespace addin {
+namespace common {
 
-Options GetOptionsFromRegistry(const common::SettingsStore& settings) {
-  namespace key = common::setting;
+Options GetOptionsFromRegistry(const SettingsStore& settings) {
+  namespace key = setting;
   try {
     Options options;
     options.OneCommandNumIndent = settings.flag(key::OneCommandNumIndent);
@@ -21,9 +21,9 @@ Options GetOptionsFromRegistry(const common::SettingsStore& settings) {
     options.RenameInCodeOnControlRenamed = settings.flag(key::RenameInCodeOnControlRenamed);
     return options;
   } catch (const std::exception& failure) {
-    throw common::recordError(failure, QStringLiteral("basGlobals"), QStringLiteral("GetOptionsFromRegistry"),
-                              __LINE__);
+    throw recordError(failure, QStringLiteral("basGlobals"), QStringLiteral("GetOptionsFromRegistry"),
+                      __LINE__);
   }
 }
 
-}  // namespace addin
+}  // namespace common

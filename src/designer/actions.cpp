@@ -1,0 +1,264 @@
+// SPDX-License-Identifier: MIT
+#include "designer/actions.h"
+
+#include "common/errors.h"
+#include "common/uiutils.h"
+
+#include <QStringList>
+
+#include <utility>
+#include <vector>
+
+namespace designer {
+namespace {
+
+const QString kModule = QStringLiteral("basGlobals");
+
+bool isIdentifierChar(QChar c) {
+  return c.isLetterOrNumber() || c == u'_';
+}
+
+/// A statement may begin after nothing, a colon or a line number.
+bool atStatementStart(QStringView before) {
+  before = before.trimmed();
+  if (before.isEmpty() || before.endsWith(u':')) return true;
+  for (const QChar c : before)
+    if (!c.isDigit()) return false;
+  return true;
+}
+
+/// The control the writers write for: its form's code module, its name and whether it is an element of
+/// a control array (its Index reads as 0 or more).
+struct Target {
+  ide::Ref<ide::CodeModule> module;
+  QString name;
+  bool array = false;
+  QString className;
+};
+
+Target targetOf(ide::VBControl& ctl) {
+  Target target;
+  target.module = ctl.Parent()->Parent()->CodeModule();
+  if (!target.module) ide::raise(ide::err::ObjectRequired);
+  target.name = ctl.name();
+  target.className = ctl.ClassName();
+  try {
+    bool ok = false;
+    const int index = ctl.Properties()->Item(QStringLiteral("Index"))->Value().toInt(&ok);
+    target.array = ok && index >= 0;
+  } catch (const std::exception&) {
+    target.array = false;
+  }
+  return target;
+}
+
+bool hasMember(ide::CodeModule& module, const QString& name) {
+  const auto members = module.Members();
+  const int count = members->Count();
+  for (int i = 1; i <= count; ++i)
+    if (members->Item(i)->Name().compare(name, Qt::CaseInsensitive) == 0) return true;
+  return false;
+}
+
+/// Appends the lines after the module's last line, in one insertion.
+void append(ide::CodeModule& module, const QStringList& lines) {
+  module.InsertLines(module.CountOfLines() + 1, lines.join(QStringLiteral("\r\n")));
+}
+
+}  // namespace
+
+QString renameControlInLine(QStringView line, QStringView oldName, QStringView newName) {
+  if (oldName.isEmpty()) return line.toString();
+  QString out;
+  out.reserve(line.size() + 16);
+  bool inString = false;
+  bool inComment = false;
+  qsizetype i = 0;
+  while (i < line.size()) {
+    const QChar c = line[i];
+    if (!inComment) {
+      if (inString || c == u'"') {
+        // A doubled quote inside a string closes and opens it again: the same as staying inside.
+        if (c == u'"') inString = !inString;
+        out += c;
+        ++i;
+        continue;
+      }
+      if (c == u'\'') inComment = true;
+    }
+    if (!c.isLetter() || (i > 0 && isIdentifierChar(line[i - 1]))) {
+      out += c;
+      ++i;
+      continue;
+    }
+    qsizetype end = i;
+    while (end < line.size() && isIdentifierChar(line[end]))
+      ++end;
+    const QStringView word = line.sliced(i, end - i);
+    if (!inComment && word.compare(u"Rem", Qt::CaseInsensitive) == 0 && atStatementStart(out))
+      inComment = true;
+    if (word == oldName) {
+      out += newName;
+    } else if (word.size() > oldName.size() + 1 && word.startsWith(oldName) && word[oldName.size()] == u'_') {
+      out += newName;  // an event procedure of the control: Text1_Change
+      out += word.sliced(oldName.size());
+    } else {
+      out += word;
+    }
+    i = end;
+  }
+  return out;
+}
+
+// ---------------------------------------------------------------------------------------------------
+// The events
+
+void DesignerActions::FormAdded(const ide::Ref<ide::VBComponent>& component) {
+  if (component->Type() != ide::ComponentType::VBForm) return;
+  if (!m_options.FormsPosition && !m_options.FormsBorder) return;
+  // A form added from its file is not new: its layout is the programmer's.
+  if (!component->FileNames(1).isEmpty()) return;
+  const auto properties = component->Properties();
+  if (properties->Item(QStringLiteral("MDIChild"))->Value().toBool()) return;
+  if (m_options.FormsPosition) properties->Item(QStringLiteral("StartUpPosition"))->setValue(2);
+  if (m_options.FormsBorder) properties->Item(QStringLiteral("BorderStyle"))->setValue(1);
+}
+
+bool DesignerActions::selectsText(const QString& className) const {
+  return m_options.SelectTextBoxOnFocus &&
+         (className == QLatin1StringView("TextBox") || className == QLatin1StringView("ComboBox"));
+}
+
+void DesignerActions::ControlAdded(const ide::Ref<ide::VBControl>& control) {
+  bool applyColour = false;
+  QString colour;
+  if (m_options.ShowProperties && m_showProperties) {
+    const PropsChoice choice = m_showProperties(control);
+    if (!choice.Cancelled) {
+      if (choice.EnterAsTab) IncluirCodigoDeTabParaKeyReturn(*control);
+      applyColour = choice.BackColorOnFocus;
+      colour = choice.FocusColor;
+    }
+  }
+  const QString className = control->ClassName();
+  if (className == QLatin1StringView("Label") && m_options.LabelsTransparent)
+    control->Properties()->Item(QStringLiteral("BackStyle"))->setValue(0);
+  if (className == QLatin1StringView("TextBox") && m_options.ClearTextProperty)
+    control->Properties()->Item(QStringLiteral("Text"))->setValue(QString());
+  if (applyColour || selectsText(className)) IncluirCodigoGotLostFocus(*control, applyColour, colour);
+  if (m_options.TextBoxUpperCase && className == QLatin1StringView("TextBox"))
+    IncluirCodigoTextUcase(*control);
+}
+
+void DesignerActions::ControlRenamed(const ide::Ref<ide::VBControl>& control, const QString& oldName, int) {
+  if (!m_options.RenameInCodeOnControlRenamed) return;
+  const QString newName = control->name();
+  if (oldName.isEmpty() || newName == oldName) return;  // only its index changed
+  common::CHourGlass hourglass(m_ui);
+  const auto module = control->Parent()->Parent()->CodeModule();
+  if (!module) return;
+
+  struct Change {
+    int line;
+    QString before;
+    QString after;
+  };
+  std::vector<Change> changes;
+  const int count = module->CountOfLines();
+  for (int line = 1; line <= count; ++line) {
+    QString text = module->Lines(line, 1);
+    if (!text.contains(oldName, Qt::CaseSensitive)) continue;
+    QString renamed = renameControlInLine(text, oldName, newName);
+    if (renamed != text) changes.push_back({line, std::move(text), std::move(renamed)});
+  }
+  size_t written = 0;
+  try {
+    for (; written < changes.size(); ++written)
+      module->ReplaceLine(changes[written].line, changes[written].after);
+  } catch (...) {
+    // A module that refuses a line keeps its code as it was.
+    while (written > 0) {
+      --written;
+      try {
+        module->ReplaceLine(changes[written].line, changes[written].before);
+      } catch (const std::exception& failure) {
+        common::logFailure(failure, kModule, QStringLiteral("ControlRenamed"), __LINE__);
+      }
+    }
+    throw;
+  }
+}
+
+// ---------------------------------------------------------------------------------------------------
+// The code writers
+
+void DesignerActions::IncluirCodigoDeTabParaKeyReturn(ide::VBControl& ctl) {
+  try {
+    static const QStringList kNoEnterKey = {QStringLiteral("Label"),         QStringLiteral("Frame"),
+                                            QStringLiteral("PictureBox"),    QStringLiteral("Image"),
+                                            QStringLiteral("CommandButton"), QStringLiteral("Timer")};
+    const Target target = targetOf(ctl);
+    if (kNoEnterKey.contains(target.className)) return;
+    if (hasMember(*target.module, target.name + QStringLiteral("_KeyDown"))) return;
+    const QString signature = target.array
+                                  ? QStringLiteral("(Index As Integer, KeyCode As Integer, Shift As Integer)")
+                                  : QStringLiteral("(KeyCode As Integer, Shift As Integer)");
+    append(*target.module,
+           {QStringLiteral("Private Sub ") + target.name + QStringLiteral("_KeyDown") + signature,
+            QStringLiteral("   If (KeyCode = vbKeyReturn) Then"), QStringLiteral("       KeyCode = 0"),
+            QStringLiteral("       SendKeys \"{Tab}\", False"), QStringLiteral("   End If"),
+            QStringLiteral("End Sub")});
+  } catch (const std::exception& failure) {
+    throw common::recordError(failure, kModule, QStringLiteral("IncluirCodigoDeTabParaKeyReturn"), __LINE__);
+  }
+}
+
+void DesignerActions::IncluirCodigoGotLostFocus(ide::VBControl& ctl, bool applyColour,
+                                                const QString& colour) {
+  try {
+    const Target target = targetOf(ctl);
+    const bool selectText = selectsText(target.className);
+    if (!applyColour && !selectText) return;
+    if (hasMember(*target.module, target.name + QStringLiteral("_GotFocus")) ||
+        hasMember(*target.module, target.name + QStringLiteral("_LostFocus")))
+      return;
+    const QString self = target.array ? target.name + QStringLiteral("(Index)") : target.name;
+    QStringList lines = {
+        QStringLiteral("Private Sub ") + target.name +
+            (target.array ? QStringLiteral("_GotFocus(Index as Integer)") : QStringLiteral("_GotFocus()")),
+        QStringLiteral("   On Error Resume Next")};
+    if (applyColour) lines << QStringLiteral("   ") + self + QStringLiteral(".BackColor = ") + colour;
+    if (selectText) {
+      lines << QStringLiteral("   ") + self + QStringLiteral(".SelStart = 0");
+      lines << QStringLiteral("   ") + self + QStringLiteral(".SelLength = Len(") + self +
+                   QStringLiteral(".Text)");
+    }
+    lines << QStringLiteral("End Sub");
+    if (applyColour) {
+      lines << QStringLiteral("Private Sub ") + target.name +
+                   (target.array ? QStringLiteral("_LostFocus(Index As Integer)")
+                                 : QStringLiteral("_LostFocus()"));
+      lines << QStringLiteral("   ") + self + QStringLiteral(".BackColor = &H80000005&");
+      lines << QStringLiteral("End Sub");
+    }
+    append(*target.module, lines);
+  } catch (const std::exception& failure) {
+    throw common::recordError(failure, kModule, QStringLiteral("IncluirCodigoGotLostFocus"), __LINE__);
+  }
+}
+
+void DesignerActions::IncluirCodigoTextUcase(ide::VBControl& ctl) {
+  try {
+    const Target target = targetOf(ctl);
+    if (hasMember(*target.module, target.name + QStringLiteral("_KeyPress"))) return;
+    append(*target.module,
+           {QStringLiteral("Private Sub ") + target.name +
+                (target.array ? QStringLiteral("_KeyPress(Index As Integer, KeyAscii As Integer)")
+                              : QStringLiteral("_KeyPress(KeyAscii As Integer)")),
+            QStringLiteral("   KeyAscii = Asc(UCase(Chr(KeyAscii)))"), QStringLiteral("End Sub")});
+  } catch (const std::exception& failure) {
+    throw common::recordError(failure, kModule, QStringLiteral("IncluirCodigoTextUcase"), __LINE__);
+  }
+}
+
+}  // namespace designer
