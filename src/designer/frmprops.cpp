@@ -393,11 +393,13 @@ void frmProps::cmdCor_Click() {
 
 void frmProps::cmdOk_Click() {
   try {
-    // The box still being edited is left first.
-    if (m_editingRow >= 0) {
-      const int row = m_editingRow;
-      m_editingRow = -1;
-      if (!isListRow(row) && !commitRow(row)) {
+    // The box still being edited is left first, and so is any other free-text box whose text is not its
+    // row's value (text put there without the box having had the focus): nothing typed is lost.
+    m_editingRow = -1;
+    for (int row = 0; row < std::min(m_properties.Count(), int(kRows)); ++row) {
+      if (isListRow(row)) continue;
+      if (m_txtValor[size_t(row)]->text().trimmed() == m_properties.Item(row + 1).shownText()) continue;
+      if (!commitRow(row)) {
         m_txtValor[size_t(row)]->setFocus();
         return;
       }
