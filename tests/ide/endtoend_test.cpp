@@ -230,10 +230,9 @@ TEST(EndToEnd, AScriptMistakeIsReportedWithItsLineBeforeAnythingRuns) {
       << session.err.toStdString();
 }
 
-TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
-  if (!hasAddIn()) GTEST_SKIP() << "the add-in is not built";
-  ExampleCopy copy;
-  QTemporaryDir work;
+/// The environment of a session with the add-in on the example copy: settings, data and installation in
+/// `work`.
+QProcessEnvironment addInEnvironment(ExampleCopy& copy, QTemporaryDir& work) {
   QProcessEnvironment environment;
   environment.insert(QStringLiteral("DEMO"), QDir(copy.path(QStringLiteral("."))).absolutePath());
   environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), work.filePath(QStringLiteral("config")));
@@ -243,6 +242,14 @@ TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
   writeBytes(work.filePath(QStringLiteral("quimbel.conf")),
              "InstallationPath=" + work.filePath(QStringLiteral("install")).toUtf8() + "\n");
   environment.insert(QStringLiteral("QUIMBEL_MACHINE_CONFIG"), work.filePath(QStringLiteral("quimbel.conf")));
+  return environment;
+}
+
+TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
+  if (!hasAddIn()) GTEST_SKIP() << "the add-in is not built";
+  ExampleCopy copy;
+  QTemporaryDir work;
+  const QProcessEnvironment environment = addInEnvironment(copy, work);
   auto session = [&](const QByteArray& script) {
     const QString path = work.filePath(QStringLiteral("session.qis"));
     writeBytes(path, script);
@@ -291,6 +298,57 @@ TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
   ASSERT_TRUE(tool.waitForFinished(60000));
   EXPECT_TRUE(QString::fromUtf8(tool.readAllStandardOutput())
                   .contains(QStringLiteral("[ ]  Conferir o frete (urgente)")));
+}
+
+TEST(EndToEnd, AFormDesignedWithTheAddInGetsItsPropertiesAndProceduresSaved) {
+  if (!hasAddIn()) GTEST_SKIP() << "the add-in is not built";
+  ExampleCopy copy;
+  QTemporaryDir work;
+  const QString script = work.filePath(QStringLiteral("design.qis"));
+  // A new form, a text box from the toolbox with its property dialog, a label, a rename in the properties
+  // window (carried into the code once the option is on).
+  writeBytes(script,
+             "open \"${DEMO}/Loja/Loja.vbp\"\n"
+             "click \"Menu Bar\" Quimbel Op\xc3\xa7\xc3\xb5"
+             "es\n"
+             "set ckControlRenamed true\n"
+             "press cmdOK\n"
+             "wait closed\n"
+             "click \"Menu Bar\" Project \"Add Form\"\n"
+             "expect property StartUpPosition \"2 - CenterScreen\"\n"
+             "tool TextBox\n"
+             "wait dialog\n"
+             "set txtValor0 txtNome\n"
+             "set txtValor3 30\n"
+             "set ckBackColor true\n"
+             "set txtCor &HC0FFFF&\n"
+             "press cmdOK\n"
+             "wait closed\n"
+             "expect property MaxLength 30\n"
+             "expect property Text \"\"\n"
+             "tool Label\n"
+             "wait dialog\n"
+             "key Escape\n"
+             "wait closed\n"
+             "expect property BackStyle \"0 - Transparent\"\n"
+             "control txtNome\n"
+             "property Name txtCliente\n"
+             "save\n");
+  const Session run = runIde(script, addInEnvironment(copy, work),
+                             {QStringLiteral("--addin"), QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
+  ASSERT_EQ(run.exitCode, 0) << run.out.toStdString() << run.err.toStdString();
+  const QString form = QString::fromLatin1(readBytes(copy.path(QStringLiteral("Loja/Form1.frm"))));
+  for (const char* line :
+       {"   BorderStyle     =   1  'Fixed Single\r\n", "   StartUpPosition =   2  'CenterScreen\r\n",
+        "   Begin VB.TextBox txtCliente \r\n", "      MaxLength       =   30\r\n",
+        "      Text            =   \"\"\r\n", "      BackStyle       =   0  'Transparent\r\n",
+        "Private Sub txtCliente_GotFocus()\r\n   On Error Resume Next\r\n   txtCliente.BackColor = "
+        "&HC0FFFF&\r\n"
+        "   txtCliente.SelStart = 0\r\n   txtCliente.SelLength = Len(txtCliente.Text)\r\nEnd Sub\r\n"
+        "Private Sub txtCliente_LostFocus()\r\n   txtCliente.BackColor = &H80000005&\r\nEnd Sub\r\n"
+        "Private Sub txtCliente_KeyPress(KeyAscii As Integer)\r\n"})
+    EXPECT_TRUE(form.contains(QString::fromLatin1(line))) << line << "\n" << form.toStdString();
+  EXPECT_FALSE(form.contains(QStringLiteral("txtNome")));
 }
 
 }  // namespace
