@@ -346,7 +346,7 @@ bool frmProps::commitRow(int row) {
     }
     QVariant value = property.SelectedValue.Value;
     if (isIndex(property) && valueText(value).isEmpty()) value = -1;
-    if (value.isValid()) m_control->Properties()->Item(property.PropertyName)->setValue(value);
+    if (value.isValid()) writeProperty(property.PropertyName, value);
     return true;
   } catch (const std::exception& failure) {
     property.SelectedValue = before;
@@ -354,6 +354,16 @@ bool frmProps::commitRow(int row) {
     report(failure, "txtValor_LostFocus", __LINE__);
     return false;
   }
+}
+
+void frmProps::writeProperty(const QString& name, const QVariant& value) {
+  const auto property = m_control->Properties()->Item(name);
+  // A value the control holds already is not written again: the form would record a default it leaves out.
+  try {
+    if (const QVariant current = property->Value(); current.isValid() && sameValue(current, value)) return;
+  } catch (const std::exception&) {
+  }
+  property->setValue(value);
 }
 
 void frmProps::cmdSeta_Click() {
@@ -417,7 +427,7 @@ void frmProps::cmdOk_Click() {
       QVariant value = row->SelectedValue.Value;
       if (isIndex(*row) && valueText(value).isEmpty()) value = -1;
       // A row whose property could not be read holds nothing to write.
-      if (value.isValid()) m_control->Properties()->Item(row->PropertyName)->setValue(value);
+      if (value.isValid()) writeProperty(row->PropertyName, value);
     }
     accept();
   } catch (const std::exception& failure) {

@@ -68,6 +68,8 @@ class frmProps final : public QDialog {
   /// The free-text row's box written to its value and to the control; false (and the row as it was)
   /// when the text is no value of the property or the control refuses it.
   bool commitRow(int row);
+  /// Writes the value to the control's property, unless the property holds it already.
+  void writeProperty(const QString& name, const QVariant& value);
   void cmdSeta_Click();
   void lstColeta_Click(int item);
   /// The list closed: hidden, and the focus back in its row's box.

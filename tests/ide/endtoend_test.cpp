@@ -349,6 +349,7 @@ TEST(EndToEnd, AFormDesignedWithTheAddInGetsItsPropertiesAndProceduresSaved) {
         "Private Sub txtCliente_KeyPress(KeyAscii As Integer)\r\n"})
     EXPECT_TRUE(form.contains(QString::fromLatin1(line))) << line << "\n" << form.toStdString();
   EXPECT_FALSE(form.contains(QStringLiteral("txtNome")));
+  EXPECT_FALSE(form.contains(QStringLiteral("ToolTipText"))) << "the dialog wrote only what changed";
 }
 
 }  // namespace
