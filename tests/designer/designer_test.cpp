@@ -331,6 +331,24 @@ TEST(PropertyDialog, OtherClassesOfferTheirCommonPropertiesAndClosingOtherwiseCa
   EXPECT_TRUE(dialog.Cancelled());
 }
 
+TEST(PropertyDialog, EmptiedBoxesTakeTheirDefaults) {
+  Scene scene;
+  auto button = scene.form->Designer()->VBControls()->Add(u"CommandButton"_qs);
+  button->Properties()->Item(u"Index"_qs)->setValue(0);
+  frmProps dialog(button, scene.options, *scene.vbe->headlessUi());
+  showActive(dialog);
+  EXPECT_EQ(rowsOf(dialog).mid(0, 3),
+            (QStringList{u"Name=Command1"_qs, u"Index=0"_qs, u"Caption=Command1"_qs}));
+  for (int row : {0, 1, 2})
+    dialog.txtValor(row)->clear();
+  dialog.cmdOK()->click();
+  ASSERT_FALSE(dialog.isVisible());
+  EXPECT_EQ(propertyOf(button, "Name"), u"Command1"_qs) << "an empty name is the current one";
+  EXPECT_EQ(propertyOf(button, "Index"), QVariant::fromValue<qint16>(-1));
+  EXPECT_EQ(propertyOf(button, "Caption"), QString());
+  EXPECT_TRUE(scene.vbe->headlessUi()->messageBoxes().empty());
+}
+
 TEST(OptionsDialog, ShowsTheSettingsAndOkSavesThemIntoTheGlobals) {
   Scene scene;
   common::SettingsStore settings(scene.dir.filePath(u"Quimbel.ini"_qs));
