@@ -228,14 +228,14 @@ CVBCTProperties CriarPropriedades(ide::VBControl& control) {
     const QString className = control.ClassName();
     for (const ClassRows& entry : kClasses) {
       if (className != QLatin1StringView(entry.className)) continue;
-      for (const RowSpec& spec : entry.rows) {
-        const QString property = QString::fromLatin1(spec.property);
+      for (const RowSpec& row : entry.rows) {
+        const QString property = QString::fromLatin1(row.property);
         std::optional<CPropValue> defaultValue;
-        if (spec.list == 0)
-          defaultValue = spec.numericDefault ? numericDefault(QString::fromLatin1(spec.numericDefault),
-                                                              currentValue(control, property))
-                                             : CPropValue{QString(), QString()};
-        AddProperty(rows, property, control, std::move(defaultValue), propertyList(spec.list));
+        if (row.list == 0)
+          defaultValue = row.numericDefault ? numericDefault(QString::fromLatin1(row.numericDefault),
+                                                             currentValue(control, property))
+                                            : CPropValue{QString(), QString()};
+        AddProperty(rows, property, control, std::move(defaultValue), propertyList(row.list));
       }
       return rows;
     }

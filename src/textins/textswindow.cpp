@@ -55,10 +55,10 @@ TextsWindow::TextsWindow(ide::UserInterface& ui, HelpOpener help, const Layout& 
   m_text->setObjectName(QLatin1StringView(layout.textName));
   m_toolBar->setObjectName(QLatin1StringView(layout.toolBarName));
 
-  for (const ButtonSpec& spec : kButtons) {
-    const QString key = QLatin1StringView(spec.key);
+  for (const ButtonSpec& item : kButtons) {
+    const QString key = QLatin1StringView(item.key);
     QAction* action = m_toolBar->addAction(
-        QIcon(QStringLiteral(":/quimbel/textins/%1.xpm").arg(key.toLower())), QString::fromUtf16(spec.tip));
+        QIcon(QStringLiteral(":/quimbel/textins/%1.xpm").arg(key.toLower())), QString::fromUtf16(item.tip));
     action->setObjectName(key);
     m_toolBar->widgetForAction(action)->setObjectName(key);
     if (key == QLatin1StringView("Delete") || key == QLatin1StringView("Help")) {
