@@ -13,14 +13,14 @@
 namespace addin::test {
 
 AddInEnvironment::AddInEnvironment() {
-  QDir(m_dir.path()).mkpath(QStringLiteral("install/help"));
-  QFile index(path(QStringLiteral("install/help/index.html")));
+  QDir(m_dir.path()).mkpath(u"install/help"_qs);
+  QFile index(path(u"install/help/index.html"_qs));
   index.open(QIODevice::WriteOnly);
   index.write("<html></html>");
   index.close();
-  writeMachineConfig(QStringLiteral("InstallationPath=") + installDir() + u'\n');
-  qputenv("QUIMBEL_CONFIG_DIR", path(QStringLiteral("config")).toLocal8Bit());
-  qputenv("QUIMBEL_DATA_DIR", path(QStringLiteral("data")).toLocal8Bit());
+  writeMachineConfig(u"InstallationPath="_qs + installDir() + u'\n');
+  qputenv("QUIMBEL_CONFIG_DIR", path(u"config"_qs).toLocal8Bit());
+  qputenv("QUIMBEL_DATA_DIR", path(u"data"_qs).toLocal8Bit());
   qputenv("QUIMBEL_MACHINE_CONFIG", machineConfigPath().toLocal8Bit());
 }
 
@@ -38,7 +38,7 @@ void AddInEnvironment::writeMachineConfig(const QString& text) const {
 }
 
 QStringList AddInEnvironment::errorLog() const {
-  QFile file(path(QStringLiteral("data/errors.log")));
+  QFile file(path(u"data/errors.log"_qs));
   if (!file.open(QIODevice::ReadOnly)) return {};
   return QString::fromUtf8(file.readAll()).split(u'\n', Qt::SkipEmptyParts);
 }
@@ -50,26 +50,25 @@ QString commandBarsSnapshot(ide::CommandBars& bars) {
     auto controls = bar.Controls();
     for (int i = 1; i <= controls->Count(); ++i) {
       auto control = controls->Item(i);
-      lines << QStringLiteral("%1%2 [%3] type %4 tag %5 enabled %6")
-                   .arg(indent)
+      lines << u"%1%2 [%3] type %4 tag %5 enabled %6"_qs.arg(indent)
                    .arg(i)
                    .arg(control->Caption())
                    .arg(static_cast<int>(control->Type()))
                    .arg(control->Tag())
                    .arg(control->Enabled());
-      if (auto popup = control->CommandBar()) dump(*popup, indent + QStringLiteral("  "));
+      if (auto popup = control->CommandBar()) dump(*popup, indent + u"  "_qs);
     }
   };
   for (int i = 1; i <= bars.Count(); ++i) {
     auto bar = bars.Item(i);
-    lines << QStringLiteral("bar %1 visible %2").arg(bar->Name()).arg(bar->Visible());
-    dump(*bar, QStringLiteral("  "));
+    lines << u"bar %1 visible %2"_qs.arg(bar->Name()).arg(bar->Visible());
+    dump(*bar, u"  "_qs);
   }
   return lines.join(u'\n');
 }
 
 int quimbelPopups(ide::VBE& vbe) {
-  auto controls = vbe.CommandBars()->Item(QStringLiteral("Menu Bar"))->Controls();
+  auto controls = vbe.CommandBars()->Item(u"Menu Bar"_qs)->Controls();
   int count = 0;
   for (int i = 1; i <= controls->Count(); ++i)
     if (controls->Item(i)->Caption() == common::title()) ++count;
@@ -92,18 +91,18 @@ void RecordingHotKeyClient::registerHotKeys(ide::HWnd window) {
   for (const TestHotKey& key : m_keys)
     m_windows.RegisterHotKey(window, key.id, key.modifiers, key.virtualKey);
   registeredOn = window;
-  log << QStringLiteral("%1 register").arg(m_name);
+  log << u"%1 register"_qs.arg(m_name);
 }
 
 void RecordingHotKeyClient::unregisterHotKeys(ide::HWnd window) {
   for (const TestHotKey& key : m_keys)
     m_windows.UnregisterHotKey(window, key.id);
   if (registeredOn == window) registeredOn = 0;
-  log << QStringLiteral("%1 unregister").arg(m_name);
+  log << u"%1 unregister"_qs.arg(m_name);
 }
 
 void RecordingFeatures::addFavorite(const FavoritePlace& place) {
-  note(QStringLiteral("favorite %1.%2 kind %3 line %4")
+  note(u"favorite %1.%2 kind %3 line %4"_qs
            .arg(place.component ? place.component->Name() : QString(), place.procName)
            .arg(static_cast<int>(place.procKind))
            .arg(place.line));
@@ -152,13 +151,13 @@ ide::Ref<ide::CommandBarControl> findControl(const ide::Ref<ide::CommandBar>& ba
 }  // namespace
 
 void LinkedAddIn::clickToolBar(common::CommandId command) {
-  auto button = findControl(vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2")),
+  auto button = findControl(vbe->CommandBars()->Item(u"Quimbel 2.2"_qs),
                             common::LoadResString(static_cast<int>(command)));
   if (button) button->Execute();
 }
 
 void LinkedAddIn::clickMenu(common::CommandId command) {
-  auto popup = vbe->CommandBars()->Item(QStringLiteral("Menu Bar"))->Controls()->Item(common::title());
+  auto popup = vbe->CommandBars()->Item(u"Menu Bar"_qs)->Controls()->Item(common::title());
   if (auto item = findControl(popup->CommandBar(), common::LoadResString(static_cast<int>(command))))
     item->Execute();
 }
@@ -172,14 +171,14 @@ std::shared_ptr<host::ComponentImpl> addModule(const std::shared_ptr<host::Proje
   auto component =
       std::dynamic_pointer_cast<host::ComponentImpl>(project->Add(ide::ComponentType::StdModule));
   component->setName(name);
-  QStringList lines{QStringLiteral("Option Explicit"), QStringLiteral("Private m As Long")};
+  QStringList lines{u"Option Explicit"_qs, u"Private m As Long"_qs};
   for (int p = 1; p <= procedures; ++p) {
-    lines << QStringLiteral("Public Sub Proc%1()").arg(p);
+    lines << u"Public Sub Proc%1()"_qs.arg(p);
     for (int l = 0; l < linesEach - 2; ++l)
-      lines << QStringLiteral("    m = m + %1").arg(l);
-    lines << QStringLiteral("End Sub");
+      lines << u"    m = m + %1"_qs.arg(l);
+    lines << u"End Sub"_qs;
   }
-  component->CodeModule()->AddFromString(lines.join(QStringLiteral("\r\n")));
+  component->CodeModule()->AddFromString(lines.join(u"\r\n"_qs));
   return component;
 }
 

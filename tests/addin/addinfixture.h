@@ -34,8 +34,8 @@ class AddInEnvironment {
 
   QString path(const QString& relative) const { return m_dir.filePath(relative); }
   /// The installation directory, without a trailing "/".
-  QString installDir() const { return path(QStringLiteral("install")); }
-  QString machineConfigPath() const { return path(QStringLiteral("quimbel.conf")); }
+  QString installDir() const { return path(u"install"_qs); }
+  QString machineConfigPath() const { return path(u"quimbel.conf"_qs); }
   /// Rewrites the machine configuration with these lines.
   void writeMachineConfig(const QString& text) const;
   /// The error log's lines so far.
@@ -60,8 +60,8 @@ host::AddInImpl& registerRealAddIn(host::VbeImpl& vbe, bool loadAtStartup);
 class FakeAddIn final : public ide::AddIn {
  public:
   explicit FakeAddIn(std::shared_ptr<host::VbeImpl> vbe) : m_vbe(std::move(vbe)) {}
-  QString ProgId() override { return QStringLiteral("Quimbel.Connect"); }
-  QString Description() override { return QStringLiteral("Quimbel 2.2 Add-In"); }
+  QString ProgId() override { return u"Quimbel.Connect"_qs; }
+  QString Description() override { return u"Quimbel 2.2 Add-In"_qs; }
   bool Connect() override { return m_connected; }
   void setConnect(bool connect) override {
     m_connected = connect;
@@ -90,7 +90,7 @@ class RecordingHotKeyClient final : public HotKeyClient {
       : m_windows(windows), m_name(std::move(name)), m_keys(std::move(keys)) {}
   void registerHotKeys(ide::HWnd window) override;
   void unregisterHotKeys(ide::HWnd window) override;
-  void HandleHotKey(int id) override { log << QStringLiteral("%1 hotkey %2").arg(m_name).arg(id); }
+  void HandleHotKey(int id) override { log << u"%1 hotkey %2"_qs.arg(m_name).arg(id); }
 
   QStringList log;
   /// The window the hotkeys are registered on; 0 when none.
@@ -106,44 +106,40 @@ class RecordingHotKeyClient final : public HotKeyClient {
 class RecordingFeatures final : public Features {
  public:
   RecordingFeatures(QStringList& log, const QString& failing) : m_log(log), m_failing(failing) {}
-  void showFavorites() override { note(QStringLiteral("favorites")); }
-  void showMacros() override { note(QStringLiteral("macros")); }
-  void showCopyBuffers() override { note(QStringLiteral("copy buffers")); }
-  void showLineNumbering() override { note(QStringLiteral("numbering")); }
-  void showIndentation() override { note(QStringLiteral("indentation")); }
-  void showExtendedFind() override { note(QStringLiteral("find")); }
-  void showTaskList() override { note(QStringLiteral("tasks")); }
-  void showNewProcedure() override { note(QStringLiteral("new procedure")); }
-  void showOptions() override { note(QStringLiteral("options")); }
+  void showFavorites() override { note(u"favorites"_qs); }
+  void showMacros() override { note(u"macros"_qs); }
+  void showCopyBuffers() override { note(u"copy buffers"_qs); }
+  void showLineNumbering() override { note(u"numbering"_qs); }
+  void showIndentation() override { note(u"indentation"_qs); }
+  void showExtendedFind() override { note(u"find"_qs); }
+  void showTaskList() override { note(u"tasks"_qs); }
+  void showNewProcedure() override { note(u"new procedure"_qs); }
+  void showOptions() override { note(u"options"_qs); }
   void addFavorite(const FavoritePlace& place) override;
-  void projectAdded(const ide::Ref<ide::VBProject>& p) override {
-    note(QStringLiteral("project added ") + p->Name());
-  }
+  void projectAdded(const ide::Ref<ide::VBProject>& p) override { note(u"project added "_qs + p->Name()); }
   void projectRemoved(const ide::Ref<ide::VBProject>& p) override {
-    note(QStringLiteral("project removed ") + p->Name());
+    note(u"project removed "_qs + p->Name());
   }
   void projectRenamed(const ide::Ref<ide::VBProject>& p, const QString& old) override {
-    note(QStringLiteral("project renamed ") + old + QStringLiteral(" ") + p->Name());
+    note(u"project renamed "_qs + old + u" "_qs + p->Name());
   }
   void projectFileMoved(const ide::Ref<ide::VBProject>& p, const QString&, const QString&) override {
-    note(QStringLiteral("project moved ") + p->Name());
+    note(u"project moved "_qs + p->Name());
   }
   bool isIdentityModule(const ide::Ref<ide::VBComponent>&) override { return false; }
   void allProjectsClosed() override {}
   void componentAdded(const ide::Ref<ide::VBComponent>& c) override {
-    note(QStringLiteral("component added ") + c->Name());
+    note(u"component added "_qs + c->Name());
   }
   void componentRemoved(const ide::Ref<ide::VBComponent>& c) override {
-    note(QStringLiteral("component removed ") + c->Name());
+    note(u"component removed "_qs + c->Name());
   }
   void componentRenamed(const ide::Ref<ide::VBComponent>& c, const QString& old) override {
-    note(QStringLiteral("component renamed ") + old + QStringLiteral(" ") + c->Name());
+    note(u"component renamed "_qs + old + u" "_qs + c->Name());
   }
-  void controlAdded(const ide::Ref<ide::VBControl>& c) override {
-    note(QStringLiteral("control added ") + c->name());
-  }
+  void controlAdded(const ide::Ref<ide::VBControl>& c) override { note(u"control added "_qs + c->name()); }
   void controlRenamed(const ide::Ref<ide::VBControl>& c, const QString& old, int) override {
-    note(QStringLiteral("control renamed ") + old + QStringLiteral(" ") + c->name());
+    note(u"control renamed "_qs + old + u" "_qs + c->name());
   }
   void findWindowProjectRemoved(const ide::Ref<ide::VBProject>&) override {}
   void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>&) override {}

@@ -67,7 +67,7 @@ TEST(CommandState, AfterTheFirstProjectTheProjectCommandsWorkAtOnceAndNewProcedu
   addIn.connect();
   addIn.loop().advance(100);
   auto project = addIn.vbe->newProject();
-  auto module = addModule(project, QStringLiteral("modUm"), 2, 10);
+  auto module = addModule(project, u"modUm"_qs, 2, 10);
   QStringList expected{u"favorites"_qs,   u"macros"_qs, u"copy buffers"_qs, u"numbering"_qs,
                        u"indentation"_qs, u"find"_qs,   u"tasks"_qs,        u"options"_qs};
   EXPECT_EQ(clickAll(addIn), expected) << "before any tick";
@@ -123,7 +123,7 @@ TEST(CommandState, AMenuItemDoesWhatItsToolBarButtonDoes) {
   LinkedAddIn addIn;
   addIn.connect();
   auto project = addIn.vbe->newProject();
-  showAt(addModule(project, QStringLiteral("modUm"), 1, 10), 1);
+  showAt(addModule(project, u"modUm"_qs, 1, 10), 1);
   addIn.loop().advance(100);
   addIn.takeFeatureLog();
   for (const auto& [number, feature] : featureOfCommand()) {
@@ -136,7 +136,7 @@ TEST(CommandState, ClickingLeavesTheIdesClickFlagsAsTheyAre) {
   AddInEnvironment environment;
   LinkedAddIn addIn;
   addIn.connect();
-  auto button = addIn.vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2"))->Controls()->Item(12);
+  auto button = addIn.vbe->CommandBars()->Item(u"Quimbel 2.2"_qs)->Controls()->Item(12);
   bool handled = false;
   bool cancel = false;
   auto source = addIn.vbe->Events()->CommandBarEvents(button);
@@ -151,8 +151,8 @@ TEST(Commands, CloseWindowsClosesCodeAndDesignerWindowsAndLeavesToolWindows) {
   LinkedAddIn addIn;
   addIn.connect();
   auto project = addIn.vbe->newProject();
-  showAt(addModule(project, QStringLiteral("modUm"), 1, 10), 1);
-  showAt(addModule(project, QStringLiteral("modDois"), 1, 10), 1);
+  showAt(addModule(project, u"modUm"_qs, 1, 10), 1);
+  showAt(addModule(project, u"modDois"_qs, 1, 10), 1);
   auto form = std::dynamic_pointer_cast<host::ComponentImpl>(
       project->VBComponents()->Add(ide::ComponentType::VBForm));
   form->designerWindow()->SetFocus();
@@ -176,21 +176,19 @@ TEST(Commands, CloseWindowsClosesCodeAndDesignerWindowsAndLeavesToolWindows) {
 
 TEST(Commands, HelpOpensTheContentsPageOrSaysItCannot) {
   AddInEnvironment environment;
-  environment.writeMachineConfig(QStringLiteral("InstallationPath = ") + environment.installDir() + u'\n');
+  environment.writeMachineConfig(u"InstallationPath = "_qs + environment.installDir() + u'\n');
   LinkedAddIn addIn;
   addIn.ui().setCanOpenDocuments(true);
   addIn.connect();
   addIn.clickMenu(CommandId::Help);
   ASSERT_EQ(addIn.ui().openedDocuments().size(), 1u);
-  EXPECT_EQ(addIn.ui().openedDocuments().front(),
-            environment.installDir() + QStringLiteral("/help/index.html"));
+  EXPECT_EQ(addIn.ui().openedDocuments().front(), environment.installDir() + u"/help/index.html"_qs);
   EXPECT_TRUE(addIn.ui().messageBoxes().empty());
 
-  QFile::remove(environment.installDir() + QStringLiteral("/help/index.html"));
+  QFile::remove(environment.installDir() + u"/help/index.html"_qs);
   addIn.clickMenu(CommandId::Help);
   ASSERT_EQ(addIn.ui().messageBoxes().size(), 1u);
-  EXPECT_EQ(addIn.ui().messageBoxes().front().prompt,
-            QStringLiteral("Não foi possível localizar o arquivo de ajuda."));
+  EXPECT_EQ(addIn.ui().messageBoxes().front().prompt, u"Não foi possível localizar o arquivo de ajuda."_qs);
   EXPECT_EQ(ide::mb::iconOf(addIn.ui().messageBoxes().front().style), ide::mb::Information);
   EXPECT_EQ(addIn.ui().openedDocuments().size(), 1u);
 }
@@ -200,7 +198,7 @@ TEST(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
   LinkedAddIn addIn;
   addIn.connect();
   auto project = addIn.vbe->newProject();
-  auto module = addModule(project, QStringLiteral("modUm"), 2, 10);
+  auto module = addModule(project, u"modUm"_qs, 2, 10);
   module->CodeModule()->AddFromString(
       QStringLiteral("Public Property Get Valor() As Long\r\n    Valor = m\r\nEnd Property\r\n"
                      "Public Property Let Valor(ByVal v As Long)\r\n    m = v\r\nEnd Property"));
@@ -208,7 +206,7 @@ TEST(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
   auto favoriteAt = [&](int line) {
     pane->SetSelection(line, 1, line, 1);
     addIn.takeFeatureLog();
-    addIn.vbe->CommandBars()->Item(QStringLiteral("Code Window"))->Controls()->Item(1)->Execute();
+    addIn.vbe->CommandBars()->Item(u"Code Window"_qs)->Controls()->Item(1)->Execute();
     return addIn.takeFeatureLog();
   };
   EXPECT_EQ(favoriteAt(1), QStringList{u"favorite modUm.General Declarations kind 0 line 1"_qs});
@@ -217,19 +215,19 @@ TEST(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
   EXPECT_EQ(favoriteAt(26), QStringList{u"favorite modUm.Valor kind 1 line 26"_qs});
   // The break-mode menu's item does the same.
   pane->SetSelection(15, 1, 15, 1);
-  addIn.vbe->CommandBars()->Item(QStringLiteral("Code Window (Break)"))->Controls()->Item(1)->Execute();
+  addIn.vbe->CommandBars()->Item(u"Code Window (Break)"_qs)->Controls()->Item(1)->Execute();
   EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"favorite modUm.Proc2 kind 0 line 15"_qs});
 }
 
 TEST(Commands, WithoutAnAddInsMenuTheConnectionFailsWithItsOwnNumber) {
   AddInEnvironment environment;
   LinkedAddIn addIn;
-  addIn.vbe->CommandBars()->Item(QStringLiteral("Menu Bar"))->Controls()->Item(11)->Delete();
+  addIn.vbe->CommandBars()->Item(u"Menu Bar"_qs)->Controls()->Item(11)->Delete();
   addIn.connect();
   EXPECT_EQ(addIn.connection->globals(), nullptr);
   EXPECT_EQ(addIn.addIn->requests, std::vector<bool>{false});
   EXPECT_EQ(common::lastError().number, static_cast<qint32>(0x80040C81u));
-  EXPECT_EQ(common::lastError().description, QStringLiteral("Não há menu de Add-Ins."));
+  EXPECT_EQ(common::lastError().description, u"Não há menu de Add-Ins."_qs);
 }
 
 TEST(Commands, FailuresTheHandlersEndOnSilentlyAreLoggedOnceWithTheirPlace) {
@@ -279,16 +277,16 @@ TEST(IdeEvents, WhileTheProgramRunsComponentsAndControlsAreLeftAloneExceptForRen
 
   addIn.vbe->setMode(ide::IdeMode::Run);
   auto module = project->VBComponents()->Add(ide::ComponentType::StdModule);
-  module->setName(QStringLiteral("modNovo"));
-  auto label = form->Designer()->VBControls()->Add(QStringLiteral("VB.Label"));
-  label->Properties()->Item(QStringLiteral("Name"))->setValue(QStringLiteral("lblNome"));
+  module->setName(u"modNovo"_qs);
+  auto label = form->Designer()->VBControls()->Add(u"VB.Label"_qs);
+  label->Properties()->Item(u"Name"_qs)->setValue(u"lblNome"_qs);
   project->VBComponents()->Remove(module);
   EXPECT_EQ(addIn.takeFeatureLog(),
             (QStringList{u"component renamed Module1 modNovo"_qs, u"control renamed Label1 lblNome"_qs}));
 
   addIn.vbe->setMode(ide::IdeMode::Design);
   auto second = project->VBComponents()->Add(ide::ComponentType::StdModule);
-  auto box = form->Designer()->VBControls()->Add(QStringLiteral("VB.TextBox"));
+  auto box = form->Designer()->VBControls()->Add(u"VB.TextBox"_qs);
   project->VBComponents()->Remove(second);
   EXPECT_EQ(addIn.takeFeatureLog(), (QStringList{u"component added Module1"_qs, u"control added Text1"_qs,
                                                  u"component removed Module1"_qs}));
@@ -304,10 +302,10 @@ TEST(IdeEvents, ProjectsAreAnnouncedAndTheComponentEventsFollowTheActiveProject)
 
   auto first = addIn.vbe->newProject();
   // The idle procedure waits on the main window until the IDE is idle, then takes itself off.
-  EXPECT_TRUE(windows.GetProp(main, QStringLiteral("OldWndProc")).has_value());
+  EXPECT_TRUE(windows.GetProp(main, u"OldWndProc"_qs).has_value());
   EXPECT_NE(windows.GetWindowProc(main), ownProc);
   addIn.loop().DoEvents();
-  EXPECT_FALSE(windows.GetProp(main, QStringLiteral("OldWndProc")).has_value());
+  EXPECT_FALSE(windows.GetProp(main, u"OldWndProc"_qs).has_value());
   EXPECT_EQ(windows.GetWindowProc(main), ownProc);
 
   auto second = addIn.vbe->newProject();
@@ -323,7 +321,7 @@ TEST(IdeEvents, ProjectsAreAnnouncedAndTheComponentEventsFollowTheActiveProject)
   first->VBComponents()->Add(ide::ComponentType::StdModule);
   EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"component added Module2"_qs});
 
-  second->setName(QStringLiteral("Biblioteca"));
+  second->setName(u"Biblioteca"_qs);
   addIn.vbe->removeProject(second);
   EXPECT_EQ(addIn.takeFeatureLog(),
             (QStringList{u"project renamed Project2 Biblioteca"_qs, u"project removed Biblioteca"_qs}));
@@ -339,18 +337,14 @@ TEST(IdeEvents, AFailingProjectHandlerShowsTheUndeterminedErrorMessage) {
   auto project = addIn.vbe->newProject();
   addIn.loop().DoEvents();
   // The removal handler reads the IDE's mode; without "Continue" on the "Standard" bar that fails.
-  auto module = addModule(project, QStringLiteral("modUm"), 1, 5);
-  addIn.vbe->CommandBars()
-      ->Item(QStringLiteral("Standard"))
-      ->Controls()
-      ->Item(QStringLiteral("Continue"))
-      ->Delete();
+  auto module = addModule(project, u"modUm"_qs, 1, 5);
+  addIn.vbe->CommandBars()->Item(u"Standard"_qs)->Controls()->Item(u"Continue"_qs)->Delete();
   addIn.ui().clearMessageBoxes();
   project->VBComponents()->Remove(module);
   ASSERT_EQ(addIn.ui().messageBoxes().size(), 1u);
-  EXPECT_EQ(addIn.ui().messageBoxes().front().prompt, QStringLiteral("Erro indeterminado."));
+  EXPECT_EQ(addIn.ui().messageBoxes().front().prompt, u"Erro indeterminado."_qs);
   EXPECT_EQ(ide::mb::iconOf(addIn.ui().messageBoxes().front().style), ide::mb::Critical);
-  EXPECT_EQ(addIn.ui().messageBoxes().front().title, QStringLiteral("Quimbel"));
+  EXPECT_EQ(addIn.ui().messageBoxes().front().title, u"Quimbel"_qs);
 }
 
 TEST(IdeEvents, AProjectFileMovingToAnotherDirectoryIsAnnounced) {

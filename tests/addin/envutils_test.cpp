@@ -32,11 +32,11 @@ TEST(GetSelectedText, OneLineSeveralLinesAndNoSelection) {
   ModuleIde ide;
   // Line 1 "Option Explicit", line 2 "Private m As Long", line 3 "Public Property Get Valor() As Long".
   ide.pane->SetSelection(1, 8, 1, 16);
-  EXPECT_EQ(ide.utils.GetSelectedText(), QStringLiteral("Explicit"));
+  EXPECT_EQ(ide.utils.GetSelectedText(), u"Explicit"_qs);
   ide.pane->SetSelection(1, 8, 3, 7);
-  EXPECT_EQ(ide.utils.GetSelectedText(), QStringLiteral("Explicit\r\nPrivate m As Long\r\nPublic"));
+  EXPECT_EQ(ide.utils.GetSelectedText(), u"Explicit\r\nPrivate m As Long\r\nPublic"_qs);
   ide.pane->SetSelection(1, 8, 2, 1);
-  EXPECT_EQ(ide.utils.GetSelectedText(), QStringLiteral("Explicit\r\n"));
+  EXPECT_EQ(ide.utils.GetSelectedText(), u"Explicit\r\n"_qs);
   ide.pane->SetSelection(2, 5, 2, 5);
   EXPECT_EQ(ide.utils.GetSelectedText(), QString());
   ide.pane->Window()->Close();

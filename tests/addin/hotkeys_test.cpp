@@ -26,8 +26,8 @@ TEST(HotKeyRouting, DigitsWithCtrlOrCtrlShiftGoToTheCopyBuffers) {
 }
 
 TEST(HotKeyRouting, LettersGoToTheMacrosExceptTheEditorsOwnCombinations) {
-  const QString ctrlAltExcluded = QStringLiteral("ICJVX");
-  const QString ctrlShiftExcluded = QStringLiteral("FCIJVX");
+  const QString ctrlAltExcluded = u"ICJVX"_qs;
+  const QString ctrlShiftExcluded = u"FCIJVX"_qs;
   for (char letter = 'A'; letter <= 'Z'; ++letter) {
     const auto key = static_cast<unsigned>(letter);
     EXPECT_EQ(routeHotKey(key, kCtrl | kAlt),

@@ -38,19 +38,19 @@ struct RealAddIn {
 TEST(LifeCycle, StartUpPutsTheCommandsIntoTheIdeAndShutDownTakesThemAllAway) {
   RealAddIn ide;
   auto& addIn = ide.registerAddIn(true);
-  EXPECT_EQ(addIn.ProgId(), QStringLiteral("Quimbel.Connect"));
-  EXPECT_EQ(addIn.Description(), QStringLiteral("Quimbel 2.2 Add-In"));
+  EXPECT_EQ(addIn.ProgId(), u"Quimbel.Connect"_qs);
+  EXPECT_EQ(addIn.Description(), u"Quimbel 2.2 Add-In"_qs);
   ide.vbe->startup();
   ASSERT_TRUE(addIn.Connect());
   EXPECT_TRUE(ide.ui().messageBoxes().empty()) << boxTexts(ide.ui()).join(u'|').toStdString();
 
   // The popup stands before the eleventh menu, which is then the Add-Ins menu at position 12.
-  auto menuBar = ide.vbe->CommandBars()->Item(QStringLiteral("Menu Bar"))->Controls();
+  auto menuBar = ide.vbe->CommandBars()->Item(u"Menu Bar"_qs)->Controls();
   auto popup = menuBar->Item(11);
-  EXPECT_EQ(popup->Caption(), QStringLiteral("Quimbel"));
+  EXPECT_EQ(popup->Caption(), u"Quimbel"_qs);
   EXPECT_EQ(popup->Type(), ide::ControlType::Popup);
   EXPECT_TRUE(popup->Temporary());
-  EXPECT_EQ(menuBar->Item(12)->Caption(), QStringLiteral("&Add-Ins"));
+  EXPECT_EQ(menuBar->Item(12)->Caption(), u"&Add-Ins"_qs);
   // Every command has its menu item and, but for help, its toolbar button with the same caption and
   // picture: a 16 by 16 image.
   auto items = popup->CommandBar()->Controls();
@@ -64,7 +64,7 @@ TEST(LifeCycle, StartUpPutsTheCommandsIntoTheIdeAndShutDownTakesThemAllAway) {
   }
   EXPECT_EQ(items->Item(13)->Caption(), u"Ajuda"_qs);
 
-  auto toolbar = ide.vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2"));
+  auto toolbar = ide.vbe->CommandBars()->Item(u"Quimbel 2.2"_qs);
   EXPECT_TRUE(toolbar->Visible());
   EXPECT_EQ(toolbar->Position(), ide::BarPosition::Top);
   auto buttons = toolbar->Controls();
@@ -85,7 +85,7 @@ TEST(LifeCycle, StartUpPutsTheCommandsIntoTheIdeAndShutDownTakesThemAllAway) {
 
   for (const char* name : {"Code Window", "Code Window (Break)"}) {
     auto first = ide.vbe->CommandBars()->Item(QLatin1StringView(name))->Controls()->Item(1);
-    EXPECT_EQ(first->Caption(), QStringLiteral("Adicionar aos Favoritos"));
+    EXPECT_EQ(first->Caption(), u"Adicionar aos Favoritos"_qs);
     EXPECT_EQ(first->Style(), ide::ButtonStyle::IconAndCaption);
     EXPECT_EQ(first->Face(), items->Item(3)->Face()) << "the favourites picture";
   }
@@ -141,7 +141,7 @@ TEST(LifeCycle, TheStartUpShowsTheSplashAndTheHourglassOnlyWhileItRuns) {
   auto& addIn = ide.registerAddIn(false);
   addIn.setConnect(true);
   ASSERT_EQ(ide.ui().splashHistory().size(), 2u);
-  EXPECT_EQ(ide.ui().splashHistory().front(), QStringLiteral("Quimbel 2.2"));
+  EXPECT_EQ(ide.ui().splashHistory().front(), u"Quimbel 2.2"_qs);
   EXPECT_TRUE(ide.ui().splashText().isEmpty());
   EXPECT_EQ(ide.ui().cursor(), ide::Cursor::Default);
   ide.vbe->shutdown();
@@ -152,24 +152,24 @@ TEST(LifeCycle, StartUpLeavesTheClipboardAlone) {
   static char name[] = "addin_test";
   static char* argv[] = {name, nullptr};
   if (!QGuiApplication::instance()) new QGuiApplication(argc, argv);  // kept: Qt is not set up twice
-  QGuiApplication::clipboard()->setText(QStringLiteral("texto do usuário"));
+  QGuiApplication::clipboard()->setText(u"texto do usuário"_qs);
   RealAddIn ide;
   ide.registerAddIn(true);
   ide.vbe->startup();
   ASSERT_EQ(quimbelPopups(*ide.vbe), 1);
-  EXPECT_EQ(QGuiApplication::clipboard()->text(), QStringLiteral("texto do usuário"));
+  EXPECT_EQ(QGuiApplication::clipboard()->text(), u"texto do usuário"_qs);
   ide.vbe->shutdown();
-  EXPECT_EQ(QGuiApplication::clipboard()->text(), QStringLiteral("texto do usuário"));
+  EXPECT_EQ(QGuiApplication::clipboard()->text(), u"texto do usuário"_qs);
 }
 
 TEST(LifeCycle, AToolBarLeftBehindByAnEarlierConnectionIsReplaced) {
   RealAddIn ide;
-  ide.vbe->CommandBars()->Add(QStringLiteral("Quimbel 2.2"), ide::BarPosition::Top, false, false);
+  ide.vbe->CommandBars()->Add(u"Quimbel 2.2"_qs, ide::BarPosition::Top, false, false);
   auto& addIn = ide.registerAddIn(false);
   addIn.setConnect(true);
   EXPECT_TRUE(addIn.Connect());
   EXPECT_EQ(quimbelToolBars(*ide.vbe), 1);
-  EXPECT_EQ(ide.vbe->CommandBars()->Item(QStringLiteral("Quimbel 2.2"))->Controls()->Count(), 12);
+  EXPECT_EQ(ide.vbe->CommandBars()->Item(u"Quimbel 2.2"_qs)->Controls()->Count(), 12);
   ide.vbe->shutdown();
   EXPECT_EQ(quimbelToolBars(*ide.vbe), 0);
 }
@@ -178,8 +178,7 @@ TEST(LifeCycle, AToolBarLeftBehindByAnEarlierConnectionIsReplaced) {
 // Failures
 
 TEST(StartUpFailures, WithoutAnInstallationPathTheAddInSaysSoAndUnloadsItself) {
-  const QStringList configurations{QString(), QStringLiteral("# nothing\n"),
-                                   QStringLiteral("InstallationPath=   \n")};
+  const QStringList configurations{QString(), u"# nothing\n"_qs, u"InstallationPath=   \n"_qs};
   for (const QString& configuration : configurations) {
     RealAddIn ide;
     if (configuration.isNull())
@@ -192,9 +191,9 @@ TEST(StartUpFailures, WithoutAnInstallationPathTheAddInSaysSoAndUnloadsItself) {
     EXPECT_FALSE(addIn.Connect());
     ASSERT_EQ(ide.ui().messageBoxes().size(), 1u) << configuration.toStdString();
     const auto& box = ide.ui().messageBoxes().front();
-    EXPECT_EQ(box.prompt, QStringLiteral("Erro: não foi possível detectar o diretório de instalação."));
+    EXPECT_EQ(box.prompt, u"Erro: não foi possível detectar o diretório de instalação."_qs);
     EXPECT_EQ(ide::mb::iconOf(box.style), kExclamation);
-    EXPECT_EQ(box.title, QStringLiteral("Quimbel"));
+    EXPECT_EQ(box.title, u"Quimbel"_qs);
     EXPECT_TRUE(ide.ui().splashHistory().empty());
     EXPECT_EQ(ide.bars(), ide.barsBefore);
     EXPECT_EQ(ide.loop().activeTimers(), 0);
@@ -215,17 +214,13 @@ TEST(StartUpFailures, AReadOnlyMachineConfigurationIsEnough) {
 TEST(StartUpFailures, WithoutAnAddInsMenuTheStartUpFailsAndTakesApartWhatItBuilt) {
   RealAddIn ide;
   // An IDE without the Add-Ins menu.
-  ide.vbe->CommandBars()
-      ->Item(QStringLiteral("Menu Bar"))
-      ->Controls()
-      ->Item(QStringLiteral("&Add-Ins"))
-      ->Delete();
+  ide.vbe->CommandBars()->Item(u"Menu Bar"_qs)->Controls()->Item(u"&Add-Ins"_qs)->Delete();
   const QString before = ide.bars();
   auto& addIn = ide.registerAddIn(true);
   ide.vbe->startup();
   ide.loop().DoEvents();
   EXPECT_FALSE(addIn.Connect());
-  ASSERT_EQ(boxTexts(ide.ui()), QStringList{QStringLiteral("Erro de inicialização.")});
+  ASSERT_EQ(boxTexts(ide.ui()), QStringList{u"Erro de inicialização."_qs});
   EXPECT_EQ(ide::mb::iconOf(ide.ui().messageBoxes().front().style), kExclamation);
   EXPECT_EQ(ide.bars(), before);
   EXPECT_EQ(ide.loop().activeTimers(), 0);
@@ -234,10 +229,9 @@ TEST(StartUpFailures, WithoutAnAddInsMenuTheStartUpFailsAndTakesApartWhatItBuilt
   // The log names the number (0x80040C81 as a 32-bit number), the text and where it failed.
   const QStringList log = ide.environment.errorLog();
   ASSERT_EQ(log.size(), 1);
-  EXPECT_TRUE(log.front().contains(QStringLiteral("\t-2147218303\tNão há menu de Add-Ins.\t")))
+  EXPECT_TRUE(log.front().contains(u"\t-2147218303\tNão há menu de Add-Ins.\t"_qs))
       << log.front().toStdString();
-  EXPECT_TRUE(log.front().contains(QStringLiteral("em CVBEvents_ConnectMenus, linha: ")))
-      << log.front().toStdString();
+  EXPECT_TRUE(log.front().contains(u"em CVBEvents_ConnectMenus, linha: "_qs)) << log.front().toStdString();
 }
 
 TEST(StartUpFailures, AnUnusableDatabaseIsNamedAndTheAddInStartsWithoutIt) {
@@ -270,25 +264,21 @@ TEST(StartUpFailures, AFailureThreeCallsDeepShowsOneMessageNamingTheInnermostPro
   auto& addIn = ide.registerAddIn(true);
   ide.vbe->startup();
   auto project = ide.vbe->newProject();
-  auto module = addModule(project, QStringLiteral("modUm"), 1, 5);
+  auto module = addModule(project, u"modUm"_qs, 1, 5);
   ide.loop().DoEvents();
   ide.ui().clearMessageBoxes();
   // Without the "Continue" button the IDE's mode cannot be read: selecting a component fails in the mode
   // test (the handler asks CEnvUtils_IdeMode, which asks CEnvUtils_IsStandardControlEnabled).
-  ide.vbe->CommandBars()
-      ->Item(QStringLiteral("Standard"))
-      ->Controls()
-      ->Item(QStringLiteral("Continue"))
-      ->Delete();
+  ide.vbe->CommandBars()->Item(u"Standard"_qs)->Controls()->Item(u"Continue"_qs)->Delete();
   ide.vbe->selectComponent(nullptr);
   ide.vbe->selectComponent(module);
   ASSERT_EQ(ide.ui().messageBoxes().size(), 1u) << boxTexts(ide.ui()).join(u'|').toStdString();
   const auto& box = ide.ui().messageBoxes().front();
-  EXPECT_EQ(box.prompt, QStringLiteral("5 ") + ide::standardDescription(5));
+  EXPECT_EQ(box.prompt, u"5 "_qs + ide::standardDescription(5));
   EXPECT_EQ(ide::mb::buttonsOf(box.style), ide::mb::OKOnly);
   const QStringList log = ide.environment.errorLog();
   ASSERT_EQ(log.size(), 1);
-  EXPECT_TRUE(log.front().contains(QStringLiteral("em CEnvUtils_IsStandardControlEnabled, linha: ")))
+  EXPECT_TRUE(log.front().contains(u"em CEnvUtils_IsStandardControlEnabled, linha: "_qs))
       << log.front().toStdString();
   EXPECT_TRUE(addIn.Connect()) << "a failing handler does not unload the add-in";
   ide.vbe->shutdown();

@@ -23,7 +23,7 @@ TEST(Options, AFreshUserHasEveryOptionOnButRenamingInCode) {
   const common::Options options = common::GetOptionsFromRegistry(store);
   EXPECT_TRUE(options.OneCommandNumIndent);
   EXPECT_TRUE(options.ShowProperties);
-  EXPECT_EQ(options.ColorOnFocus, QStringLiteral("&HFFFF&"));
+  EXPECT_EQ(options.ColorOnFocus, u"&HFFFF&"_qs);
   EXPECT_TRUE(options.LabelsTransparent);
   EXPECT_TRUE(options.ClearTextProperty);
   EXPECT_TRUE(options.FormsPosition);
@@ -45,7 +45,7 @@ TEST(Options, OnlyZeroTurnsAnOptionOff) {
   EXPECT_FALSE(options.ShowProperties);
   EXPECT_TRUE(options.FormsBorder);
   EXPECT_TRUE(options.RenameInCodeOnControlRenamed);
-  EXPECT_EQ(options.ColorOnFocus, QStringLiteral("&HC0FFFF&"));
+  EXPECT_EQ(options.ColorOnFocus, u"&HC0FFFF&"_qs);
 }
 
 TEST(MachineConfig, TheInstallationPathIsTrimmedAndEndsInASlash) {
@@ -53,9 +53,9 @@ TEST(MachineConfig, TheInstallationPathIsTrimmedAndEndsInASlash) {
   MachineConfigFile config(environment.machineConfigPath());
   environment.writeMachineConfig(
       u"# Quimbel\n[Quimbel]\nOther=1\n  InstallationPath =  /opt/quim,bel  \n"_qs);
-  EXPECT_EQ(installationDirectory(config), QStringLiteral("/opt/quim,bel/"));
+  EXPECT_EQ(installationDirectory(config), u"/opt/quim,bel/"_qs);
   environment.writeMachineConfig(u"InstallationPath=/opt/quimbel/\n"_qs);
-  EXPECT_EQ(installationDirectory(config), QStringLiteral("/opt/quimbel/"));
+  EXPECT_EQ(installationDirectory(config), u"/opt/quimbel/"_qs);
   environment.writeMachineConfig(u"InstallationPath=\n"_qs);
   EXPECT_EQ(installationDirectory(config), QString());
   EXPECT_TRUE(config.canRead());
@@ -115,12 +115,12 @@ TEST(ErrorConvention, AFailureThreeCallsDeepIsShownOnceWithTheInnermostLocation)
   host::HeadlessUi ui;
   outermost(ui);
   ASSERT_EQ(ui.messageBoxes().size(), 1u);
-  EXPECT_EQ(ui.messageBoxes().front().prompt, QStringLiteral("9 ") + ide::standardDescription(9));
+  EXPECT_EQ(ui.messageBoxes().front().prompt, u"9 "_qs + ide::standardDescription(9));
   EXPECT_EQ(ui.messageBoxes().front().style, ide::mb::OKOnly);
-  EXPECT_EQ(common::lastError().location, QStringLiteral("em basUm_Innermost, linha: 30"));
+  EXPECT_EQ(common::lastError().location, u"em basUm_Innermost, linha: 30"_qs);
   const QStringList log = environment.errorLog();
   ASSERT_EQ(log.size(), 1);
-  EXPECT_TRUE(log.front().endsWith(QStringLiteral("\tem basUm_Innermost, linha: 30")));
+  EXPECT_TRUE(log.front().endsWith(u"\tem basUm_Innermost, linha: 30"_qs));
 }
 
 TEST(ErrorConvention, TheCancelCodesEndSilently) {

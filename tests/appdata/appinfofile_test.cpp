@@ -21,7 +21,7 @@ namespace {
 std::pair<int, QString> sqlcipher(const QString& file, const QString& script) {
   QProcess shell;
   shell.setProcessChannelMode(QProcess::MergedChannels);
-  shell.start(QStringLiteral("sqlcipher"), {QStringLiteral("-batch"), file});
+  shell.start(u"sqlcipher"_qs, {u"-batch"_qs, file});
   shell.write(script.toUtf8());
   shell.closeWriteChannel();
   shell.waitForFinished(30000);
@@ -46,7 +46,7 @@ std::pair<long, QString> failureOf(const std::function<void()>& work) {
 
 class AppInfoFileTest : public ::testing::Test {
  protected:
-  QString file() const { return dir.filePath(QStringLiteral("Quimbel.inf")); }
+  QString file() const { return dir.filePath(u"Quimbel.inf"_qs); }
   QTemporaryDir dir;
 };
 
@@ -72,14 +72,14 @@ TEST_F(AppInfoFileTest, TheShellSeesTheFourTablesOnlyWithThePassword) {
   EXPECT_EQ(keyedExit, 0);
   EXPECT_TRUE(keyed.contains(u"id 1\n"_qs)) << keyed.toStdString();
 
-  const auto [bareExit, bare] = sqlcipher(file(), QStringLiteral("SELECT count(*) FROM sqlite_master;\n"));
+  const auto [bareExit, bare] = sqlcipher(file(), u"SELECT count(*) FROM sqlite_master;\n"_qs);
   EXPECT_NE(bareExit, 0);
   EXPECT_TRUE(bare.contains(u"not a database"_qs)) << bare.toStdString();
 }
 
 TEST_F(AppInfoFileTest, RowsAreAddedChangedAndFoundByTheirRules) {
   CAppInfoFile db;
-  db.OpenFile(QStringLiteral("  ") + dir.path() + QStringLiteral("/ "));
+  db.OpenFile(u"  "_qs + dir.path() + u"/ "_qs);
   EXPECT_EQ(db.FilePath(), file());
   // A first read adds the row enabled, and says so; keys compare without regard to case.
   EXPECT_TRUE(db.GetMacroState(u"Ctrl+Alt+A"_qs));
@@ -128,7 +128,7 @@ TEST_F(AppInfoFileTest, TextsOfAnyLengthAndCharacterComeBackUnchangedOrAreRefuse
     CAppInfoFile db;
     db.OpenFile(dir.path());
     for (int i = 0; i < 6; ++i)
-      db.WriteCopyBufferText(QStringLiteral("Ctrl+%1").arg(i), texts[i]);
+      db.WriteCopyBufferText(u"Ctrl+%1"_qs.arg(i), texts[i]);
     db.WriteMacroText(u"Ctrl+Alt+B"_qs, texts[1]);
     // Half a surrogate pair is not text: refused, and what was there stays.
     const QString broken = QChar(0xD800) + u"x"_qs;
@@ -140,7 +140,7 @@ TEST_F(AppInfoFileTest, TextsOfAnyLengthAndCharacterComeBackUnchangedOrAreRefuse
   CAppInfoFile db;
   db.OpenFile(dir.path());
   for (int i = 0; i < 6; ++i)
-    EXPECT_EQ(db.GetCopyBufferText(QStringLiteral("Ctrl+%1").arg(i)), texts[i]) << i;
+    EXPECT_EQ(db.GetCopyBufferText(u"Ctrl+%1"_qs.arg(i)), texts[i]) << i;
   EXPECT_EQ(db.GetMacroText(u"Ctrl+Alt+B"_qs), texts[1]);
   EXPECT_EQ(db.GetDefErrorHandler(), CAppInfoFile::DefaultErrorHandler());
 }
@@ -158,7 +158,7 @@ TEST_F(AppInfoFileTest, AFileThatCannotBeUsedIsNamedAndLeftAsItWas) {
   }
   const QByteArray good = contents(file());
   const QString otherKey = dir.filePath(u"other.db"_qs);
-  sqlcipher(otherKey, QStringLiteral("PRAGMA key = 'outra senha'; CREATE TABLE Macros (MacroId);\n"));
+  sqlcipher(otherKey, u"PRAGMA key = 'outra senha'; CREATE TABLE Macros (MacroId);\n"_qs);
   const struct {
     QByteArray bytes;
     QString reason;
@@ -203,7 +203,7 @@ TEST_F(AppInfoFileTest, ProcessesDrawingIdentifiersAtOnceNeverGetTheSameOne) {
   ids.sort();
   QStringList expected;
   for (int id = 1; id <= ids.size(); ++id)
-    expected << QStringLiteral("%1").arg(id, 6, 10, QChar(u'0'));
+    expected << u"%1"_qs.arg(id, 6, 10, QChar(u'0'));
   EXPECT_EQ(ids, expected);
 }
 

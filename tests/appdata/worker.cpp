@@ -18,8 +18,7 @@ int main(int argc, char** argv) {
       if (mode == QLatin1StringView("ids")) {
         std::printf("%s\n", file.GetNextProjId().toLatin1().constData());
       } else {
-        file.WriteMacroText(QStringLiteral("Ctrl+Alt+A"),
-                            QString(300'000, QChar(u'a' + i % 26)) + QString::number(i));
+        file.WriteMacroText(u"Ctrl+Alt+A"_qs, QString(300'000, QChar(u'a' + i % 26)) + QString::number(i));
         std::printf("%d\n", i);
       }
       std::fflush(stdout);

@@ -44,9 +44,9 @@ class Tool {
   Result runProgram(const QString& program, const QStringList& arguments, const QString& directory = {}) {
     QProcess process;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-    environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), m_home.filePath(QStringLiteral("config")));
-    environment.insert(QStringLiteral("QUIMBEL_DATA_DIR"), m_home.filePath(QStringLiteral("data")));
-    environment.insert(QStringLiteral("LC_ALL"), QStringLiteral("C.UTF-8"));
+    environment.insert(u"QUIMBEL_CONFIG_DIR"_qs, m_home.filePath(u"config"_qs));
+    environment.insert(u"QUIMBEL_DATA_DIR"_qs, m_home.filePath(u"data"_qs));
+    environment.insert(u"LC_ALL"_qs, u"C.UTF-8"_qs);
     process.setProcessEnvironment(environment);
     if (!directory.isEmpty()) process.setWorkingDirectory(directory);
     process.start(program, arguments);
@@ -58,7 +58,7 @@ class Tool {
 
   /// The settings the dialogs would have left.
   void setSetting(const common::setting::Key& key, const QString& value) {
-    common::SettingsStore(m_home.filePath(QStringLiteral("config/Quimbel.ini"))).setValue(key, value);
+    common::SettingsStore(m_home.filePath(u"config/Quimbel.ini"_qs)).setValue(key, value);
   }
 
  private:
@@ -93,7 +93,7 @@ const QByteArray kCalculoNumbered =
 // A directory holding Calculo.bas.
 struct Workspace {
   QTemporaryDir dir;
-  QString file = dir.filePath(QStringLiteral("Calculo.bas"));
+  QString file = dir.filePath(u"Calculo.bas"_qs);
   explicit Workspace(const QByteArray& bytes = kCalculo) { writeBytes(file, bytes); }
   QByteArray bytes() const { return readBytes(file); }
 };
@@ -106,25 +106,23 @@ TEST(CommandLine, BadCommandLinesExitWithTwoAndSayWhy) {
   Tool tool;
   const QList<QStringList> bad = {
       {},
-      {QStringLiteral("renumber"), work.file},
-      {QStringLiteral("number")},
-      {QStringLiteral("number"), QStringLiteral("--bogus"), work.file},
-      {QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("dez"), work.file},
-      {QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("-5"), work.file},
-      {QStringLiteral("number"), QStringLiteral("--interval"), QStringLiteral("0"), work.file},
-      {QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("99999999999"), work.file},
-      {QStringLiteral("number"), QStringLiteral("--tabs"), work.file},
-      {QStringLiteral("indent"), QStringLiteral("--spaces"), QStringLiteral("0"), work.file},
-      {QStringLiteral("indent"), QStringLiteral("--tabs"), QStringLiteral("--spaces"), QStringLiteral("2"),
-       work.file},
-      {QStringLiteral("indent"), QStringLiteral("--remove"), work.file},
-      {QStringLiteral("unnumber"), QStringLiteral("--module"), QStringLiteral("Calculo"),
-       QStringLiteral("--procedure"), QStringLiteral("Calculo.Preco"), work.file},
+      {u"renumber"_qs, work.file},
+      {u"number"_qs},
+      {u"number"_qs, u"--bogus"_qs, work.file},
+      {u"number"_qs, u"--start"_qs, u"dez"_qs, work.file},
+      {u"number"_qs, u"--start"_qs, u"-5"_qs, work.file},
+      {u"number"_qs, u"--interval"_qs, u"0"_qs, work.file},
+      {u"number"_qs, u"--start"_qs, u"99999999999"_qs, work.file},
+      {u"number"_qs, u"--tabs"_qs, work.file},
+      {u"indent"_qs, u"--spaces"_qs, u"0"_qs, work.file},
+      {u"indent"_qs, u"--tabs"_qs, u"--spaces"_qs, u"2"_qs, work.file},
+      {u"indent"_qs, u"--remove"_qs, work.file},
+      {u"unnumber"_qs, u"--module"_qs, u"Calculo"_qs, u"--procedure"_qs, u"Calculo.Preco"_qs, work.file},
   };
   for (const QStringList& arguments : bad) {
     const Result result = tool.run(arguments);
     EXPECT_EQ(result.code, 2) << arguments.join(u' ').toStdString();
-    EXPECT_TRUE(result.err.startsWith(QStringLiteral("quimbel: "))) << result.err.toStdString();
+    EXPECT_TRUE(result.err.startsWith(u"quimbel: "_qs)) << result.err.toStdString();
   }
   EXPECT_EQ(work.bytes(), kCalculo);
 }
@@ -132,28 +130,25 @@ TEST(CommandLine, BadCommandLinesExitWithTwoAndSayWhy) {
 TEST(CommandLine, AScopeThatNamesNothingIsAUsageError) {
   Workspace work;
   Tool tool;
-  Result result =
-      tool.run({QStringLiteral("number"), QStringLiteral("--module"), QStringLiteral("Nada"), work.file});
+  Result result = tool.run({u"number"_qs, u"--module"_qs, u"Nada"_qs, work.file});
   EXPECT_EQ(result.code, 2);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("no module 'Nada'"))) << result.err.toStdString();
-  result = tool.run(
-      {QStringLiteral("number"), QStringLiteral("--procedure"), QStringLiteral("Calculo.Nada"), work.file});
+  EXPECT_TRUE(result.err.contains(u"no module 'Nada'"_qs)) << result.err.toStdString();
+  result = tool.run({u"number"_qs, u"--procedure"_qs, u"Calculo.Nada"_qs, work.file});
   EXPECT_EQ(result.code, 2);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("no procedure 'Calculo.Nada'"))) << result.err.toStdString();
-  result =
-      tool.run({QStringLiteral("number"), QStringLiteral("--procedure"), QStringLiteral("Preco"), work.file});
+  EXPECT_TRUE(result.err.contains(u"no procedure 'Calculo.Nada'"_qs)) << result.err.toStdString();
+  result = tool.run({u"number"_qs, u"--procedure"_qs, u"Preco"_qs, work.file});
   EXPECT_EQ(result.code, 2);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("MODULE.NAME"))) << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(u"MODULE.NAME"_qs)) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), kCalculo);
 }
 
 TEST(CommandLine, HelpListsTheCommandsAndTheirOptions) {
   Tool tool;
-  Result result = tool.run({QStringLiteral("--help")});
+  Result result = tool.run({u"--help"_qs});
   EXPECT_EQ(result.code, 0);
   for (const char* command : {"list", "number", "unnumber", "indent", "numindent"})
     EXPECT_TRUE(result.out.contains(QString::fromLatin1(command))) << command;
-  result = tool.run({QStringLiteral("numindent"), QStringLiteral("--help")});
+  result = tool.run({u"numindent"_qs, u"--help"_qs});
   EXPECT_EQ(result.code, 0);
   for (const char* option : {"--module", "--procedure", "--start", "--interval", "--tabs", "--spaces",
                              "--remove", "--check", "--diff"})
@@ -166,17 +161,16 @@ TEST(CommandLine, HelpListsTheCommandsAndTheirOptions) {
 TEST(UnreadableInput, ExitsWithThreeNamingTheFileAndWritesNothing) {
   Workspace work;
   Tool tool;
-  Result result = tool.run({QStringLiteral("indent"), work.dir.filePath(QStringLiteral("Falta.bas"))});
+  Result result = tool.run({u"indent"_qs, work.dir.filePath(u"Falta.bas"_qs)});
   EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("Falta.bas"))) << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(u"Falta.bas"_qs)) << result.err.toStdString();
 
   // A good file given with a bad one is not written either.
-  const QString binary = work.dir.filePath(QStringLiteral("Binario.bas"));
+  const QString binary = work.dir.filePath(u"Binario.bas"_qs);
   writeBytes(binary, QByteArray("Attribute VB_Name = \"B\"\r\n\0\1\2", 28));
-  result = tool.run(
-      {QStringLiteral("indent"), QStringLiteral("--spaces"), QStringLiteral("2"), work.file, binary});
+  result = tool.run({u"indent"_qs, u"--spaces"_qs, u"2"_qs, work.file, binary});
   EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("Binario.bas"))) << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(u"Binario.bas"_qs)) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), kCalculo);
 }
 
@@ -188,11 +182,11 @@ TEST(UnreadableInput, CodeTheCommandCannotRewriteStopsItAndNothingIsWritten) {
       longLine + "\r\nEnd Sub\r\n");
   const QByteArray before = work.bytes();
   Tool tool;
-  const Result result = tool.run({QStringLiteral("number"), work.file});
+  const Result result = tool.run({u"number"_qs, work.file});
   EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("Calculo.bas, line 5: Longo, line 3: Line too long")))
+  EXPECT_TRUE(result.err.contains(u"Calculo.bas, line 5: Longo, line 3: Line too long"_qs))
       << result.err.toStdString();
-  EXPECT_TRUE(result.err.contains(QStringLiteral("nothing was written"))) << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(u"nothing was written"_qs)) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), before);
 }
 
@@ -200,11 +194,9 @@ TEST(UnreadableInput, NumbersPastTheLargestStopTheRun) {
   Workspace work;
   Tool tool;
   const Result result =
-      tool.run({QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("2147483647"),
-                QStringLiteral("--interval"), QStringLiteral("1"), work.file});
+      tool.run({u"number"_qs, u"--start"_qs, u"2147483647"_qs, u"--interval"_qs, u"1"_qs, work.file});
   EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("line numbers would pass 2147483647")))
-      << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(u"line numbers would pass 2147483647"_qs)) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), kCalculo);
 }
 
@@ -214,26 +206,25 @@ TEST(UnreadableInput, NumbersPastTheLargestStopTheRun) {
 TEST(Rewriting, NumbersAModuleKeepingItsCodePageAndLineEnds) {
   Workspace work;
   Tool tool;
-  const Result result = tool.run({QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("10"),
-                                  QStringLiteral("--interval"), QStringLiteral("10"), work.file});
+  const Result result =
+      tool.run({u"number"_qs, u"--start"_qs, u"10"_qs, u"--interval"_qs, u"10"_qs, work.file});
   EXPECT_EQ(result.code, 0) << result.err.toStdString();
   EXPECT_TRUE(result.out.isEmpty());
   EXPECT_EQ(work.bytes(), kCalculoNumbered);
 
   // Numbering again changes nothing, and removing the numbers gives the module back byte for byte.
   EXPECT_EQ(
-      tool.run({QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("10"),
-                QStringLiteral("--interval"), QStringLiteral("10"), QStringLiteral("--check"), work.file})
+      tool.run({u"number"_qs, u"--start"_qs, u"10"_qs, u"--interval"_qs, u"10"_qs, u"--check"_qs, work.file})
           .code,
       0);
-  EXPECT_EQ(tool.run({QStringLiteral("unnumber"), work.file}).code, 0);
+  EXPECT_EQ(tool.run({u"unnumber"_qs, work.file}).code, 0);
   EXPECT_EQ(work.bytes(), kCalculo);
 }
 
 TEST(Rewriting, LineFeedsAndAMissingLastLineEndStayAsTheyWere) {
   Workspace work("Attribute VB_Name = \"Lf\"\nSub A()\nx = 1\nEnd Sub");
   Tool tool;
-  EXPECT_EQ(tool.run({QStringLiteral("indent"), QStringLiteral("--tabs"), work.file}).code, 0);
+  EXPECT_EQ(tool.run({u"indent"_qs, u"--tabs"_qs, work.file}).code, 0);
   EXPECT_EQ(work.bytes(), QByteArray("Attribute VB_Name = \"Lf\"\nSub A()\n\tx = 1\nEnd Sub"));
 }
 
@@ -241,16 +232,15 @@ TEST(Rewriting, OnlyTheFilesOfTheScopeChangeAndOnlyInTheirCode) {
   ExampleCopy copy;
   const auto before = copy.snapshot();
   Tool tool;
-  const Result result = tool.run({QStringLiteral("numindent"), QStringLiteral("--module"),
-                                  QStringLiteral("clsPedido"), copy.groupFile()});
+  const Result result = tool.run({u"numindent"_qs, u"--module"_qs, u"clsPedido"_qs, copy.groupFile()});
   EXPECT_EQ(result.code, 0) << result.err.toStdString();
   const auto after = copy.snapshot();
   for (auto it = before.cbegin(); it != before.cend(); ++it) {
-    if (it.key() == QStringLiteral("Loja/clsPedido.cls")) continue;
+    if (it.key() == u"Loja/clsPedido.cls"_qs) continue;
     EXPECT_EQ(after.value(it.key()), it.value()) << it.key().toStdString();
   }
-  const QList<QByteArray> oldLines = before.value(QStringLiteral("Loja/clsPedido.cls")).split('\n');
-  const QList<QByteArray> newLines = after.value(QStringLiteral("Loja/clsPedido.cls")).split('\n');
+  const QList<QByteArray> oldLines = before.value(u"Loja/clsPedido.cls"_qs).split('\n');
+  const QList<QByteArray> newLines = after.value(u"Loja/clsPedido.cls"_qs).split('\n');
   ASSERT_EQ(newLines.size(), oldLines.size());
   int changed = 0;
   for (qsizetype i = 0; i + 1 < newLines.size(); ++i) {
@@ -278,8 +268,7 @@ TEST(Rewriting, AProcedureScopeTakesEveryKindOfAProperty) {
       "x = 1\r\n"
       "End Sub\r\n");
   Tool tool;
-  const Result result = tool.run(
-      {QStringLiteral("number"), QStringLiteral("--procedure"), QStringLiteral("prop.valor"), work.file});
+  const Result result = tool.run({u"number"_qs, u"--procedure"_qs, u"prop.valor"_qs, work.file});
   EXPECT_EQ(result.code, 0) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), QByteArray("Attribute VB_Name = \"Prop\"\r\n"
                                      "Private mValor As Long\r\n"
@@ -296,63 +285,53 @@ TEST(Rewriting, AProcedureScopeTakesEveryKindOfAProperty) {
 
 TEST(Rewriting, OptionsLeftOutComeFromTheDialogsSettings) {
   Tool tool;
-  tool.setSetting(common::setting::InitialNumber, QStringLiteral("500"));
-  tool.setSetting(common::setting::Interval, QStringLiteral("50"));
-  tool.setSetting(common::setting::Indentation, QStringLiteral("2"));
-  tool.setSetting(common::setting::UseOption, QStringLiteral("1"));
+  tool.setSetting(common::setting::InitialNumber, u"500"_qs);
+  tool.setSetting(common::setting::Interval, u"50"_qs);
+  tool.setSetting(common::setting::Indentation, u"2"_qs);
+  tool.setSetting(common::setting::UseOption, u"1"_qs);
   const QByteArray module =
       "Attribute VB_Name = \"M\"\r\nSub A()\r\nIf x Then\r\ny = 1\r\nEnd If\r\nEnd Sub\r\n";
 
   Workspace numbered(module);
-  EXPECT_EQ(tool.run({QStringLiteral("number"), numbered.file}).code, 0);
+  EXPECT_EQ(tool.run({u"number"_qs, numbered.file}).code, 0);
   EXPECT_EQ(
       numbered.bytes(),
       QByteArray(
           "Attribute VB_Name = \"M\"\r\nSub A()\r\n500 If x Then\r\n550 y = 1\r\n600 End If\r\nEnd Sub\r\n"));
 
   Workspace indented(module);
-  EXPECT_EQ(tool.run({QStringLiteral("indent"), indented.file}).code, 0);
+  EXPECT_EQ(tool.run({u"indent"_qs, indented.file}).code, 0);
   EXPECT_EQ(
       indented.bytes(),
       QByteArray(
           "Attribute VB_Name = \"M\"\r\nSub A()\r\n  If x Then\r\n    y = 1\r\n  End If\r\nEnd Sub\r\n"));
 
   Workspace both(module);
-  EXPECT_EQ(tool.run({QStringLiteral("numindent"), both.file}).code, 0);
+  EXPECT_EQ(tool.run({u"numindent"_qs, both.file}).code, 0);
   EXPECT_EQ(both.bytes(),
             QByteArray("Attribute VB_Name = \"M\"\r\nSub A()\r\n500   If x Then\r\n550     y = 1\r\n"
                        "600   End If\r\nEnd Sub\r\n"));
 
   // Given options win.
   Workspace given(module);
-  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--start"), QStringLiteral("1"),
-                      QStringLiteral("--tabs"), given.file})
-                .code,
-            0);
+  EXPECT_EQ(tool.run({u"numindent"_qs, u"--start"_qs, u"1"_qs, u"--tabs"_qs, given.file}).code, 0);
   EXPECT_EQ(given.bytes(),
             QByteArray("Attribute VB_Name = \"M\"\r\nSub A()\r\n1   \tIf x Then\r\n51  \t\ty = 1\r\n"
                        "101 \tEnd If\r\nEnd Sub\r\n"));
 
   // Removing with numindent re-indents with an empty number column.
-  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--remove"), given.file}).code, 0);
+  EXPECT_EQ(tool.run({u"numindent"_qs, u"--remove"_qs, given.file}).code, 0);
   EXPECT_EQ(given.bytes(), indented.bytes());
 }
 
 TEST(Rewriting, NumberAndIndentTwiceChangesNothingTheSecondTime) {
   ExampleCopy copy;
   Tool tool;
-  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--spaces"), QStringLiteral("4"),
-                      copy.groupFile()})
-                .code,
-            0);
+  EXPECT_EQ(tool.run({u"numindent"_qs, u"--spaces"_qs, u"4"_qs, copy.groupFile()}).code, 0);
   const auto once = copy.snapshot();
-  const Result again = tool.run({QStringLiteral("numindent"), QStringLiteral("--spaces"), QStringLiteral("4"),
-                                 QStringLiteral("--check"), copy.groupFile()});
+  const Result again = tool.run({u"numindent"_qs, u"--spaces"_qs, u"4"_qs, u"--check"_qs, copy.groupFile()});
   EXPECT_EQ(again.code, 0) << again.out.toStdString();
-  EXPECT_EQ(tool.run({QStringLiteral("numindent"), QStringLiteral("--spaces"), QStringLiteral("4"),
-                      copy.groupFile()})
-                .code,
-            0);
+  EXPECT_EQ(tool.run({u"numindent"_qs, u"--spaces"_qs, u"4"_qs, copy.groupFile()}).code, 0);
   EXPECT_EQ(copy.snapshot(), once);
 }
 
@@ -369,13 +348,13 @@ TEST(Rewriting, NumberingTwiceChangesNothingAndRemovingTheNumbersGivesTheCodeBac
     SCOPED_TRACE(file.toStdString());
     Tool tool;
     // The code without numbers of its own (the examples and the generator write some).
-    ASSERT_EQ(tool.run({QStringLiteral("unnumber"), file}).code, 0);
+    ASSERT_EQ(tool.run({u"unnumber"_qs, file}).code, 0);
     const auto code = host::test::snapshot(directory);
-    ASSERT_EQ(tool.run({QStringLiteral("number"), file}).code, 0);
+    ASSERT_EQ(tool.run({u"number"_qs, file}).code, 0);
     EXPECT_NE(host::test::snapshot(directory), code);
-    const Result again = tool.run({QStringLiteral("number"), QStringLiteral("--check"), file});
+    const Result again = tool.run({u"number"_qs, u"--check"_qs, file});
     EXPECT_EQ(again.code, 0) << again.out.toStdString();
-    ASSERT_EQ(tool.run({QStringLiteral("unnumber"), file}).code, 0);
+    ASSERT_EQ(tool.run({u"unnumber"_qs, file}).code, 0);
     EXPECT_EQ(host::test::snapshot(directory), code);
   }
 }
@@ -383,13 +362,12 @@ TEST(Rewriting, NumberingTwiceChangesNothingAndRemovingTheNumbersGivesTheCodeBac
 TEST(Rewriting, AReadOnlyFileIsRefusedWithFourAndNothingIsWritten) {
   Workspace work;
   Tool tool;
-  const QString other = work.dir.filePath(QStringLiteral("Outro.bas"));
+  const QString other = work.dir.filePath(u"Outro.bas"_qs);
   writeBytes(other, QByteArray(kCalculo).replace("Calculo", "Outro"));
   QFile::setPermissions(work.file, QFile::ReadOwner | QFile::ReadGroup | QFile::ReadOther);
-  const Result result = tool.run({QStringLiteral("number"), other, work.file});
+  const Result result = tool.run({u"number"_qs, other, work.file});
   EXPECT_EQ(result.code, 4);
-  EXPECT_TRUE(result.err.contains(work.file + QStringLiteral(": the file is read-only")))
-      << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(work.file + u": the file is read-only"_qs)) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), kCalculo);
   EXPECT_EQ(readBytes(other), QByteArray(kCalculo).replace("Calculo", "Outro"));
 }
@@ -400,13 +378,12 @@ TEST(Rewriting, AReadOnlyFileIsRefusedWithFourAndNothingIsWritten) {
 TEST(CheckAndDiff, CheckExitsWithOneWhenSomethingWouldChange) {
   Workspace work;
   Tool tool;
-  Result result = tool.run(
-      {QStringLiteral("number"), QStringLiteral("--check"), QStringLiteral("Calculo.bas")}, work.dir.path());
+  Result result = tool.run({u"number"_qs, u"--check"_qs, u"Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(result.code, 1);
-  EXPECT_EQ(result.out, QStringLiteral("would change Calculo.bas\n"));
+  EXPECT_EQ(result.out, u"would change Calculo.bas\n"_qs);
   EXPECT_EQ(work.bytes(), kCalculo);
   // Nothing to remove: nothing would change.
-  result = tool.run({QStringLiteral("unnumber"), QStringLiteral("--check"), work.file});
+  result = tool.run({u"unnumber"_qs, u"--check"_qs, work.file});
   EXPECT_EQ(result.code, 0);
   EXPECT_TRUE(result.out.isEmpty());
 }
@@ -414,10 +391,9 @@ TEST(CheckAndDiff, CheckExitsWithOneWhenSomethingWouldChange) {
 TEST(CheckAndDiff, DiffPrintsTheChangedLinesWithThreeLinesOfContext) {
   Workspace work;
   Tool tool;
-  const Result result = tool.run({QStringLiteral("number"), QStringLiteral("--start"), QStringLiteral("10"),
-                                  QStringLiteral("--interval"), QStringLiteral("10"),
-                                  QStringLiteral("--diff"), QStringLiteral("Calculo.bas")},
-                                 work.dir.path());
+  const Result result = tool.run(
+      {u"number"_qs, u"--start"_qs, u"10"_qs, u"--interval"_qs, u"10"_qs, u"--diff"_qs, u"Calculo.bas"_qs},
+      work.dir.path());
   EXPECT_EQ(result.code, 0) << result.err.toStdString();
   EXPECT_EQ(result.out, QStringLiteral("--- a/Calculo.bas\n"
                                        "+++ b/Calculo.bas\n"
@@ -446,9 +422,8 @@ TEST(CheckAndDiff, DistantChangesMakeSeparateHunks) {
   module += "Sub B()\r\n    y = 2\r\nz = 3\r\nEnd Sub";  // no line end after the last line
   Workspace work(module);
   Tool tool;
-  const Result result = tool.run({QStringLiteral("indent"), QStringLiteral("--spaces"), QStringLiteral("4"),
-                                  QStringLiteral("--diff"), QStringLiteral("Calculo.bas")},
-                                 work.dir.path());
+  const Result result =
+      tool.run({u"indent"_qs, u"--spaces"_qs, u"4"_qs, u"--diff"_qs, u"Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(result.code, 0) << result.err.toStdString();
   EXPECT_EQ(result.out, QStringLiteral("--- a/Calculo.bas\n"
                                        "+++ b/Calculo.bas\n"
@@ -474,13 +449,11 @@ TEST(CheckAndDiff, DistantChangesMakeSeparateHunks) {
 TEST(CheckAndDiff, GroupPathsAreShownFromTheCurrentDirectory) {
   ExampleCopy copy;
   Tool tool;
-  const Result result = tool.run(
-      {QStringLiteral("indent"), QStringLiteral("--tabs"), QStringLiteral("--diff"),
-       QStringLiteral("--procedure"), QStringLiteral("modApi.NomeDoUsuario"), QStringLiteral("Demo.vbg")},
-      copy.path(QString()));
+  const Result result = tool.run({u"indent"_qs, u"--tabs"_qs, u"--diff"_qs, u"--procedure"_qs,
+                                  u"modApi.NomeDoUsuario"_qs, u"Demo.vbg"_qs},
+                                 copy.path(QString()));
   EXPECT_EQ(result.code, 0) << result.err.toStdString();
-  EXPECT_TRUE(result.out.startsWith(
-      QStringLiteral("--- a/Utilitarios/modApi.bas\n+++ b/Utilitarios/modApi.bas\n@@ ")))
+  EXPECT_TRUE(result.out.startsWith(u"--- a/Utilitarios/modApi.bas\n+++ b/Utilitarios/modApi.bas\n@@ "_qs))
       << result.out.toStdString();
 }
 
@@ -491,11 +464,11 @@ TEST(MessyInput, MissingFilesAreNamedAndWhatIsNotVb6CodeOrOutputThatFailsIsRefus
   QTemporaryDir dir;
   const QString project = host::test::writeMessyProject(dir.path());
   const QByteArray before = readBytes(project);
-  ASSERT_EQ(::mkfifo(QFile::encodeName(dir.filePath(QStringLiteral("Fila.bas"))).constData(), 0600), 0);
-  ASSERT_TRUE(QDir(dir.path()).mkdir(QStringLiteral("Pasta.bas")));
-  ASSERT_TRUE(QFile::link(QStringLiteral("/dev/zero"), dir.filePath(QStringLiteral("Zero.bas"))));
-  writeBytes(dir.filePath(QStringLiteral("Leiame.txt")), "Attribute VB_Name = \"Leiame\"\r\n");
-  writeBytes(dir.filePath(QStringLiteral("Pasta.vbp")), "Type=Exe\r\nModule=modPasta; PASTA.bas\r\n");
+  ASSERT_EQ(::mkfifo(QFile::encodeName(dir.filePath(u"Fila.bas"_qs)).constData(), 0600), 0);
+  ASSERT_TRUE(QDir(dir.path()).mkdir(u"Pasta.bas"_qs));
+  ASSERT_TRUE(QFile::link(u"/dev/zero"_qs, dir.filePath(u"Zero.bas"_qs)));
+  writeBytes(dir.filePath(u"Leiame.txt"_qs), "Attribute VB_Name = \"Leiame\"\r\n");
+  writeBytes(dir.filePath(u"Pasta.vbp"_qs), "Type=Exe\r\nModule=modPasta; PASTA.bas\r\n");
   const std::tuple<const char*, int, const char*> runs[] = {
       {"list Entrada.vbp > /dev/full", 4, "write error: No space left on device"},
       {"indent --diff Entrada.vbp >&-", 4, "write error: Bad file descriptor"},
@@ -509,13 +482,12 @@ TEST(MessyInput, MissingFilesAreNamedAndWhatIsNotVb6CodeOrOutputThatFailsIsRefus
       {"number Entrada.vbp", 5, "Entrada.vbp, line 4: file not found: Classes\\clsFalta.cls"}};
   Tool tool;
   for (const auto& [arguments, code, message] : runs) {
-    const QStringList shell = {QStringLiteral("-c"),
-                               QStringLiteral("'%1' %2").arg(QUIMBEL_BINARY, arguments)};
-    const Result result = tool.runProgram(QStringLiteral("/bin/sh"), shell, dir.path());
+    const QStringList shell = {u"-c"_qs, u"'%1' %2"_qs.arg(QUIMBEL_BINARY, arguments)};
+    const Result result = tool.runProgram(u"/bin/sh"_qs, shell, dir.path());
     EXPECT_EQ(result.code, code) << arguments;
     EXPECT_TRUE(result.err.contains(QString::fromLatin1(message))) << result.err.toStdString();
   }
-  EXPECT_TRUE(readBytes(dir.filePath(QStringLiteral("Fontes/modEntrada.bas"))).contains("\r\n10000 "));
+  EXPECT_TRUE(readBytes(dir.filePath(u"Fontes/modEntrada.bas"_qs)).contains("\r\n10000 "));
   EXPECT_EQ(readBytes(project), before);
 }
 
@@ -523,7 +495,7 @@ TEST(MessyInput, MissingFilesAreNamedAndWhatIsNotVb6CodeOrOutputThatFailsIsRefus
 // The progress bar
 
 TEST(ProgressBar, ALongRunOnATerminalShowsABarOnStandardErrorAndClearsIt) {
-  const QString script = QStandardPaths::findExecutable(QStringLiteral("script"));
+  const QString script = QStandardPaths::findExecutable(u"script"_qs);
   if (script.isEmpty()) GTEST_SKIP() << "no script(1) to give the tool a terminal";
   QTemporaryDir dir;
   gen::GeneratorOptions options;
@@ -532,16 +504,16 @@ TEST(ProgressBar, ALongRunOnATerminalShowsABarOnStandardErrorAndClearsIt) {
   Tool tool;
 
   // Without a terminal there is no bar.
-  Result result = tool.run({QStringLiteral("indent"), QStringLiteral("--check"), project});
+  Result result = tool.run({u"indent"_qs, u"--check"_qs, project});
   EXPECT_EQ(result.code, 1);
   EXPECT_TRUE(result.err.isEmpty()) << result.err.toStdString();
 
-  const QString command = QStringLiteral("QUIMBEL_PROGRESS_AFTER_MS=0 '%1' indent --check '%2' > /dev/null")
-                              .arg(QStringLiteral(QUIMBEL_BINARY), project);
-  result = tool.runProgram(script, {QStringLiteral("-qec"), command, QStringLiteral("/dev/null")});
+  const QString command = u"QUIMBEL_PROGRESS_AFTER_MS=0 '%1' indent --check '%2' > /dev/null"_qs.arg(
+      QStringLiteral(QUIMBEL_BINARY), project);
+  result = tool.runProgram(script, {u"-qec"_qs, command, u"/dev/null"_qs});
   EXPECT_EQ(result.code, 1);
-  EXPECT_TRUE(result.out.contains(QStringLiteral("\rquimbel: ["))) << result.out.toStdString();
-  EXPECT_TRUE(result.out.contains(QStringLiteral("%"))) << result.out.toStdString();
+  EXPECT_TRUE(result.out.contains(u"\rquimbel: ["_qs)) << result.out.toStdString();
+  EXPECT_TRUE(result.out.contains(u"%"_qs)) << result.out.toStdString();
   // The last thing written takes the bar off the line again.
   EXPECT_TRUE(result.out.endsWith(u'\r')) << result.out.toStdString();
 }
@@ -556,8 +528,7 @@ QStringList modelRows(const QString& file, const find::FindOptions& options) {
     void status(const QString&) override {}
     void resultsLabel(const QString&) override {}
     void found(find::FoundRow row) override {
-      rows << QStringLiteral("%1\t%2\t%3\t%4:%5\t%6")
-                  .arg(row.project, row.module, row.procedure)
+      rows << u"%1\t%2\t%3\t%4:%5\t%6"_qs.arg(row.project, row.module, row.procedure)
                   .arg(row.item.startline)
                   .arg(row.item.startcol)
                   .arg(row.text.replace(u'\t', u' '));
@@ -565,7 +536,7 @@ QStringList modelRows(const QString& file, const find::FindOptions& options) {
   } report;
   auto vbe = host::VbeImpl::create();
   vbe->open(file);
-  transform::WalkContext context(QStringLiteral("test"), nullptr, nullptr);
+  transform::WalkContext context(u"test"_qs, nullptr, nullptr);
   find::FindWalk(context, *vbe, report).Search(find::SearchScope::AllProjects, options);
   return report.rows;
 }
@@ -583,12 +554,12 @@ TEST(FindCommand, ListsWhatTheAddInListsInTheSameOrder) {
   big.projects = 2;
   const QString group = gen::generateProjects(generated.path(), big).groupFile;
   const find::FindOptions searches[] = {
-      {QStringLiteral("cliente"), true, false, false}, {QStringLiteral("Nome"), false, true, false},
-      {QStringLiteral("aa"), false, false, false},     {QStringLiteral("Valor*"), true, false, true},
-      {QStringLiteral("ação"), false, false, false},   {QStringLiteral("Boolean"), true, false, false},
-      {QStringLiteral("End Sub"), false, false, false}};
+      {u"cliente"_qs, true, false, false}, {u"Nome"_qs, false, true, false},
+      {u"aa"_qs, false, false, false},     {u"Valor*"_qs, true, false, true},
+      {u"ação"_qs, false, false, false},   {u"Boolean"_qs, true, false, false},
+      {u"End Sub"_qs, false, false, false}};
   // Line feeds, a lone carriage return, a hidden attribute, labels and line numbers.
-  const QString mixed = generated.filePath(QStringLiteral("Misto.bas"));
+  const QString mixed = generated.filePath(u"Misto.bas"_qs);
   writeBytes(mixed,
              "Attribute VB_Name = \"Misto\"\nOption Explicit\nPublic Function Nome() As String\r"
              "Attribute Nome.VB_UserMemId = 0\r\n10 Nome = \"A\xE7\xE3o\" ' Nome\n20 GoTo Fim\n"
@@ -596,16 +567,15 @@ TEST(FindCommand, ListsWhatTheAddInListsInTheSameOrder) {
   Tool tool;
   for (const QString& file : {example.groupFile(), group, mixed}) {
     for (const find::FindOptions& search : searches) {
-      QStringList arguments{QStringLiteral("find"), QStringLiteral("--tsv"), search.text, file};
-      if (search.wholeWord) arguments << QStringLiteral("--whole-word");
-      if (search.matchCase) arguments << QStringLiteral("--match-case");
-      if (search.patternSearch) arguments << QStringLiteral("--pattern");
+      QStringList arguments{u"find"_qs, u"--tsv"_qs, search.text, file};
+      if (search.wholeWord) arguments << u"--whole-word"_qs;
+      if (search.matchCase) arguments << u"--match-case"_qs;
+      if (search.patternSearch) arguments << u"--pattern"_qs;
       const Result result = tool.run(arguments);
       const QStringList expected = modelRows(file, search);
       EXPECT_EQ(lines(result.out), expected) << arguments.join(u' ').toStdString();
       EXPECT_EQ(result.code, expected.isEmpty() ? 1 : 0);
-      EXPECT_EQ(result.err,
-                QStringLiteral("Pesquisa completada ... %1 linhas localizadas\n").arg(expected.size()));
+      EXPECT_EQ(result.err, u"Pesquisa completada ... %1 linhas localizadas\n"_qs.arg(expected.size()));
     }
   }
 }
@@ -613,67 +583,59 @@ TEST(FindCommand, ListsWhatTheAddInListsInTheSameOrder) {
 TEST(FindCommand, RowsPointAtTheLineAndColumnInTheFile) {
   ExampleCopy example;
   Tool tool;
-  const Result result = tool.run(
-      {QStringLiteral("find"), QStringLiteral("cliente"), QStringLiteral("Demo.vbg")}, example.path({}));
+  const Result result = tool.run({u"find"_qs, u"cliente"_qs, u"Demo.vbg"_qs}, example.path({}));
   ASSERT_EQ(result.code, 0);
   for (const QString& row : lines(result.out)) {
     // path:line:column: text, the line counted in the file (headers and hidden attributes included)
-    const QStringList place = row.section(QStringLiteral(": "), 0, 0).split(u':');
+    const QStringList place = row.section(u": "_qs, 0, 0).split(u':');
     ASSERT_EQ(place.size(), 3) << row.toStdString();
     const QString line =
         host::decodeAnsi(readBytes(example.path(place[0])).split('\n').value(place[1].toInt() - 1))
             .chopped(1);
-    EXPECT_EQ(line.trimmed(), row.section(QStringLiteral(": "), 1)) << row.toStdString();
-    EXPECT_EQ(line.mid(place[2].toInt() - 1, 7).toLower(), QStringLiteral("cliente")) << row.toStdString();
+    EXPECT_EQ(line.trimmed(), row.section(u": "_qs, 1)) << row.toStdString();
+    EXPECT_EQ(line.mid(place[2].toInt() - 1, 7).toLower(), u"cliente"_qs) << row.toStdString();
   }
-  EXPECT_TRUE(result.out.contains(QStringLiteral("Loja/frmCliente.frm:"))) << result.out.toStdString();
+  EXPECT_TRUE(result.out.contains(u"Loja/frmCliente.frm:"_qs)) << result.out.toStdString();
 }
 
 TEST(FindCommand, AMissingFileIsNamedAndTheRestIsSearched) {
   ExampleCopy example;
-  QFile::remove(example.path(QStringLiteral("Loja/clsPedido.cls")));
-  QFile::remove(example.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
+  QFile::remove(example.path(u"Loja/clsPedido.cls"_qs));
+  QFile::remove(example.path(u"Utilitarios/Utilitarios.vbp"_qs));
   Tool tool;
-  const find::FindOptions search{QStringLiteral("pedido")};
-  const Result result =
-      tool.run({QStringLiteral("find"), QStringLiteral("--tsv"), search.text, QStringLiteral("Demo.vbg")},
-               example.path({}));
+  const find::FindOptions search{u"pedido"_qs};
+  const Result result = tool.run({u"find"_qs, u"--tsv"_qs, search.text, u"Demo.vbg"_qs}, example.path({}));
   EXPECT_EQ(result.code, 5);
   EXPECT_EQ(lines(result.out), modelRows(example.groupFile(), search));
-  EXPECT_TRUE(
-      result.err.contains(QStringLiteral("Demo.vbg, line 3: file not found: Utilitarios\\Utilitarios.vbp")))
+  EXPECT_TRUE(result.err.contains(u"Demo.vbg, line 3: file not found: Utilitarios\\Utilitarios.vbp"_qs))
       << result.err.toStdString();
-  EXPECT_TRUE(result.err.contains(QStringLiteral("Loja/Loja.vbp, line 9: file not found: clsPedido.cls")))
+  EXPECT_TRUE(result.err.contains(u"Loja/Loja.vbp, line 9: file not found: clsPedido.cls"_qs))
       << result.err.toStdString();
 }
 
 TEST(FindCommand, BadSearchesAndBadInput) {
   Workspace work;
   Tool tool;
-  const QString find = QStringLiteral("find");
-  Result result = tool.run({find, QStringLiteral("Nada"), work.file});
+  const QString find = u"find"_qs;
+  Result result = tool.run({find, u"Nada"_qs, work.file});
   EXPECT_EQ(result.code, 1);
-  EXPECT_EQ(result.err, QStringLiteral("Pesquisa completada ... 0 linhas localizadas\n"));
+  EXPECT_EQ(result.err, u"Pesquisa completada ... 0 linhas localizadas\n"_qs);
   for (const QStringList& arguments :
-       {QStringList{find, QStringLiteral("--pattern"), QStringLiteral("--match-case"), QStringLiteral("P*"),
-                    work.file},
-        QStringList{find, QString(), work.file},
-        QStringList{find, QStringLiteral("--pattern"), QStringLiteral("[abc"), work.file},
-        QStringList{find, QStringLiteral("--module"), QStringLiteral("Nada"), QStringLiteral("x"),
-                    work.file}}) {
+       {QStringList{find, u"--pattern"_qs, u"--match-case"_qs, u"P*"_qs, work.file},
+        QStringList{find, QString(), work.file}, QStringList{find, u"--pattern"_qs, u"[abc"_qs, work.file},
+        QStringList{find, u"--module"_qs, u"Nada"_qs, u"x"_qs, work.file}}) {
     result = tool.run(arguments);
     EXPECT_EQ(result.code, 2) << arguments.join(u' ').toStdString();
-    EXPECT_TRUE(result.err.startsWith(QStringLiteral("quimbel: "))) << result.err.toStdString();
+    EXPECT_TRUE(result.err.startsWith(u"quimbel: "_qs)) << result.err.toStdString();
   }
-  EXPECT_TRUE(tool.run({find, QStringLiteral("--pattern"), QStringLiteral("[abc"), work.file})
-                  .err.contains(QStringLiteral("Invalid pattern string")));
+  EXPECT_TRUE(
+      tool.run({find, u"--pattern"_qs, u"[abc"_qs, work.file}).err.contains(u"Invalid pattern string"_qs));
 
-  const QString binary = work.dir.filePath(QStringLiteral("Binario.bas"));
+  const QString binary = work.dir.filePath(u"Binario.bas"_qs);
   writeBytes(binary, QByteArray("Attribute VB_Name = \"B\"\r\nSub A()\r\n\0\1\2", 37));
-  result = tool.run({find, QStringLiteral("Preco"), work.file, binary});
+  result = tool.run({find, u"Preco"_qs, work.file, binary});
   EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(QStringLiteral("Binario.bas, line 3: not a text file")))
-      << result.err.toStdString();
+  EXPECT_TRUE(result.err.contains(u"Binario.bas, line 3: not a text file"_qs)) << result.err.toStdString();
   EXPECT_TRUE(result.out.isEmpty());
 }
 

@@ -90,8 +90,8 @@ TEST(PropertyValueTest, ParsesValueTextsByType) {
   };
   const QVariant refused;
   const std::vector<Case> cases = {
-      {"\"Form1\"", PropertyType::String, QStringLiteral("Form1")},
-      {"\"a\"\"b\"", PropertyType::String, QStringLiteral("a\"b")},
+      {"\"Form1\"", PropertyType::String, u"Form1"_qs},
+      {"\"a\"\"b\"", PropertyType::String, u"a\"b"_qs},
       {"\"\"", PropertyType::String, QString()},
       {"\"Endereço\"", PropertyType::String, QString::fromUtf8("Endereço")},
       {"\"Form1.frx\":0000", PropertyType::String, refused},  // text kept in the .frx is not a literal
@@ -122,13 +122,13 @@ TEST(PropertyValueTest, ParsesValueTextsByType) {
       {"&H1FFFFFFFF&", PropertyType::Color, refused},
       {"2", PropertyType::Enumerated, qint32(2)},
       // Untyped values keep the kind their text shows.
-      {"\"Nome\"", PropertyType::Untyped, QStringLiteral("Nome")},
+      {"\"Nome\"", PropertyType::Untyped, u"Nome"_qs},
       {"393217", PropertyType::Untyped, qint32(393217)},
       {"-1", PropertyType::Untyped, qint32(-1)},
       {"&H8000000F&", PropertyType::Untyped, qint32(0x8000000F)},
       {"8.25", PropertyType::Untyped, 8.25},
-      {"^Q", PropertyType::Untyped, QStringLiteral("^Q")},
-      {"\"Form1.frx\":0000", PropertyType::Untyped, QStringLiteral("\"Form1.frx\":0000")},
+      {"^Q", PropertyType::Untyped, u"^Q"_qs},
+      {"\"Form1.frx\":0000", PropertyType::Untyped, u"\"Form1.frx\":0000"_qs},
   };
   for (const Case& sample : cases) {
     SCOPED_TRACE(sample.text);
@@ -159,14 +159,14 @@ TEST(PropertyValueTest, FormatsAsTheIdeWrites) {
       {"Form", "BackColor", qint32(0x8000000F), "&H8000000F&", ""},
       {"Form", "BackColor", qint32(0xFF00), "&H0000FF00&", ""},
       {"Form", "BackColor", qint32(0), "&H00000000&", ""},
-      {"Form", "Caption", QStringLiteral("Diga \"olá\""), "\"Diga \"\"olá\"\"\"", ""},
+      {"Form", "Caption", u"Diga \"olá\""_qs, "\"Diga \"\"olá\"\"\"", ""},
       {"Form", "Caption", QString(), "\"\"", ""},
       {"Form", "ScaleHeight", 8.25f, "8.25", ""},
       {"Form", "ScaleHeight", 1264.2f, "1264.2", ""},
       {"Form", "ClientHeight", 3195.0f, "3195", ""},
       {"TextBox", "TabIndex", QVariant::fromValue(qint16(-5)), "-5", ""},
       {"TextBox", "MaxLength", qint32(40), "40", ""},
-      {"Threed.SSPanel", "Caption", QStringLiteral("x"), "\"x\"", ""},
+      {"Threed.SSPanel", "Caption", u"x"_qs, "\"x\"", ""},
       {"Threed.SSPanel", "Caption", qint32(7), "7", ""},
       {"Threed.SSPanel", "Caption", true, "-1", "'True"},
       {"Threed.SSPanel", "Caption", 2.5, "2.5", ""},
@@ -193,7 +193,7 @@ TEST(PropertyValueTest, FormattedLinesReadBackAsTheSameValue) {
       {"Form", "MaxButton", false, "   MaxButton       =   0   'False"},
       {"Form", "KeyPreview", true, "   KeyPreview      =   -1  'True"},
       {"Form", "BackColor", qint32(0x00C0C0C0), "   BackColor       =   &H00C0C0C0&"},
-      {"Form", "Caption", QStringLiteral("Pedido n\u00BA 1"), "   Caption         =   \"Pedido n\u00BA 1\""},
+      {"Form", "Caption", u"Pedido n\u00BA 1"_qs, "   Caption         =   \"Pedido n\u00BA 1\""},
       {"Form", "ScaleWidth", 4680.5f, "   ScaleWidth      =   4680.5"},
       {"TextBox", "ScrollBars", qint32(2), "   ScrollBars      =   2  'Vertical"},
       {"MSComctlLib.ListView", "View", qint32(3), "   View            =   3"},
@@ -218,11 +218,11 @@ TEST(PropertyValueTest, ConvertsAssignedValues) {
   };
   const QVariant fails;
   const std::vector<Case> cases = {
-      {QStringLiteral("5"), PropertyType::Long, qint32(5)},
-      {QStringLiteral(" 5 "), PropertyType::Long, qint32(5)},
-      {QStringLiteral("&HFF"), PropertyType::Long, qint32(255)},
-      {QStringLiteral("abc"), PropertyType::Long, fails},
-      {QStringLiteral("5abc"), PropertyType::Long, fails},
+      {u"5"_qs, PropertyType::Long, qint32(5)},
+      {u" 5 "_qs, PropertyType::Long, qint32(5)},
+      {u"&HFF"_qs, PropertyType::Long, qint32(255)},
+      {u"abc"_qs, PropertyType::Long, fails},
+      {u"5abc"_qs, PropertyType::Long, fails},
       {QVariant(), PropertyType::Long, fails},
       {7.6, PropertyType::Long, qint32(8)},
       {2.5, PropertyType::Integer, QVariant::fromValue(qint16(2))},  // halves round to even
@@ -235,19 +235,19 @@ TEST(PropertyValueTest, ConvertsAssignedValues) {
       {5, PropertyType::Boolean, true},
       {-0.5, PropertyType::Boolean, true},
       {0, PropertyType::Boolean, false},
-      {QStringLiteral("true"), PropertyType::Boolean, true},
-      {QStringLiteral("False"), PropertyType::Boolean, false},
-      {QStringLiteral("2"), PropertyType::Boolean, true},
-      {QStringLiteral("sim"), PropertyType::Boolean, fails},
-      {42, PropertyType::String, QStringLiteral("42")},
-      {true, PropertyType::String, QStringLiteral("True")},
-      {1.5, PropertyType::String, QStringLiteral("1.5")},
-      {QStringLiteral("x"), PropertyType::String, QStringLiteral("x")},
-      {QStringLiteral("8.25"), PropertyType::Single, 8.25f},
+      {u"true"_qs, PropertyType::Boolean, true},
+      {u"False"_qs, PropertyType::Boolean, false},
+      {u"2"_qs, PropertyType::Boolean, true},
+      {u"sim"_qs, PropertyType::Boolean, fails},
+      {42, PropertyType::String, u"42"_qs},
+      {true, PropertyType::String, u"True"_qs},
+      {1.5, PropertyType::String, u"1.5"_qs},
+      {u"x"_qs, PropertyType::String, u"x"_qs},
+      {u"8.25"_qs, PropertyType::Single, 8.25f},
       {1e300, PropertyType::Single, fails},
-      {QStringLiteral("1e3"), PropertyType::Double, 1000.0},
-      {QStringLiteral("&H8000000F&"), PropertyType::Color, qint32(0x8000000F)},
-      {QStringLiteral("anything"), PropertyType::Untyped, QStringLiteral("anything")},
+      {u"1e3"_qs, PropertyType::Double, 1000.0},
+      {u"&H8000000F&"_qs, PropertyType::Color, qint32(0x8000000F)},
+      {u"anything"_qs, PropertyType::Untyped, u"anything"_qs},
   };
   for (const Case& sample : cases) {
     SCOPED_TRACE(sample.in.toString().toStdString() + " as type " + std::to_string(int(sample.type)));
@@ -260,11 +260,10 @@ TEST(PropertyValueTest, ConvertsAssignedValues) {
 
   // An enumerated value must be one the property lists; other types convert as their type alone says.
   const PropertyInfo& position = *findPropertyInfo(u"Form", u"StartUpPosition");
-  EXPECT_EQ(convertPropertyValue(QStringLiteral("3"), position), QVariant(qint32(3)));
+  EXPECT_EQ(convertPropertyValue(u"3"_qs, position), QVariant(qint32(3)));
   EXPECT_FALSE(convertPropertyValue(4, position).has_value());
   EXPECT_FALSE(convertPropertyValue(-1, position).has_value());
-  EXPECT_EQ(convertPropertyValue(QStringLiteral("9"), *findPropertyInfo(u"Timer", u"Interval")),
-            QVariant(qint32(9)));
+  EXPECT_EQ(convertPropertyValue(u"9"_qs, *findPropertyInfo(u"Timer", u"Interval")), QVariant(qint32(9)));
 }
 
 }  // namespace

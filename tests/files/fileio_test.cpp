@@ -60,22 +60,20 @@ TEST_F(FileIoTest, ReadsTheBytesAsTheyAre) {
 }
 
 TEST_F(FileIoTest, FailuresNameThePathAndTheReason) {
-  ASSERT_TRUE(QDir(m_directory.path()).mkdir(QStringLiteral("Forms")));
+  ASSERT_TRUE(QDir(m_directory.path()).mkdir(u"Forms"_qs));
   const QString missing = path("Missing.bas");
   ide::Error error = expectError([&] { readFileBytes(missing); });
   EXPECT_EQ(error.number(), ide::err::FileNotFound);
-  EXPECT_EQ(error.description(), QStringLiteral("File not found: ") + missing);
+  EXPECT_EQ(error.description(), u"File not found: "_qs + missing);
 
   error = expectError([&] { readFileBytes(path("Forms")); });
   EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
-  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot read %1: ").arg(path("Forms"))))
-      << error.what();
+  EXPECT_TRUE(error.description().startsWith(u"Cannot read %1: "_qs.arg(path("Forms")))) << error.what();
 
   const QString target = path("NoSuchFolder/Module1.bas");
   error = expectError([&] { writeFileAtomically(target, "x"); });
   EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
-  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot write %1: ").arg(target)))
-      << error.what();
+  EXPECT_TRUE(error.description().startsWith(u"Cannot write %1: "_qs.arg(target))) << error.what();
 }
 
 TEST_F(FileIoTest, UnreadableFileIsAccessError) {
@@ -85,10 +83,8 @@ TEST_F(FileIoTest, UnreadableFileIsAccessError) {
   if (!permissionsApply(locked)) GTEST_SKIP() << "permission bits do not apply to this user (root)";
   const ide::Error error = expectError([&] { readFileBytes(locked); });
   EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
-  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot read ") + locked + QStringLiteral(": ")))
-      << error.what();
-  EXPECT_GT(error.description().size(),
-            (QStringLiteral("Cannot read ") + locked + QStringLiteral(": ")).size())
+  EXPECT_TRUE(error.description().startsWith(u"Cannot read "_qs + locked + u": "_qs)) << error.what();
+  EXPECT_GT(error.description().size(), (u"Cannot read "_qs + locked + u": "_qs).size())
       << "the reason is given";
 }
 
@@ -98,19 +94,18 @@ TEST_F(FileIoTest, WriteCreatesOrReplacesAFileAndLeavesNoTemporaryFile) {
   writePlainFile(path("Class1.cls"), "old content that is longer than the new one\r\n");
   writeFileAtomically(path("Class1.cls"), "new\r\n");
   EXPECT_EQ(readPlainFile(path("Class1.cls")), QByteArray("new\r\n"));
-  EXPECT_EQ(QDir(m_directory.path()).entryList(QDir::Files),
-            (QStringList{QStringLiteral("Class1.cls"), QStringLiteral("New.bas")}));
+  EXPECT_EQ(QDir(m_directory.path()).entryList(QDir::Files), (QStringList{u"Class1.cls"_qs, u"New.bas"_qs}));
 }
 
 TEST_F(FileIoTest, WriteIntoReadOnlyDirectoryFailsAndKeepsTheOldFile) {
   const QString subdirectory = path("ReadOnly");
-  ASSERT_TRUE(QDir(m_directory.path()).mkdir(QStringLiteral("ReadOnly")));
-  const QString target = subdirectory + QStringLiteral("/Form1.frm");
+  ASSERT_TRUE(QDir(m_directory.path()).mkdir(u"ReadOnly"_qs));
+  const QString target = subdirectory + u"/Form1.frm"_qs;
   writePlainFile(target, "old\r\n");
   ASSERT_TRUE(QFile::setPermissions(subdirectory, QFileDevice::ReadOwner | QFileDevice::ExeOwner));
-  const bool bound = !QFile(subdirectory + QStringLiteral("/probe")).open(QIODevice::WriteOnly);
+  const bool bound = !QFile(subdirectory + u"/probe"_qs).open(QIODevice::WriteOnly);
   if (!bound) {
-    QFile::remove(subdirectory + QStringLiteral("/probe"));
+    QFile::remove(subdirectory + u"/probe"_qs);
     QFile::setPermissions(subdirectory,
                           QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
     GTEST_SKIP() << "permission bits do not apply to this user (root)";
@@ -119,17 +114,16 @@ TEST_F(FileIoTest, WriteIntoReadOnlyDirectoryFailsAndKeepsTheOldFile) {
   QFile::setPermissions(subdirectory,
                         QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
   EXPECT_EQ(error.number(), ide::err::PathFileAccessError);
-  EXPECT_TRUE(error.description().startsWith(QStringLiteral("Cannot write ") + target + QStringLiteral(": ")))
-      << error.what();
+  EXPECT_TRUE(error.description().startsWith(u"Cannot write "_qs + target + u": "_qs)) << error.what();
   EXPECT_EQ(readPlainFile(target), QByteArray("old\r\n"));
-  EXPECT_EQ(QDir(subdirectory).entryList(QDir::Files), QStringList{QStringLiteral("Form1.frm")});
+  EXPECT_EQ(QDir(subdirectory).entryList(QDir::Files), QStringList{u"Form1.frm"_qs});
 }
 
 TEST(FileWriteBatchTest, FilesAddedTogetherAreAllOrNothing) {
   QTemporaryDir dir;
   std::vector<FileWriteBatch::File> files;
   for (int i = 0; i < 12; ++i) {
-    const QString path = dir.filePath(QStringLiteral("m%1.bas").arg(i));
+    const QString path = dir.filePath(u"m%1.bas"_qs.arg(i));
     if (i > 0) writePlainFile(path, "old");  // m0.bas is new
     files.push_back({path, QByteArray("new ") + QByteArray::number(i), {}});
   }
@@ -139,12 +133,12 @@ TEST(FileWriteBatchTest, FilesAddedTogetherAreAllOrNothing) {
       EXPECT_EQ(readPlainFile(files[i].path), QByteArray("old")) << when;
     EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden).size(), 11) << "a temporary is left";
   };
-  ASSERT_TRUE(QDir().mkpath(dir.filePath(QStringLiteral("in-the-way.bas"))));
+  ASSERT_TRUE(QDir().mkpath(dir.filePath(u"in-the-way.bas"_qs)));
   std::vector<FileWriteBatch::File> withDirectory = files;
-  withDirectory.insert(withDirectory.begin() + 5, {dir.filePath(QStringLiteral("in-the-way.bas")), "x", {}});
+  withDirectory.insert(withDirectory.begin() + 5, {dir.filePath(u"in-the-way.bas"_qs), "x", {}});
   FileWriteBatch failing;
   const ide::Error error = expectError([&] { failing.addAll(withDirectory); });
-  EXPECT_TRUE(error.description().contains(QStringLiteral("in-the-way.bas")));
+  EXPECT_TRUE(error.description().contains(u"in-the-way.bas"_qs));
   EXPECT_TRUE(failing.empty());
   expectOld("after a failed add");
   {
@@ -163,26 +157,24 @@ TEST(FileWriteBatchTest, FilesAddedTogetherAreAllOrNothing) {
 }
 
 QStringList hiddenFiles(const QString& directory) {
-  return QDir(directory)
-      .entryList(QDir::Files | QDir::Hidden | QDir::System)
-      .filter(QStringLiteral(".quimbel-"));
+  return QDir(directory).entryList(QDir::Files | QDir::Hidden | QDir::System).filter(u".quimbel-"_qs);
 }
 
 TEST(FileWriteBatchTest, KeepsModeOwnerLinksAndRefusesAReadOnlyFile) {
   QTemporaryDir dir;
-  const QString real = dir.filePath(QStringLiteral("Real.bas"));
-  const QString chain = dir.filePath(QStringLiteral("l1.bas"));  // l1.bas -> sub/l2.bas -> ../Real.bas
+  const QString real = dir.filePath(u"Real.bas"_qs);
+  const QString chain = dir.filePath(u"l1.bas"_qs);  // l1.bas -> sub/l2.bas -> ../Real.bas
   writePlainFile(real, "old");
-  ASSERT_TRUE(QDir(dir.path()).mkdir(QStringLiteral("sub")));
-  ASSERT_EQ(::symlink("../Real.bas", QFile::encodeName(dir.filePath(QStringLiteral("sub/l2.bas")))), 0);
+  ASSERT_TRUE(QDir(dir.path()).mkdir(u"sub"_qs));
+  ASSERT_EQ(::symlink("../Real.bas", QFile::encodeName(dir.filePath(u"sub/l2.bas"_qs))), 0);
   ASSERT_EQ(::symlink("sub/l2.bas", QFile::encodeName(chain)), 0);
   ASSERT_EQ(::chmod(QFile::encodeName(real), 0640), 0);
   const bool root = ::geteuid() == 0;
   if (root) {
     ASSERT_EQ(::chown(QFile::encodeName(real), 4321, 4322), 0);
   }
-  const QString linked = dir.filePath(QStringLiteral("Linked.cls"));
-  const QString other = dir.filePath(QStringLiteral("Other.cls"));
+  const QString linked = dir.filePath(u"Linked.cls"_qs);
+  const QString other = dir.filePath(u"Other.cls"_qs);
   writePlainFile(linked, "old");
   ASSERT_EQ(::link(QFile::encodeName(linked), QFile::encodeName(other)), 0);
   struct stat before {};
@@ -194,8 +186,7 @@ TEST(FileWriteBatchTest, KeepsModeOwnerLinksAndRefusesAReadOnlyFile) {
   struct stat after {};
   ASSERT_EQ(::stat(QFile::encodeName(real), &after), 0);
   EXPECT_EQ(readPlainFile(real), QByteArray("new real"));
-  EXPECT_TRUE(QFileInfo(chain).isSymLink() &&
-              QFileInfo(dir.filePath(QStringLiteral("sub/l2.bas"))).isSymLink());
+  EXPECT_TRUE(QFileInfo(chain).isSymLink() && QFileInfo(dir.filePath(u"sub/l2.bas"_qs)).isSymLink());
   EXPECT_EQ(after.st_mode & 07777, 0640u);
   if (root) {
     EXPECT_EQ(std::pair(after.st_uid, after.st_gid), std::pair(4321u, 4322u));
@@ -209,7 +200,7 @@ TEST(FileWriteBatchTest, KeepsModeOwnerLinksAndRefusesAReadOnlyFile) {
   FileWriteBatch refused;
   const ide::Error error = expectError([&] { refused.addAll({{real, "x", {}}, {linked, "y", {}}}); });
   EXPECT_EQ(error.number(), ide::err::PermissionDenied);
-  EXPECT_EQ(error.description(), QStringLiteral("Cannot write %1: the file is read-only").arg(linked));
+  EXPECT_EQ(error.description(), u"Cannot write %1: the file is read-only"_qs.arg(linked));
   EXPECT_EQ(readPlainFile(real), QByteArray("new real"));
   EXPECT_TRUE(hiddenFiles(dir.path()).isEmpty());
 }
@@ -219,23 +210,21 @@ TEST(FileWriteBatchTest, AFailedRenamePutsBackWhatWasReplacedOrSaysWhichFilesHol
     QTemporaryDir dir;
     std::vector<FileWriteBatch::File> files;
     for (int i = 0; i < 6; ++i) {
-      const QString path = dir.filePath(QStringLiteral("Mod%1.bas").arg(i));
+      const QString path = dir.filePath(u"Mod%1.bas"_qs.arg(i));
       if (i != 1) writePlainFile(path, "old");  // Mod1.bas is new
       files.push_back({path, QByteArray("new ") + QByteArray::number(i), {}});
     }
     // Hard-linked: rewritten in place.
-    ASSERT_EQ(::link(QFile::encodeName(files[2].path), QFile::encodeName(dir.filePath(QStringLiteral("x")))),
-              0);
+    ASSERT_EQ(::link(QFile::encodeName(files[2].path), QFile::encodeName(dir.filePath(u"x"_qs))), 0);
     setFileFaultHook([&](FileStep step, const QString& path) {
-      if (step == FileStep::Replace && path.endsWith(QStringLiteral("Mod4.bas"))) return EIO;
-      return step == FileStep::Restore && restoreFails && path.endsWith(QStringLiteral("Mod0.bas")) ? EIO : 0;
+      if (step == FileStep::Replace && path.endsWith(u"Mod4.bas"_qs)) return EIO;
+      return step == FileStep::Restore && restoreFails && path.endsWith(u"Mod0.bas"_qs) ? EIO : 0;
     });
     FileWriteBatch batch;
     batch.addAll(files);
     const QString description = expectError([&] { batch.commit(); }).description();
     setFileFaultHook({});
-    EXPECT_TRUE(description.startsWith(QStringLiteral("Cannot write %1: ").arg(files[4].path)))
-        << restoreFails;
+    EXPECT_TRUE(description.startsWith(u"Cannot write %1: "_qs.arg(files[4].path))) << restoreFails;
     for (int i = 0; i < 6; ++i)
       EXPECT_EQ(readPlainFile(files[size_t(i)].path), i == 0 && restoreFails ? QByteArray("new 0")
                                                       : i == 1               ? QByteArray("<unreadable>")
@@ -244,8 +233,8 @@ TEST(FileWriteBatchTest, AFailedRenamePutsBackWhatWasReplacedOrSaysWhichFilesHol
     EXPECT_EQ(batch.written(0) != nullptr, restoreFails);
     // The backup that holds the old text is the one file left, and the message names it.
     EXPECT_EQ(hiddenFiles(dir.path()).size(), restoreFails ? 1 : 0);
-    EXPECT_EQ(description.contains(QStringLiteral("%1 holds the new text").arg(files[0].path)) &&
-                  description.contains(hiddenFiles(dir.path()).value(0, QStringLiteral("?"))),
+    EXPECT_EQ(description.contains(u"%1 holds the new text"_qs.arg(files[0].path)) &&
+                  description.contains(hiddenFiles(dir.path()).value(0, u"?"_qs)),
               restoreFails)
         << description.toStdString();
   }
@@ -278,7 +267,7 @@ TEST(FileWriteBatchTest, AFileChangedOrDeletedSinceItWasReadIsNotReplaced) {
   };
   for (const Case& c : cases) {
     QTemporaryDir dir;
-    const QString path = dir.filePath(QStringLiteral("Form1.frm"));
+    const QString path = dir.filePath(u"Form1.frm"_qs);
     writePlainFile(path, "old");
     setTime(path, future);
     FileStamp stamp;
@@ -333,15 +322,14 @@ int inChild(const std::function<void()>& body, const std::function<void(pid_t)>&
 std::vector<FileWriteBatch::File> manyFiles(const QTemporaryDir& dir, int count) {
   std::vector<FileWriteBatch::File> files;
   for (int i = 0; i < count; ++i)
-    files.push_back({dir.filePath(QStringLiteral("Mod%1.bas").arg(i)), QByteArray(300, 'x'), {}});
+    files.push_back({dir.filePath(u"Mod%1.bas"_qs.arg(i)), QByteArray(300, 'x'), {}});
   return files;
 }
 
 TEST(FileWriteBatchTest, ABatchOfMoreFilesThanMayBeOpenAtOnceIsWritten) {
   // In memory where it can be: 1,500 flushes to a disk take seconds.
-  const bool shm = QFileInfo(QStringLiteral("/dev/shm")).isWritable();
-  QTemporaryDir dir(shm ? QStringLiteral("/dev/shm/quimbel-XXXXXX")
-                        : QDir::tempPath() + QStringLiteral("/q-XXXXXX"));
+  const bool shm = QFileInfo(u"/dev/shm"_qs).isWritable();
+  QTemporaryDir dir(shm ? u"/dev/shm/quimbel-XXXXXX"_qs : QDir::tempPath() + u"/q-XXXXXX"_qs);
   const int status = inChild([&] {
     const rlimit limit{1024, 1024};
     ::setrlimit(RLIMIT_NOFILE, &limit);
@@ -356,13 +344,13 @@ TEST(FileWriteBatchTest, ABatchOfMoreFilesThanMayBeOpenAtOnceIsWritten) {
 TEST(FileWriteBatchTest, ASignalWhileWritingLeavesNothingBehindAndAKilledSaveIsSweptNextTime) {
   for (const int signal : {SIGINT, SIGTERM, SIGHUP, SIGKILL}) {
     QTemporaryDir dir;
-    writePlainFile(dir.filePath(QStringLiteral("Mod0.bas")), "old");
+    writePlainFile(dir.filePath(u"Mod0.bas"_qs), "old");
     const int status = inChild(
         [&] {
           const rlimit limit{64, 64};  // flushed and named in groups of 16
           ::setrlimit(RLIMIT_NOFILE, &limit);
           setFileFaultHook([](FileStep, const QString& path) {
-            if (path.endsWith(QStringLiteral("Mod60.bas"))) {
+            if (path.endsWith(u"Mod60.bas"_qs)) {
               if (::write(g_ready, "!", 1) != 1) ::_exit(3);
               ::usleep(300000);
             }
@@ -374,11 +362,10 @@ TEST(FileWriteBatchTest, ASignalWhileWritingLeavesNothingBehindAndAKilledSaveIsS
         },
         [&](pid_t child) { ::kill(child, signal); });
     EXPECT_TRUE(WIFSIGNALED(status) && WTERMSIG(status) == signal) << signal << " " << status;
-    EXPECT_EQ(readPlainFile(dir.filePath(QStringLiteral("Mod0.bas"))), QByteArray("old")) << signal;
+    EXPECT_EQ(readPlainFile(dir.filePath(u"Mod0.bas"_qs)), QByteArray("old")) << signal;
     EXPECT_EQ(hiddenFiles(dir.path()).isEmpty(), signal != SIGKILL) << signal;
-    writeFileAtomically(dir.filePath(QStringLiteral("Mod0.bas")), "new");
-    EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden),
-              QStringList{QStringLiteral("Mod0.bas")});
+    writeFileAtomically(dir.filePath(u"Mod0.bas"_qs), "new");
+    EXPECT_EQ(QDir(dir.path()).entryList(QDir::Files | QDir::Hidden), QStringList{u"Mod0.bas"_qs});
   }
 }
 

@@ -150,9 +150,9 @@ class FormDescriptionTest : public ::testing::Test {
 
   void read() {
     m_bytes = windowsFile(kCustomerForm);
-    m_lines = readSourceLines(m_bytes, QStringLiteral("frmCliente.frm"));
+    m_lines = readSourceLines(m_bytes, u"frmCliente.frm"_qs);
     std::size_t position = kBeginIndex;
-    m_form.emplace(FormDescription::parse(m_lines, position, QStringLiteral("frmCliente.frm")));
+    m_form.emplace(FormDescription::parse(m_lines, position, u"frmCliente.frm"_qs));
     m_afterEnd = position;
   }
 
@@ -161,7 +161,7 @@ class FormDescriptionTest : public ::testing::Test {
     std::vector<SourceLine> lines(m_lines.begin(), m_lines.begin() + kBeginIndex);
     m_form->appendLines(lines);
     lines.insert(lines.end(), m_lines.begin() + static_cast<std::ptrdiff_t>(m_afterEnd), m_lines.end());
-    return writeSourceLines(lines, QStringLiteral("frmCliente.frm"));
+    return writeSourceLines(lines, u"frmCliente.frm"_qs);
   }
 
   FormNode& node(const char* name, int index = -1) {
@@ -215,7 +215,7 @@ TEST_F(FormDescriptionTest, ListsPropertiesInFileOrder) {
             (QStringList{"Height", "Index", "Left", "MaxLength", "TabIndex", "Text", "Top", "Width"}));
   // The Font group is not a property line.
   EXPECT_EQ(m_form->root().propertyNames().size(), 15);
-  EXPECT_FALSE(m_form->root().propertyNames().contains(QStringLiteral("Font")));
+  EXPECT_FALSE(m_form->root().propertyNames().contains(u"Font"_qs));
 }
 
 TEST_F(FormDescriptionTest, ReadsValuesAsWrittenWithoutComments) {
@@ -279,9 +279,9 @@ TEST(FormDescriptionReadTest, NestedPropertyGroupsAndDesignerClasses) {
    EndProperty
 End
 )");
-  const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("deDados.Dsr"));
+  const std::vector<SourceLine> lines = readSourceLines(bytes, u"deDados.Dsr"_qs);
   std::size_t position = 0;
-  const FormDescription form = FormDescription::parse(lines, position, QStringLiteral("deDados.Dsr"));
+  const FormDescription form = FormDescription::parse(lines, position, u"deDados.Dsr"_qs);
   EXPECT_EQ(position, lines.size());
   EXPECT_EQ(form.root().className(), u"{C0E45035-5775-11D0-B388-00A0C9055D8E}");
   EXPECT_EQ(form.root().name(), u"deDados");
@@ -291,23 +291,23 @@ End
   EXPECT_EQ(connection->propertyBlocks()[0]->property(u"Prompt"), u"0");
   std::vector<SourceLine> written;
   form.appendLines(written);
-  EXPECT_EQ(writeSourceLines(written, QStringLiteral("deDados.Dsr")), bytes);
+  EXPECT_EQ(writeSourceLines(written, u"deDados.Dsr"_qs), bytes);
 }
 
 TEST(FormDescriptionReadTest, KeepsBlankLinesAndUnusualSpacing) {
   const QByteArray bytes(
       "Begin VB.Form Form1\n\tCaption=\"x\"   \n\n   Begin VB.Timer Timer1\n      Interval"
       "   =   500 ' half a second\n   End\nEnd");
-  const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("Form1.frm"));
+  const std::vector<SourceLine> lines = readSourceLines(bytes, u"Form1.frm"_qs);
   std::size_t position = 0;
-  const FormDescription form = FormDescription::parse(lines, position, QStringLiteral("Form1.frm"));
+  const FormDescription form = FormDescription::parse(lines, position, u"Form1.frm"_qs);
   EXPECT_EQ(form.root().name(), u"Form1");
   EXPECT_EQ(form.root().property(u"Caption"), u"\"x\"");
   EXPECT_EQ(form.root().children()[0]->property(u"Interval"), u"500");
   EXPECT_EQ(form.root().children()[0]->propertyComment(u"Interval"), u"' half a second");
   std::vector<SourceLine> written;
   form.appendLines(written);
-  EXPECT_EQ(writeSourceLines(written, QStringLiteral("Form1.frm")), bytes);
+  EXPECT_EQ(writeSourceLines(written, u"Form1.frm"_qs), bytes);
 }
 
 // --- Property edits --------------------------------------------------------------------------------------
@@ -365,10 +365,10 @@ TEST_F(FormDescriptionTest, SettingAPropertyRewritesOnlyItsLine) {
 
 TEST_F(FormDescriptionTest, NewPropertiesGoInAlphabeticalOrderInTheIdesLayout) {
   FormNode& text = node("txtCampo", 0);
-  text.setProperty(QStringLiteral("Enabled"), QStringLiteral("0"), QStringLiteral("'False"));
-  text.setProperty(QStringLiteral("Alignment"), QStringLiteral("2"), QStringLiteral("'Center"));
-  text.setProperty(QStringLiteral("Locked"), QStringLiteral("-1"), QStringLiteral("'True"));
-  text.setProperty(QStringLiteral("ToolTipText"), QStringLiteral("\"Número\""));
+  text.setProperty(u"Enabled"_qs, u"0"_qs, u"'False"_qs);
+  text.setProperty(u"Alignment"_qs, u"2"_qs, u"'Center"_qs);
+  text.setProperty(u"Locked"_qs, u"-1"_qs, u"'True"_qs);
+  text.setProperty(u"ToolTipText"_qs, u"\"Número\""_qs);
   EXPECT_EQ(asText(writtenFile()), asText(replacedOnce(m_bytes, R"(      Begin VB.TextBox txtCampo 
          Height          =   315
          Index           =   0
@@ -394,9 +394,7 @@ TEST_F(FormDescriptionTest, NewPropertiesGoInAlphabeticalOrderInTheIdesLayout) {
 }
 
 TEST_F(FormDescriptionTest, ObjectNamesInPropertyGroupsUseTheIdesPadding) {
-  node("lvwContatos")
-      .propertyBlock(u"ColumnHeader(1)")
-      ->setProperty(QStringLiteral("Object.Tag"), QStringLiteral("\"nome\""));
+  node("lvwContatos").propertyBlock(u"ColumnHeader(1)")->setProperty(u"Object.Tag"_qs, u"\"nome\""_qs);
   // The control's own order is not alphabetical; a new line still goes before the first name after it.
   EXPECT_EQ(asText(writtenFile()),
             asText(replacedOnce(
@@ -414,13 +412,12 @@ TEST_F(FormDescriptionTest, RemovesProperties) {
 TEST_F(FormDescriptionTest, RefusesValuesThatWouldNotReadBack) {
   FormNode& ok = node("cmdOk");
   // A line break, an unbalanced quote that would swallow the comment, blanks the reader would trim.
-  for (const QString& value : {QStringLiteral("\"a\nb\""), QStringLiteral("\"open"), QStringLiteral("x  ")}) {
-    const ide::Error error =
-        expectError([&] { ok.setProperty(QStringLiteral("Caption"), value, QStringLiteral("'note")); });
+  for (const QString& value : {u"\"a\nb\""_qs, u"\"open"_qs, u"x  "_qs}) {
+    const ide::Error error = expectError([&] { ok.setProperty(u"Caption"_qs, value, u"'note"_qs); });
     EXPECT_EQ(error.number(), ide::err::InvalidProcedureCall);
   }
-  for (const QString& name : {QString(), QStringLiteral("Two Words"), QStringLiteral("A=B")}) {
-    const ide::Error error = expectError([&] { ok.setProperty(name, QStringLiteral("1")); });
+  for (const QString& name : {QString(), u"Two Words"_qs, u"A=B"_qs}) {
+    const ide::Error error = expectError([&] { ok.setProperty(name, u"1"_qs); });
     EXPECT_EQ(error.number(), ide::err::InvalidProcedureCall);
   }
   EXPECT_EQ(asText(writtenFile()), asText(m_bytes)) << "a refused edit leaves the description alone";
@@ -440,9 +437,9 @@ TEST_F(FormDescriptionTest, SetsAndRemovesTheIndex) {
 }
 
 TEST_F(FormDescriptionTest, AddsAndRemovesPropertyGroups) {
-  PropertyBlock& font = node("cmdOk").addPropertyBlock(QStringLiteral("Font"));
-  font.setProperty(QStringLiteral("Name"), QStringLiteral("\"Arial\""));
-  font.setProperty(QStringLiteral("Size"), QStringLiteral("9.75"));
+  PropertyBlock& font = node("cmdOk").addPropertyBlock(u"Font"_qs);
+  font.setProperty(u"Name"_qs, u"\"Arial\""_qs);
+  font.setProperty(u"Size"_qs, u"9.75"_qs);
   EXPECT_EQ(asText(writtenFile()),
             asText(replacedOnce(m_bytes, "      Default         =   -1  'True\n      Height",
                                 R"(      Default         =   -1  'True
@@ -455,9 +452,9 @@ TEST_F(FormDescriptionTest, AddsAndRemovesPropertyGroups) {
   EXPECT_FALSE(node("cmdOk").removePropertyBlock(u"Font"));
   EXPECT_EQ(asText(writtenFile()), asText(m_bytes));
 
-  PropertyBlock& column = node("lvwContatos")
-                              .addPropertyBlock(QStringLiteral("ColumnHeader(3)"),
-                                                QStringLiteral("{BDD1F052-858B-11D1-B16A-00C0F0283628}"));
+  PropertyBlock& column =
+      node("lvwContatos")
+          .addPropertyBlock(u"ColumnHeader(3)"_qs, u"{BDD1F052-858B-11D1-B16A-00C0F0283628}"_qs);
   EXPECT_EQ(column.guid(), u"{BDD1F052-858B-11D1-B16A-00C0F0283628}");
   EXPECT_EQ(node("lvwContatos").propertyBlocks().size(), 3u);
 }
@@ -465,18 +462,18 @@ TEST_F(FormDescriptionTest, AddsAndRemovesPropertyGroups) {
 // --- Control edits ---------------------------------------------------------------------------------------
 
 TEST_F(FormDescriptionTest, RenamingRewritesOnlyTheNameOnTheBeginLine) {
-  node("cmdOk").setName(QStringLiteral("cmdConfirmar"));
+  node("cmdOk").setName(u"cmdConfirmar"_qs);
   EXPECT_EQ(asText(writtenFile()), asText(replacedOnce(m_bytes, "   Begin VB.CommandButton cmdOk \n",
                                                        "   Begin VB.CommandButton cmdConfirmar \n")));
   EXPECT_EQ(m_form->root().children()[3]->name(), u"cmdConfirmar");
-  EXPECT_EQ(expectError([&] { node("cmdConfirmar").setName(QStringLiteral("two words")); }).number(),
+  EXPECT_EQ(expectError([&] { node("cmdConfirmar").setName(u"two words"_qs); }).number(),
             ide::err::InvalidProcedureCall);
 }
 
 TEST_F(FormDescriptionTest, AddsControlsAsTheIdeWritesThem) {
-  FormNode& added = node("fraEndereco").addChild(QStringLiteral("VB.TextBox"), QStringLiteral("txtCep"), 1);
-  added.setProperty(QStringLiteral("Height"), QStringLiteral("315"));
-  added.setProperty(QStringLiteral("Left"), QStringLiteral("1320"));
+  FormNode& added = node("fraEndereco").addChild(u"VB.TextBox"_qs, u"txtCep"_qs, 1);
+  added.setProperty(u"Height"_qs, u"315"_qs);
+  added.setProperty(u"Left"_qs, u"1320"_qs);
   EXPECT_EQ(added.parent(), &node("fraEndereco"));
   EXPECT_EQ(added.className(), u"VB.TextBox");
   EXPECT_EQ(added.index(), -1);
@@ -501,8 +498,8 @@ TEST_F(FormDescriptionTest, AddsControlsAsTheIdeWritesThem) {
 }
 
 TEST_F(FormDescriptionTest, AppendsControlsAfterTheLastOne) {
-  m_form->root().addChild(QStringLiteral("VB.Timer"), QStringLiteral("tmrRelogio"));
-  node("mnuSair").addChild(QStringLiteral("VB.Menu"), QStringLiteral("mnuSub"), 7);
+  m_form->root().addChild(u"VB.Timer"_qs, u"tmrRelogio"_qs);
+  node("mnuSair").addChild(u"VB.Menu"_qs, u"mnuSub"_qs, 7);
   QByteArray expected =
       replacedOnce(m_bytes, "         Shortcut        =   ^Q\n      End\n   End\nEnd\n",
                    "         Shortcut        =   ^Q\n         Begin VB.Menu mnuSub \n         End\n"
@@ -534,11 +531,11 @@ TEST_F(FormDescriptionTest, TakesAControlWithItsWholeBlock) {
 
 TEST_F(FormDescriptionTest, MovingAControlReindentsItsLines) {
   std::unique_ptr<FormNode> label = node("fraEndereco").takeChild(node("lblCidade"));
-  label->setName(QStringLiteral("lblMovido"));
+  label->setName(u"lblMovido"_qs);
   FormNode& moved = m_form->root().insertChild(std::move(label), 0);
   EXPECT_EQ(moved.parent(), &m_form->root());
   EXPECT_EQ(m_form->root().children()[0], &moved);
-  moved.setProperty(QStringLiteral("Top"), QStringLiteral("60"));
+  moved.setProperty(u"Top"_qs, u"60"_qs);
   EXPECT_EQ(moved.name(), u"lblMovido");
   EXPECT_EQ(moved.property(u"Caption"), u"\"Cidade:\"");
 
@@ -562,14 +559,14 @@ TEST_F(FormDescriptionTest, MovingAControlReindentsItsLines) {
 
 TEST_F(FormDescriptionTest, CopiesAreDeepAndIndependent) {
   FormDescription copy = *m_form;
-  copy.root().findNode(u"cmdOk")->setProperty(QStringLiteral("Caption"), QStringLiteral("\"Sim\""));
-  copy.root().findNode(u"fraEndereco")->addChild(QStringLiteral("VB.Label"), QStringLiteral("lblNovo"));
+  copy.root().findNode(u"cmdOk")->setProperty(u"Caption"_qs, u"\"Sim\""_qs);
+  copy.root().findNode(u"fraEndereco")->addChild(u"VB.Label"_qs, u"lblNovo"_qs);
   EXPECT_EQ(asText(writtenFile()), asText(m_bytes)) << "the original is untouched";
   EXPECT_EQ(copy.root().children()[0]->children().size(), 4u);
   EXPECT_EQ(copy.root().children()[0]->children()[3]->parent(), copy.root().children()[0]);
   EXPECT_EQ(copy.root().children()[0]->children()[0]->parent(), copy.root().children()[0]);
 
-  FormDescription assigned(QStringLiteral("VB.Form"), QStringLiteral("Other"));
+  FormDescription assigned(u"VB.Form"_qs, u"Other"_qs);
   assigned = copy;
   EXPECT_EQ(assigned.root().findNode(u"cmdOk")->property(u"Caption"), u"\"Sim\"");
   FormDescription moved = std::move(assigned);
@@ -577,33 +574,32 @@ TEST_F(FormDescriptionTest, CopiesAreDeepAndIndependent) {
 }
 
 TEST(FormDescriptionCreateTest, NewDescriptionsAreWrittenAsTheIdeWritesThem) {
-  FormDescription form(QStringLiteral("VB.UserControl"), QStringLiteral("ctlData"), LineEnd::LF);
-  form.root().setProperty(QStringLiteral("ScaleHeight"), QStringLiteral("3600"));
-  form.root().setProperty(QStringLiteral("ClientHeight"), QStringLiteral("3600"));
-  FormNode& box = form.root().addChild(QStringLiteral("VB.TextBox"), QStringLiteral("txtData"));
-  box.setProperty(QStringLiteral("Text"), QStringLiteral("\"\""));
+  FormDescription form(u"VB.UserControl"_qs, u"ctlData"_qs, LineEnd::LF);
+  form.root().setProperty(u"ScaleHeight"_qs, u"3600"_qs);
+  form.root().setProperty(u"ClientHeight"_qs, u"3600"_qs);
+  FormNode& box = form.root().addChild(u"VB.TextBox"_qs, u"txtData"_qs);
+  box.setProperty(u"Text"_qs, u"\"\""_qs);
   std::vector<SourceLine> lines;
   form.appendLines(lines);
-  EXPECT_EQ(writeSourceLines(lines, QStringLiteral("ctlData.ctl")),
-            QByteArray("Begin VB.UserControl ctlData \n"
-                       "   ClientHeight    =   3600\n"
-                       "   ScaleHeight     =   3600\n"
-                       "   Begin VB.TextBox txtData \n"
-                       "      Text            =   \"\"\n"
-                       "   End\n"
-                       "End\n"));
+  EXPECT_EQ(writeSourceLines(lines, u"ctlData.ctl"_qs), QByteArray("Begin VB.UserControl ctlData \n"
+                                                                   "   ClientHeight    =   3600\n"
+                                                                   "   ScaleHeight     =   3600\n"
+                                                                   "   Begin VB.TextBox txtData \n"
+                                                                   "      Text            =   \"\"\n"
+                                                                   "   End\n"
+                                                                   "End\n"));
 }
 
 TEST(FormDescriptionCreateTest, GeneratedLinesEndLikeTheirBlocksBeginLine) {
   const QByteArray bytes("Begin VB.Form Form1 \n   Begin VB.Frame Frame1 \r\n   End\nEnd\n");
-  const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("Form1.frm"));
+  const std::vector<SourceLine> lines = readSourceLines(bytes, u"Form1.frm"_qs);
   std::size_t position = 0;
-  FormDescription form = FormDescription::parse(lines, position, QStringLiteral("Form1.frm"));
-  form.root().setProperty(QStringLiteral("Caption"), QStringLiteral("\"x\""));
-  form.root().children()[0]->setProperty(QStringLiteral("Caption"), QStringLiteral("\"y\""));
+  FormDescription form = FormDescription::parse(lines, position, u"Form1.frm"_qs);
+  form.root().setProperty(u"Caption"_qs, u"\"x\""_qs);
+  form.root().children()[0]->setProperty(u"Caption"_qs, u"\"y\""_qs);
   std::vector<SourceLine> written;
   form.appendLines(written);
-  EXPECT_EQ(writeSourceLines(written, QStringLiteral("Form1.frm")),
+  EXPECT_EQ(writeSourceLines(written, u"Form1.frm"_qs),
             QByteArray("Begin VB.Form Form1 \n   Caption         =   \"x\"\n   Begin VB.Frame Frame1 \r\n"
                        "      Caption         =   \"y\"\r\n   End\nEnd\n"));
 }
@@ -635,10 +631,9 @@ class FormDescriptionErrorTest : public ::testing::TestWithParam<MalformedForm> 
 
 TEST_P(FormDescriptionErrorTest, NamesTheFileAndTheLine) {
   const QByteArray bytes = windowsFile(GetParam().text);
-  const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("Form1.frm"));
+  const std::vector<SourceLine> lines = readSourceLines(bytes, u"Form1.frm"_qs);
   std::size_t position = 1;  // after the VERSION line
-  const ide::Error error =
-      expectError([&] { FormDescription::parse(lines, position, QStringLiteral("Form1.frm")); });
+  const ide::Error error = expectError([&] { FormDescription::parse(lines, position, u"Form1.frm"_qs); });
   EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
   EXPECT_EQ(error.description(), QString::fromUtf8(GetParam().description));
 }
@@ -678,12 +673,11 @@ INSTANTIATE_TEST_SUITE_P(
 TEST(FormDescriptionNestingTest, RefusesAbsurdNestingInsteadOfOverflowing) {
   std::vector<SourceLine> lines;
   for (int i = 0; i < 500; ++i)
-    lines.push_back({QStringLiteral("Begin VB.Frame F%1").arg(i), LineEnd::CRLF});
+    lines.push_back({u"Begin VB.Frame F%1"_qs.arg(i), LineEnd::CRLF});
   for (int i = 0; i < 500; ++i)
-    lines.push_back({QStringLiteral("End"), LineEnd::CRLF});
+    lines.push_back({u"End"_qs, LineEnd::CRLF});
   std::size_t position = 0;
-  const ide::Error error =
-      expectError([&] { FormDescription::parse(lines, position, QStringLiteral("deep.frm")); });
+  const ide::Error error = expectError([&] { FormDescription::parse(lines, position, u"deep.frm"_qs); });
   EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
   EXPECT_EQ(error.description(), u"deep.frm, line 202: controls nested too deeply");
 }

@@ -24,17 +24,17 @@ Project=..\Comum\Relatorios.vbp
 class GroupFileTest : public ::testing::Test {
  protected:
   void SetUp() override { m_bytes = windowsFile(kGroup); }
-  QByteArray written() const { return m_group.toBytes(QStringLiteral("Demo.vbg")); }
+  QByteArray written() const { return m_group.toBytes(u"Demo.vbg"_qs); }
 
   QByteArray m_bytes;
-  GroupFile m_group = GroupFile::parse(windowsFile(kGroup), QStringLiteral("Demo.vbg"));
+  GroupFile m_group = GroupFile::parse(windowsFile(kGroup), u"Demo.vbg"_qs);
 };
 
 TEST_F(GroupFileTest, ListsProjectsAndTheStartupProjectAndWritesBackByteForByte) {
   EXPECT_EQ(asText(written()), asText(m_bytes));
   const std::vector<GroupProject> expected = {{QString::fromUtf8("Utilitários\\Utilitarios.vbp"), false},
-                                              {QStringLiteral("Loja\\Loja.vbp"), true},
-                                              {QStringLiteral("..\\Comum\\Relatorios.vbp"), false}};
+                                              {u"Loja\\Loja.vbp"_qs, true},
+                                              {u"..\\Comum\\Relatorios.vbp"_qs, false}};
   EXPECT_EQ(m_group.projects(), expected);
   EXPECT_EQ(m_group.startupProject(), 1);
 }
@@ -56,7 +56,7 @@ TEST_F(GroupFileTest, ChangesTheStartupProjectByRewritingTwoKeys) {
 }
 
 TEST_F(GroupFileTest, AddsProjectsAfterTheLastOne) {
-  m_group.addProject(QStringLiteral("Novo\\Novo.vbp"));
+  m_group.addProject(u"Novo\\Novo.vbp"_qs);
   EXPECT_EQ(asText(written()),
             asText(replacedOnce(m_bytes, "Relatorios.vbp\n", "Relatorios.vbp\nProject=Novo\\Novo.vbp\n")));
   EXPECT_EQ(m_group.projects().size(), 3u + 1u);
@@ -74,25 +74,25 @@ TEST_F(GroupFileTest, RemovesProjects) {
 
 TEST(GroupFileCreateTest, NewGroupsStartWithTheSignature) {
   GroupFile group;
-  group.addProject(QStringLiteral("A\\A.vbp"));
-  group.addProject(QStringLiteral("B\\B.vbp"));
+  group.addProject(u"A\\A.vbp"_qs);
+  group.addProject(u"B\\B.vbp"_qs);
   group.setStartupProject(0);
-  EXPECT_EQ(group.toBytes(QStringLiteral("G.vbg")),
+  EXPECT_EQ(group.toBytes(u"G.vbg"_qs),
             QByteArray("VBGROUP 5.0\r\nStartupProject=A\\A.vbp\r\nProject=B\\B.vbp\r\n"));
 }
 
 TEST(GroupFileCreateTest, KeepsLineEndsAndOtherKeys) {
   const QByteArray bytes("VBGROUP 5.0\nStartupProject=A.vbp\nExtra=1\nProject=B.vbp");
-  GroupFile group = GroupFile::parse(bytes, QStringLiteral("G.vbg"));
-  EXPECT_EQ(group.toBytes(QStringLiteral("G.vbg")), bytes);
+  GroupFile group = GroupFile::parse(bytes, u"G.vbg"_qs);
+  EXPECT_EQ(group.toBytes(u"G.vbg"_qs), bytes);
   EXPECT_EQ(group.projects().size(), 2u);
-  group.addProject(QStringLiteral("C.vbp"));
-  EXPECT_EQ(group.toBytes(QStringLiteral("G.vbg")),
+  group.addProject(u"C.vbp"_qs);
+  EXPECT_EQ(group.toBytes(u"G.vbg"_qs),
             QByteArray("VBGROUP 5.0\nStartupProject=A.vbp\nExtra=1\nProject=B.vbp\nProject=C.vbp"));
 
-  GroupFile empty = GroupFile::parse(QByteArray("VBGROUP 5.0\r\n\r\n"), QStringLiteral("G.vbg"));
-  empty.addProject(QStringLiteral("A.vbp"));
-  EXPECT_EQ(empty.toBytes(QStringLiteral("G.vbg")), QByteArray("VBGROUP 5.0\r\nProject=A.vbp\r\n\r\n"));
+  GroupFile empty = GroupFile::parse(QByteArray("VBGROUP 5.0\r\n\r\n"), u"G.vbg"_qs);
+  empty.addProject(u"A.vbp"_qs);
+  EXPECT_EQ(empty.toBytes(u"G.vbg"_qs), QByteArray("VBGROUP 5.0\r\nProject=A.vbp\r\n\r\n"));
 }
 
 struct MalformedGroup {
@@ -103,8 +103,7 @@ struct MalformedGroup {
 class GroupFileErrorTest : public ::testing::TestWithParam<MalformedGroup> {};
 
 TEST_P(GroupFileErrorTest, NamesTheFileAndTheLine) {
-  const ide::Error error =
-      expectError([&] { GroupFile::parse(GetParam().bytes, QStringLiteral("Demo.vbg")); });
+  const ide::Error error = expectError([&] { GroupFile::parse(GetParam().bytes, u"Demo.vbg"_qs); });
   EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
   EXPECT_EQ(error.description(), QString::fromUtf8(GetParam().description));
 }

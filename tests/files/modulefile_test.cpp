@@ -107,7 +107,7 @@ std::vector<QString> texts(const std::vector<SourceLine>& lines) {
 
 TEST(ModuleFileTest, StandardModuleHasOnlyItsNameAsHeader) {
   const QByteArray bytes = windowsFile(kStandardModule);
-  const ModuleSource module = parseModule(bytes, QStringLiteral("modPrincipal.bas"));
+  const ModuleSource module = parseModule(bytes, u"modPrincipal.bas"_qs);
   EXPECT_TRUE(module.preamble.empty());
   EXPECT_FALSE(module.form.has_value());
   ASSERT_EQ(module.moduleAttributes.size(), 1u);
@@ -119,12 +119,12 @@ TEST(ModuleFileTest, StandardModuleHasOnlyItsNameAsHeader) {
   EXPECT_EQ(module.code[8].text, u"End Sub");
   EXPECT_TRUE(module.memberAttributes.empty());
   EXPECT_EQ(moduleName(module), u"modPrincipal");
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("modPrincipal.bas"))), asText(bytes));
+  EXPECT_EQ(asText(writeModule(module, u"modPrincipal.bas"_qs)), asText(bytes));
 }
 
 TEST(ModuleFileTest, ClassKeepsItsBeginBlockAndHidesMemberAttributes) {
   const QByteArray bytes = windowsFile(kCollectionClass);
-  const ModuleSource module = parseModule(bytes, QStringLiteral("clsPedidos.cls"));
+  const ModuleSource module = parseModule(bytes, u"clsPedidos.cls"_qs);
   ASSERT_EQ(module.preamble.size(), 8u);
   EXPECT_EQ(module.preamble.front().text, u"VERSION 1.0 CLASS");
   EXPECT_EQ(module.preamble.back().text, u"END");
@@ -149,12 +149,12 @@ TEST(ModuleFileTest, ClassKeepsItsBeginBlockAndHidesMemberAttributes) {
                             {11, "Attribute NewEnum.VB_MemberFlags = \"40\""}}));
 
   EXPECT_EQ(moduleName(module), u"clsPedidos");
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("clsPedidos.cls"))), asText(bytes));
+  EXPECT_EQ(asText(writeModule(module, u"clsPedidos.cls"_qs)), asText(bytes));
 }
 
 TEST(ModuleFileTest, FormHasObjectLinesAndADescription) {
   const QByteArray bytes = windowsFile(kForm);
-  const ModuleSource module = parseModule(bytes, QStringLiteral("frmSobre.frm"));
+  const ModuleSource module = parseModule(bytes, u"frmSobre.frm"_qs);
   EXPECT_EQ(texts(module.preamble),
             (std::vector<QString>{
                 "VERSION 5.00", "Object = \"{831FDD16-0C5C-11D2-A9FC-0000F8754DA1}#2.0#0\"; \"MSCOMCTL.OCX\"",
@@ -166,7 +166,7 @@ TEST(ModuleFileTest, FormHasObjectLinesAndADescription) {
   EXPECT_EQ(module.moduleAttributes.size(), 5u);
   ASSERT_EQ(module.code.size(), 5u);
   EXPECT_EQ(module.code[0].text, u"Option Explicit");
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(bytes));
+  EXPECT_EQ(asText(writeModule(module, u"frmSobre.frm"_qs)), asText(bytes));
 }
 
 // Each case turns on one rule of where attribute lines belong; every one writes back byte for byte.
@@ -221,7 +221,7 @@ TEST(ModuleFileTest, SplitsAttributeLinesByRule) {
   };
   for (const Case& sample : cases) {
     SCOPED_TRACE(sample.rule);
-    const ModuleSource module = parseModule(sample.bytes, QStringLiteral("m.bas"));
+    const ModuleSource module = parseModule(sample.bytes, u"m.bas"_qs);
     EXPECT_EQ(moduleName(module), QString::fromLatin1(sample.name));
     EXPECT_EQ(module.moduleAttributes.size(), 1u);
     std::vector<int> after;
@@ -229,58 +229,57 @@ TEST(ModuleFileTest, SplitsAttributeLinesByRule) {
       after.push_back(attribute.afterCodeLine);
     EXPECT_EQ(after, sample.memberAttributesAfter);
     EXPECT_EQ(module.code.size(), sample.codeLines);
-    EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))), asText(sample.bytes));
+    EXPECT_EQ(asText(writeModule(module, u"m.bas"_qs)), asText(sample.bytes));
   }
 }
 
 TEST(ModuleFileTest, EmptyFileHasNoParts) {
-  const ModuleSource module = parseModule(QByteArrayView(), QStringLiteral("Module1.bas"));
+  const ModuleSource module = parseModule(QByteArrayView(), u"Module1.bas"_qs);
   EXPECT_TRUE(module.preamble.empty());
   EXPECT_TRUE(module.moduleAttributes.empty());
   EXPECT_TRUE(module.code.empty());
   EXPECT_EQ(moduleName(module), u"");
-  EXPECT_TRUE(writeModule(module, QStringLiteral("Module1.bas")).isEmpty());
+  EXPECT_TRUE(writeModule(module, u"Module1.bas"_qs).isEmpty());
 }
 
 // --- Writing after edits ---------------------------------------------------------------------------------
 
 TEST(ModuleFileTest, MemberAttributesFollowTheirCodeLineAfterEdits) {
   const QByteArray bytes = windowsFile(kCollectionClass);
-  ModuleSource module = parseModule(bytes, QStringLiteral("clsPedidos.cls"));
+  ModuleSource module = parseModule(bytes, u"clsPedidos.cls"_qs);
   // Insert a line above Item's header and move its attributes down with it, as an editor does.
-  module.code.insert(module.code.begin() + 5, SourceLine{QStringLiteral("' Atenção: base 1"), LineEnd::CRLF});
+  module.code.insert(module.code.begin() + 5, SourceLine{u"' Atenção: base 1"_qs, LineEnd::CRLF});
   for (MemberAttributeLine& attribute : module.memberAttributes) {
     if (attribute.afterCodeLine >= 6) ++attribute.afterCodeLine;
   }
   EXPECT_EQ(
-      asText(writeModule(module, QStringLiteral("clsPedidos.cls"))),
+      asText(writeModule(module, u"clsPedidos.cls"_qs)),
       asText(replacedOnce(bytes, "' Item padrão da coleção", "' Atenção: base 1\n' Item padrão da coleção")));
 }
 
 TEST(ModuleFileTest, WritesAttributesAddedOutOfOrderAfterTheirLines) {
-  ModuleSource module = parseModule(
-      windowsFile("Attribute VB_Name = \"m\"\nPublic x\nPublic Sub A()\nEnd Sub\n"), QStringLiteral("m.bas"));
-  module.memberAttributes.push_back({2, {QStringLiteral("Attribute A.VB_UserMemId = 0"), LineEnd::CRLF}});
-  module.memberAttributes.push_back({1, {QStringLiteral("Attribute x.VB_VarUserMemId = 0"), LineEnd::CRLF}});
-  module.memberAttributes.push_back(
-      {9, {QStringLiteral("Attribute Z.VB_MemberFlags = \"40\""), LineEnd::CRLF}});
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("m.bas"))),
+  ModuleSource module =
+      parseModule(windowsFile("Attribute VB_Name = \"m\"\nPublic x\nPublic Sub A()\nEnd Sub\n"), u"m.bas"_qs);
+  module.memberAttributes.push_back({2, {u"Attribute A.VB_UserMemId = 0"_qs, LineEnd::CRLF}});
+  module.memberAttributes.push_back({1, {u"Attribute x.VB_VarUserMemId = 0"_qs, LineEnd::CRLF}});
+  module.memberAttributes.push_back({9, {u"Attribute Z.VB_MemberFlags = \"40\""_qs, LineEnd::CRLF}});
+  EXPECT_EQ(asText(writeModule(module, u"m.bas"_qs)),
             asText(windowsFile("Attribute VB_Name = \"m\"\nPublic x\nAttribute x.VB_VarUserMemId = 0\n"
                                "Public Sub A()\nAttribute A.VB_UserMemId = 0\nEnd Sub\n"
                                "Attribute Z.VB_MemberFlags = \"40\"\n")));
 }
 
 TEST(ModuleFileTest, ALastLineWithoutEndGetsOneWhenLinesFollowIt) {
-  ModuleSource module = parseModule("Attribute VB_Name = \"m\"\r\nOption Explicit", QStringLiteral("m.bas"));
-  module.code.push_back({QStringLiteral("Dim x"), LineEnd::None});
-  EXPECT_EQ(writeModule(module, QStringLiteral("m.bas")),
+  ModuleSource module = parseModule("Attribute VB_Name = \"m\"\r\nOption Explicit", u"m.bas"_qs);
+  module.code.push_back({u"Dim x"_qs, LineEnd::None});
+  EXPECT_EQ(writeModule(module, u"m.bas"_qs),
             QByteArray("Attribute VB_Name = \"m\"\r\nOption Explicit\r\nDim x"));
 }
 
 TEST(ModuleFileTest, WritingNamesTheFileLineOfAnUnwritableCharacter) {
-  ModuleSource module = parseModule(windowsFile(kCollectionClass), QStringLiteral("clsPedidos.cls"));
+  ModuleSource module = parseModule(windowsFile(kCollectionClass), u"clsPedidos.cls"_qs);
   module.code[7].text = QString::fromUtf16(u"    Set Item = mCol(\"\u4E2D\")");
-  const ide::Error error = expectError([&] { writeModule(module, QStringLiteral("clsPedidos.cls")); });
+  const ide::Error error = expectError([&] { writeModule(module, u"clsPedidos.cls"_qs); });
   EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
   // 8 preamble lines, 6 header attributes, 7 code lines and 3 member attributes come before it.
   EXPECT_TRUE(error.description().startsWith(u"clsPedidos.cls, line 25: the character U+4E2D in column 22"))
@@ -291,48 +290,48 @@ TEST(ModuleFileTest, WritingNamesTheFileLineOfAnUnwritableCharacter) {
 
 TEST(ModuleFileTest, RenamingRewritesTheNameLinesOrAddsOne) {
   const QByteArray form = windowsFile(kForm);
-  ModuleSource module = parseModule(form, QStringLiteral("frmSobre.frm"));
-  setModuleName(module, QStringLiteral("frmCreditos"));
+  ModuleSource module = parseModule(form, u"frmSobre.frm"_qs);
+  setModuleName(module, u"frmCreditos"_qs);
   EXPECT_EQ(moduleName(module), u"frmCreditos");
   QByteArray expected = replacedOnce(form, "Begin VB.Form frmSobre \n", "Begin VB.Form frmCreditos \n");
   expected =
       replacedOnce(expected, "Attribute VB_Name = \"frmSobre\"\n", "Attribute VB_Name = \"frmCreditos\"\n");
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmCreditos.frm"))), asText(expected));
+  EXPECT_EQ(asText(writeModule(module, u"frmCreditos.frm"_qs)), asText(expected));
 
-  ModuleSource withoutName = parseModule("Option Explicit\nDim x\n", QStringLiteral("sem nome.bas"));
+  ModuleSource withoutName = parseModule("Option Explicit\nDim x\n", u"sem nome.bas"_qs);
   EXPECT_EQ(moduleName(withoutName), u"");
-  setModuleName(withoutName, QStringLiteral("modNovo"));
-  EXPECT_EQ(writeModule(withoutName, QStringLiteral("modNovo.bas")),
+  setModuleName(withoutName, u"modNovo"_qs);
+  EXPECT_EQ(writeModule(withoutName, u"modNovo.bas"_qs),
             QByteArray("Attribute VB_Name = \"modNovo\"\nOption Explicit\nDim x\n"));
 
   // A class's name line goes after its BEGIN block, before the other attributes.
   ModuleSource classWithoutName = parseModule(
       windowsFile("VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nEND\nAttribute VB_Exposed = False\n"),
-      QStringLiteral("c.cls"));
-  setModuleName(classWithoutName, QStringLiteral("a\"b"));
+      u"c.cls"_qs);
+  setModuleName(classWithoutName, u"a\"b"_qs);
   EXPECT_EQ(moduleName(classWithoutName), u"a\"b");
-  EXPECT_EQ(asText(writeModule(classWithoutName, QStringLiteral("c.cls"))),
+  EXPECT_EQ(asText(writeModule(classWithoutName, u"c.cls"_qs)),
             asText(windowsFile("VERSION 1.0 CLASS\nBEGIN\n  MultiUse = -1  'True\nEND\n"
                                "Attribute VB_Name = \"a\"\"b\"\nAttribute VB_Exposed = False\n")));
 }
 
 TEST(ModuleFileTest, ReadsAndWritesHeaderAttributes) {
   const QByteArray bytes = windowsFile(kForm);
-  ModuleSource module = parseModule(bytes, QStringLiteral("frmSobre.frm"));
+  ModuleSource module = parseModule(bytes, u"frmSobre.frm"_qs);
   EXPECT_EQ(moduleAttribute(module, u"VB_PredeclaredId"), u"True");
   EXPECT_EQ(moduleAttribute(module, u"vb_name"), u"\"frmSobre\"");
   EXPECT_FALSE(moduleAttribute(module, u"VB_Description").has_value());
 
-  setModuleAttribute(module, QStringLiteral("VB_Exposed"), QStringLiteral("False"));  // unchanged
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(bytes));
+  setModuleAttribute(module, u"VB_Exposed"_qs, u"False"_qs);  // unchanged
+  EXPECT_EQ(asText(writeModule(module, u"frmSobre.frm"_qs)), asText(bytes));
 
-  setModuleAttribute(module, QStringLiteral("VB_PredeclaredId"), QStringLiteral("False"));
-  setModuleAttribute(module, QStringLiteral("VB_Description"), QStringLiteral("\"Janela Sobre\""));
+  setModuleAttribute(module, u"VB_PredeclaredId"_qs, u"False"_qs);
+  setModuleAttribute(module, u"VB_Description"_qs, u"\"Janela Sobre\""_qs);
   QByteArray expected =
       replacedOnce(bytes, "Attribute VB_PredeclaredId = True\n", "Attribute VB_PredeclaredId = False\n");
   expected = replacedOnce(expected, "Attribute VB_Exposed = False\n",
                           "Attribute VB_Exposed = False\nAttribute VB_Description = \"Janela Sobre\"\n");
-  EXPECT_EQ(asText(writeModule(module, QStringLiteral("frmSobre.frm"))), asText(expected));
+  EXPECT_EQ(asText(writeModule(module, u"frmSobre.frm"_qs)), asText(expected));
 }
 
 // --- Errors ----------------------------------------------------------------------------------------------

@@ -55,12 +55,12 @@ class ProjectFileTest : public ::testing::Test {
  protected:
   void SetUp() override {
     m_bytes = windowsFile(kProject);
-    m_project = ProjectFile::parse(m_bytes, QStringLiteral("Loja.vbp"));
+    m_project = ProjectFile::parse(m_bytes, u"Loja.vbp"_qs);
   }
-  QByteArray written() const { return m_project.toBytes(QStringLiteral("Loja.vbp")); }
+  QByteArray written() const { return m_project.toBytes(u"Loja.vbp"_qs); }
 
   QByteArray m_bytes;
-  ProjectFile m_project = ProjectFile::parse(QByteArrayView(), QStringLiteral("empty.vbp"));
+  ProjectFile m_project = ProjectFile::parse(QByteArrayView(), u"empty.vbp"_qs);
 };
 
 TEST_F(ProjectFileTest, WritesBackByteForByte) {
@@ -97,12 +97,12 @@ TEST_F(ProjectFileTest, ListsComponentsInFileOrder) {
 }
 
 TEST_F(ProjectFileTest, EditsOfTheMainPartRewriteOnlyTheirLines) {
-  m_project.setValue(QStringLiteral("MinorVer"), QStringLiteral("5"));
-  m_project.setValue(QStringLiteral("Type"), QStringLiteral("Exe"));  // unchanged
-  m_project.setValue(QStringLiteral("NoAliasing"), QStringLiteral("0"));
+  m_project.setValue(u"MinorVer"_qs, u"5"_qs);
+  m_project.setValue(u"Type"_qs, u"Exe"_qs);  // unchanged
+  m_project.setValue(u"NoAliasing"_qs, u"0"_qs);
   EXPECT_TRUE(m_project.removeValue(u"helpfile"));
   EXPECT_FALSE(m_project.removeValue(u"HelpFile"));
-  m_project.setName(QStringLiteral("LojaNova"));
+  m_project.setName(u"LojaNova"_qs);
   QByteArray expected = replacedOnce(m_bytes, "MinorVer=4\n", "MinorVer=5\n");
   expected = replacedOnce(expected, "CompilationType=0\n", "CompilationType=0\nNoAliasing=0\n");
   expected = replacedOnce(expected, "HelpFile=\"\"\n", "");
@@ -113,12 +113,11 @@ TEST_F(ProjectFileTest, EditsOfTheMainPartRewriteOnlyTheirLines) {
 }
 
 TEST_F(ProjectFileTest, AddsComponentsAfterTheLastEntry) {
-  m_project.addComponent(
-      {ComponentKind::Class, QStringLiteral("clsPedido"), QStringLiteral("clsPedido.cls")});
-  m_project.addComponent({ComponentKind::PropertyPage, {}, QStringLiteral("ppgData.pag")});
-  m_project.addComponent({ComponentKind::UserDocument, {}, QStringLiteral("docLoja.dob")});
-  m_project.addComponent({ComponentKind::Designer, {}, QStringLiteral("deDados.Dsr")});
-  m_project.addComponent({ComponentKind::RelatedDocument, {}, QStringLiteral("Notas.txt")});
+  m_project.addComponent({ComponentKind::Class, u"clsPedido"_qs, u"clsPedido.cls"_qs});
+  m_project.addComponent({ComponentKind::PropertyPage, {}, u"ppgData.pag"_qs});
+  m_project.addComponent({ComponentKind::UserDocument, {}, u"docLoja.dob"_qs});
+  m_project.addComponent({ComponentKind::Designer, {}, u"deDados.Dsr"_qs});
+  m_project.addComponent({ComponentKind::RelatedDocument, {}, u"Notas.txt"_qs});
   EXPECT_EQ(asText(written()), asText(replacedOnce(m_bytes, "ResFile32=\"Loja.RES\"\n",
                                                    "ResFile32=\"Loja.RES\"\nClass=clsPedido; clsPedido.cls\n"
                                                    "PropertyPage=ppgData.pag\nUserDocument=docLoja.dob\n"
@@ -130,22 +129,21 @@ TEST_F(ProjectFileTest, AddsComponentsAfterTheLastEntry) {
 TEST(ProjectFileEditTest, FirstComponentGoesAfterReferencesOrType) {
   ProjectFile withReference = ProjectFile::parse(
       QByteArray("Type=OleDll\r\nReference=*\\Astdole.tlb\r\nObject={0}#1.0#0; x.ocx\r\nName=\"Dll\"\r\n"),
-      QStringLiteral("Dll.vbp"));
-  withReference.addComponent({ComponentKind::Module, QStringLiteral("modA"), QStringLiteral("modA.bas")});
+      u"Dll.vbp"_qs);
+  withReference.addComponent({ComponentKind::Module, u"modA"_qs, u"modA.bas"_qs});
   EXPECT_EQ(
-      withReference.toBytes(QStringLiteral("Dll.vbp")),
+      withReference.toBytes(u"Dll.vbp"_qs),
       QByteArray(
           "Type=OleDll\r\nReference=*\\Astdole.tlb\r\nObject={0}#1.0#0; x.ocx\r\nModule=modA; modA.bas\r\n"
           "Name=\"Dll\"\r\n"));
 
-  ProjectFile typeOnly = ProjectFile::parse(QByteArray("Type=Exe\nName=\"P\"\n"), QStringLiteral("P.vbp"));
-  typeOnly.addComponent({ComponentKind::ResourceFile, {}, QStringLiteral("P.RES")});
-  EXPECT_EQ(typeOnly.toBytes(QStringLiteral("P.vbp")),
-            QByteArray("Type=Exe\nResFile32=\"P.RES\"\nName=\"P\"\n"));
+  ProjectFile typeOnly = ProjectFile::parse(QByteArray("Type=Exe\nName=\"P\"\n"), u"P.vbp"_qs);
+  typeOnly.addComponent({ComponentKind::ResourceFile, {}, u"P.RES"_qs});
+  EXPECT_EQ(typeOnly.toBytes(u"P.vbp"_qs), QByteArray("Type=Exe\nResFile32=\"P.RES\"\nName=\"P\"\n"));
 
-  ProjectFile bare = ProjectFile::parse(QByteArray("Name=\"P\""), QStringLiteral("P.vbp"));
-  bare.addComponent({ComponentKind::Form, {}, QStringLiteral("Form1.frm")});
-  EXPECT_EQ(bare.toBytes(QStringLiteral("P.vbp")), QByteArray("Name=\"P\"\r\nForm=Form1.frm"))
+  ProjectFile bare = ProjectFile::parse(QByteArray("Name=\"P\""), u"P.vbp"_qs);
+  bare.addComponent({ComponentKind::Form, {}, u"Form1.frm"_qs});
+  EXPECT_EQ(bare.toBytes(u"P.vbp"_qs), QByteArray("Name=\"P\"\r\nForm=Form1.frm"))
       << "the old last line gets a line end, the new one has none like it had";
 }
 
@@ -159,18 +157,18 @@ TEST_F(ProjectFileTest, RemovesComponentsByPosition) {
 }
 
 TEST_F(ProjectFileTest, RenamesAndMovesComponents) {
-  m_project.setComponentName(1, QStringLiteral("clsFreguês"));
-  m_project.setComponentPath(1, QStringLiteral("Classes\\clsFregues.cls"));
-  m_project.setComponentPath(2, QStringLiteral("Telas\\frmPrincipal.frm"));
-  m_project.setComponentPath(6, QStringLiteral("Recursos\\Loja.res"));
-  m_project.setComponentName(2, QStringLiteral("ignored"));  // forms are named in their own file
+  m_project.setComponentName(1, u"clsFreguês"_qs);
+  m_project.setComponentPath(1, u"Classes\\clsFregues.cls"_qs);
+  m_project.setComponentPath(2, u"Telas\\frmPrincipal.frm"_qs);
+  m_project.setComponentPath(6, u"Recursos\\Loja.res"_qs);
+  m_project.setComponentName(2, u"ignored"_qs);  // forms are named in their own file
   QByteArray expected = replacedOnce(m_bytes, "Class=clsCliente; Classes\\clsCliente.cls\n",
                                      "Class=clsFreguês; Classes\\clsFregues.cls\n");
   expected = replacedOnce(expected, "Form=frmPrincipal.frm\n", "Form=Telas\\frmPrincipal.frm\n");
   expected = replacedOnce(expected, "ResFile32=\"Loja.RES\"\n", "ResFile32=\"Recursos\\Loja.res\"\n");
   EXPECT_EQ(asText(written()), asText(expected));
   EXPECT_EQ(m_project.components()[1].name, QString::fromUtf8("clsFreguês"));
-  EXPECT_EQ(expectError([&] { m_project.setComponentPath(7, QStringLiteral("x")); }).number(),
+  EXPECT_EQ(expectError([&] { m_project.setComponentPath(7, u"x"_qs); }).number(),
             ide::err::SubscriptOutOfRange);
 }
 
@@ -200,49 +198,46 @@ TEST_F(ProjectFileTest, ReadsAndWritesSections) {
   EXPECT_FALSE(m_project.sectionValue(u"Quimbel", u"AutoRefresh").has_value());
   EXPECT_FALSE(m_project.sectionValue(u"Nenhuma", u"x").has_value());
 
-  m_project.setSectionValue(QStringLiteral("MS Transaction Server"), QStringLiteral("AutoRefresh"),
-                            QStringLiteral("0"));
-  m_project.setSectionValue(QStringLiteral("MS Transaction Server"), QStringLiteral("Extra"),
-                            QStringLiteral("sim"));
-  m_project.setSectionValue(QStringLiteral("Nova Seção"), QStringLiteral("Chave"), QStringLiteral("valor"));
+  m_project.setSectionValue(u"MS Transaction Server"_qs, u"AutoRefresh"_qs, u"0"_qs);
+  m_project.setSectionValue(u"MS Transaction Server"_qs, u"Extra"_qs, u"sim"_qs);
+  m_project.setSectionValue(u"Nova Seção"_qs, u"Chave"_qs, u"valor"_qs);
   QByteArray expected = replacedOnce(m_bytes, "AutoRefresh=1\n", "AutoRefresh=0\nExtra=sim\n");
   expected.append(windowsFile("[Nova Seção]\nChave=valor\n"));
   EXPECT_EQ(asText(written()), asText(expected));
 }
 
 TEST(ProjectFileEditTest, NewSectionAfterALastLineWithoutEnd) {
-  ProjectFile project = ProjectFile::parse(QByteArray("Type=Exe\r\nName=\"P\""), QStringLiteral("P.vbp"));
-  project.setSectionValue(QStringLiteral("Add-In"), QStringLiteral("Mode"), QStringLiteral("1"));
-  EXPECT_EQ(project.toBytes(QStringLiteral("P.vbp")),
-            QByteArray("Type=Exe\r\nName=\"P\"\r\n[Add-In]\r\nMode=1"));
+  ProjectFile project = ProjectFile::parse(QByteArray("Type=Exe\r\nName=\"P\""), u"P.vbp"_qs);
+  project.setSectionValue(u"Add-In"_qs, u"Mode"_qs, u"1"_qs);
+  EXPECT_EQ(project.toBytes(u"P.vbp"_qs), QByteArray("Type=Exe\r\nName=\"P\"\r\n[Add-In]\r\nMode=1"));
 }
 
 TEST(ProjectFileErrorTest, MalformedMainPartLinesNameTheFileAndLine) {
   const QByteArray bytes = windowsFile("Type=Exe\nModule=modA; modA.bas\nisto não é uma chave\nName=\"P\"\n");
-  const ide::Error error = expectError([&] { ProjectFile::parse(bytes, QStringLiteral("Projeto.vbp")); });
+  const ide::Error error = expectError([&] { ProjectFile::parse(bytes, u"Projeto.vbp"_qs); });
   EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
   EXPECT_EQ(error.description(),
             QString::fromUtf8("Projeto.vbp, line 3: not a \"Key=value\" line: isto não é uma chave"));
 
   const ide::Error emptyKey =
-      expectError([] { ProjectFile::parse(QByteArray("Type=Exe\r\n=x\r\n"), QStringLiteral("P.vbp")); });
+      expectError([] { ProjectFile::parse(QByteArray("Type=Exe\r\n=x\r\n"), u"P.vbp"_qs); });
   EXPECT_EQ(emptyKey.description(), u"P.vbp, line 2: not a \"Key=value\" line: =x");
 
   const ide::Error binary =
-      expectError([] { ProjectFile::parse(QByteArray("Type=Exe\r\n\0", 11), QStringLiteral("P.vbp")); });
+      expectError([] { ProjectFile::parse(QByteArray("Type=Exe\r\n\0", 11), u"P.vbp"_qs); });
   EXPECT_EQ(binary.description(), u"P.vbp, line 2: not a text file");
 
   for (const char* entry : {"Module=modA", "Module=;", "Form=", "ResFile32=\"\""}) {  // no file named
     const QByteArray bytes = "Type=Exe\r\n" + QByteArray(entry) + "\r\n";
-    EXPECT_EQ(expectError([&] { ProjectFile::parse(bytes, QStringLiteral("P.vbp")); }).description(),
-              QStringLiteral("P.vbp, line 2: the entry names no file: ") + entry);
+    EXPECT_EQ(expectError([&] { ProjectFile::parse(bytes, u"P.vbp"_qs); }).description(),
+              u"P.vbp, line 2: the entry names no file: "_qs + entry);
   }
 }
 
 TEST(ProjectFileErrorTest, SectionsMayHoldAnything) {
   const QByteArray bytes("Type=Exe\r\n\r\n[Notes]\r\nfree text without a key\r\n");
-  const ProjectFile project = ProjectFile::parse(bytes, QStringLiteral("P.vbp"));
-  EXPECT_EQ(project.toBytes(QStringLiteral("P.vbp")), bytes);
+  const ProjectFile project = ProjectFile::parse(bytes, u"P.vbp"_qs);
+  EXPECT_EQ(project.toBytes(u"P.vbp"_qs), bytes);
 }
 
 // --- Paths -----------------------------------------------------------------------------------------------
@@ -252,8 +247,8 @@ class ProjectPathTest : public ::testing::Test {
   void SetUp() override {
     ASSERT_TRUE(m_directory.isValid());
     QDir root(m_directory.path());
-    ASSERT_TRUE(root.mkpath(QStringLiteral("Loja/Classes")));
-    ASSERT_TRUE(root.mkpath(QStringLiteral("Utilitarios")));
+    ASSERT_TRUE(root.mkpath(u"Loja/Classes"_qs));
+    ASSERT_TRUE(root.mkpath(u"Utilitarios"_qs));
     for (const char* file :
          {"Loja/modPrincipal.bas", "Loja/Classes/clsCliente.cls", "Utilitarios/Utilitarios.vbp"}) {
       QFile touch(root.filePath(QString::fromLatin1(file)));
@@ -278,8 +273,8 @@ TEST_F(ProjectPathTest, ResolvesBackslashPathsMatchingNamesCaseInsensitively) {
       // Missing files come back as written; drive and network paths cannot be resolved.
       {"Novo\\frmNovo.frm", local("Loja/Novo/frmNovo.frm")},
       {"CLASSES\\clsNovo.cls", local("Loja/CLASSES/clsNovo.cls")},
-      {"C:\\Windows\\System32\\MSCOMCTL.OCX", QStringLiteral("C:/Windows/System32/MSCOMCTL.OCX")},
-      {"\\\\servidor\\fontes\\a.bas", QStringLiteral("//servidor/fontes/a.bas")},
+      {"C:\\Windows\\System32\\MSCOMCTL.OCX", u"C:/Windows/System32/MSCOMCTL.OCX"_qs},
+      {"\\\\servidor\\fontes\\a.bas", u"//servidor/fontes/a.bas"_qs},
   };
   for (const auto& [written, expected] : cases)
     EXPECT_EQ(resolveProjectPath(local("Loja"), QString::fromLatin1(written)), expected) << written;
@@ -288,10 +283,8 @@ TEST_F(ProjectPathTest, ResolvesBackslashPathsMatchingNamesCaseInsensitively) {
 TEST_F(ProjectPathTest, PrefersTheExactCase) {
   QFile other(local("Loja/MODPRINCIPAL.BAS"));
   ASSERT_TRUE(other.open(QIODevice::WriteOnly));
-  EXPECT_EQ(resolveProjectPath(local("Loja"), QStringLiteral("MODPRINCIPAL.BAS")),
-            local("Loja/MODPRINCIPAL.BAS"));
-  EXPECT_EQ(resolveProjectPath(local("Loja"), QStringLiteral("modPrincipal.bas")),
-            local("Loja/modPrincipal.bas"));
+  EXPECT_EQ(resolveProjectPath(local("Loja"), u"MODPRINCIPAL.BAS"_qs), local("Loja/MODPRINCIPAL.BAS"));
+  EXPECT_EQ(resolveProjectPath(local("Loja"), u"modPrincipal.bas"_qs), local("Loja/modPrincipal.bas"));
 }
 
 TEST_F(ProjectPathTest, WritesPathsRelativeWithBackslashes) {

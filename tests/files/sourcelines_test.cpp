@@ -37,19 +37,19 @@ TEST(SourceLinesTest, KeepsEachLinesOwnEnd) {
   };
   for (const auto& [bytes, expected] : cases) {
     SCOPED_TRACE(bytes.toStdString());
-    const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("Module1.bas"));
+    const std::vector<SourceLine> lines = readSourceLines(bytes, u"Module1.bas"_qs);
     Lines read;
     for (const SourceLine& line : lines)
       read.emplace_back(line.text, line.end);
     EXPECT_EQ(read, expected);
-    EXPECT_EQ(writeSourceLines(lines, QStringLiteral("Module1.bas")), bytes);
+    EXPECT_EQ(writeSourceLines(lines, u"Module1.bas"_qs), bytes);
   }
 }
 
 TEST(SourceLinesTest, AcceptsTheLongestLineWhateverItsEnd) {
   const QByteArray longest(kMaxLineLength, 'y');
   const std::vector<SourceLine> lines =
-      readSourceLines(longest + "\r\n" + longest + "\r" + longest, QStringLiteral("a.bas"));
+      readSourceLines(longest + "\r\n" + longest + "\r" + longest, u"a.bas"_qs);
   ASSERT_EQ(lines.size(), 3u);
   EXPECT_EQ(lines[2].text.size(), 1023);
 }
@@ -64,16 +64,16 @@ TEST(SourceLinesTest, RefusesOverlongLinesAndBinaryContentNamingTheFileAndLine) 
       {QByteArray("\0", 1), "Module1.bas, line 1: not a text file"},
   };
   for (const auto& [bytes, description] : cases) {
-    const ide::Error error = expectError([&] { readSourceLines(bytes, QStringLiteral("Module1.bas")); });
+    const ide::Error error = expectError([&] { readSourceLines(bytes, u"Module1.bas"_qs); });
     EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
     EXPECT_EQ(error.description(), QString::fromUtf8(description));
   }
 }
 
 TEST(SourceLinesTest, WritingRefusesCharactersWithoutAnsiCode) {
-  const std::vector<SourceLine> lines = {{QStringLiteral("Option Explicit"), LineEnd::CRLF},
+  const std::vector<SourceLine> lines = {{u"Option Explicit"_qs, LineEnd::CRLF},
                                          {QString::fromUtf16(u"Const Nome = \"\u4E2D\""), LineEnd::CRLF}};
-  const ide::Error error = expectError([&] { writeSourceLines(lines, QStringLiteral("Module1.bas")); });
+  const ide::Error error = expectError([&] { writeSourceLines(lines, u"Module1.bas"_qs); });
   EXPECT_EQ(error.number(), ide::err::InvalidFileFormat);
   EXPECT_EQ(error.description(),
             u"Module1.bas, line 2: the character U+4E2D in column 15 has no code in the "
@@ -82,10 +82,10 @@ TEST(SourceLinesTest, WritingRefusesCharactersWithoutAnsiCode) {
 
 TEST(SourceLinesTest, AppendNumbersTheLineAsTold) {
   QByteArray out("x\r\n");
-  appendSourceLine(out, {QStringLiteral("Dim a"), LineEnd::LF}, QStringLiteral("a.bas"), 2);
+  appendSourceLine(out, {u"Dim a"_qs, LineEnd::LF}, u"a.bas"_qs, 2);
   EXPECT_EQ(out, QByteArray("x\r\nDim a\n"));
   const ide::Error error = expectError([&] {
-    appendSourceLine(out, {QString(QChar(0x0100)), LineEnd::CRLF}, QStringLiteral("a.bas"), 7);
+    appendSourceLine(out, {QString(QChar(0x0100)), LineEnd::CRLF}, u"a.bas"_qs, 7);
   });
   EXPECT_TRUE(error.description().startsWith(u"a.bas, line 7: the character U+0100 in column 1"));
 }
@@ -105,28 +105,27 @@ TEST(SourceLinesTest, RandomTextRoundTripsByteForByte) {
       bytes.append(byte);
       sinceLineEnd = (byte == '\n' || byte == '\r') ? 0 : sinceLineEnd + 1;
     }
-    const std::vector<SourceLine> lines = readSourceLines(bytes, QStringLiteral("random.bas"));
-    ASSERT_EQ(writeSourceLines(lines, QStringLiteral("random.bas")), bytes) << "round " << round;
+    const std::vector<SourceLine> lines = readSourceLines(bytes, u"random.bas"_qs);
+    ASSERT_EQ(writeSourceLines(lines, u"random.bas"_qs), bytes) << "round " << round;
   }
 }
 
 TEST(SourceLinesTest, InsertedLinesTakeTheirNeighboursEnd) {
-  std::vector<SourceLine> lines = {{QStringLiteral("a"), LineEnd::LF}, {QStringLiteral("b"), LineEnd::None}};
-  insertSourceLine(lines, 1, QStringLiteral("between"));
+  std::vector<SourceLine> lines = {{u"a"_qs, LineEnd::LF}, {u"b"_qs, LineEnd::None}};
+  insertSourceLine(lines, 1, u"between"_qs);
   ASSERT_EQ(lines.size(), 3u);
   EXPECT_EQ(lines[1].text, u"between");
   EXPECT_EQ(lines[1].end, LineEnd::LF);
 
   // Appended after a last line without end: the new line becomes the last one without end.
-  insertSourceLine(lines, 3, QStringLiteral("after"));
-  EXPECT_EQ(writeSourceLines(lines, QStringLiteral("x")), QByteArray("a\nbetween\nb\nafter"));
+  insertSourceLine(lines, 3, u"after"_qs);
+  EXPECT_EQ(writeSourceLines(lines, u"x"_qs), QByteArray("a\nbetween\nb\nafter"));
 
   std::vector<SourceLine> empty;
-  insertSourceLine(empty, 0, QStringLiteral("first"));
+  insertSourceLine(empty, 0, u"first"_qs);
   ASSERT_EQ(empty.size(), 1u);
   EXPECT_EQ(empty[0].end, LineEnd::CRLF);
-  EXPECT_EQ(lineEndAt({{QStringLiteral("only"), LineEnd::None}, {QStringLiteral("x"), LineEnd::CR}}, 1),
-            LineEnd::CR);
+  EXPECT_EQ(lineEndAt({{u"only"_qs, LineEnd::None}, {u"x"_qs, LineEnd::CR}}, 1), LineEnd::CR);
 }
 
 }  // namespace

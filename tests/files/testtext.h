@@ -18,7 +18,7 @@ namespace host::testing {
 
 /// The sample as a file on disk: Windows-1252 bytes with CRLF line ends.
 inline QByteArray windowsFile(const char* utf8) {
-  const QString text = QString::fromUtf8(utf8).replace(QStringLiteral("\n"), QStringLiteral("\r\n"));
+  const QString text = QString::fromUtf8(utf8).replace(u"\n"_qs, u"\r\n"_qs);
   const std::optional<QByteArray> bytes = encodeAnsi(text);
   EXPECT_TRUE(bytes.has_value()) << "a sample holds a character outside Windows-1252";
   return bytes.value_or(QByteArray());

@@ -25,19 +25,18 @@ namespace {
 
 // Two projects, like the code programmers search: line numbers, labels, GoTo, accented text.
 const QStringList kPedidos = {
-    QStringLiteral("Option Explicit"),
-    QStringLiteral("Private Const MARCA As String = \"aaaa\""),  // 2: three "aa" in the declarations
+    u"Option Explicit"_qs,
+    u"Private Const MARCA As String = \"aaaa\""_qs,  // 2: three "aa" in the declarations
     QString(),
-    QStringLiteral("Public Function Total(ByVal Valor As Currency) As Currency"),
-    QStringLiteral("10    On Error GoTo Erro"),
-    QStringLiteral("20    Total = Valor * 1.1 ' acréscimo"),
-    QStringLiteral("      Exit Function"),
-    QStringLiteral("Erro:"),
-    QStringLiteral("\t30  Total = 0   "),  // 9
-    QStringLiteral("End Function"),
+    u"Public Function Total(ByVal Valor As Currency) As Currency"_qs,
+    u"10    On Error GoTo Erro"_qs,
+    u"20    Total = Valor * 1.1 ' acréscimo"_qs,
+    u"      Exit Function"_qs,
+    u"Erro:"_qs,
+    u"\t30  Total = 0   "_qs,  // 9
+    u"End Function"_qs,
 };
-const QStringList kDatas = {QStringLiteral("Sub Somar()"), QStringLiteral("  total = TOTAL + 1"),
-                            QStringLiteral("End Sub")};
+const QStringList kDatas = {u"Sub Somar()"_qs, u"  total = TOTAL + 1"_qs, u"End Sub"_qs};
 
 struct Scene {
   transform::test::Ide ide;  // Project1, the active one
@@ -46,7 +45,7 @@ struct Scene {
   ide::Ref<ide::CodeModule> datas = other->Add(ide::ComponentType::StdModule)->CodeModule();
 
   Scene() {
-    datas->AddFromString(kDatas.join(QStringLiteral("\r\n")));
+    datas->AddFromString(kDatas.join(u"\r\n"_qs));
     ide.vbe->setActiveVBProject(ide.project);
     ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(pedidos->Parent()));
   }
@@ -55,15 +54,14 @@ struct Scene {
   QStringList boxes() {
     QStringList shown;
     for (const auto& box : ui().messageBoxes())
-      shown << QStringLiteral("%1 %2").arg(box.style).arg(box.prompt);
+      shown << u"%1 %2"_qs.arg(box.style).arg(box.prompt);
     return shown;
   }
 };
 
 /// A row as one text: project | module | procedure | start line:column-end column | text.
 QString rowText(const FoundRow& row) {
-  return QStringLiteral("%1|%2|%3|%4:%5-%6|%7")
-      .arg(row.project, row.module, row.procedure)
+  return u"%1|%2|%3|%4:%5-%6|%7"_qs.arg(row.project, row.module, row.procedure)
       .arg(row.item.startline)
       .arg(row.item.startcol)
       .arg(row.item.endcol)
@@ -81,7 +79,7 @@ struct Recorder final : FindReport {
 QStringList search(Scene& scene, SearchScope scope, const FindOptions& options,
                    QStringList* labels = nullptr) {
   Recorder recorder;
-  transform::WalkContext context(QStringLiteral("test"), &scene.loop(), nullptr);
+  transform::WalkContext context(u"test"_qs, &scene.loop(), nullptr);
   FindWalk(context, *scene.ide.vbe, recorder).Search(scope, options);
   if (labels) *labels = recorder.labels;
   return recorder.rows;
@@ -90,28 +88,27 @@ QStringList search(Scene& scene, SearchScope scope, const FindOptions& options,
 TEST(FindWalk, ListsOverlappingOccurrencesWithTheirProcedureAndTrimmedLine) {
   Scene scene;
   QStringList labels;
-  EXPECT_EQ(search(scene, SearchScope::AllProjects, {QStringLiteral("aa")}, &labels),
-            (QStringList{QStringLiteral("Project1|Module1|(Declarations)|2:34-36|") + kPedidos[1],
-                         QStringLiteral("Project1|Module1|(Declarations)|2:35-37|") + kPedidos[1],
-                         QStringLiteral("Project1|Module1|(Declarations)|2:36-38|") + kPedidos[1]}));
-  EXPECT_EQ(labels, (QStringList{QStringLiteral("Resultados da pesquisa em Project1"),
-                                 QStringLiteral("Resultados da pesquisa em Project2")}));
-  EXPECT_EQ(
-      search(scene, SearchScope::AllProjects, {QStringLiteral("total = "), false, false, false}),
-      (QStringList{QStringLiteral("Project1|Module1|Total|6:7-15|20    Total = Valor * 1.1 ' acréscimo"),
-                   QStringLiteral("Project1|Module1|Total|9:6-14|30  Total = 0"),
-                   QStringLiteral("Project2|Module1|Somar|2:3-11|total = TOTAL + 1")}));
+  EXPECT_EQ(search(scene, SearchScope::AllProjects, {u"aa"_qs}, &labels),
+            (QStringList{u"Project1|Module1|(Declarations)|2:34-36|"_qs + kPedidos[1],
+                         u"Project1|Module1|(Declarations)|2:35-37|"_qs + kPedidos[1],
+                         u"Project1|Module1|(Declarations)|2:36-38|"_qs + kPedidos[1]}));
+  EXPECT_EQ(labels, (QStringList{u"Resultados da pesquisa em Project1"_qs,
+                                 u"Resultados da pesquisa em Project2"_qs}));
+  EXPECT_EQ(search(scene, SearchScope::AllProjects, {u"total = "_qs, false, false, false}),
+            (QStringList{u"Project1|Module1|Total|6:7-15|20    Total = Valor * 1.1 ' acréscimo"_qs,
+                         u"Project1|Module1|Total|9:6-14|30  Total = 0"_qs,
+                         u"Project2|Module1|Somar|2:3-11|total = TOTAL + 1"_qs}));
 }
 
 TEST(FindWalk, SearchesTheScopeTheOptionButtonsChoose) {
   Scene scene;
-  const FindOptions total{QStringLiteral("Total"), true, true, false};
+  const FindOptions total{u"Total"_qs, true, true, false};
   EXPECT_EQ(search(scene, SearchScope::ActiveProject, total).size(), 3);
   EXPECT_EQ(search(scene, SearchScope::ActiveModule, total).size(), 3);
   scene.ide.vbe->setActiveVBProject(scene.other);
   scene.ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(scene.datas->Parent()));
   EXPECT_TRUE(search(scene, SearchScope::ActiveProject, total).isEmpty());  // "TOTAL", "total"
-  EXPECT_EQ(search(scene, SearchScope::ActiveModule, {QStringLiteral("total"), true}).size(), 2);
+  EXPECT_EQ(search(scene, SearchScope::ActiveModule, {u"total"_qs, true}).size(), 2);
   scene.ide.vbe->selectComponent(nullptr);
   EXPECT_TRUE(search(scene, SearchScope::ActiveModule, total).isEmpty());
 }
@@ -122,17 +119,17 @@ TEST(FindResults, RemovalTakesTheRowsOfAModuleOrProjectAndKeepsTheOtherKeys) {
   for (const char* project : {"Loja", "Dados", "Loja"})
     for (const char* module : {"modA", "modB", "modA"})
       results.add({QString::fromLatin1(project), QString::fromLatin1(module), {}, {}, {}});
-  EXPECT_EQ(results.RemoveItemsOfComponent(QStringLiteral("modA")), 6);
+  EXPECT_EQ(results.RemoveItemsOfComponent(u"modA"_qs), 6);
   EXPECT_EQ(results.rowCount(), 3);
-  EXPECT_EQ(results.keyOf(0), QStringLiteral("_2"));
-  EXPECT_EQ(results.keyOf(2), QStringLiteral("_8"));
-  EXPECT_EQ(results.item(QStringLiteral("_1")), nullptr);
-  EXPECT_NE(results.item(QStringLiteral("_5")), nullptr);
-  EXPECT_EQ(results.RemoveItemsOfProject(QStringLiteral("Loja")), 2);
-  EXPECT_EQ(results.keyOf(0), QStringLiteral("_5"));
+  EXPECT_EQ(results.keyOf(0), u"_2"_qs);
+  EXPECT_EQ(results.keyOf(2), u"_8"_qs);
+  EXPECT_EQ(results.item(u"_1"_qs), nullptr);
+  EXPECT_NE(results.item(u"_5"_qs), nullptr);
+  EXPECT_EQ(results.RemoveItemsOfProject(u"Loja"_qs), 2);
+  EXPECT_EQ(results.keyOf(0), u"_5"_qs);
   results.clear();
-  EXPECT_EQ(results.add({}), QStringLiteral("_1"));
-  EXPECT_EQ(results.headerData(3, Qt::Horizontal).toString(), QStringLiteral("Texto Localizado"));
+  EXPECT_EQ(results.add({}), u"_1"_qs);
+  EXPECT_EQ(results.headerData(3, Qt::Horizontal).toString(), u"Texto Localizado"_qs);
 }
 
 TEST(Navigation, ShowsTheOccurrenceWithHalfAPaneAboveItOrAtTheTop) {
@@ -141,7 +138,7 @@ TEST(Navigation, ShowsTheOccurrenceWithHalfAPaneAboveItOrAtTheTop) {
   EXPECT_EQ(TopLineFor(100, 41), 80);
   Scene scene;
   for (int i = 0; i < 200; ++i)
-    scene.pedidos->InsertLines(1, QStringLiteral("' linha"));
+    scene.pedidos->InsertLines(1, u"' linha"_qs);
   const CItemFound item{scene.ide.project, scene.pedidos->Parent(), 206, 7, 206, 12};
   bool minimised = false;
   ShowItemFound(*scene.ide.vbe, item, [&] { minimised = true; });
@@ -160,7 +157,7 @@ TEST(Navigation, ShowsTheOccurrenceWithHalfAPaneAboveItOrAtTheTop) {
   ShowItemFound(*scene.ide.vbe, item, {});
   EXPECT_EQ(
       scene.boxes(),
-      (QStringList{QStringLiteral("64 O item seleciondado pertence a um projeto não localizado."),
+      (QStringList{u"64 O item seleciondado pertence a um projeto não localizado."_qs,
                    QStringLiteral("64 Não foi possível abrir a janela de código de \"Module1\" no projeto "
                                   "ativo.")}));
 }
@@ -173,7 +170,7 @@ struct Window {
   frmFind form{scene.ide.vbe};
   Window() {
     form.Show();
-    form.txtSearch()->setText(QStringLiteral("Total"));
+    form.txtSearch()->setText(u"Total"_qs);
   }
   QStringList keys() {
     QStringList shown;
@@ -185,12 +182,11 @@ struct Window {
 
 TEST(FindWindow, AnEmptyTextDoesNothingAndTheRowsStay) {
   Window window;
-  EXPECT_EQ(window.form.windowTitle(), QStringLiteral("Quimbel - Localizar Estendido"));
+  EXPECT_EQ(window.form.windowTitle(), u"Quimbel - Localizar Estendido"_qs);
   window.form.cmdFind()->click();
-  EXPECT_EQ(window.keys(), (QStringList{QStringLiteral("_1"), QStringLiteral("_2"), QStringLiteral("_3"),
-                                        QStringLiteral("_4"), QStringLiteral("_5")}));
-  EXPECT_EQ(window.form.statusText(), QStringLiteral("Pesquisa completada ... 5 linhas localizadas"));
-  EXPECT_EQ(window.form.lblResults()->text(), QStringLiteral("Resultados da pesquisa em Project2"));
+  EXPECT_EQ(window.keys(), (QStringList{u"_1"_qs, u"_2"_qs, u"_3"_qs, u"_4"_qs, u"_5"_qs}));
+  EXPECT_EQ(window.form.statusText(), u"Pesquisa completada ... 5 linhas localizadas"_qs);
+  EXPECT_EQ(window.form.lblResults()->text(), u"Resultados da pesquisa em Project2"_qs);
   window.form.txtSearch()->clear();
   window.form.cmdFind()->click();
   EXPECT_EQ(window.keys().size(), 5);
@@ -201,7 +197,7 @@ TEST(FindWindow, StopDuringAllProjectsKeepsTheRowsFoundAndCountsThem) {
   Window window;
   QStringList many;
   for (int i = 0; i < 5000; ++i)
-    many << QStringLiteral("%1 x = Total + Total ' Total").arg(i + 1);
+    many << u"%1 x = Total + Total ' Total"_qs.arg(i + 1);
   window.scene.ide.addModule(many);
   QObject::connect(&window.form.results(), &QAbstractItemModel::rowsInserted, [&] {
     if (window.form.results().rowCount() == 100) {
@@ -211,7 +207,7 @@ TEST(FindWindow, StopDuringAllProjectsKeepsTheRowsFoundAndCountsThem) {
   });
   window.form.cmdFind()->click();
   EXPECT_EQ(window.form.results().rowCount(), 100);
-  EXPECT_EQ(window.form.statusText(), QStringLiteral("Pesquisa completada ... 100 linhas localizadas"));
+  EXPECT_EQ(window.form.statusText(), u"Pesquisa completada ... 100 linhas localizadas"_qs);
   EXPECT_FALSE(window.form.cmdCancel()->isEnabled());
   EXPECT_TRUE(window.form.cmdFind()->isEnabled());
   EXPECT_FALSE(window.form.searching());
@@ -222,7 +218,7 @@ TEST(FindWindow, WithWildcardsTheGreyedMatchCaseBoxDoesNotFailTheSearch) {
   window.form.ckMatchCase()->setChecked(true);
   window.form.ckPattern()->click();
   EXPECT_FALSE(window.form.ckMatchCase()->isEnabled());
-  window.form.txtSearch()->setText(QStringLiteral("TOTAL =*#"));
+  window.form.txtSearch()->setText(u"TOTAL =*#"_qs);
   window.form.cmdFind()->click();
   EXPECT_TRUE(window.scene.boxes().isEmpty());
   EXPECT_EQ(window.form.results().rowCount(), 3);  // "Total = Valor * 1", "Total = 0", "total = TOTAL + 1"
@@ -233,11 +229,11 @@ TEST(FindWindow, WithWildcardsTheGreyedMatchCaseBoxDoesNotFailTheSearch) {
 TEST(FindWindow, AnInvalidPatternSaysSoAndEndsTheSearch) {
   Window window;
   window.form.ckPattern()->setChecked(true);
-  window.form.txtSearch()->setText(QStringLiteral("Total[0-9"));
+  window.form.txtSearch()->setText(u"Total[0-9"_qs);
   window.form.cmdFind()->click();
   EXPECT_EQ(window.scene.boxes(),
-            (QStringList{QStringLiteral("48 Erro na localização de texto.\n93 Invalid pattern string")}));
-  EXPECT_EQ(window.form.statusText(), QStringLiteral("Pesquisa completada ... 0 linhas localizadas"));
+            (QStringList{u"48 Erro na localização de texto.\n93 Invalid pattern string"_qs}));
+  EXPECT_EQ(window.form.statusText(), u"Pesquisa completada ... 0 linhas localizadas"_qs);
   EXPECT_TRUE(window.form.cmdFind()->isEnabled());
 }
 
@@ -249,16 +245,16 @@ TEST(FindWindow, CloseHidesItPutsBackTheResultsCaptionAndKeepsTheOptions) {
   EXPECT_EQ(window.form.results().rowCount(), 3);
   window.form.cmdClose()->click();
   EXPECT_FALSE(window.form.isVisible());
-  EXPECT_EQ(window.form.lblResults()->text(), QStringLiteral("Resultados:"));
+  EXPECT_EQ(window.form.lblResults()->text(), u"Resultados:"_qs);
   EXPECT_TRUE(window.form.txtSearch()->text().isEmpty());
   EXPECT_EQ(window.form.results().rowCount(), 0);
   EXPECT_TRUE(window.form.statusText().isEmpty());
-  window.form.Show(QStringLiteral("Valor"));
+  window.form.Show(u"Valor"_qs);
   EXPECT_TRUE(window.form.OpSearch(2)->isChecked());
   EXPECT_TRUE(window.form.ckWholeWd()->isChecked());
-  EXPECT_EQ(window.form.txtSearch()->text(), QStringLiteral("Valor"));
-  window.form.Show(QStringLiteral("duas\r\nlinhas"));
-  EXPECT_EQ(window.form.txtSearch()->text(), QStringLiteral("Valor"));
+  EXPECT_EQ(window.form.txtSearch()->text(), u"Valor"_qs);
+  window.form.Show(u"duas\r\nlinhas"_qs);
+  EXPECT_EQ(window.form.txtSearch()->text(), u"Valor"_qs);
 }
 
 TEST(FindWindow, ADoubleClickOpensTheOccurrenceAndMinimisesTheWindow) {
@@ -282,7 +278,7 @@ TEST(FindWindow, ADoubleClickOpensTheOccurrenceAndMinimisesTheWindow) {
 TEST(FindWindow, AWindowDestroyedWhileItsSearchYieldsEndsTheSearch) {
   Scene scene;
   QPointer<frmFind> form = new frmFind(scene.ide.vbe);
-  form->txtSearch()->setText(QStringLiteral("Total"));
+  form->txtSearch()->setText(u"Total"_qs);
   QObject::connect(&form->results(), &QAbstractItemModel::rowsInserted, [&] {
     scene.loop().post([&] { delete form.data(); });  // the add-in shuts down from the IDE's loop
   });

@@ -36,22 +36,22 @@ long errorNumberOf(const std::function<void()>& action) {
 
 // The example of the IDE's documentation of procedure extents.
 const QStringList kPropertyModule = {
-    QStringLiteral("Option Explicit"),                           // 1
-    QStringLiteral("Private m As Long"),                         // 2
-    QString(),                                                   // 3
-    QStringLiteral("' about Foo"),                               // 4
-    QStringLiteral("Public Sub Foo()"),                          // 5
-    QStringLiteral("    m = 1"),                                 // 6
-    QStringLiteral("End Sub"),                                   // 7
-    QString(),                                                   // 8
-    QStringLiteral("Public Property Get Bar() As Long"),         // 9
-    QStringLiteral("    Bar = m"),                               // 10
-    QStringLiteral("End Property"),                              // 11
-    QStringLiteral("Public Property Let Bar(ByVal v As Long)"),  // 12
-    QStringLiteral("    m = v"),                                 // 13
-    QStringLiteral("End Property"),                              // 14
-    QString(),                                                   // 15
-    QStringLiteral("' trailing note"),                           // 16
+    u"Option Explicit"_qs,                           // 1
+    u"Private m As Long"_qs,                         // 2
+    QString(),                                       // 3
+    u"' about Foo"_qs,                               // 4
+    u"Public Sub Foo()"_qs,                          // 5
+    u"    m = 1"_qs,                                 // 6
+    u"End Sub"_qs,                                   // 7
+    QString(),                                       // 8
+    u"Public Property Get Bar() As Long"_qs,         // 9
+    u"    Bar = m"_qs,                               // 10
+    u"End Property"_qs,                              // 11
+    u"Public Property Let Bar(ByVal v As Long)"_qs,  // 12
+    u"    m = v"_qs,                                 // 13
+    u"End Property"_qs,                              // 14
+    QString(),                                       // 15
+    u"' trailing note"_qs,                           // 16
 };
 
 TEST(ProcedureExtents, FollowTheIdeForPropertiesAndTrailingLines) {
@@ -76,14 +76,14 @@ TEST(ProcedureExtents, ProcOfLineAnswersWithTheOwnerAndItsKind) {
   ide::ProcKind kind = ide::ProcKind::Get;
   EXPECT_EQ(text.procOfLine(1, kind), QString());
   EXPECT_EQ(kind, ide::ProcKind::Proc);
-  EXPECT_EQ(text.procOfLine(3, kind), QStringLiteral("Foo"));  // blank above the comment: first procedure
-  EXPECT_EQ(text.procOfLine(4, kind), QStringLiteral("Foo"));
+  EXPECT_EQ(text.procOfLine(3, kind), u"Foo"_qs);  // blank above the comment: first procedure
+  EXPECT_EQ(text.procOfLine(4, kind), u"Foo"_qs);
   EXPECT_EQ(kind, ide::ProcKind::Proc);
-  EXPECT_EQ(text.procOfLine(8, kind), QStringLiteral("Bar"));
+  EXPECT_EQ(text.procOfLine(8, kind), u"Bar"_qs);
   EXPECT_EQ(kind, ide::ProcKind::Get);
-  EXPECT_EQ(text.procOfLine(13, kind), QStringLiteral("Bar"));
+  EXPECT_EQ(text.procOfLine(13, kind), u"Bar"_qs);
   EXPECT_EQ(kind, ide::ProcKind::Let);
-  EXPECT_EQ(text.procOfLine(16, kind), QStringLiteral("Bar"));
+  EXPECT_EQ(text.procOfLine(16, kind), u"Bar"_qs);
   EXPECT_EQ(kind, ide::ProcKind::Let);
   EXPECT_EQ(errorNumberOf([&] { text.procOfLine(17, kind); }), ide::err::SubscriptOutOfRange);
 }
@@ -98,31 +98,31 @@ TEST(ProcedureExtents, MissingNameOrKindIsError35AndNamesIgnoreCase) {
 }
 
 const QStringList kDeclarationsModule = {
-    QStringLiteral("Option Explicit"),                                                    // 1
-    QStringLiteral("#If Win32 Then"),                                                     // 2
-    QStringLiteral("Private Declare Function GetTickCount Lib \"kernel32\" () As Long"),  // 3
-    QStringLiteral("#Else"),                                                              // 4
-    QStringLiteral("Private Declare Function GetTickCount Lib \"kernel\" () As Long"),    // 5
-    QStringLiteral("#End If"),                                                            // 6
-    QStringLiteral("Public Declare Sub Sleep Lib \"kernel32\" _"),                        // 7
-    QStringLiteral("    (ByVal ms As Long)"),                                             // 8
-    QStringLiteral("Private Type Ponto"),                                                 // 9
-    QStringLiteral("    X As Long"),                                                      // 10
-    QStringLiteral("End Type"),                                                           // 11
-    QStringLiteral("Public Enum Cor"),                                                    // 12
-    QStringLiteral("    Vermelho = 1"),                                                   // 13
-    QStringLiteral("End Enum"),                                                           // 14
-    QStringLiteral("Private WithEvents mTimer As Timer"),                                 // 15
-    QStringLiteral("Dim a As Long, b(1 To 3) As String ' dois"),                          // 16
-    QStringLiteral("Public Const MAXIMO = 10, MINIMO = 1"),                               // 17
-    QStringLiteral("Public Event Mudou(ByVal valor As Long)"),                            // 18
-    QStringLiteral("' comentário acima do primeiro procedimento"),                        // 19
-    QString(),                                                                            // 20
-    QStringLiteral("Private Static Function Soma( _"),                                    // 21
-    QStringLiteral("    ByVal x As Long, _"),                                             // 22
-    QStringLiteral("    ByVal y As Long) As Long"),                                       // 23
-    QStringLiteral("    Soma = x + y"),                                                   // 24
-    QStringLiteral("End Function"),                                                       // 25
+    u"Option Explicit"_qs,                                                    // 1
+    u"#If Win32 Then"_qs,                                                     // 2
+    u"Private Declare Function GetTickCount Lib \"kernel32\" () As Long"_qs,  // 3
+    u"#Else"_qs,                                                              // 4
+    u"Private Declare Function GetTickCount Lib \"kernel\" () As Long"_qs,    // 5
+    u"#End If"_qs,                                                            // 6
+    u"Public Declare Sub Sleep Lib \"kernel32\" _"_qs,                        // 7
+    u"    (ByVal ms As Long)"_qs,                                             // 8
+    u"Private Type Ponto"_qs,                                                 // 9
+    u"    X As Long"_qs,                                                      // 10
+    u"End Type"_qs,                                                           // 11
+    u"Public Enum Cor"_qs,                                                    // 12
+    u"    Vermelho = 1"_qs,                                                   // 13
+    u"End Enum"_qs,                                                           // 14
+    u"Private WithEvents mTimer As Timer"_qs,                                 // 15
+    u"Dim a As Long, b(1 To 3) As String ' dois"_qs,                          // 16
+    u"Public Const MAXIMO = 10, MINIMO = 1"_qs,                               // 17
+    u"Public Event Mudou(ByVal valor As Long)"_qs,                            // 18
+    u"' comentário acima do primeiro procedimento"_qs,                        // 19
+    QString(),                                                                // 20
+    u"Private Static Function Soma( _"_qs,                                    // 21
+    u"    ByVal x As Long, _"_qs,                                             // 22
+    u"    ByVal y As Long) As Long"_qs,                                       // 23
+    u"    Soma = x + y"_qs,                                                   // 24
+    u"End Function"_qs,                                                       // 25
 };
 
 TEST(ProcedureExtents, ContinuedHeaderAndDeclarationsSection) {
@@ -133,7 +133,7 @@ TEST(ProcedureExtents, ContinuedHeaderAndDeclarationsSection) {
   EXPECT_EQ(text.procBodyLine(u"Soma", ide::ProcKind::Proc), 21);
   EXPECT_EQ(text.procCountLines(u"Soma", ide::ProcKind::Proc), 7);
   ide::ProcKind kind;
-  EXPECT_EQ(text.procOfLine(22, kind), QStringLiteral("Soma"));
+  EXPECT_EQ(text.procOfLine(22, kind), u"Soma"_qs);
   EXPECT_EQ(text.procOfLine(7, kind), QString());
   ASSERT_EQ(text.procedures().size(), 1u);
   EXPECT_EQ(text.procedures()[0].headerEnd, 23);
@@ -185,17 +185,16 @@ TEST(Members, OnePerPropertyWhateverItsAccessors) {
   loadLines(text, kPropertyModule);
   const auto& members = text.members();
   ASSERT_EQ(members.size(), 3u);
-  EXPECT_EQ(members[0].name, QStringLiteral("m"));
-  EXPECT_EQ(members[1].name, QStringLiteral("Foo"));
-  EXPECT_EQ(members[2].name, QStringLiteral("Bar"));
+  EXPECT_EQ(members[0].name, u"m"_qs);
+  EXPECT_EQ(members[1].name, u"Foo"_qs);
+  EXPECT_EQ(members[2].name, u"Bar"_qs);
   EXPECT_EQ(members[2].type, ide::MemberType::Property);
   EXPECT_EQ(members[2].line, 8);  // the first procedure line of its first accessor
 }
 
 TEST(ModulesWithoutProcedures, DeclarationsEndAtTheLastLineThatIsNotBlank) {
   CodeText text;
-  loadLines(text, {QStringLiteral("Option Explicit"), QStringLiteral("Public Total As Long"),
-                   QStringLiteral("' fim"), QString(), QString()});
+  loadLines(text, {u"Option Explicit"_qs, u"Public Total As Long"_qs, u"' fim"_qs, QString(), QString()});
   EXPECT_EQ(text.countOfDeclarationLines(), 3);
   ide::ProcKind kind;
   EXPECT_EQ(text.procOfLine(5, kind), QString());
@@ -210,8 +209,8 @@ TEST(ModulesWithoutProcedures, DeclarationsEndAtTheLastLineThatIsNotBlank) {
 
 TEST(ModulesWithoutProcedures, StrayEndLinesCloseNothing) {
   CodeText text;
-  loadLines(text, {QStringLiteral("End Sub"), QStringLiteral("Sub A()"), QStringLiteral("End Sub"),
-                   QStringLiteral("End Function"), QStringLiteral("Sub B()"), QStringLiteral("x = 1")});
+  loadLines(text,
+            {u"End Sub"_qs, u"Sub A()"_qs, u"End Sub"_qs, u"End Function"_qs, u"Sub B()"_qs, u"x = 1"_qs});
   EXPECT_EQ(text.countOfDeclarationLines(), 1);
   EXPECT_EQ(text.procCountLines(u"A", ide::ProcKind::Proc), 2);
   // B has no End line: it runs to the end of the module.
@@ -273,9 +272,9 @@ End Property)",
 
 TEST(Editing, LinesJoinWithCrLfAndClampAtTheEnd) {
   CodeText text;
-  loadLines(text, {QStringLiteral("a"), QStringLiteral("b"), QStringLiteral("c")});
-  EXPECT_EQ(text.lines(2, 2), QStringLiteral("b\r\nc"));
-  EXPECT_EQ(text.lines(2, 10), QStringLiteral("b\r\nc"));
+  loadLines(text, {u"a"_qs, u"b"_qs, u"c"_qs});
+  EXPECT_EQ(text.lines(2, 2), u"b\r\nc"_qs);
+  EXPECT_EQ(text.lines(2, 10), u"b\r\nc"_qs);
   EXPECT_EQ(text.lines(4, 1), QString());
   EXPECT_EQ(text.lines(1, 0), QString());
   EXPECT_EQ(errorNumberOf([&] { text.lines(0, 1); }), ide::err::SubscriptOutOfRange);
@@ -283,11 +282,11 @@ TEST(Editing, LinesJoinWithCrLfAndClampAtTheEnd) {
 
 TEST(Editing, InsertLinesSplitsTextAndATrailingLineEndAddsAnEmptyLine) {
   CodeText text;
-  loadLines(text, {QStringLiteral("a"), QStringLiteral("d")});
+  loadLines(text, {u"a"_qs, u"d"_qs});
   text.insertLines(2, u"b\r\nc\nx\ry\r\n");
-  EXPECT_EQ(text.lines(1, 100), QStringLiteral("a\r\nb\r\nc\r\nx\r\ny\r\n\r\nd"));
+  EXPECT_EQ(text.lines(1, 100), u"a\r\nb\r\nc\r\nx\r\ny\r\n\r\nd"_qs);
   text.insertLines(text.countOfLines() + 1, u"fim");
-  EXPECT_EQ(text.line(text.countOfLines()), QStringLiteral("fim"));
+  EXPECT_EQ(text.line(text.countOfLines()), u"fim"_qs);
   EXPECT_EQ(errorNumberOf([&] { text.insertLines(text.countOfLines() + 2, u"x"); }),
             ide::err::SubscriptOutOfRange);
   EXPECT_EQ(errorNumberOf([&] { text.insertLines(0, u"x"); }), ide::err::SubscriptOutOfRange);
@@ -300,28 +299,26 @@ TEST(Editing, ReplaceAndDeleteCheckTheirLines) {
   text.addFromString(u"one\r\ntwo\r\nthree");
   EXPECT_EQ(text.countOfLines(), 3);
   text.replaceLine(2, u"2a\r\n2b");
-  EXPECT_EQ(text.lines(1, 4), QStringLiteral("one\r\n2a\r\n2b\r\nthree"));
+  EXPECT_EQ(text.lines(1, 4), u"one\r\n2a\r\n2b\r\nthree"_qs);
   EXPECT_EQ(errorNumberOf([&] { text.deleteLines(3, 3); }), ide::err::SubscriptOutOfRange);
   text.deleteLines(2, 2);
-  EXPECT_EQ(text.lines(1, 4), QStringLiteral("one\r\nthree"));
+  EXPECT_EQ(text.lines(1, 4), u"one\r\nthree"_qs);
 }
 
 TEST(Editing, LinesOverTheIdesLimitAreRefusedWithNothingChanged) {
   CodeText text;
-  loadLines(text, {QStringLiteral("a")});
+  loadLines(text, {u"a"_qs});
   const QString tooLong(kMaxLineLength + 1, u'x');
   EXPECT_EQ(errorNumberOf([&] { text.replaceLine(1, tooLong); }), ide::err::LineTooLong);
-  EXPECT_EQ(errorNumberOf([&] { text.insertLines(1, QStringLiteral("ok\r\n") + tooLong); }),
-            ide::err::LineTooLong);
-  EXPECT_EQ(text.lines(1, 5), QStringLiteral("a"));
+  EXPECT_EQ(errorNumberOf([&] { text.insertLines(1, u"ok\r\n"_qs + tooLong); }), ide::err::LineTooLong);
+  EXPECT_EQ(text.lines(1, 5), u"a"_qs);
   text.replaceLine(1, QString(kMaxLineLength, u'y'));
   EXPECT_EQ(text.line(1).size(), kMaxLineLength);
 }
 
 TEST(Editing, AFileWithoutAFinalLineEndKeepsItWhenLinesAreAppended) {
   CodeText text;
-  text.load({SourceLine{QStringLiteral("a"), LineEnd::CRLF}, SourceLine{QStringLiteral("b"), LineEnd::None}},
-            {});
+  text.load({SourceLine{u"a"_qs, LineEnd::CRLF}, SourceLine{u"b"_qs, LineEnd::None}}, {});
   text.insertLines(3, u"c");
   std::vector<SourceLine> code;
   std::vector<MemberAttributeLine> attributes;
@@ -342,7 +339,7 @@ TEST(Editing, ChangeCountGrowsWithEveryEditAndListenersHearOfIt) {
     }
   } recorder;
   CodeText text;
-  loadLines(text, {QStringLiteral("a"), QStringLiteral("b")});
+  loadLines(text, {u"a"_qs, u"b"_qs});
   text.addListener(&recorder);
   const quint64 before = text.changeCount();
   text.replaceLine(2, u"B");
@@ -396,32 +393,32 @@ TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
   // Lines that make and unmake structure: headers (also continued ones), End lines, declarations, Type and
   // Enum blocks, comments, blanks, continuation marks, and ordinary statements.
   const QStringList pool = {
-      QStringLiteral("Public Sub Alfa()"),
-      QStringLiteral("Private Function Beta( _"),
-      QStringLiteral("    ByVal x As Long) As Long"),
-      QStringLiteral("Property Get Gama() As Long"),
-      QStringLiteral("Property Let Gama(v As Long)"),
-      QStringLiteral("End Sub"),
-      QStringLiteral("End Function"),
-      QStringLiteral("End Property"),
-      QStringLiteral("Dim a As Long"),
-      QStringLiteral("Private b As String, c"),
-      QStringLiteral("Const K = 1"),
-      QStringLiteral("Declare Sub Dorme Lib \"k\" ()"),
-      QStringLiteral("Type T"),
-      QStringLiteral("End Type"),
-      QStringLiteral("' comentário"),
+      u"Public Sub Alfa()"_qs,
+      u"Private Function Beta( _"_qs,
+      u"    ByVal x As Long) As Long"_qs,
+      u"Property Get Gama() As Long"_qs,
+      u"Property Let Gama(v As Long)"_qs,
+      u"End Sub"_qs,
+      u"End Function"_qs,
+      u"End Property"_qs,
+      u"Dim a As Long"_qs,
+      u"Private b As String, c"_qs,
+      u"Const K = 1"_qs,
+      u"Declare Sub Dorme Lib \"k\" ()"_qs,
+      u"Type T"_qs,
+      u"End Type"_qs,
+      u"' comentário"_qs,
       QString(),
-      QStringLiteral("    x = x + 1 _"),
-      QStringLiteral("    + 2"),
-      QStringLiteral("If a Then"),
-      QStringLiteral("Rem nota"),
-      QStringLiteral("Event Aviso()"),
-      QStringLiteral("Sub Delta(): x = 1"),
-      QStringLiteral("Public WithEvents w As C"),
-      QStringLiteral("Enum E"),
-      QStringLiteral("End Enum"),
-      QStringLiteral("    sUB As Long"),
+      u"    x = x + 1 _"_qs,
+      u"    + 2"_qs,
+      u"If a Then"_qs,
+      u"Rem nota"_qs,
+      u"Event Aviso()"_qs,
+      u"Sub Delta(): x = 1"_qs,
+      u"Public WithEvents w As C"_qs,
+      u"Enum E"_qs,
+      u"End Enum"_qs,
+      u"    sUB As Long"_qs,
   };
   std::mt19937 random(20261206);
   auto pick = [&] { return pool[static_cast<int>(random() % static_cast<unsigned>(pool.size()))]; };
@@ -454,18 +451,18 @@ TEST(Editing, TheIndexFollowsLinesAddedAndRemovedInsideProcedures) {
   // Ordinary lines only, so that the index moves procedures instead of reading their headers again; the
   // module has a continued header and procedures without End lines, in the middle and at the end.
   const QStringList module = {
-      QStringLiteral("Option Explicit"),  QStringLiteral("Dim a As Long"),
-      QStringLiteral("Sub Alfa()"),       QStringLiteral("    a = 1"),
-      QStringLiteral("End Sub"),          QString(),
-      QStringLiteral("Function Beta( _"), QStringLiteral("    ByVal x As Long) As Long"),
-      QStringLiteral("    Beta = x"),     QStringLiteral("End Function"),
-      QStringLiteral("Sub Gama()"),       QStringLiteral("    a = 2"),
-      QStringLiteral("' sem fim"),        QStringLiteral("Property Get Delta() As Long"),
-      QStringLiteral("    Delta = a"),    QStringLiteral("End Property"),
-      QStringLiteral("Sub Epsilon()"),    QStringLiteral("    a = 3"),
+      u"Option Explicit"_qs,  u"Dim a As Long"_qs,
+      u"Sub Alfa()"_qs,       u"    a = 1"_qs,
+      u"End Sub"_qs,          QString(),
+      u"Function Beta( _"_qs, u"    ByVal x As Long) As Long"_qs,
+      u"    Beta = x"_qs,     u"End Function"_qs,
+      u"Sub Gama()"_qs,       u"    a = 2"_qs,
+      u"' sem fim"_qs,        u"Property Get Delta() As Long"_qs,
+      u"    Delta = a"_qs,    u"End Property"_qs,
+      u"Sub Epsilon()"_qs,    u"    a = 3"_qs,
   };
-  const QStringList pool = {QStringLiteral("    x = x + 1"), QStringLiteral("' nota"), QString(),
-                            QStringLiteral("    If a Then b = 1"), QStringLiteral("    Dim k As Long")};
+  const QStringList pool = {u"    x = x + 1"_qs, u"' nota"_qs, QString(), u"    If a Then b = 1"_qs,
+                            u"    Dim k As Long"_qs};
   std::mt19937 random(7);
   auto pick = [&] { return pool[static_cast<int>(random() % static_cast<unsigned>(pool.size()))]; };
   CodeText text;
@@ -496,25 +493,24 @@ TEST(Editing, TheIndexFollowsLinesAddedAndRemovedInsideProcedures) {
 // Hidden member attributes
 
 const QStringList kClassCode = {
-    QStringLiteral("Option Explicit"),                                       // 1
-    QStringLiteral("Private mItens As Collection"),                          // 2
-    QStringLiteral("Public Property Get Item(ByVal i As Long) As Variant"),  // 3
-    QStringLiteral("    Item = mItens(i)"),                                  // 4
-    QStringLiteral("End Property"),                                          // 5
-    QStringLiteral("Public Function Count() As Long"),                       // 6
-    QStringLiteral("    Count = mItens.Count"),                              // 7
-    QStringLiteral("End Function"),                                          // 8
+    u"Option Explicit"_qs,                                       // 1
+    u"Private mItens As Collection"_qs,                          // 2
+    u"Public Property Get Item(ByVal i As Long) As Variant"_qs,  // 3
+    u"    Item = mItens(i)"_qs,                                  // 4
+    u"End Property"_qs,                                          // 5
+    u"Public Function Count() As Long"_qs,                       // 6
+    u"    Count = mItens.Count"_qs,                              // 7
+    u"End Function"_qs,                                          // 8
 };
 
 std::vector<MemberAttributeLine> itemIsDefault() {
-  return {
-      MemberAttributeLine{3, SourceLine{QStringLiteral("Attribute Item.VB_UserMemId = 0"), LineEnd::CRLF}}};
+  return {MemberAttributeLine{3, SourceLine{u"Attribute Item.VB_UserMemId = 0"_qs, LineEnd::CRLF}}};
 }
 
 TEST(MemberAttributes, AreKeptWithTheirMemberAndWrittenBackInPlace) {
   CodeText text;
   loadLines(text, kClassCode, itemIsDefault());
-  EXPECT_EQ(text.memberAttribute(u"item", u"VB_UserMemId"), QStringLiteral("0"));
+  EXPECT_EQ(text.memberAttribute(u"item", u"VB_UserMemId"), u"0"_qs);
   EXPECT_FALSE(text.memberAttribute(u"Count", u"VB_UserMemId"));
   text.insertLines(4, u"    ' novo");
   std::vector<SourceLine> code;
@@ -522,25 +518,25 @@ TEST(MemberAttributes, AreKeptWithTheirMemberAndWrittenBackInPlace) {
   text.store(code, attributes);
   ASSERT_EQ(attributes.size(), 1u);
   EXPECT_EQ(attributes[0].afterCodeLine, 3);
-  EXPECT_EQ(attributes[0].line.text, QStringLiteral("Attribute Item.VB_UserMemId = 0"));
+  EXPECT_EQ(attributes[0].line.text, u"Attribute Item.VB_UserMemId = 0"_qs);
 }
 
 TEST(MemberAttributes, CanBeSetChangedAndRemoved) {
   CodeText text;
   loadLines(text, kClassCode, itemIsDefault());
-  text.setMemberAttribute(u"Item", u"VB_UserMemId", QStringLiteral("1234"));
-  text.setMemberAttribute(u"Count", u"VB_UserMemId", QStringLiteral("0"));
-  EXPECT_EQ(text.memberAttribute(u"Item", u"VB_UserMemId"), QStringLiteral("1234"));
+  text.setMemberAttribute(u"Item", u"VB_UserMemId", u"1234"_qs);
+  text.setMemberAttribute(u"Count", u"VB_UserMemId", u"0"_qs);
+  EXPECT_EQ(text.memberAttribute(u"Item", u"VB_UserMemId"), u"1234"_qs);
   std::vector<SourceLine> code;
   std::vector<MemberAttributeLine> attributes;
   text.store(code, attributes);
   ASSERT_EQ(attributes.size(), 2u);
-  EXPECT_EQ(attributes[0].line.text, QStringLiteral("Attribute Item.VB_UserMemId = 1234"));
+  EXPECT_EQ(attributes[0].line.text, u"Attribute Item.VB_UserMemId = 1234"_qs);
   EXPECT_EQ(attributes[1].afterCodeLine, 6);
-  EXPECT_EQ(attributes[1].line.text, QStringLiteral("Attribute Count.VB_UserMemId = 0"));
+  EXPECT_EQ(attributes[1].line.text, u"Attribute Count.VB_UserMemId = 0"_qs);
   text.setMemberAttribute(u"Item", u"VB_UserMemId", std::nullopt);
   EXPECT_FALSE(text.memberAttribute(u"Item", u"VB_UserMemId"));
-  EXPECT_EQ(errorNumberOf([&] { text.setMemberAttribute(u"Nada", u"VB_UserMemId", QStringLiteral("0")); }),
+  EXPECT_EQ(errorNumberOf([&] { text.setMemberAttribute(u"Nada", u"VB_UserMemId", u"0"_qs); }),
             ide::err::SubscriptOutOfRange);
 }
 
@@ -552,14 +548,14 @@ TEST(MemberAttributes, FollowARenamedHeaderAndARewrittenOne) {
   std::vector<MemberAttributeLine> attributes;
   text.store(code, attributes);
   ASSERT_EQ(attributes.size(), 1u);
-  EXPECT_EQ(attributes[0].line.text, QStringLiteral("Attribute Elemento.VB_UserMemId = 0"));
+  EXPECT_EQ(attributes[0].line.text, u"Attribute Elemento.VB_UserMemId = 0"_qs);
 
   // Deleting the header and inserting a new one for the same member keeps the member's attribute.
   CodeText rewritten;
   loadLines(rewritten, kClassCode, itemIsDefault());
   rewritten.deleteLines(3, 1);
   rewritten.insertLines(3, u"Public Property Get Item(ByVal i As Long) As String");
-  EXPECT_EQ(rewritten.memberAttribute(u"Item", u"VB_UserMemId"), QStringLiteral("0"));
+  EXPECT_EQ(rewritten.memberAttribute(u"Item", u"VB_UserMemId"), u"0"_qs);
   rewritten.store(code, attributes);
   ASSERT_EQ(attributes.size(), 1u);
   EXPECT_EQ(attributes[0].afterCodeLine, 3);
@@ -589,70 +585,66 @@ std::optional<Range> find(CodeText& text, const QString& target, Range in, bool 
 }
 
 const QStringList kFindModule = {
-    QStringLiteral("Dim Soma As Long, SomaTotal As Long"),   // 1
-    QStringLiteral("Sub Calcula()"),                         // 2
-    QStringLiteral("    soma = x.Soma + Valor1 + Valor23"),  // 3
-    QStringLiteral("    SomaTotal = Soma * 2 ' ação"),       // 4
-    QStringLiteral("End Sub"),                               // 5
+    u"Dim Soma As Long, SomaTotal As Long"_qs,   // 1
+    u"Sub Calcula()"_qs,                         // 2
+    u"    soma = x.Soma + Valor1 + Valor23"_qs,  // 3
+    u"    SomaTotal = Soma * 2 ' ação"_qs,       // 4
+    u"End Sub"_qs,                               // 5
 };
 constexpr Range kAll{1, 1, -1, -1};
 
 TEST(Find, PlainTextIgnoresCaseUnlessAskedAndReturnsTheMatch) {
   CodeText text;
   loadLines(text, kFindModule);
-  EXPECT_EQ(find(text, QStringLiteral("sub calcula"), kAll), (Range{2, 1, 2, 12}));
-  EXPECT_EQ(find(text, QStringLiteral("soma ="), kAll, false, true), (Range{3, 5, 3, 11}));
-  EXPECT_EQ(find(text, QStringLiteral("AÇÃO"), kAll), (Range{4, 28, 4, 32}));
-  EXPECT_FALSE(find(text, QStringLiteral("AÇÃO"), kAll, false, true));
+  EXPECT_EQ(find(text, u"sub calcula"_qs, kAll), (Range{2, 1, 2, 12}));
+  EXPECT_EQ(find(text, u"soma ="_qs, kAll, false, true), (Range{3, 5, 3, 11}));
+  EXPECT_EQ(find(text, u"AÇÃO"_qs, kAll), (Range{4, 28, 4, 32}));
+  EXPECT_FALSE(find(text, u"AÇÃO"_qs, kAll, false, true));
   EXPECT_FALSE(find(text, QString(), kAll));
 }
 
 TEST(Find, WholeWordSkipsLongerWordsButNotMembers) {
   CodeText text;
   loadLines(text, kFindModule);
-  EXPECT_EQ(find(text, QStringLiteral("Soma"), Range{1, 6, -1, -1}, true), (Range{3, 5, 3, 9}));
-  EXPECT_EQ(find(text, QStringLiteral("Soma"), Range{3, 6, -1, -1}, true), (Range{3, 14, 3, 18}));
-  EXPECT_EQ(find(text, QStringLiteral(".Soma"), kAll, true), (Range{3, 13, 3, 18}));
-  EXPECT_EQ(find(text, QStringLiteral("SomaT"), kAll), (Range{1, 19, 1, 24}));
-  EXPECT_FALSE(find(text, QStringLiteral("SomaT"), kAll, true));
+  EXPECT_EQ(find(text, u"Soma"_qs, Range{1, 6, -1, -1}, true), (Range{3, 5, 3, 9}));
+  EXPECT_EQ(find(text, u"Soma"_qs, Range{3, 6, -1, -1}, true), (Range{3, 14, 3, 18}));
+  EXPECT_EQ(find(text, u".Soma"_qs, kAll, true), (Range{3, 13, 3, 18}));
+  EXPECT_EQ(find(text, u"SomaT"_qs, kAll), (Range{1, 19, 1, 24}));
+  EXPECT_FALSE(find(text, u"SomaT"_qs, kAll, true));
 }
 
 TEST(Find, TheRangeIsInclusiveOfItsEndColumn) {
   CodeText text;
   loadLines(text, kFindModule);
   // "Calcula" occupies columns 5 to 11 of line 2.
-  EXPECT_EQ(find(text, QStringLiteral("Calcula"), Range{1, 1, 2, 11}), (Range{2, 5, 2, 12}));
-  EXPECT_FALSE(find(text, QStringLiteral("Calcula"), Range{1, 1, 2, 10}));
-  EXPECT_FALSE(find(text, QStringLiteral("End Sub"), Range{1, 1, 4, -1}));
-  EXPECT_FALSE(find(text, QStringLiteral("Dim"), Range{1, 2, -1, -1}));
-  EXPECT_EQ(errorNumberOf([&] {
-              find(text, QStringLiteral("x"), Range{0, 1, -1, -1});
-            }),
-            ide::err::InvalidProcedureCall);
+  EXPECT_EQ(find(text, u"Calcula"_qs, Range{1, 1, 2, 11}), (Range{2, 5, 2, 12}));
+  EXPECT_FALSE(find(text, u"Calcula"_qs, Range{1, 1, 2, 10}));
+  EXPECT_FALSE(find(text, u"End Sub"_qs, Range{1, 1, 4, -1}));
+  EXPECT_FALSE(find(text, u"Dim"_qs, Range{1, 2, -1, -1}));
+  EXPECT_EQ(errorNumberOf([&] { find(text, u"x"_qs, Range{0, 1, -1, -1}); }), ide::err::InvalidProcedureCall);
 }
 
 TEST(Find, PatternsUseTheIdesWildcards) {
   CodeText text;
   loadLines(text, kFindModule);
-  EXPECT_EQ(find(text, QStringLiteral("Valor#"), kAll, false, false, true), (Range{3, 21, 3, 27}));
-  EXPECT_EQ(find(text, QStringLiteral("Valor##"), kAll, false, false, true), (Range{3, 30, 3, 37}));
-  EXPECT_EQ(find(text, QStringLiteral("s?ma"), kAll, false, false, true), (Range{1, 5, 1, 9}));
+  EXPECT_EQ(find(text, u"Valor#"_qs, kAll, false, false, true), (Range{3, 21, 3, 27}));
+  EXPECT_EQ(find(text, u"Valor##"_qs, kAll, false, false, true), (Range{3, 30, 3, 37}));
+  EXPECT_EQ(find(text, u"s?ma"_qs, kAll, false, false, true), (Range{1, 5, 1, 9}));
   // "*" takes the longest run on the line.
-  EXPECT_EQ(find(text, QStringLiteral("Dim*Long"), kAll, false, false, true), (Range{1, 1, 1, 36}));
-  EXPECT_EQ(find(text, QStringLiteral("[a-c]alcula"), kAll, false, false, true), (Range{2, 5, 2, 12}));
-  EXPECT_EQ(find(text, QStringLiteral("Valor[!1]"), kAll, false, false, true), (Range{3, 30, 3, 36}));
-  EXPECT_EQ(find(text, QStringLiteral("x[.,]Soma"), kAll, false, false, true), (Range{3, 12, 3, 18}));
+  EXPECT_EQ(find(text, u"Dim*Long"_qs, kAll, false, false, true), (Range{1, 1, 1, 36}));
+  EXPECT_EQ(find(text, u"[a-c]alcula"_qs, kAll, false, false, true), (Range{2, 5, 2, 12}));
+  EXPECT_EQ(find(text, u"Valor[!1]"_qs, kAll, false, false, true), (Range{3, 30, 3, 36}));
+  EXPECT_EQ(find(text, u"x[.,]Soma"_qs, kAll, false, false, true), (Range{3, 12, 3, 18}));
   // Whole word with a pattern: "Soma*" would end inside "SomaTotal" otherwise.
-  EXPECT_EQ(find(text, QStringLiteral("Soma"), Range{4, 1, -1, -1}, true, false, true),
-            (Range{4, 17, 4, 21}));
+  EXPECT_EQ(find(text, u"Soma"_qs, Range{4, 1, -1, -1}, true, false, true), (Range{4, 17, 4, 21}));
 }
 
 TEST(Find, PatternErrors) {
   CodeText text;
   loadLines(text, kFindModule);
-  EXPECT_EQ(errorNumberOf([&] { find(text, QStringLiteral("[abc"), kAll, false, false, true); }), 93);
-  EXPECT_EQ(errorNumberOf([&] { find(text, QStringLiteral("[z-a]"), kAll, false, false, true); }), 93);
-  EXPECT_EQ(errorNumberOf([&] { find(text, QStringLiteral("Soma"), kAll, false, true, true); }),
+  EXPECT_EQ(errorNumberOf([&] { find(text, u"[abc"_qs, kAll, false, false, true); }), 93);
+  EXPECT_EQ(errorNumberOf([&] { find(text, u"[z-a]"_qs, kAll, false, false, true); }), 93);
+  EXPECT_EQ(errorNumberOf([&] { find(text, u"Soma"_qs, kAll, false, true, true); }),
             ide::err::InvalidProcedureCall);
 }
 

@@ -70,14 +70,14 @@ TEST(FindPatterns, ABadPatternIsError93) {
       ADD_FAILURE() << QString::fromUtf16(pattern).toStdString();
     } catch (const ide::Error& error) {
       EXPECT_EQ(error.number(), 93);
-      EXPECT_EQ(error.description(), QStringLiteral("Invalid pattern string"));
+      EXPECT_EQ(error.description(), u"Invalid pattern string"_qs);
     }
   }
 }
 
 TEST(FindPatterns, TakeTheLeftmostStartThenTheLongestEnd) {
   using Match = std::optional<std::pair<qsizetype, qsizetype>>;
-  const QString line = QStringLiteral("If sTexto = \"x\" Then sTexto = sTexto & Valor1");
+  const QString line = u"If sTexto = \"x\" Then sTexto = sTexto & Valor1"_qs;
   const auto find = [&](const char* pattern, bool wholeWord = false, qsizetype from = 0) {
     return FindMatcher(QString::fromLatin1(pattern), wholeWord, false, true).findIn(line, from, line.size());
   };
@@ -94,7 +94,7 @@ TEST(FindPatterns, WorkOnTheLongestLineTheIdeAllows) {
   const QString line = QString(1022, u'a') + u'b';
   for (const char* pattern : {"*a*a*a*a*a*a*a*a*c", "a?a?a?a?a?a?a?a?a?a?a?a?c", "*[!a]a"})
     EXPECT_FALSE(FindMatcher(QString::fromLatin1(pattern), false, false, true).findIn(line, 0, line.size()));
-  EXPECT_EQ(FindMatcher(QStringLiteral("a*b"), false, false, true).findIn(line, 0, line.size()),
+  EXPECT_EQ(FindMatcher(u"a*b"_qs, false, false, true).findIn(line, 0, line.size()),
             (std::optional<std::pair<qsizetype, qsizetype>>{{0, 1023}}));
 }
 

@@ -31,7 +31,7 @@ using test::readBytes;
 using test::writeBytes;
 
 QStringList splitCrLf(const QByteArray& bytes) {
-  return decodeAnsi(bytes).split(QStringLiteral("\r\n"));
+  return decodeAnsi(bytes).split(u"\r\n"_qs);
 }
 
 std::shared_ptr<ComponentImpl> componentOf(const std::shared_ptr<VbeImpl>& vbe, const QString& project,
@@ -65,12 +65,12 @@ TEST(RoundTrip, AnEditChangesOnlyTheEditedLines) {
   const auto before = copy.snapshot();
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto clientes = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("clsClientes"));
+  auto clientes = componentOf(vbe, u"Loja"_qs, u"clsClientes"_qs);
   ASSERT_TRUE(clientes);
   auto module = clientes->codeModule();
-  const int body = module->ProcBodyLine(QStringLiteral("Item"), ide::ProcKind::Get);
-  module->ReplaceLine(body + 1, QStringLiteral("    Set Item = mCol(Indice) ' alterado"));
-  module->InsertLines(1, QStringLiteral("' cabeçalho novo"));
+  const int body = module->ProcBodyLine(u"Item"_qs, ide::ProcKind::Get);
+  module->ReplaceLine(body + 1, u"    Set Item = mCol(Indice) ' alterado"_qs);
+  module->InsertLines(1, u"' cabeçalho novo"_qs);
   EXPECT_TRUE(clientes->IsDirty());
   vbe->saveAll();
   const auto after = copy.snapshot();
@@ -78,15 +78,15 @@ TEST(RoundTrip, AnEditChangesOnlyTheEditedLines) {
     if (it.key() == QLatin1StringView("Loja/clsClientes.cls")) continue;
     EXPECT_EQ(after.value(it.key()), it.value()) << it.key().toStdString();
   }
-  QStringList expected = splitCrLf(before.value(QStringLiteral("Loja/clsClientes.cls")));
-  const int headerLines = expected.indexOf(QStringLiteral("Option Explicit"));
+  QStringList expected = splitCrLf(before.value(u"Loja/clsClientes.cls"_qs));
+  const int headerLines = expected.indexOf(u"Option Explicit"_qs);
   ASSERT_GT(headerLines, 0);
   // Code line n is file line headerLines + n, plus one for the hidden attribute line below Item's header.
-  const int itemLine = expected.indexOf(QStringLiteral("Attribute Item.VB_UserMemId = 0"));
+  const int itemLine = expected.indexOf(u"Attribute Item.VB_UserMemId = 0"_qs);
   ASSERT_GT(itemLine, 0);
-  expected[itemLine + 1] = QStringLiteral("    Set Item = mCol(Indice) ' alterado");
-  expected.insert(headerLines, QStringLiteral("' cabeçalho novo"));
-  EXPECT_EQ(splitCrLf(after.value(QStringLiteral("Loja/clsClientes.cls"))), expected);
+  expected[itemLine + 1] = u"    Set Item = mCol(Indice) ' alterado"_qs;
+  expected.insert(headerLines, u"' cabeçalho novo"_qs);
+  EXPECT_EQ(splitCrLf(after.value(u"Loja/clsClientes.cls"_qs)), expected);
   EXPECT_FALSE(clientes->IsDirty());
 }
 
@@ -120,19 +120,19 @@ TEST(RoundTrip, GeneratedProjectsSurviveLoadAndSave) {
 
 TEST(RoundTrip, AModuleFileOpensAloneAndSavesInPlace) {
   ExampleCopy copy;
-  const QString path = copy.path(QStringLiteral("Loja/modPrincipal.bas"));
+  const QString path = copy.path(u"Loja/modPrincipal.bas"_qs);
   const QByteArray original = readBytes(path);
   auto vbe = VbeImpl::create();
   auto project = vbe->openModuleFile(path);
   ASSERT_EQ(project->components().size(), 1u);
   EXPECT_EQ(project->FileName(), QString());
   auto module = project->components().front()->codeModule();
-  module->InsertLines(module->CountOfLines() + 1, QStringLiteral("' fim"));
+  module->InsertLines(module->CountOfLines() + 1, u"' fim"_qs);
   vbe->saveAll();
   const QByteArray saved = readBytes(path);
   EXPECT_EQ(saved.left(original.size()), original);
   EXPECT_EQ(saved.mid(original.size()), QByteArray("' fim\r\n"));
-  EXPECT_FALSE(QFileInfo::exists(copy.path(QStringLiteral("Loja/Project1.vbp"))));
+  EXPECT_FALSE(QFileInfo::exists(copy.path(u"Loja/Project1.vbp"_qs)));
 }
 
 TEST(BadInput, FailuresNameTheFileAndLineAndAddNothing) {
@@ -140,22 +140,22 @@ TEST(BadInput, FailuresNameTheFileAndLineAndAddNothing) {
   auto vbe = VbeImpl::create();
   QString description;
 
-  EXPECT_EQ(errorNumberOf([&] { vbe->open(copy.path(QStringLiteral("Nada.vbp"))); }, &description),
+  EXPECT_EQ(errorNumberOf([&] { vbe->open(copy.path(u"Nada.vbp"_qs)); }, &description),
             ide::err::FileNotFound);
-  EXPECT_TRUE(description.contains(QStringLiteral("Nada.vbp")));
+  EXPECT_TRUE(description.contains(u"Nada.vbp"_qs));
 
   // A form whose description lacks its End.
-  const QString form = copy.path(QStringLiteral("Utilitarios/Quebrado.frm"));
+  const QString form = copy.path(u"Utilitarios/Quebrado.frm"_qs);
   writeBytes(form, "VERSION 5.00\r\nBegin VB.Form Quebrado \r\n   Caption = \"x\"\r\n");
   EXPECT_EQ(errorNumberOf([&] { vbe->open(form); }, &description), 321);
-  EXPECT_TRUE(description.contains(QStringLiteral("Quebrado.frm, line"))) << description.toStdString();
+  EXPECT_TRUE(description.contains(u"Quebrado.frm, line"_qs)) << description.toStdString();
 
   // A line over the IDE's limit, and a file that is not text.
-  const QString longLine = copy.path(QStringLiteral("Longa.bas"));
+  const QString longLine = copy.path(u"Longa.bas"_qs);
   writeBytes(longLine, "Attribute VB_Name = \"Longa\"\r\n' ok\r\n" + QByteArray(1024, 'x') + "\r\n");
   EXPECT_EQ(errorNumberOf([&] { vbe->open(longLine); }, &description), 321);
-  EXPECT_TRUE(description.contains(QStringLiteral("Longa.bas, line 3"))) << description.toStdString();
-  const QString binary = copy.path(QStringLiteral("Binario.bas"));
+  EXPECT_TRUE(description.contains(u"Longa.bas, line 3"_qs)) << description.toStdString();
+  const QString binary = copy.path(u"Binario.bas"_qs);
   writeBytes(binary, QByteArray("Attribute VB_Name = \"B\"\r\n\0\1\2", 28));
   EXPECT_EQ(errorNumberOf([&] { vbe->open(binary); }, &description), 321);
 
@@ -166,19 +166,18 @@ TEST(MessyProjects, EntriesKeepTheirSpellingAndMissingFilesTheirLines) {
   QTemporaryDir dir;
   const QString file = test::writeMessyProject(dir.path());
   const QByteArray original = readBytes(file);
-  writeBytes(dir.filePath(QStringLiteral("Grupo.vbg")),
+  writeBytes(dir.filePath(u"Grupo.vbg"_qs),
              "VBGROUP 5.0\r\nStartupProject=entrada.VBP\r\nProject=Outro\\Falta.vbp\r\n");
   auto vbe = VbeImpl::create();
-  auto project = vbe->open(dir.filePath(QStringLiteral("Grupo.vbg"))).at(0);
+  auto project = vbe->open(dir.filePath(u"Grupo.vbg"_qs)).at(0);
   EXPECT_EQ(project->Count(), 3);
   QStringList missing;
   for (const MissingFile& entry : vbe->missingFiles())
-    missing << QStringLiteral("%1: %2").arg(entry.line).arg(entry.entry);
-  EXPECT_EQ(missing,
-            QStringList({QStringLiteral("3: Outro\\Falta.vbp"), QStringLiteral("4: Classes\\clsFalta.cls")}));
+    missing << u"%1: %2"_qs.arg(entry.line).arg(entry.entry);
+  EXPECT_EQ(missing, QStringList({u"3: Outro\\Falta.vbp"_qs, u"4: Classes\\clsFalta.cls"_qs}));
   // A change touches its own entry only (the entries after the missing one still find their lines).
-  project->component(QStringLiteral("modMisto"))->setName(QStringLiteral("modAntigo"));
-  project->Remove(project->component(QStringLiteral("modEntrada")));
+  project->component(u"modMisto"_qs)->setName(u"modAntigo"_qs);
+  project->Remove(project->component(u"modEntrada"_qs));
   vbe->saveAll();
   QByteArray expected = original;
   expected.replace("Module=modEntrada; FONTES\\ModEntrada.bas\r\n", "")
@@ -189,34 +188,34 @@ TEST(MessyProjects, EntriesKeepTheirSpellingAndMissingFilesTheirLines) {
 TEST(Saving, AWriteThatCannotBeDoneSaysWhatFailedAndKeepsTheChanges) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
-  auto project = vbe->openProject(copy.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
-  auto component = project->component(QStringLiteral("modApi"));
-  component->codeModule()->InsertLines(1, QStringLiteral("' x"));
+  auto project = vbe->openProject(copy.path(u"Utilitarios/Utilitarios.vbp"_qs));
+  auto component = project->component(u"modApi"_qs);
+  component->codeModule()->InsertLines(1, u"' x"_qs);
   // A directory where the file should be: no write can replace it, not even root's.
-  const QString path = copy.path(QStringLiteral("Utilitarios/modApi.bas"));
+  const QString path = copy.path(u"Utilitarios/modApi.bas"_qs);
   QFile::remove(path);
-  ASSERT_TRUE(QDir().mkpath(path + QStringLiteral("/in-the-way")));
+  ASSERT_TRUE(QDir().mkpath(path + u"/in-the-way"_qs));
   QString description;
   EXPECT_EQ(errorNumberOf([&] { vbe->saveAll(); }, &description), ide::err::PathFileAccessError);
-  EXPECT_TRUE(description.contains(QStringLiteral("modApi.bas"))) << description.toStdString();
-  EXPECT_TRUE(QFileInfo(path + QStringLiteral("/in-the-way")).isDir());
+  EXPECT_TRUE(description.contains(u"modApi.bas"_qs)) << description.toStdString();
+  EXPECT_TRUE(QFileInfo(path + u"/in-the-way"_qs).isDir());
   EXPECT_TRUE(component->IsDirty());
 }
 
 TEST(Saving, AReadOnlyFileIsRefusedAndKeptAsItIs) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
-  auto project = vbe->openProject(copy.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
-  auto module = project->component(QStringLiteral("modApi"))->codeModule();
-  const QString path = copy.path(QStringLiteral("Utilitarios/modApi.bas"));
+  auto project = vbe->openProject(copy.path(u"Utilitarios/Utilitarios.vbp"_qs));
+  auto module = project->component(u"modApi"_qs)->codeModule();
+  const QString path = copy.path(u"Utilitarios/modApi.bas"_qs);
   const QByteArray original = readBytes(path);
-  module->InsertLines(1, QStringLiteral("' x"));
+  module->InsertLines(1, u"' x"_qs);
   QFile::setPermissions(path, QFileDevice::ReadOwner | QFileDevice::ReadGroup);
   QString description;
   EXPECT_EQ(errorNumberOf([&] { vbe->saveAll(); }, &description), ide::err::PermissionDenied);
-  EXPECT_EQ(description, QStringLiteral("Cannot write %1: the file is read-only").arg(path));
+  EXPECT_EQ(description, u"Cannot write %1: the file is read-only"_qs.arg(path));
   EXPECT_EQ(readBytes(path), original);
-  EXPECT_TRUE(project->component(QStringLiteral("modApi"))->IsDirty());
+  EXPECT_TRUE(project->component(u"modApi"_qs)->IsDirty());
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -258,8 +257,7 @@ struct EventLog {
     connections.push_back(events->FileControlEvents(nullptr)->AfterChangeFileName.connect(
         [this](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& newName,
                const QString& oldName) {
-          entries << QStringLiteral("file %1 %2 -> %3")
-                         .arg(static_cast<int>(type))
+          entries << u"file %1 %2 -> %3"_qs.arg(static_cast<int>(type))
                          .arg(QFileInfo(oldName).filePath(), newName);
         }));
   }
@@ -270,15 +268,14 @@ TEST(Events, OpeningAddingRenamingAndRemovingFireInOrder) {
   auto vbe = VbeImpl::create();
   EventLog log;
   log.attach(vbe);
-  auto project = vbe->openProject(copy.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
+  auto project = vbe->openProject(copy.path(u"Utilitarios/Utilitarios.vbp"_qs));
   auto added = project->VBComponents()->Add(ide::ComponentType::StdModule);
-  EXPECT_EQ(added->Name(), QStringLiteral("Module1"));
-  added->setName(QStringLiteral("modNovo"));
+  EXPECT_EQ(added->Name(), u"Module1"_qs);
+  added->setName(u"modNovo"_qs);
   project->VBComponents()->Remove(added);
-  const QStringList expected = {QStringLiteral("project added Utilitarios"),
-                                QStringLiteral("project activated Utilitarios"),
-                                QStringLiteral("added Module1"), QStringLiteral("renamed Module1 modNovo"),
-                                QStringLiteral("removed modNovo (present)")};
+  const QStringList expected = {u"project added Utilitarios"_qs, u"project activated Utilitarios"_qs,
+                                u"added Module1"_qs, u"renamed Module1 modNovo"_qs,
+                                u"removed modNovo (present)"_qs};
   EXPECT_EQ(log.entries, expected);
   // Loading components announces none of them: the project's addition covers them.
   EXPECT_EQ(project->components().size(), 3u);
@@ -291,7 +288,7 @@ TEST(Events, AHandlerMayCauseFurtherEventsBeforeItReturns) {
   auto components = vbe->Events()->VBComponentsEvents(nullptr);
   auto onAdded = components->ItemAdded.connect([&](const ide::Ref<ide::VBComponent>& c) {
     order << "added " + c->Name();
-    if (c->Name() == QLatin1StringView("Module1")) c->setName(QStringLiteral("Primeiro"));
+    if (c->Name() == QLatin1StringView("Module1")) c->setName(u"Primeiro"_qs);
     order << "added done " + c->Name();
   });
   auto onRenamed =
@@ -299,30 +296,30 @@ TEST(Events, AHandlerMayCauseFurtherEventsBeforeItReturns) {
         order << "renamed " + old + " " + c->Name();
       });
   vbe->newProject()->VBComponents()->Add(ide::ComponentType::StdModule);
-  const QStringList expected = {QStringLiteral("added Module1"), QStringLiteral("renamed Module1 Primeiro"),
-                                QStringLiteral("added done Primeiro")};
+  const QStringList expected = {u"added Module1"_qs, u"renamed Module1 Primeiro"_qs,
+                                u"added done Primeiro"_qs};
   EXPECT_EQ(order, expected);
 }
 
 TEST(Components, NamesAreCheckedAndRenamesReachTheFiles) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
-  auto project = vbe->openProject(copy.path(QStringLiteral("Loja/Loja.vbp")));
-  auto module = project->component(QStringLiteral("modConstantes"));
-  EXPECT_EQ(errorNumberOf([&] { module->setName(QStringLiteral("modPrincipal")); }), ide::err::NameConflict);
-  EXPECT_EQ(errorNumberOf([&] { module->setName(QStringLiteral("2mod")); }), ide::err::InvalidName);
-  EXPECT_EQ(errorNumberOf([&] { module->setName(QStringLiteral("Loja")); }), ide::err::NameConflict);
-  module->setName(QStringLiteral("modValores"));
-  auto form = project->component(QStringLiteral("frmCliente"));
-  form->setName(QStringLiteral("frmClienteNovo"));
+  auto project = vbe->openProject(copy.path(u"Loja/Loja.vbp"_qs));
+  auto module = project->component(u"modConstantes"_qs);
+  EXPECT_EQ(errorNumberOf([&] { module->setName(u"modPrincipal"_qs); }), ide::err::NameConflict);
+  EXPECT_EQ(errorNumberOf([&] { module->setName(u"2mod"_qs); }), ide::err::InvalidName);
+  EXPECT_EQ(errorNumberOf([&] { module->setName(u"Loja"_qs); }), ide::err::NameConflict);
+  module->setName(u"modValores"_qs);
+  auto form = project->component(u"frmCliente"_qs);
+  form->setName(u"frmClienteNovo"_qs);
   vbe->saveAll();
-  const QString vbp = decodeAnsi(readBytes(copy.path(QStringLiteral("Loja/Loja.vbp"))));
-  EXPECT_TRUE(vbp.contains(QStringLiteral("Module=modValores; modConstantes.bas\r\n")));
-  const QString bas = decodeAnsi(readBytes(copy.path(QStringLiteral("Loja/modConstantes.bas"))));
-  EXPECT_TRUE(bas.startsWith(QStringLiteral("Attribute VB_Name = \"modValores\"\r\n")));
-  const QString frm = decodeAnsi(readBytes(copy.path(QStringLiteral("Loja/frmCliente.frm"))));
-  EXPECT_TRUE(frm.contains(QStringLiteral("Begin VB.Form frmClienteNovo ")));
-  EXPECT_TRUE(frm.contains(QStringLiteral("Attribute VB_Name = \"frmClienteNovo\"")));
+  const QString vbp = decodeAnsi(readBytes(copy.path(u"Loja/Loja.vbp"_qs)));
+  EXPECT_TRUE(vbp.contains(u"Module=modValores; modConstantes.bas\r\n"_qs));
+  const QString bas = decodeAnsi(readBytes(copy.path(u"Loja/modConstantes.bas"_qs)));
+  EXPECT_TRUE(bas.startsWith(u"Attribute VB_Name = \"modValores\"\r\n"_qs));
+  const QString frm = decodeAnsi(readBytes(copy.path(u"Loja/frmCliente.frm"_qs)));
+  EXPECT_TRUE(frm.contains(u"Begin VB.Form frmClienteNovo "_qs));
+  EXPECT_TRUE(frm.contains(u"Attribute VB_Name = \"frmClienteNovo\""_qs));
 }
 
 TEST(Components, NewComponentsAreSavedBesideTheProject) {
@@ -331,23 +328,23 @@ TEST(Components, NewComponentsAreSavedBesideTheProject) {
   auto project = vbe->newProject();
   EXPECT_EQ(project->FileName(), QString());
   auto module = project->VBComponents()->Add(ide::ComponentType::StdModule);
-  module->CodeModule()->AddFromString(QStringLiteral("Option Explicit\r\nPublic Sub Main()\r\nEnd Sub"));
+  module->CodeModule()->AddFromString(u"Option Explicit\r\nPublic Sub Main()\r\nEnd Sub"_qs);
   auto form = project->VBComponents()->Add(ide::ComponentType::VBForm);
   auto klass = project->VBComponents()->Add(ide::ComponentType::ClassModule);
   EXPECT_EQ(module->FileNames(1), QString());
-  const QString path = dir.filePath(QStringLiteral("Novo.vbp"));
+  const QString path = dir.filePath(u"Novo.vbp"_qs);
   project->SaveAs(path);
   EXPECT_EQ(project->FileName(), path);
-  EXPECT_EQ(module->FileNames(1), dir.filePath(QStringLiteral("Module1.bas")));
+  EXPECT_EQ(module->FileNames(1), dir.filePath(u"Module1.bas"_qs));
   EXPECT_EQ(
       readBytes(module->FileNames(1)),
       QByteArray("Attribute VB_Name = \"Module1\"\r\nOption Explicit\r\nPublic Sub Main()\r\nEnd Sub\r\n"));
   EXPECT_TRUE(readBytes(form->FileNames(1)).startsWith("VERSION 5.00\r\nBegin VB.Form Form1 \r\n"));
   EXPECT_TRUE(readBytes(klass->FileNames(1)).startsWith("VERSION 1.0 CLASS\r\n"));
   const QString vbp = decodeAnsi(readBytes(path));
-  EXPECT_TRUE(vbp.contains(QStringLiteral("Module=Module1; Module1.bas\r\n")));
-  EXPECT_TRUE(vbp.contains(QStringLiteral("Form=Form1.frm\r\n")));
-  EXPECT_TRUE(vbp.contains(QStringLiteral("Class=Class1; Class1.cls\r\n")));
+  EXPECT_TRUE(vbp.contains(u"Module=Module1; Module1.bas\r\n"_qs));
+  EXPECT_TRUE(vbp.contains(u"Form=Form1.frm\r\n"_qs));
+  EXPECT_TRUE(vbp.contains(u"Class=Class1; Class1.cls\r\n"_qs));
   EXPECT_TRUE(project->Saved());
 
   // The saved project opens again with the same components.
@@ -362,16 +359,16 @@ TEST(Projects, SaveAsIntoAnotherDirectoryReportsTheProjectFile) {
   auto vbe = VbeImpl::create();
   EventLog log;
   log.attach(vbe);
-  auto project = vbe->openProject(copy.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
+  auto project = vbe->openProject(copy.path(u"Utilitarios/Utilitarios.vbp"_qs));
   const QString oldPath = project->FileName();
-  const QString newPath = elsewhere.filePath(QStringLiteral("Util2.vbp"));
+  const QString newPath = elsewhere.filePath(u"Util2.vbp"_qs);
   log.entries.clear();
   project->SaveAs(newPath);
   ASSERT_EQ(log.entries.size(), 1);
-  EXPECT_EQ(log.entries[0], QStringLiteral("file 3 %1 -> %2").arg(oldPath, newPath));
+  EXPECT_EQ(log.entries[0], u"file 3 %1 -> %2"_qs.arg(oldPath, newPath));
   // The components stay where they are; the new project file refers to them from its folder.
   const QString vbp = decodeAnsi(readBytes(newPath));
-  EXPECT_TRUE(vbp.contains(QStringLiteral("modApi.bas")));
+  EXPECT_TRUE(vbp.contains(u"modApi.bas"_qs));
   auto again = VbeImpl::create();
   EXPECT_EQ(again->openProject(newPath)->VBComponents()->Count(), 3);
 }
@@ -383,17 +380,16 @@ TEST(Projects, RenamingAndRemovingAProject) {
   log.attach(vbe);
   vbe->open(copy.groupFile());
   log.entries.clear();
-  auto util = vbe->project(QStringLiteral("Utilitarios"));
-  util->setName(QStringLiteral("Util"));
-  EXPECT_EQ(errorNumberOf([&] { util->setName(QStringLiteral("Loja")); }), ide::err::NameConflict);
+  auto util = vbe->project(u"Utilitarios"_qs);
+  util->setName(u"Util"_qs);
+  EXPECT_EQ(errorNumberOf([&] { util->setName(u"Loja"_qs); }), ide::err::NameConflict);
   vbe->VBProjects()->Remove(util);
   // The project that remains becomes the active one.
-  const QStringList expected = {QStringLiteral("project renamed Utilitarios Util"),
-                                QStringLiteral("project removed Util with 3"),
-                                QStringLiteral("project activated Loja")};
+  const QStringList expected = {u"project renamed Utilitarios Util"_qs, u"project removed Util with 3"_qs,
+                                u"project activated Loja"_qs};
   EXPECT_EQ(log.entries, expected);
   EXPECT_EQ(vbe->VBProjects()->Count(), 1);
-  EXPECT_EQ(vbe->ActiveVBProject()->Name(), QStringLiteral("Loja"));
+  EXPECT_EQ(vbe->ActiveVBProject()->Name(), u"Loja"_qs);
   EXPECT_EQ(errorNumberOf([&] { util->Collection(); }), ide::err::ObjectVariableNotSet);
 }
 
@@ -405,21 +401,20 @@ TEST(Windows, ACodePaneOpensItsWindowAndBecomesActive) {
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
   EXPECT_FALSE(vbe->ActiveCodePane());
-  auto module = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->CodeModule();
+  auto module = componentOf(vbe, u"Loja"_qs, u"modPrincipal"_qs)->CodeModule();
   auto pane = module->CodePane();
   EXPECT_EQ(pane, module->CodePane());
   pane->Show();
   EXPECT_EQ(vbe->ActiveCodePane(), pane);
   EXPECT_EQ(vbe->ActiveWindow(), pane->Window());
-  EXPECT_EQ(pane->Window()->Caption(), QStringLiteral("Loja - modPrincipal (Code)"));
+  EXPECT_EQ(pane->Window()->Caption(), u"Loja - modPrincipal (Code)"_qs);
   EXPECT_EQ(pane->Window()->Type(), ide::WindowType::CodeWindow);
   EXPECT_EQ(vbe->SelectedVBComponent(), module->Parent());
   auto& windows = vbe->Platform().windows();
   EXPECT_EQ(windows.GetFocus(), pane->Window()->hWnd());
   // In MDI display code windows live in the main window's MDI client.
-  const ide::HWnd client =
-      windows.FindWindowEx(vbe->MainWindow()->hWnd(), 0, QStringLiteral("MDIClient"), {});
-  EXPECT_EQ(windows.FindWindowEx(client, 0, QStringLiteral("VbaWindow"), pane->Window()->Caption()),
+  const ide::HWnd client = windows.FindWindowEx(vbe->MainWindow()->hWnd(), 0, u"MDIClient"_qs, {});
+  EXPECT_EQ(windows.FindWindowEx(client, 0, u"VbaWindow"_qs, pane->Window()->Caption()),
             pane->Window()->hWnd());
 }
 
@@ -428,10 +423,8 @@ TEST(Windows, ClosingTheActiveCodeWindowActivatesTheNextAndSendsDestroy) {
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
   const int toolWindows = vbe->Windows()->Count();
-  auto first =
-      componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->CodeModule()->CodePane();
-  auto second =
-      componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("clsCliente"))->CodeModule()->CodePane();
+  auto first = componentOf(vbe, u"Loja"_qs, u"modPrincipal"_qs)->CodeModule()->CodePane();
+  auto second = componentOf(vbe, u"Loja"_qs, u"clsCliente"_qs)->CodeModule()->CodePane();
   first->Show();
   second->Show();
   auto& windows = vbe->Platform().windows();
@@ -462,7 +455,7 @@ TEST(Windows, SelectionAndTopLineFollowTheIdesConventions) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto module = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule();
+  auto module = componentOf(vbe, u"Loja"_qs, u"modPrincipal"_qs)->codeModule();
   auto pane = module->pane();
   pane->setCountOfVisibleLines(10);
   pane->SetSelection(30, 5, 28, 2);  // given backwards
@@ -476,7 +469,7 @@ TEST(Windows, SelectionAndTopLineFollowTheIdesConventions) {
   EXPECT_EQ(errorNumberOf([&] { pane->setTopLine(0); }), ide::err::InvalidProcedureCall);
   // Lines inserted above the selection move it down with its text.
   pane->SetSelection(10, 1, 10, 4);
-  module->InsertLines(1, QStringLiteral("' a\r\n' b"));
+  module->InsertLines(1, u"' a\r\n' b"_qs);
   pane->GetSelection(sl, sc, el, ec);
   EXPECT_EQ((std::array{sl, sc, el, ec}), (std::array{12, 1, 12, 4}));
 }
@@ -487,13 +480,11 @@ TEST(Windows, SdiDisplayPutsCodeWindowsAtTheTopLevel) {
   options.displayModel = ide::DisplayModel::SDI;
   auto vbe = VbeImpl::create(std::move(options));
   vbe->open(copy.groupFile());
-  auto pane =
-      componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->CodeModule()->CodePane();
+  auto pane = componentOf(vbe, u"Loja"_qs, u"modPrincipal"_qs)->CodeModule()->CodePane();
   pane->Show();
   EXPECT_EQ(vbe->DisplayModel(), ide::DisplayModel::SDI);
-  EXPECT_EQ(
-      vbe->Platform().windows().FindWindowEx(0, 0, QStringLiteral("VbaWindow"), pane->Window()->Caption()),
-      pane->Window()->hWnd());
+  EXPECT_EQ(vbe->Platform().windows().FindWindowEx(0, 0, u"VbaWindow"_qs, pane->Window()->Caption()),
+            pane->Window()->hWnd());
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -503,20 +494,20 @@ TEST(Members, TheDefaultMemberIsTheOneWithProcedureIdZero) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto clientes = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("clsClientes"));
+  auto clientes = componentOf(vbe, u"Loja"_qs, u"clsClientes"_qs);
   auto members = clientes->CodeModule()->Members();
-  EXPECT_EQ(members->Item(QStringLiteral("Item"))->ProcedureId(), 0);
-  EXPECT_EQ(members->Item(QStringLiteral("Item"))->Type(), ide::MemberType::Property);
-  EXPECT_FALSE(members->Item(QStringLiteral("Add"))->ProcedureId());
-  members->Item(QStringLiteral("Item"))->setProcedureId(1234);
-  members->Item(QStringLiteral("Add"))->setProcedureId(0);
+  EXPECT_EQ(members->Item(u"Item"_qs)->ProcedureId(), 0);
+  EXPECT_EQ(members->Item(u"Item"_qs)->Type(), ide::MemberType::Property);
+  EXPECT_FALSE(members->Item(u"Add"_qs)->ProcedureId());
+  members->Item(u"Item"_qs)->setProcedureId(1234);
+  members->Item(u"Add"_qs)->setProcedureId(0);
   clientes->save();
-  const QString cls = decodeAnsi(readBytes(copy.path(QStringLiteral("Loja/clsClientes.cls"))));
+  const QString cls = decodeAnsi(readBytes(copy.path(u"Loja/clsClientes.cls"_qs)));
   EXPECT_TRUE(
       cls.contains(QStringLiteral("Public Property Get Item(ByVal Indice As Variant) As "
                                   "clsCliente\r\nAttribute Item.VB_UserMemId = 1234\r\n")));
-  EXPECT_TRUE(cls.contains(QStringLiteral("As clsCliente\r\nAttribute Add.VB_UserMemId = 0\r\n")));
-  EXPECT_EQ(errorNumberOf([&] { members->Item(QStringLiteral("Nenhum")); }), ide::err::SubscriptOutOfRange);
+  EXPECT_TRUE(cls.contains(u"As clsCliente\r\nAttribute Add.VB_UserMemId = 0\r\n"_qs));
+  EXPECT_EQ(errorNumberOf([&] { members->Item(u"Nenhum"_qs); }), ide::err::SubscriptOutOfRange);
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -526,37 +517,36 @@ TEST(Designers, ControlsPropertiesAndArraysAsTheFormDescribesThem) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto principal = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("frmPrincipal"));
+  auto principal = componentOf(vbe, u"Loja"_qs, u"frmPrincipal"_qs);
   ASSERT_TRUE(principal->Designer());
   EXPECT_EQ(principal->Type(), ide::ComponentType::VBForm);
-  EXPECT_EQ(principal->Properties()->Item(QStringLiteral("MDIChild"))->Value(), QVariant(false));
+  EXPECT_EQ(principal->Properties()->Item(u"MDIChild"_qs)->Value(), QVariant(false));
   int menus = 0;
   for (const auto& control : principal->Designer()->VBControls()->items())
     if (control->ClassName() == QLatin1StringView("Menu")) ++menus;
   EXPECT_GE(menus, 3);
 
   // cmdAcao(0 to 2) and optTipo(0 to 1), the latter inside the frame fraTipo.
-  auto cliente = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("frmCliente"));
+  auto cliente = componentOf(vbe, u"Loja"_qs, u"frmCliente"_qs);
   QStringList elements;
   for (const auto& control : cliente->Designer()->VBControls()->items()) {
-    const int index = control->Properties()->Item(QStringLiteral("Index"))->Value().toInt();
-    if (index >= 0) elements << QStringLiteral("%1(%2)").arg(control->name()).arg(index);
+    const int index = control->Properties()->Item(u"Index"_qs)->Value().toInt();
+    if (index >= 0) elements << u"%1(%2)"_qs.arg(control->name()).arg(index);
     if (control->name() == QLatin1StringView("optTipo")) {
-      EXPECT_EQ(control->Container()->name(), QStringLiteral("fraTipo"));
+      EXPECT_EQ(control->Container()->name(), u"fraTipo"_qs);
     }
   }
-  EXPECT_EQ(elements, (QStringList{QStringLiteral("cmdAcao(2)"), QStringLiteral("cmdAcao(1)"),
-                                   QStringLiteral("cmdAcao(0)"), QStringLiteral("optTipo(1)"),
-                                   QStringLiteral("optTipo(0)")}));
-  auto txtNome = cliente->Designer()->VBControls()->Item(QStringLiteral("txtNome"));
-  EXPECT_EQ(txtNome->Properties()->Item(QStringLiteral("Index"))->Value(), QVariant::fromValue(qint16(-1)));
+  EXPECT_EQ(elements, (QStringList{u"cmdAcao(2)"_qs, u"cmdAcao(1)"_qs, u"cmdAcao(0)"_qs, u"optTipo(1)"_qs,
+                                   u"optTipo(0)"_qs}));
+  auto txtNome = cliente->Designer()->VBControls()->Item(u"txtNome"_qs);
+  EXPECT_EQ(txtNome->Properties()->Item(u"Index"_qs)->Value(), QVariant::fromValue(qint16(-1)));
 }
 
 TEST(Designers, AddingRenamingAndRemovingControlsFireEventsAndReachTheFile) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto component = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("frmCliente"));
+  auto component = componentOf(vbe, u"Loja"_qs, u"frmCliente"_qs);
   auto designer = component->Designer();
   QStringList events;
   auto source = vbe->Events()->VBControlsEvents(component->project(), designer);
@@ -564,40 +554,33 @@ TEST(Designers, AddingRenamingAndRemovingControlsFireEventsAndReachTheFile) {
       source->ItemAdded.connect([&](const ide::Ref<ide::VBControl>& c) { events << "added " + c->name(); });
   auto r =
       source->ItemRenamed.connect([&](const ide::Ref<ide::VBControl>& c, const QString& old, int oldIndex) {
-        events << QStringLiteral("renamed %1(%2) %3(%4)")
-                      .arg(old)
-                      .arg(oldIndex)
-                      .arg(c->name())
-                      .arg(c->Properties()->Item(QStringLiteral("Index"))->Value().toInt());
+        events << u"renamed %1(%2) %3(%4)"_qs.arg(old).arg(oldIndex).arg(c->name()).arg(
+            c->Properties()->Item(u"Index"_qs)->Value().toInt());
       });
   auto d = source->ItemRemoved.connect(
       [&](const ide::Ref<ide::VBControl>& c) { events << "removed " + c->name(); });
 
-  auto box = designer->VBControls()->Add(QStringLiteral("VB.TextBox"));
-  EXPECT_EQ(box->ClassName(), QStringLiteral("TextBox"));
-  EXPECT_EQ(box->Properties()->Item(QStringLiteral("Text"))->Value(), QVariant(QStringLiteral("Text1")));
-  EXPECT_EQ(box->Properties()->Item(QStringLiteral("MaxLength"))->Value(), QVariant(qint32(0)));
-  box->Properties()->Item(QStringLiteral("Name"))->setValue(QStringLiteral("txtApelido"));
-  box->Properties()->Item(QStringLiteral("Index"))->setValue(0);
-  box->Properties()->Item(QStringLiteral("MaxLength"))->setValue(QStringLiteral("5"));
-  EXPECT_EQ(box->Properties()->Item(QStringLiteral("MaxLength"))->Value(), QVariant(qint32(5)));
-  EXPECT_EQ(errorNumberOf([&] {
-              box->Properties()->Item(QStringLiteral("MaxLength"))->setValue(QStringLiteral("abc"));
-            }),
-            380);
-  box->Properties()->Item(QStringLiteral("Locked"))->setValue(-1);
-  const QStringList expected = {QStringLiteral("added Text1"),
-                                QStringLiteral("renamed Text1(-1) txtApelido(-1)"),
-                                QStringLiteral("renamed txtApelido(-1) txtApelido(0)")};
+  auto box = designer->VBControls()->Add(u"VB.TextBox"_qs);
+  EXPECT_EQ(box->ClassName(), u"TextBox"_qs);
+  EXPECT_EQ(box->Properties()->Item(u"Text"_qs)->Value(), QVariant(u"Text1"_qs));
+  EXPECT_EQ(box->Properties()->Item(u"MaxLength"_qs)->Value(), QVariant(qint32(0)));
+  box->Properties()->Item(u"Name"_qs)->setValue(u"txtApelido"_qs);
+  box->Properties()->Item(u"Index"_qs)->setValue(0);
+  box->Properties()->Item(u"MaxLength"_qs)->setValue(u"5"_qs);
+  EXPECT_EQ(box->Properties()->Item(u"MaxLength"_qs)->Value(), QVariant(qint32(5)));
+  EXPECT_EQ(errorNumberOf([&] { box->Properties()->Item(u"MaxLength"_qs)->setValue(u"abc"_qs); }), 380);
+  box->Properties()->Item(u"Locked"_qs)->setValue(-1);
+  const QStringList expected = {u"added Text1"_qs, u"renamed Text1(-1) txtApelido(-1)"_qs,
+                                u"renamed txtApelido(-1) txtApelido(0)"_qs};
   EXPECT_EQ(events, expected);
   component->save();
-  const QString frm = decodeAnsi(readBytes(copy.path(QStringLiteral("Loja/frmCliente.frm"))));
-  EXPECT_TRUE(frm.contains(QStringLiteral("   Begin VB.TextBox txtApelido \r\n")));
-  EXPECT_TRUE(frm.contains(QStringLiteral("      Locked          =   -1  'True\r\n")));
-  EXPECT_TRUE(frm.contains(QStringLiteral("      MaxLength       =   5\r\n")));
+  const QString frm = decodeAnsi(readBytes(copy.path(u"Loja/frmCliente.frm"_qs)));
+  EXPECT_TRUE(frm.contains(u"   Begin VB.TextBox txtApelido \r\n"_qs));
+  EXPECT_TRUE(frm.contains(u"      Locked          =   -1  'True\r\n"_qs));
+  EXPECT_TRUE(frm.contains(u"      MaxLength       =   5\r\n"_qs));
   events.clear();
   designer->VBControls()->Remove(box);
-  EXPECT_EQ(events, QStringList{QStringLiteral("removed txtApelido")});
+  EXPECT_EQ(events, QStringList{u"removed txtApelido"_qs});
   EXPECT_EQ(errorNumberOf([&] { box->ClassName(); }), ide::err::ObjectVariableNotSet);
 }
 
@@ -605,66 +588,61 @@ TEST(Designers, NewControlsGetOnlyThePropertiesTheirClassHas) {
   auto vbe = VbeImpl::create();
   auto form = vbe->newProject()->VBComponents()->Add(ide::ComponentType::VBForm);
   auto controls = form->Designer()->VBControls();
-  auto timer = std::dynamic_pointer_cast<ControlImpl>(controls->Add(QStringLiteral("VB.Timer")));
-  auto line = std::dynamic_pointer_cast<ControlImpl>(controls->Add(QStringLiteral("Line")));
-  auto label = std::dynamic_pointer_cast<ControlImpl>(controls->Add(QStringLiteral("Label")));
-  EXPECT_EQ(timer->node()->propertyNames(), (QStringList{QStringLiteral("Left"), QStringLiteral("Top")}));
-  EXPECT_FALSE(line->node()->property(QStringLiteral("Width")));
-  EXPECT_FALSE(line->node()->property(QStringLiteral("Caption")));
-  EXPECT_EQ(label->node()->property(QStringLiteral("Caption")), QStringLiteral("\"Label1\""));
-  EXPECT_TRUE(label->node()->property(QStringLiteral("Height")));
+  auto timer = std::dynamic_pointer_cast<ControlImpl>(controls->Add(u"VB.Timer"_qs));
+  auto line = std::dynamic_pointer_cast<ControlImpl>(controls->Add(u"Line"_qs));
+  auto label = std::dynamic_pointer_cast<ControlImpl>(controls->Add(u"Label"_qs));
+  EXPECT_EQ(timer->node()->propertyNames(), (QStringList{u"Left"_qs, u"Top"_qs}));
+  EXPECT_FALSE(line->node()->property(u"Width"_qs));
+  EXPECT_FALSE(line->node()->property(u"Caption"_qs));
+  EXPECT_EQ(label->node()->property(u"Caption"_qs), u"\"Label1\""_qs);
+  EXPECT_TRUE(label->node()->property(u"Height"_qs));
 }
 
 TEST(Designers, SelectionChangesAreAnnounced) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto component = componentOf(vbe, QStringLiteral("Loja"), QStringLiteral("frmCliente"));
+  auto component = componentOf(vbe, u"Loja"_qs, u"frmCliente"_qs);
   auto form = component->form();
   QStringList events;
   auto source = vbe->Events()->SelectedVBControlsEvents(component->project(), form);
   auto a = source->ItemAdded.connect([&](const ide::Ref<ide::VBControl>& c) { events << "+" + c->name(); });
   auto r = source->ItemRemoved.connect([&](const ide::Ref<ide::VBControl>& c) { events << "-" + c->name(); });
-  auto nome = form->findControl(QStringLiteral("txtNome"));
-  auto email = form->findControl(QStringLiteral("txtEmail"));
+  auto nome = form->findControl(u"txtNome"_qs);
+  auto email = form->findControl(u"txtEmail"_qs);
   form->setSelection({nome, email});
   form->setSelection({email});
-  EXPECT_EQ(events, (QStringList{QStringLiteral("+txtNome"), QStringLiteral("+txtEmail"),
-                                 QStringLiteral("-txtNome")}));
+  EXPECT_EQ(events, (QStringList{u"+txtNome"_qs, u"+txtEmail"_qs, u"-txtNome"_qs}));
   EXPECT_EQ(form->SelectedVBControls()->Count(), 1);
 }
 
 TEST(Events, FilesWrittenAddedAndRemovedAreAnnounced) {
   ExampleCopy copy;
   auto vbe = VbeImpl::create();
-  auto project = vbe->openProject(copy.path(QStringLiteral("Utilitarios/Utilitarios.vbp")));
+  auto project = vbe->openProject(copy.path(u"Utilitarios/Utilitarios.vbp"_qs));
   QStringList events;
   auto files = vbe->Events()->FileControlEvents(project);
-  auto w = files->AfterWriteFile.connect(
-      [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& name, int result) {
-        events << QStringLiteral("write %1 %2 %3")
-                      .arg(static_cast<int>(type))
-                      .arg(QFileInfo(name).fileName())
-                      .arg(result);
-      });
+  auto w = files->AfterWriteFile.connect([&](const ide::Ref<ide::VBProject>&, ide::FileType type,
+                                             const QString& name, int result) {
+    events << u"write %1 %2 %3"_qs.arg(static_cast<int>(type)).arg(QFileInfo(name).fileName()).arg(result);
+  });
   auto add = files->AfterAddFile.connect(
       [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& name) {
-        events << QStringLiteral("add %1 %2").arg(static_cast<int>(type)).arg(QFileInfo(name).fileName());
+        events << u"add %1 %2"_qs.arg(static_cast<int>(type)).arg(QFileInfo(name).fileName());
       });
   auto rem = files->AfterRemoveFile.connect(
       [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& name) {
-        events << QStringLiteral("remove %1 %2").arg(static_cast<int>(type)).arg(QFileInfo(name).fileName());
+        events << u"remove %1 %2"_qs.arg(static_cast<int>(type)).arg(QFileInfo(name).fileName());
       });
-  project->component(QStringLiteral("modApi"))->codeModule()->InsertLines(1, QStringLiteral("' x"));
+  project->component(u"modApi"_qs)->codeModule()->InsertLines(1, u"' x"_qs);
   vbe->saveAll();
-  auto added = project->VBComponents()->AddFile(copy.path(QStringLiteral("Loja/modConstantes.bas")));
+  auto added = project->VBComponents()->AddFile(copy.path(u"Loja/modConstantes.bas"_qs));
   project->VBComponents()->Remove(added);
-  EXPECT_EQ(events,
-            (QStringList{QStringLiteral("write 1 modApi.bas 0"), QStringLiteral("add 1 modConstantes.bas"),
-                         QStringLiteral("remove 1 modConstantes.bas")}));
+  EXPECT_EQ(events, (QStringList{u"write 1 modApi.bas 0"_qs, u"add 1 modConstantes.bas"_qs,
+                                 u"remove 1 modConstantes.bas"_qs}));
   events.clear();
   vbe->saveAll();  // the project file changed (a component came and went)
-  EXPECT_EQ(events, QStringList{QStringLiteral("write 3 Utilitarios.vbp 0")});
+  EXPECT_EQ(events, QStringList{u"write 3 Utilitarios.vbp 0"_qs});
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -673,19 +651,19 @@ TEST(Events, FilesWrittenAddedAndRemovedAreAnnounced) {
 TEST(CommandBars, TheIdesBarsAreThereAndControlsComeAndGo) {
   auto vbe = VbeImpl::create();
   auto bars = vbe->CommandBars();
-  auto menuBar = bars->Item(QStringLiteral("Menu Bar"));
+  auto menuBar = bars->Item(u"Menu Bar"_qs);
   ASSERT_GE(menuBar->Controls()->Count(), 11);
-  EXPECT_EQ(menuBar->Controls()->Item(11)->Caption(), QStringLiteral("&Add-Ins"));
-  auto addIns = bars->Item(QStringLiteral("Add-Ins"));
+  EXPECT_EQ(menuBar->Controls()->Item(11)->Caption(), u"&Add-Ins"_qs);
+  auto addIns = bars->Item(u"Add-Ins"_qs);
   EXPECT_EQ(addIns, menuBar->Controls()->Item(11)->CommandBar());
   for (const char* name : {"Code Window", "Code Window (Break)", "Standard"})
     EXPECT_NO_THROW(bars->Item(QLatin1StringView(name)));
-  EXPECT_EQ(errorNumberOf([&] { bars->Item(QStringLiteral("Nenhuma")); }), ide::err::InvalidProcedureCall);
+  EXPECT_EQ(errorNumberOf([&] { bars->Item(u"Nenhuma"_qs); }), ide::err::InvalidProcedureCall);
 
   auto popup = menuBar->Controls()->Add(ide::ControlType::Popup, 1, {}, 11, true);
-  popup->setCaption(QStringLiteral("Quimbel"));
+  popup->setCaption(u"Quimbel"_qs);
   EXPECT_EQ(menuBar->Controls()->Item(11), popup);
-  EXPECT_EQ(menuBar->Controls()->Item(12)->Caption(), QStringLiteral("&Add-Ins"));
+  EXPECT_EQ(menuBar->Controls()->Item(12)->Caption(), u"&Add-Ins"_qs);
   auto item = popup->CommandBar()->Controls()->Add(ide::ControlType::Button, 1, {}, 0, true);
   item->setFace(QByteArray("png bytes"));
   EXPECT_EQ(item->Face(), QByteArray("png bytes"));
@@ -701,37 +679,34 @@ TEST(CommandBars, TheIdesBarsAreThereAndControlsComeAndGo) {
   EXPECT_EQ(menuBar->Controls()->Count(), count - 1);
   EXPECT_EQ(errorNumberOf([&] { popup->Delete(); }), ide::err::ObjectVariableNotSet);
 
-  auto toolbar = bars->Add(QStringLiteral("Quimbel 2.2"), ide::BarPosition::Top, false, false);
-  EXPECT_EQ(bars->Item(QStringLiteral("Quimbel 2.2")), toolbar);
+  auto toolbar = bars->Add(u"Quimbel 2.2"_qs, ide::BarPosition::Top, false, false);
+  EXPECT_EQ(bars->Item(u"Quimbel 2.2"_qs), toolbar);
   toolbar->Delete();
-  EXPECT_EQ(errorNumberOf([&] { bars->Item(QStringLiteral("Quimbel 2.2")); }),
-            ide::err::InvalidProcedureCall);
-  EXPECT_EQ(errorNumberOf([&] { bars->Item(QStringLiteral("Standard"))->Delete(); }),
-            ide::err::InvalidProcedureCall);
+  EXPECT_EQ(errorNumberOf([&] { bars->Item(u"Quimbel 2.2"_qs); }), ide::err::InvalidProcedureCall);
+  EXPECT_EQ(errorNumberOf([&] { bars->Item(u"Standard"_qs)->Delete(); }), ide::err::InvalidProcedureCall);
 }
 
 TEST(CommandBars, TheModeShowsThroughTheStandardBarsContinueAndEnd) {
   auto vbe = VbeImpl::create();
-  auto standard = vbe->CommandBars()->Item(QStringLiteral("Standard"))->Controls();
+  auto standard = vbe->CommandBars()->Item(u"Standard"_qs)->Controls();
   auto modeFromBar = [&] {
-    if (standard->Item(QStringLiteral("CONTINUE"))->Enabled()) return ide::IdeMode::Break;
-    if (standard->Item(QStringLiteral("end"))->Enabled()) return ide::IdeMode::Run;
+    if (standard->Item(u"CONTINUE"_qs)->Enabled()) return ide::IdeMode::Break;
+    if (standard->Item(u"end"_qs)->Enabled()) return ide::IdeMode::Run;
     return ide::IdeMode::Design;
   };
   EXPECT_EQ(modeFromBar(), ide::IdeMode::Design);
-  standard->Item(QStringLiteral("Start"))->Execute();
+  standard->Item(u"Start"_qs)->Execute();
   EXPECT_EQ(vbe->mode(), ide::IdeMode::Run);
   EXPECT_EQ(modeFromBar(), ide::IdeMode::Run);
-  standard->Item(QStringLiteral("Break"))->Execute();
+  standard->Item(u"Break"_qs)->Execute();
   EXPECT_EQ(modeFromBar(), ide::IdeMode::Break);
-  standard->Item(QStringLiteral("End"))->Execute();
+  standard->Item(u"End"_qs)->Execute();
   EXPECT_EQ(modeFromBar(), ide::IdeMode::Design);
 }
 
 TEST(CommandBars, ASinkCanCancelTheIdesOwnCommand) {
   auto vbe = VbeImpl::create();
-  auto start =
-      vbe->CommandBars()->Item(QStringLiteral("Standard"))->Controls()->Item(QStringLiteral("Start"));
+  auto start = vbe->CommandBars()->Item(u"Standard"_qs)->Controls()->Item(u"Start"_qs);
   auto cancel = vbe->Events()->CommandBarEvents(start)->Click.connect(
       [](const ide::Ref<ide::CommandBarControl>&, bool& handled, bool& cancelDefault) {
         handled = true;
@@ -751,11 +726,11 @@ QString takeAddInLog() {
   QLibrary library(QStringLiteral(QUIMBEL_TEST_ADDIN));
   using TakeLog = const char* (*)();
   auto take = reinterpret_cast<TakeLog>(library.resolve("testAddInTakeLog"));
-  return take ? QString::fromUtf8(take()) : QStringLiteral("no log");
+  return take ? QString::fromUtf8(take()) : u"no log"_qs;
 }
 
 int addInItems(const std::shared_ptr<VbeImpl>& vbe) {
-  auto controls = vbe->CommandBars()->Item(QStringLiteral("Add-Ins"))->Controls();
+  auto controls = vbe->CommandBars()->Item(u"Add-Ins"_qs)->Controls();
   int count = 0;
   for (int i = 1; i <= controls->Count(); ++i)
     if (controls->Item(i)->Caption() == QLatin1StringView("Test Add-In")) ++count;
@@ -766,30 +741,29 @@ TEST(AddIns, LoadAtStartupLoadLaterUnloadAndLoadAgain) {
   takeAddInLog();
   auto vbe = VbeImpl::create();
   auto addIn = vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_TEST_ADDIN), true);
-  EXPECT_EQ(vbe->Addins()->Item(QStringLiteral("QuimbelTest.Connect")), addIn);
+  EXPECT_EQ(vbe->Addins()->Item(u"QuimbelTest.Connect"_qs), addIn);
   vbe->startup();
-  EXPECT_EQ(takeAddInLog(), QStringLiteral("connect 1,update,startup"));
+  EXPECT_EQ(takeAddInLog(), u"connect 1,update,startup"_qs);
   EXPECT_TRUE(addIn->Connect());
   EXPECT_EQ(addInItems(vbe), 1);
   vbe->manualLoop()->advance(250);
-  EXPECT_EQ(takeAddInLog(), QStringLiteral("tick,tick"));
+  EXPECT_EQ(takeAddInLog(), u"tick,tick"_qs);
 
   addIn->setConnect(false);
   EXPECT_FALSE(addIn->Connect());
   vbe->manualLoop()->DoEvents();
-  EXPECT_EQ(takeAddInLog(), QStringLiteral("disconnect 1"));
+  EXPECT_EQ(takeAddInLog(), u"disconnect 1"_qs);
   EXPECT_EQ(addInItems(vbe), 0);
   EXPECT_EQ(vbe->manualLoop()->activeTimers(), 0);
 
   addIn->setConnect(true);
-  EXPECT_EQ(takeAddInLog(), QStringLiteral("connect 0,update"));
+  EXPECT_EQ(takeAddInLog(), u"connect 0,update"_qs);
   EXPECT_EQ(addInItems(vbe), 1);
-  auto item =
-      vbe->CommandBars()->Item(QStringLiteral("Add-Ins"))->Controls()->Item(QStringLiteral("Test Add-In"));
+  auto item = vbe->CommandBars()->Item(u"Add-Ins"_qs)->Controls()->Item(u"Test Add-In"_qs);
   item->Execute();
-  EXPECT_EQ(takeAddInLog(), QStringLiteral("click"));
+  EXPECT_EQ(takeAddInLog(), u"click"_qs);
   vbe->shutdown();
-  EXPECT_EQ(takeAddInLog(), QStringLiteral("disconnect 0"));
+  EXPECT_EQ(takeAddInLog(), u"disconnect 0"_qs);
   EXPECT_EQ(addInItems(vbe), 0);
   EXPECT_EQ(addIn->connectionCount(), 2);
 }
@@ -803,16 +777,15 @@ TEST(AddIns, AnAddInCanUnloadItselfFromItsOwnStartup) {
   qunsetenv("QUIMBEL_TEST_ADDIN_FAIL");
   EXPECT_FALSE(addIn->Connect());
   vbe->manualLoop()->DoEvents();
-  EXPECT_EQ(takeAddInLog(), QStringLiteral("connect 1,update,startup,disconnect 1"));
+  EXPECT_EQ(takeAddInLog(), u"connect 1,update,startup,disconnect 1"_qs);
   EXPECT_EQ(addInItems(vbe), 0);
 }
 
 TEST(AddIns, ALibraryThatIsNoAddInIsRefused) {
   auto vbe = VbeImpl::create();
   QString description;
-  EXPECT_EQ(errorNumberOf(
-                [&] { vbe->addIns().registerLibrary(QStringLiteral("/nonexistent/libnothing.so"), true); },
-                &description),
+  EXPECT_EQ(errorNumberOf([&] { vbe->addIns().registerLibrary(u"/nonexistent/libnothing.so"_qs, true); },
+                          &description),
             48);
   EXPECT_EQ(vbe->Addins()->Count(), 0);
 }

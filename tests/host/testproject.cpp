@@ -38,18 +38,18 @@ QMap<QString, QByteArray> snapshot(const QString& directory) {
 }
 
 QString writeMessyProject(const QString& dir) {
-  writeBytes(dir + QStringLiteral("/Forms/frmLuzNegra.frm"),
+  writeBytes(dir + u"/Forms/frmLuzNegra.frm"_qs,
              "VERSION 5.00\r\nBegin VB.Form frmLuzNegra \r\n   Caption         =   \"Ilumina\xE7\xE3o\"\r\n"
              "End\r\nAttribute VB_Name = \"frmLuzNegra\"\r\nOption Explicit\r\n");
-  writeBytes(dir + QStringLiteral("/Fontes/modEntrada.bas"),
+  writeBytes(dir + u"/Fontes/modEntrada.bas"_qs,
              "Attribute VB_Name = \"modEntrada\"\r\nOption Explicit\r\n' Configura\xE7\xE3o\r\n"
              "Public Sub Principal()\r\n    If Dir$(\"C:\\Dados\") = \"\" Then GoTo 10\r\n"
              "    frmLuzNegra.Show\r\n10  Exit Sub\r\nEnd Sub\r\n");
   writeBytes(
-      dir + QStringLiteral("/Fontes/modMisto.bas"),
+      dir + u"/Fontes/modMisto.bas"_qs,
       "Attribute VB_Name = \"modMisto\"\nOption Explicit\n' Vers\xE3o antiga\rSub Velha()\r    x = 1\r\r"
       "    y = 2\rEnd Sub");
-  const QString project = dir + QStringLiteral("/Entrada.vbp");
+  const QString project = dir + u"/Entrada.vbp"_qs;
   writeBytes(project,
              "Type=Exe\r\nForm=forms\\frmLuzNEGRA.frm\r\nModule=modEntrada; FONTES\\ModEntrada.bas\r\n"
              "Class=clsFalta; Classes\\clsFalta.cls\r\nModule=modMisto; .\\fontes\\modmisto.BAS\r\n"

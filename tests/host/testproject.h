@@ -18,7 +18,7 @@ class ExampleCopy {
  public:
   ExampleCopy();
   QString path(const QString& relative) const { return m_dir.filePath(relative); }
-  QString groupFile() const { return path(QStringLiteral("Demo.vbg")); }
+  QString groupFile() const { return path(u"Demo.vbg"_qs); }
   /// Every file below the directory with its bytes, by relative path.
   QMap<QString, QByteArray> snapshot() const;
 

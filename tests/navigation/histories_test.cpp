@@ -45,7 +45,7 @@ struct HistoryIde {
 TEST(CHistories, TheEleventhPlaceDropsTheOldest) {
   HistoryIde ide;
   for (int i = 1; i <= 11; ++i)
-    ide.record(ide.one, 50 * i - 47, QStringLiteral("Proc%1").arg(i));
+    ide.record(ide.one, 50 * i - 47, u"Proc%1"_qs.arg(i));
   EXPECT_EQ(ide.histories.HistoryCount(), 10);
   EXPECT_EQ(ide.histories.entry(1).ProcName, u"Proc2"_qs);
   EXPECT_EQ(ide.histories.entry(10).ProcName, u"Proc11"_qs);
@@ -124,7 +124,7 @@ TEST(CHistories, BackWithoutAKnownPresentShowsTheNewestPlaceAndAddsNoEmptyOne) {
 TEST(CHistories, ClearingForwardKeepsThePlacesUpToTheShownOne) {
   HistoryIde ide;
   for (int i = 1; i <= 4; ++i)
-    ide.record(ide.one, 50 * i - 47, QStringLiteral("Proc%1").arg(i));
+    ide.record(ide.one, 50 * i - 47, u"Proc%1"_qs.arg(i));
   ide.setCurrent(ide.two, 3, u"Proc1"_qs);
   ide.histories.ClearHistories(CA_FORWARD);
   EXPECT_EQ(ide.histories.HistoryCount(), 4) << "not browsing: nothing to clear";

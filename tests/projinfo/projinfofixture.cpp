@@ -11,11 +11,11 @@ namespace projinfo::test {
 
 Scene::Scene() : m_oldTemp(qgetenv("TMPDIR")) {
   // A project never saved keeps its info file in the temporary directory: this test's own.
-  QDir().mkpath(path(QStringLiteral("tmp")));
-  QDir().mkpath(path(QStringLiteral("install")));
-  qputenv("TMPDIR", path(QStringLiteral("tmp")).toLocal8Bit());
-  qputenv("QUIMBEL_DATA_DIR", path(QStringLiteral("data")).toLocal8Bit());
-  appInfo.OpenFile(path(QStringLiteral("install")));
+  QDir().mkpath(path(u"tmp"_qs));
+  QDir().mkpath(path(u"install"_qs));
+  qputenv("TMPDIR", path(u"tmp"_qs).toLocal8Bit());
+  qputenv("QUIMBEL_DATA_DIR", path(u"data"_qs).toLocal8Bit());
+  appInfo.OpenFile(path(u"install"_qs));
   services.vbe = vbe.get();
   services.appInfo = &appInfo;
   services.createFavorites = [](CProjInfo& info) -> std::unique_ptr<InfoRecordList> {
@@ -32,11 +32,11 @@ QString Scene::writeProject(const QString& folder, const QList<std::pair<QString
   QByteArray vbp = "Type=Exe\r\n";
   for (const auto& [name, text] : modules) {
     vbp += "Module=" + name.toLatin1() + "; " + name.toLatin1() + ".bas\r\n";
-    host::test::writeBytes(path(folder + u'/' + name + QStringLiteral(".bas")),
+    host::test::writeBytes(path(folder + u'/' + name + u".bas"_qs),
                            "Attribute VB_Name = \"" + name.toLatin1() + "\"\r\n" + text.toLatin1());
   }
   vbp += "Name=\"Loja\"\r\n";
-  const QString file = path(folder + QStringLiteral("/Proj.vbp"));
+  const QString file = path(folder + u"/Proj.vbp"_qs);
   host::test::writeBytes(file, vbp);
   return file;
 }

@@ -38,17 +38,17 @@ std::shared_ptr<Storage> createFile(const QString& path) {
 /// A file with two task records, committed.
 void writeSample(const QString& path) {
   auto root = createFile(path);
-  auto tasks = root->CreateStorage(QStringLiteral("TaskList"), kElementMode);
+  auto tasks = root->CreateStorage(u"TaskList"_qs, kElementMode);
   for (int id : {1, 2})
-    tasks->CreateStream(QStringLiteral("Task%1").arg(id), kElementMode)
-        ->WriteData(TaskRecord{QStringLiteral("Revisar cálculo %1").arg(id), {}, id == 2, id}.toText());
-  root->CreateStream(QStringLiteral("LastTaskId"), kElementMode)->WriteData(2);
+    tasks->CreateStream(u"Task%1"_qs.arg(id), kElementMode)
+        ->WriteData(TaskRecord{u"Revisar cálculo %1"_qs.arg(id), {}, id == 2, id}.toText());
+  root->CreateStream(u"LastTaskId"_qs, kElementMode)->WriteData(2);
   root->Commit(0);
 }
 
 TEST(StreamLayout, EachTypeIsWrittenByteForByteAndReadBack) {
   QTemporaryDir dir;
-  auto root = createFile(dir.filePath(QStringLiteral("a.qmi")));
+  auto root = createFile(dir.filePath(u"a.qmi"_qs));
   const struct {
     QVariant value;
     qint32 code;
@@ -70,7 +70,7 @@ TEST(StreamLayout, EachTypeIsWrittenByteForByteAndReadBack) {
       {QVariant::fromValue(false), vbBoolean, QByteArray(2, '\0')},
   };
   for (const auto& c : kCases) {
-    auto stream = root->CreateStream(QStringLiteral("Value"), kElementMode);
+    auto stream = root->CreateStream(u"Value"_qs, kElementMode);
     stream->SetSize(0);
     EXPECT_GT(stream->WriteData(c.value), 0) << c.value.typeName();
     EXPECT_EQ(stream->StreamInterface().element->data.toHex(' '), c.bytes.toHex(' ')) << c.value.typeName();
@@ -78,7 +78,7 @@ TEST(StreamLayout, EachTypeIsWrittenByteForByteAndReadBack) {
     EXPECT_EQ(stream->ReadData(c.code), c.value);
   }
   // Bytes are written but not read; types without a layout write nothing; 01 00 is true.
-  auto stream = root->CreateStream(QStringLiteral("Other"), kElementMode);
+  auto stream = root->CreateStream(u"Other"_qs, kElementMode);
   EXPECT_EQ(stream->WriteData(QVariant::fromValue(uchar(7))), 1);
   EXPECT_EQ(stream->WriteData(QVariant::fromValue(qint64(7))), 0);
   EXPECT_EQ(stream->WriteBuf(QByteArray("\x01\x00", 2)), 2);
@@ -91,7 +91,7 @@ TEST(StreamLayout, EachTypeIsWrittenByteForByteAndReadBack) {
 
 TEST(StreamLayout, AStringCountTheStreamCannotHoldIsDamage) {
   QTemporaryDir dir;
-  auto root = createFile(dir.filePath(QStringLiteral("a.qmi")));
+  auto root = createFile(dir.filePath(u"a.qmi"_qs));
   const QByteArray kBad[] = {
       QByteArray("\xFF\xFF\xFF\xFF", 4),                  // negative
       QByteArray("\x05\x00\x00\x00\x61\x00", 6),          // five characters, one there
@@ -99,7 +99,7 @@ TEST(StreamLayout, AStringCountTheStreamCannotHoldIsDamage) {
       QByteArray("\x02\x00", 2),                          // the count itself cut short
   };
   for (const QByteArray& bytes : kBad) {
-    auto stream = root->CreateStream(QStringLiteral("Bad"), kElementMode);
+    auto stream = root->CreateStream(u"Bad"_qs, kElementMode);
     stream->SetSize(0);
     stream->WriteBuf(bytes);
     stream->SSeek(0);
@@ -110,14 +110,14 @@ TEST(StreamLayout, AStringCountTheStreamCannotHoldIsDamage) {
 
 TEST(Storages, ElementsAreCreatedOpenedListedMovedAndDestroyed) {
   QTemporaryDir dir;
-  auto root = createFile(dir.filePath(QStringLiteral("a.qmi")));
-  auto list = root->CreateStorage(QStringLiteral("TaskList"), kElementMode);
+  auto root = createFile(dir.filePath(u"a.qmi"_qs));
+  auto list = root->CreateStorage(u"TaskList"_qs, kElementMode);
   EXPECT_EQ(list->Elements().Count(), 0);
   EXPECT_EQ(list->Parent, root);
   for (const char* name : {"Task10", "Task2", "Task1"})
     list->CreateStream(QLatin1StringView(name), kElementMode)->WriteData(u"longer text"_qs);
   // An existing stream opens at its start; writing overwrites from there.
-  auto again = list->CreateStream(QStringLiteral("TASK2"), kElementMode);
+  auto again = list->CreateStream(u"TASK2"_qs, kElementMode);
   EXPECT_EQ(again->position(), 0);
   again->WriteData(u"x"_qs);
   again->SSeek(0);
@@ -130,32 +130,29 @@ TEST(Storages, ElementsAreCreatedOpenedListedMovedAndDestroyed) {
   EXPECT_EQ(list->Elements().Item(1).StorageType(), 2);
   EXPECT_EQ(failure([&] { list->Elements().Item(4); }), ide::err::SubscriptOutOfRange);
 
-  list->RenameElement(QStringLiteral("Task10"), QStringLiteral("Task3"));
-  list->MoveElementTo(QStringLiteral("Task3"), root, QStringLiteral("Copy"), STGMOVE_COPY);
-  list->MoveElementTo(QStringLiteral("Task1"), root, QStringLiteral("Moved"), STGMOVE_MOVE);
-  list->DestroyElement(QStringLiteral("Task2"));
+  list->RenameElement(u"Task10"_qs, u"Task3"_qs);
+  list->MoveElementTo(u"Task3"_qs, root, u"Copy"_qs, STGMOVE_COPY);
+  list->MoveElementTo(u"Task1"_qs, root, u"Moved"_qs, STGMOVE_MOVE);
+  list->DestroyElement(u"Task2"_qs);
   EXPECT_EQ(failure([&] { again->ReadData(vbString); }), stg::Reverted) << "its element was destroyed";
-  EXPECT_EQ(failure([&] { list->OpenStream(QStringLiteral("Task1"), kElementMode); }), stg::FileNotFound);
-  EXPECT_EQ(failure([&] { root->CreateStream(QStringLiteral("TaskList"), kElementMode); }),
-            stg::FileAlreadyExists);
-  EXPECT_EQ(failure([&] { root->CreateStream(QStringLiteral("a/b"), kElementMode); }), stg::InvalidName);
-  EXPECT_EQ(failure([&] { list->MoveElementTo(QStringLiteral("Task3"), list, QStringLiteral("Task3"), 0); }),
-            stg::FileAlreadyExists);
-  EXPECT_EQ(root->OpenStream(QStringLiteral("Copy"), kElementMode)->ReadData(vbString),
-            QVariant(u"longer text"_qs));
+  EXPECT_EQ(failure([&] { list->OpenStream(u"Task1"_qs, kElementMode); }), stg::FileNotFound);
+  EXPECT_EQ(failure([&] { root->CreateStream(u"TaskList"_qs, kElementMode); }), stg::FileAlreadyExists);
+  EXPECT_EQ(failure([&] { root->CreateStream(u"a/b"_qs, kElementMode); }), stg::InvalidName);
+  EXPECT_EQ(failure([&] { list->MoveElementTo(u"Task3"_qs, list, u"Task3"_qs, 0); }), stg::FileAlreadyExists);
+  EXPECT_EQ(root->OpenStream(u"Copy"_qs, kElementMode)->ReadData(vbString), QVariant(u"longer text"_qs));
 
   // A revert goes back to the last commit.
   root->Commit(0);
-  root->CreateStream(QStringLiteral("Later"), kElementMode);
+  root->CreateStream(u"Later"_qs, kElementMode);
   root->Revert();
-  EXPECT_EQ(failure([&] { root->OpenStream(QStringLiteral("Later"), kElementMode); }), stg::FileNotFound);
+  EXPECT_EQ(failure([&] { root->OpenStream(u"Later"_qs, kElementMode); }), stg::FileNotFound);
   EXPECT_EQ(failure([&] { list->Elements(); }), stg::Reverted);
-  EXPECT_EQ(root->OpenStorage(QStringLiteral("TaskList"), kElementMode)->Elements().Count(), 1);
+  EXPECT_EQ(root->OpenStorage(u"TaskList"_qs, kElementMode)->Elements().Count(), 1);
 }
 
 TEST(DocFiles, AnExistingFileIsOpenedAsItIsAndHeldByItsFirstWriter) {
   QTemporaryDir dir;
-  const QString path = dir.filePath(QStringLiteral("qm000001.qmi"));
+  const QString path = dir.filePath(u"qm000001.qmi"_qs);
   writeSample(path);
   const QByteArray before = readBytes(path);
   bool isNew = true;
@@ -165,22 +162,22 @@ TEST(DocFiles, AnExistingFileIsOpenedAsItIsAndHeldByItsFirstWriter) {
   bool secondIsNew = true;
   auto second = OpenOrCreateDocFile(path, secondIsNew, true, false);
   EXPECT_EQ(failure([&] { second->Elements(); }, &why), stg::LockViolation);
-  EXPECT_TRUE(why.contains(path) && why.contains(QStringLiteral("in use by"))) << why.toStdString();
+  EXPECT_TRUE(why.contains(path) && why.contains(u"in use by"_qs)) << why.toStdString();
   // A reader sees the last commit while the writer works.
-  auto tasks = root->OpenStorage(QStringLiteral("TaskList"), kElementMode);
-  tasks->DestroyElement(QStringLiteral("Task1"));
-  EXPECT_EQ(OpenDocFileForReading(path)->OpenStorage(QStringLiteral("TaskList"), 0)->Elements().Count(), 2);
+  auto tasks = root->OpenStorage(u"TaskList"_qs, kElementMode);
+  tasks->DestroyElement(u"Task1"_qs);
+  EXPECT_EQ(OpenDocFileForReading(path)->OpenStorage(u"TaskList"_qs, 0)->Elements().Count(), 2);
   tasks.reset();  // destroying a storage commits
   EXPECT_NE(readBytes(path), before);
-  EXPECT_EQ(OpenDocFileForReading(path)->OpenStorage(QStringLiteral("TaskList"), 0)->Elements().Count(), 1);
-  EXPECT_TRUE(QFile::exists(dir.filePath(QStringLiteral(".qm000001.qmi.lock"))));
+  EXPECT_EQ(OpenDocFileForReading(path)->OpenStorage(u"TaskList"_qs, 0)->Elements().Count(), 1);
+  EXPECT_TRUE(QFile::exists(dir.filePath(u".qm000001.qmi.lock"_qs)));
   root.reset();
-  EXPECT_FALSE(QFile::exists(dir.filePath(QStringLiteral(".qm000001.qmi.lock"))));
+  EXPECT_FALSE(QFile::exists(dir.filePath(u".qm000001.qmi.lock"_qs)));
 }
 
 TEST(DocFiles, DamagedFilesAreRefusedWithAReasonAndLeftAsTheyAre) {
   QTemporaryDir dir;
-  const QString good = dir.filePath(QStringLiteral("good.qmi"));
+  const QString good = dir.filePath(u"good.qmi"_qs);
   writeSample(good);
   const QByteArray sample = readBytes(good);
   auto patched = [&](int offset, QByteArray bytes) {
@@ -203,12 +200,12 @@ TEST(DocFiles, DamagedFilesAreRefusedWithAReasonAndLeftAsTheyAre) {
        stg::DocFileCorrupt},
   };
   for (const auto& c : kCases) {
-    const QString path = dir.filePath(QStringLiteral("bad.qmi"));
+    const QString path = dir.filePath(u"bad.qmi"_qs);
     writeBytes(path, c.bytes);
     QString why;
     bool isNew = true;
     auto root = OpenOrCreateDocFile(path, isNew, true, false);
-    EXPECT_EQ(failure([&] { root->CreateStorage(QStringLiteral("TaskList"), kElementMode); }, &why), c.number)
+    EXPECT_EQ(failure([&] { root->CreateStorage(u"TaskList"_qs, kElementMode); }, &why), c.number)
         << c.what << ": " << why.toStdString();
     EXPECT_TRUE(why.contains(path)) << c.what;
     root.reset();
@@ -222,7 +219,7 @@ TEST(DocFiles, DamagedFilesAreRefusedWithAReasonAndLeftAsTheyAre) {
 /// Runs a Python program with Debian's olefile; empty when it is not installed.
 std::optional<QString> olefile(const QString& program, const QStringList& arguments) {
   QProcess python;
-  python.start(QStringLiteral("/usr/bin/python3"), QStringList{QStringLiteral("-c"), program} + arguments);
+  python.start(u"/usr/bin/python3"_qs, QStringList{u"-c"_qs, program} + arguments);
   if (!python.waitForFinished(30000) || python.exitCode() == 3) return std::nullopt;
   EXPECT_EQ(python.exitCode(), 0) << python.readAllStandardError().toStdString();
   return QString::fromUtf8(python.readAllStandardOutput());
@@ -251,9 +248,9 @@ if len(sys.argv) > 2:
 
 TEST(Interop, OlefileReadsWhatWeWriteAndWeReadWhatItRewrote) {
   QTemporaryDir dir;
-  const QString path = dir.filePath(QStringLiteral("qm000001.qmi"));
+  const QString path = dir.filePath(u"qm000001.qmi"_qs);
   writeSample(path);
-  const auto listing = olefile(QString::fromLatin1(kOlefileProgram), {path, QStringLiteral("rewrite")});
+  const auto listing = olefile(QString::fromLatin1(kOlefileProgram), {path, u"rewrite"_qs});
   if (!listing) GTEST_SKIP() << "python3-olefile is not installed";
   EXPECT_EQ(listing->split(u'\n', Qt::SkipEmptyParts),
             (QStringList{u"\x05"
@@ -261,50 +258,47 @@ TEST(Interop, OlefileReadsWhatWeWriteAndWeReadWhatItRewrote) {
                          u"\x05SummaryInformation"_qs, u"LastTaskId"_qs, u"TaskList"_qs, u"TaskList/Task1"_qs,
                          u"TaskList/Task2"_qs, TaskRecord{u"Revisar cálculo 2"_qs, {}, true, 2}.toText(),
                          u"codepage 1252"_qs}));
-  auto tasks = OpenDocFileForReading(path)->OpenStorage(QStringLiteral("TaskList"), 0);
-  EXPECT_EQ(
-      TaskRecord::fromText(tasks->OpenStream(QStringLiteral("Task2"), 0)->ReadData(vbString).toString()).Name,
-      u"Conferi cálculo 2"_qs);
+  auto tasks = OpenDocFileForReading(path)->OpenStorage(u"TaskList"_qs, 0);
+  EXPECT_EQ(TaskRecord::fromText(tasks->OpenStream(u"Task2"_qs, 0)->ReadData(vbString).toString()).Name,
+            u"Conferi cálculo 2"_qs);
 }
 
 TEST(Interop, LibgsfReadsWhatWeWriteAndWeReadWhatItWrites) {
   QTemporaryDir dir;
-  const QString ours = dir.filePath(QStringLiteral("ours.qmi"));
+  const QString ours = dir.filePath(u"ours.qmi"_qs);
   writeSample(ours);
   EXPECT_EQ(test::gsfTree(QFile::encodeName(ours).toStdString()),
             (std::vector<std::string>{"\x05"
                                       "DocumentSummaryInformation 116",
                                       "\x05SummaryInformation 72", "LastTaskId 4", "TaskList/",
                                       "TaskList/Task1 134", "TaskList/Task2 136"}));
-  const QString theirs = dir.filePath(QStringLiteral("theirs.qmi"));
+  const QString theirs = dir.filePath(u"theirs.qmi"_qs);
   ASSERT_TRUE(test::gsfWriteTasks(QFile::encodeName(theirs).toStdString(), 300));
-  auto tasks = OpenDocFileForReading(theirs)->OpenStorage(QStringLiteral("TaskList"), 0);
+  auto tasks = OpenDocFileForReading(theirs)->OpenStorage(u"TaskList"_qs, 0);
   EXPECT_EQ(tasks->Elements().Count(), 300);
-  EXPECT_EQ(tasks->OpenStream(QStringLiteral("Task299"), 0)->ReadData(vbString),
-            QVariant(u"[Name](Tarefa 299)"_qs));
-  EXPECT_EQ(tasks->OpenStream(QStringLiteral("Task7"), 0)->Stat().size(), 5000)
-      << "a stream of its own sectors";
+  EXPECT_EQ(tasks->OpenStream(u"Task299"_qs, 0)->ReadData(vbString), QVariant(u"[Name](Tarefa 299)"_qs));
+  EXPECT_EQ(tasks->OpenStream(u"Task7"_qs, 0)->Stat().size(), 5000) << "a stream of its own sectors";
 }
 
 TEST(Commits, AWriterKilledAtAnyMomentLeavesTheOldOrTheNewFile) {
   QTemporaryDir dir;
-  const QString path = dir.filePath(QStringLiteral("qm000001.qmi"));
+  const QString path = dir.filePath(u"qm000001.qmi"_qs);
   for (int round = 0; round < 6; ++round) {
     QProcess worker;
-    worker.start(QStringLiteral(QUIMBEL_PROJINFO_WORKER), {path, QStringLiteral("100000")});
+    worker.start(QStringLiteral(QUIMBEL_PROJINFO_WORKER), {path, u"100000"_qs});
     ASSERT_TRUE(worker.waitForReadyRead(20000)) << worker.readAllStandardError().toStdString();
     QThread::msleep(QRandomGenerator::global()->bounded(5, 60));
     ::kill(static_cast<pid_t>(worker.processId()), SIGKILL);
     worker.waitForFinished();
     // Every task the counter promises is there and readable; nothing else is.
     auto root = OpenDocFileForReading(path);
-    const qint32 last = root->OpenStream(QStringLiteral("LastTaskId"), 0)->ReadData(vbLong).toInt();
-    auto tasks = root->OpenStorage(QStringLiteral("TaskList"), 0);
+    const qint32 last = root->OpenStream(u"LastTaskId"_qs, 0)->ReadData(vbLong).toInt();
+    auto tasks = root->OpenStorage(u"TaskList"_qs, 0);
     ASSERT_EQ(tasks->Elements().Count(), last) << "round " << round;
-    EXPECT_EQ(TaskRecord::fromText(
-                  tasks->OpenStream(QStringLiteral("Task%1").arg(last), 0)->ReadData(vbString).toString())
-                  .ItemId,
-              last);
+    EXPECT_EQ(
+        TaskRecord::fromText(tasks->OpenStream(u"Task%1"_qs.arg(last), 0)->ReadData(vbString).toString())
+            .ItemId,
+        last);
   }
 }
 

@@ -13,15 +13,14 @@ int main(int argc, char** argv) {
   try {
     bool isNew = true;
     auto root = OpenOrCreateDocFile(QString::fromLocal8Bit(argv[1]), isNew, true, false);
-    auto tasks = root->CreateStorage(QStringLiteral("TaskList"), kElementMode);
-    auto counter = root->CreateStream(QStringLiteral("LastTaskId"), kElementMode);
+    auto tasks = root->CreateStorage(u"TaskList"_qs, kElementMode);
+    auto counter = root->CreateStream(u"LastTaskId"_qs, kElementMode);
     qint32 last = counter->ReadData(vbLong).toInt();
     for (int i = 0; i < QString::fromLocal8Bit(argv[2]).toInt(); ++i) {
       ++last;
       const QString text =
-          TaskRecord{QStringLiteral("Tarefa %1 ").arg(last).repeated(1 + last % 40), {}, false, last}
-              .toText();
-      tasks->CreateStream(QStringLiteral("Task%1").arg(last), kElementMode)->WriteData(text);
+          TaskRecord{u"Tarefa %1 "_qs.arg(last).repeated(1 + last % 40), {}, false, last}.toText();
+      tasks->CreateStream(u"Task%1"_qs.arg(last), kElementMode)->WriteData(text);
       counter->SSeek(0);
       counter->WriteData(last);
       root->Commit(0);

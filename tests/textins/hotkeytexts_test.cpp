@@ -78,7 +78,7 @@ TEST(HotKeySets, FortyOneMacrosAndTwentyBufferKeysInOrderEachWithAnAtomOfItsOwn)
   EXPECT_EQ(names, expected);
   names.clear();
   for (const CHotKey* hk : scene->buffers->HotKeys()) {
-    names << QStringLiteral("%1 %2 %3").arg(hk->StrId).arg(hk->Modifiers).arg(hk->Operation);
+    names << u"%1 %2 %3"_qs.arg(hk->StrId).arg(hk->Modifiers).arg(hk->Operation);
     ids << hk->Id;
   }
   EXPECT_EQ(names.first(), u"CtrlShift0 6 1"_qs);

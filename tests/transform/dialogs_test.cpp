@@ -34,11 +34,9 @@ using test::Ide;
 using test::linesOf;
 
 const QStringList kFirst = {
-    QStringLiteral("Option Explicit"), QStringLiteral("Sub Um()"), QStringLiteral("If x Then"),
-    QStringLiteral("y = 1"),           QStringLiteral("End If"),   QStringLiteral("End Sub"),
+    u"Option Explicit"_qs, u"Sub Um()"_qs, u"If x Then"_qs, u"y = 1"_qs, u"End If"_qs, u"End Sub"_qs,
 };
-const QStringList kSecond = {QStringLiteral("Sub Dois()"), QStringLiteral("z = 2"),
-                             QStringLiteral("End Sub")};
+const QStringList kSecond = {u"Sub Dois()"_qs, u"z = 2"_qs, u"End Sub"_qs};
 
 struct Box {
   QString prompt;
@@ -53,7 +51,7 @@ struct Box {
 // A headless IDE with two modules, the caret in the first one's procedure, and settings of its own.
 struct Scene {
   QTemporaryDir dir;
-  common::SettingsStore settings{dir.filePath(QStringLiteral("Quimbel.ini"))};
+  common::SettingsStore settings{dir.filePath(u"Quimbel.ini"_qs)};
   common::Options options;
   Ide ide;
   ide::Ref<ide::CodeModule> first = ide.addModule(kFirst);
@@ -69,7 +67,7 @@ struct Scene {
   std::vector<Box> boxes() {
     std::vector<Box> shown;
     for (const auto& box : ui().messageBoxes()) {
-      EXPECT_EQ(box.title, QStringLiteral("Quimbel"));
+      EXPECT_EQ(box.title, u"Quimbel"_qs);
       shown.push_back({box.prompt, box.style});
     }
     return shown;
@@ -92,18 +90,18 @@ void showActive(QWidget& widget) {
 // A project whose second component is a related document, selected.
 struct RelatedDocumentScene {
   QTemporaryDir dir;
-  common::SettingsStore settings{dir.filePath(QStringLiteral("Quimbel.ini"))};
+  common::SettingsStore settings{dir.filePath(u"Quimbel.ini"_qs)};
   common::Options options;
   std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
   std::shared_ptr<host::ProjectImpl> project;
 
   RelatedDocumentScene() {
-    host::test::writeBytes(dir.filePath(QStringLiteral("Mod1.bas")),
+    host::test::writeBytes(dir.filePath(u"Mod1.bas"_qs),
                            "Attribute VB_Name = \"Mod1\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n");
-    host::test::writeBytes(dir.filePath(QStringLiteral("Leia-me.txt")), "texto\r\n");
-    host::test::writeBytes(dir.filePath(QStringLiteral("P.vbp")),
+    host::test::writeBytes(dir.filePath(u"Leia-me.txt"_qs), "texto\r\n");
+    host::test::writeBytes(dir.filePath(u"P.vbp"_qs),
                            "Type=Exe\r\nModule=Mod1; Mod1.bas\r\nRelatedDoc=Leia-me.txt\r\nName=\"P\"\r\n");
-    project = vbe->open(dir.filePath(QStringLiteral("P.vbp"))).front();
+    project = vbe->open(dir.filePath(u"P.vbp"_qs)).front();
     vbe->setActiveVBProject(project);
     vbe->selectComponent(project->components()[1]);
     options.OneCommandNumIndent = false;
@@ -117,29 +115,29 @@ struct RelatedDocumentScene {
 TEST(LineNumberingDialog, OpensWithItsCaptionsTheStoredNumbersAndTheProcedureScope) {
   Scene scene;
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
-  EXPECT_EQ(dialog.windowTitle(), QStringLiteral("Quimbel - Numerar Linhas"));
-  EXPECT_EQ(dialog.cmdAdd()->text(), QStringLiteral("&Adicionar"));
-  EXPECT_EQ(dialog.cmdRemove()->text(), QStringLiteral("&Remover"));
-  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
-  EXPECT_EQ(dialog.frOptions()->title(), QStringLiteral("A&dicionar ou remover números de linha para:"));
-  EXPECT_EQ(dialog.lblStartNum()->text(), QStringLiteral("&Número Inicial:"));
-  EXPECT_EQ(dialog.lblInterval()->text(), QStringLiteral("Inter&valo:"));
-  EXPECT_EQ(dialog.opNumbers(0)->text(), QStringLiteral("&Projeto"));
-  EXPECT_EQ(dialog.opNumbers(1)->text(), QStringLiteral("&Módulo"));
-  EXPECT_EQ(dialog.opNumbers(2)->text(), QStringLiteral("Pr&ocedimento"));
+  EXPECT_EQ(dialog.windowTitle(), u"Quimbel - Numerar Linhas"_qs);
+  EXPECT_EQ(dialog.cmdAdd()->text(), u"&Adicionar"_qs);
+  EXPECT_EQ(dialog.cmdRemove()->text(), u"&Remover"_qs);
+  EXPECT_EQ(dialog.cmdCancel()->text(), u"&Fechar"_qs);
+  EXPECT_EQ(dialog.frOptions()->title(), u"A&dicionar ou remover números de linha para:"_qs);
+  EXPECT_EQ(dialog.lblStartNum()->text(), u"&Número Inicial:"_qs);
+  EXPECT_EQ(dialog.lblInterval()->text(), u"Inter&valo:"_qs);
+  EXPECT_EQ(dialog.opNumbers(0)->text(), u"&Projeto"_qs);
+  EXPECT_EQ(dialog.opNumbers(1)->text(), u"&Módulo"_qs);
+  EXPECT_EQ(dialog.opNumbers(2)->text(), u"Pr&ocedimento"_qs);
   EXPECT_TRUE(dialog.opNumbers(2)->isChecked());
-  EXPECT_EQ(dialog.txtInitial()->text(), QStringLiteral("10000"));
-  EXPECT_EQ(dialog.txtInterval()->text(), QStringLiteral("5"));
+  EXPECT_EQ(dialog.txtInitial()->text(), u"10000"_qs);
+  EXPECT_EQ(dialog.txtInterval()->text(), u"5"_qs);
   EXPECT_EQ(dialog.startNumber(), 10000);
   EXPECT_EQ(dialog.interval(), 5);
   EXPECT_TRUE(dialog.ProgBar()->isHidden());
 
-  scene.settings.setValue(common::setting::InitialNumber, QStringLiteral(" 200 "));
-  scene.settings.setValue(common::setting::Interval, QStringLiteral("dez"));
+  scene.settings.setValue(common::setting::InitialNumber, u" 200 "_qs);
+  scene.settings.setValue(common::setting::Interval, u"dez"_qs);
   frmLinNumbers stored(scene.ide.vbe, scene.settings, scene.options);
-  EXPECT_EQ(stored.txtInitial()->text(), QStringLiteral("200"));
+  EXPECT_EQ(stored.txtInitial()->text(), u"200"_qs);
   EXPECT_EQ(stored.startNumber(), 200);
-  EXPECT_EQ(stored.txtInterval()->text(), QStringLiteral("5"));  // not a number: the default
+  EXPECT_EQ(stored.txtInterval()->text(), u"5"_qs);  // not a number: the default
 }
 
 TEST(LineNumberingDialog, TheBoxesTakeDigitsOnly) {
@@ -149,14 +147,14 @@ TEST(LineNumberingDialog, TheBoxesTakeDigitsOnly) {
   QLineEdit* box = dialog.txtInitial();
   box->clear();
   box->setFocus();
-  QTest::keyClicks(box, QStringLiteral("12ab-3"));
-  EXPECT_EQ(box->text(), QStringLiteral("123"));
+  QTest::keyClicks(box, u"12ab-3"_qs);
+  EXPECT_EQ(box->text(), u"123"_qs);
 
-  QApplication::clipboard()->setText(QStringLiteral("45"));
-  if (QApplication::clipboard()->text() != QStringLiteral("45")) GTEST_SKIP() << "no clipboard here";
+  QApplication::clipboard()->setText(u"45"_qs);
+  if (QApplication::clipboard()->text() != u"45"_qs) GTEST_SKIP() << "no clipboard here";
   QTest::keyClick(box, Qt::Key_V, Qt::ControlModifier);
   QTest::keyClick(box, Qt::Key_Insert, Qt::ShiftModifier);
-  EXPECT_EQ(box->text(), QStringLiteral("123"));
+  EXPECT_EQ(box->text(), u"123"_qs);
   EXPECT_EQ(box->contextMenuPolicy(), Qt::NoContextMenu);
   EXPECT_FALSE(box->acceptDrops());
 
@@ -165,7 +163,7 @@ TEST(LineNumberingDialog, TheBoxesTakeDigitsOnly) {
   showActive(plain);
   plain.setFocus();
   QTest::keyClick(&plain, Qt::Key_V, Qt::ControlModifier);
-  EXPECT_EQ(plain.text(), QStringLiteral("45"));
+  EXPECT_EQ(plain.text(), u"45"_qs);
 }
 
 TEST(LineNumberingDialog, ABoxSelectsItsWholeTextWhenItGetsTheFocus) {
@@ -173,25 +171,25 @@ TEST(LineNumberingDialog, ABoxSelectsItsWholeTextWhenItGetsTheFocus) {
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
   dialog.txtInitial()->setFocus(Qt::OtherFocusReason);
-  EXPECT_EQ(dialog.txtInitial()->selectedText(), QStringLiteral("10000"));
+  EXPECT_EQ(dialog.txtInitial()->selectedText(), u"10000"_qs);
   QTest::mouseClick(dialog.txtInterval(), Qt::LeftButton);
   QCoreApplication::processEvents();
   EXPECT_TRUE(dialog.txtInterval()->hasFocus());
-  EXPECT_EQ(dialog.txtInterval()->selectedText(), QStringLiteral("5"));
+  EXPECT_EQ(dialog.txtInterval()->selectedText(), u"5"_qs);
 }
 
 TEST(LineNumberingDialog, ANonNumericBoxIsRefusedWithItsMessageAndGetsTheFocus) {
   Scene scene;
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
-  dialog.txtInitial()->setText(QStringLiteral("12a"));
+  dialog.txtInitial()->setText(u"12a"_qs);
   dialog.cmdAdd()->click();
   EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5119), ide::mb::Exclamation}}));
   EXPECT_EQ(QApplication::focusWidget(), dialog.txtInitial());
 
   scene.ui().clearMessageBoxes();
   dialog.txtInitial()->clear();  // an empty box keeps the value last used
-  dialog.txtInterval()->setText(QStringLiteral("x"));
+  dialog.txtInterval()->setText(u"x"_qs);
   dialog.cmdRemove()->click();
   EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5120), ide::mb::Exclamation}}));
   EXPECT_EQ(QApplication::focusWidget(), dialog.txtInterval());
@@ -205,12 +203,11 @@ TEST(LineNumberingDialog, NumbersTheCurrentProcedureThenClosesASecondLater) {
   Scene scene;
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   showActive(dialog);
-  dialog.txtInitial()->setText(QStringLiteral("100"));
-  dialog.txtInterval()->setText(QStringLiteral("10"));
+  dialog.txtInitial()->setText(u"100"_qs);
+  dialog.txtInterval()->setText(u"10"_qs);
   dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first),
-            (QStringList{kFirst[0], kFirst[1], QStringLiteral("100 If x Then"), QStringLiteral("110 y = 1"),
-                         QStringLiteral("120 End If"), kFirst[5]}));
+  EXPECT_EQ(linesOf(*scene.first), (QStringList{kFirst[0], kFirst[1], u"100 If x Then"_qs, u"110 y = 1"_qs,
+                                                u"120 End If"_qs, kFirst[5]}));
   EXPECT_EQ(linesOf(*scene.second), kSecond);
 
   // The finished run shows its full bar while the IDE's loop goes on.
@@ -219,7 +216,7 @@ TEST(LineNumberingDialog, NumbersTheCurrentProcedureThenClosesASecondLater) {
   EXPECT_EQ(dialog.ProgBar()->value(), dialog.ProgBar()->maximum());
   EXPECT_FALSE(dialog.cmdAdd()->isEnabled());
   EXPECT_FALSE(dialog.cmdRemove()->isEnabled());
-  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Cancelar"));
+  EXPECT_EQ(dialog.cmdCancel()->text(), u"&Cancelar"_qs);
   EXPECT_EQ(scene.ui().cursor(), ide::Cursor::ArrowHourglass);
   scene.loop().advance(999);
   EXPECT_TRUE(dialog.isVisible());
@@ -227,15 +224,14 @@ TEST(LineNumberingDialog, NumbersTheCurrentProcedureThenClosesASecondLater) {
   EXPECT_FALSE(dialog.isVisible());
   EXPECT_TRUE(dialog.ProgBar()->isHidden());
   EXPECT_TRUE(dialog.cmdAdd()->isEnabled());
-  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+  EXPECT_EQ(dialog.cmdCancel()->text(), u"&Fechar"_qs);
   EXPECT_EQ(scene.ui().cursor(), ide::Cursor::Default);
   EXPECT_TRUE(scene.boxes().empty());
 }
 
 TEST(LineNumberingDialog, RemovesTheNumbersOfTheSelectedModuleOrTheProject) {
   Scene scene;
-  auto numbered = scene.ide.addModule(
-      {QStringLiteral("Sub Tres()"), QStringLiteral("10 a = 1"), QStringLiteral("End Sub")});
+  auto numbered = scene.ide.addModule({u"Sub Tres()"_qs, u"10 a = 1"_qs, u"End Sub"_qs});
   scene.select(numbered);
   {
     frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
@@ -243,33 +239,31 @@ TEST(LineNumberingDialog, RemovesTheNumbersOfTheSelectedModuleOrTheProject) {
     dialog.cmdRemove()->click();
     scene.loop().advance(1000);
   }
-  EXPECT_EQ(linesOf(*numbered)[1], QStringLiteral("a = 1"));
+  EXPECT_EQ(linesOf(*numbered)[1], u"a = 1"_qs);
   EXPECT_EQ(linesOf(*scene.first), kFirst);
 
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.opNumbers(0)->setChecked(true);
   dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("10000 If x Then"));
-  EXPECT_EQ(linesOf(*scene.second)[1], QStringLiteral("10000 z = 2"));
-  EXPECT_EQ(linesOf(*numbered)[1], QStringLiteral("10000 a = 1"));
+  EXPECT_EQ(linesOf(*scene.first)[2], u"10000 If x Then"_qs);
+  EXPECT_EQ(linesOf(*scene.second)[1], u"10000 z = 2"_qs);
+  EXPECT_EQ(linesOf(*numbered)[1], u"10000 a = 1"_qs);
 }
 
 TEST(LineNumberingDialog, WithTheOneCommandOptionNumbersAndIndentsWithTabs) {
   Scene scene(true);
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
-  dialog.txtInitial()->setText(QStringLiteral("100"));
-  dialog.txtInterval()->setText(QStringLiteral("10"));
+  dialog.txtInitial()->setText(u"100"_qs);
+  dialog.txtInterval()->setText(u"10"_qs);
   dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first),
-            (QStringList{kFirst[0], kFirst[1], QStringLiteral("100 \tIf x Then"),
-                         QStringLiteral("110 \t\ty = 1"), QStringLiteral("120 \tEnd If"), kFirst[5]}));
+  EXPECT_EQ(linesOf(*scene.first), (QStringList{kFirst[0], kFirst[1], u"100 \tIf x Then"_qs,
+                                                u"110 \t\ty = 1"_qs, u"120 \tEnd If"_qs, kFirst[5]}));
 
   // Removing re-indents too; the number column is empty then.
   frmLinNumbers again(scene.ide.vbe, scene.settings, scene.options);
   again.cmdRemove()->click();
-  EXPECT_EQ(linesOf(*scene.first),
-            (QStringList{kFirst[0], kFirst[1], QStringLiteral("\tIf x Then"), QStringLiteral("\t\ty = 1"),
-                         QStringLiteral("\tEnd If"), kFirst[5]}));
+  EXPECT_EQ(linesOf(*scene.first), (QStringList{kFirst[0], kFirst[1], u"\tIf x Then"_qs, u"\t\ty = 1"_qs,
+                                                u"\tEnd If"_qs, kFirst[5]}));
 }
 
 TEST(LineNumberingDialog, AnErrorEventOfTheOneCommandRouteIsShownPlainAndEndsTheRun) {
@@ -279,8 +273,8 @@ TEST(LineNumberingDialog, AnErrorEventOfTheOneCommandRouteIsShownPlainAndEndsThe
   dialog.show();
   dialog.cmdAdd()->click();
   EXPECT_EQ(scene.boxes(),
-            (std::vector<Box>{{QStringLiteral("91 %1\nem CNumIndent_NumIndentCurrentProcedure, linha: 0")
-                                   .arg(ide::standardDescription(ide::err::ObjectVariableNotSet)),
+            (std::vector<Box>{{u"91 %1\nem CNumIndent_NumIndentCurrentProcedure, linha: 0"_qs.arg(
+                                   ide::standardDescription(ide::err::ObjectVariableNotSet)),
                                ide::mb::OKOnly}}));
   EXPECT_TRUE(dialog.cancelled());
   EXPECT_FALSE(dialog.isVisible());  // a cancelled run closes at once
@@ -289,10 +283,10 @@ TEST(LineNumberingDialog, AnErrorEventOfTheOneCommandRouteIsShownPlainAndEndsThe
 TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScope) {
   Scene scene;
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
-  dialog.txtInitial()->setText(QStringLiteral("2147483647"));
+  dialog.txtInitial()->setText(u"2147483647"_qs);
   dialog.cmdAdd()->click();
   EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5123), ide::mb::Exclamation}}));
-  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("2147483647 If x Then"));
+  EXPECT_EQ(linesOf(*scene.first)[2], u"2147483647 If x Then"_qs);
   EXPECT_EQ(linesOf(*scene.first)[3], kFirst[3]);
 }
 
@@ -303,16 +297,16 @@ TEST(LineNumberingDialog, ARelatedDocumentAsTheModuleChangesNothingAndLeavesTheD
   dialog.opNumbers(1)->setChecked(true);
   dialog.cmdAdd()->click();
   EXPECT_TRUE(scene.vbe->headlessUi()->messageBoxes().empty());
-  EXPECT_EQ(scene.code(), QStringLiteral("x = 1"));
+  EXPECT_EQ(scene.code(), u"x = 1"_qs);
   EXPECT_TRUE(dialog.isVisible());
   EXPECT_TRUE(dialog.cmdAdd()->isEnabled());
   EXPECT_TRUE(dialog.ProgBar()->isHidden());
-  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+  EXPECT_EQ(dialog.cmdCancel()->text(), u"&Fechar"_qs);
 
   // The project scope passes over the document.
   dialog.opNumbers(0)->setChecked(true);
   dialog.cmdAdd()->click();
-  EXPECT_EQ(scene.code(), QStringLiteral("10000 x = 1"));
+  EXPECT_EQ(scene.code(), u"10000 x = 1"_qs);
 }
 
 TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
@@ -325,7 +319,7 @@ TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
     if (value == 1) dialog.cmdCancel()->click();
   });
   dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("10000 If x Then"));
+  EXPECT_EQ(linesOf(*scene.first)[2], u"10000 If x Then"_qs);
   EXPECT_EQ(linesOf(*scene.second), kSecond);
   EXPECT_FALSE(dialog.isVisible());
   EXPECT_TRUE(dialog.ProgBar()->isHidden());
@@ -361,31 +355,31 @@ TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
   {
     frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
     dialog.show();
-    dialog.txtInitial()->setText(QStringLiteral("500"));
-    dialog.txtInterval()->setText(QStringLiteral("50"));
+    dialog.txtInitial()->setText(u"500"_qs);
+    dialog.txtInterval()->setText(u"50"_qs);
     dialog.close();
   }
-  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), QStringLiteral("500"));
-  EXPECT_EQ(scene.settings.value(common::setting::Interval), QStringLiteral("50"));
+  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), u"500"_qs);
+  EXPECT_EQ(scene.settings.value(common::setting::Interval), u"50"_qs);
   {
     frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
     dialog.show();
     dialog.txtInitial()->clear();
-    dialog.txtInterval()->setText(QStringLiteral("x"));
+    dialog.txtInterval()->setText(u"x"_qs);
     dialog.close();
   }
-  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), QStringLiteral("500"));
-  EXPECT_EQ(scene.settings.value(common::setting::Interval), QStringLiteral("50"));
+  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), u"500"_qs);
+  EXPECT_EQ(scene.settings.value(common::setting::Interval), u"50"_qs);
   {
     // The values a run used are kept too.
     frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
     dialog.show();
-    dialog.txtInitial()->setText(QStringLiteral("700"));
+    dialog.txtInitial()->setText(u"700"_qs);
     dialog.cmdAdd()->click();
     scene.loop().advance(1000);
     EXPECT_FALSE(dialog.isVisible());
   }
-  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), QStringLiteral("700"));
+  EXPECT_EQ(scene.settings.value(common::setting::InitialNumber), u"700"_qs);
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -394,19 +388,19 @@ TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
 TEST(IndentationDialog, OpensWithItsCaptionsAndTheStoredUnit) {
   Scene scene;
   frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
-  EXPECT_EQ(dialog.windowTitle(), QStringLiteral("Quimbel - Indentar Código"));
-  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
-  EXPECT_EQ(dialog.cmdIndent()->text(), QStringLiteral("&Indentar"));
-  EXPECT_EQ(dialog.frIndent()->title(), QStringLiteral("In&dentar"));
-  EXPECT_EQ(dialog.frUse()->title(), QStringLiteral("&Usar"));
-  EXPECT_EQ(dialog.opIndent(0)->text(), QStringLiteral("&Projeto"));
-  EXPECT_EQ(dialog.opIndent(1)->text(), QStringLiteral("&Módulo"));
-  EXPECT_EQ(dialog.opIndent(2)->text(), QStringLiteral("Pr&ocedimento"));
-  EXPECT_EQ(dialog.opSpaces(0)->text(), QStringLiteral("&Tabs"));
-  EXPECT_EQ(dialog.opSpaces(1)->text(), QStringLiteral("E&spaços"));
+  EXPECT_EQ(dialog.windowTitle(), u"Quimbel - Indentar Código"_qs);
+  EXPECT_EQ(dialog.cmdCancel()->text(), u"&Fechar"_qs);
+  EXPECT_EQ(dialog.cmdIndent()->text(), u"&Indentar"_qs);
+  EXPECT_EQ(dialog.frIndent()->title(), u"In&dentar"_qs);
+  EXPECT_EQ(dialog.frUse()->title(), u"&Usar"_qs);
+  EXPECT_EQ(dialog.opIndent(0)->text(), u"&Projeto"_qs);
+  EXPECT_EQ(dialog.opIndent(1)->text(), u"&Módulo"_qs);
+  EXPECT_EQ(dialog.opIndent(2)->text(), u"Pr&ocedimento"_qs);
+  EXPECT_EQ(dialog.opSpaces(0)->text(), u"&Tabs"_qs);
+  EXPECT_EQ(dialog.opSpaces(1)->text(), u"E&spaços"_qs);
   EXPECT_TRUE(dialog.opIndent(2)->isChecked());
   EXPECT_TRUE(dialog.opSpaces(0)->isChecked());
-  EXPECT_EQ(dialog.txtSpaces()->text(), QStringLiteral("3"));
+  EXPECT_EQ(dialog.txtSpaces()->text(), u"3"_qs);
   EXPECT_EQ(dialog.txtSpaces()->contextMenuPolicy(), Qt::NoContextMenu);
 
   for (const auto& [use, spaces] : {std::pair{"1", true}, std::pair{"", false}, std::pair{"0", false}}) {
@@ -446,7 +440,7 @@ TEST(IndentationDialog, AMissingOrInvalidSpaceCountIsRefused) {
   // Tabs need no count.
   dialog.opSpaces(0)->setChecked(true);
   dialog.cmdIndent()->click();
-  EXPECT_EQ(linesOf(*scene.first)[3], QStringLiteral("\t\ty = 1"));
+  EXPECT_EQ(linesOf(*scene.first)[3], u"\t\ty = 1"_qs);
 }
 
 TEST(IndentationDialog, IndentsTheSelectedModuleWithSpacesClosesAndRemembersTheUnit) {
@@ -456,40 +450,39 @@ TEST(IndentationDialog, IndentsTheSelectedModuleWithSpacesClosesAndRemembersTheU
   dialog.show();
   dialog.opIndent(1)->setChecked(true);
   dialog.opSpaces(1)->setChecked(true);
-  dialog.txtSpaces()->setText(QStringLiteral("2"));
+  dialog.txtSpaces()->setText(u"2"_qs);
   dialog.cmdIndent()->click();
-  EXPECT_EQ(linesOf(*scene.second), (QStringList{kSecond[0], QStringLiteral("  z = 2"), kSecond[2]}));
+  EXPECT_EQ(linesOf(*scene.second), (QStringList{kSecond[0], u"  z = 2"_qs, kSecond[2]}));
   EXPECT_EQ(linesOf(*scene.first), kFirst);
   EXPECT_FALSE(dialog.isVisible());
-  EXPECT_EQ(scene.settings.value(common::setting::UseOption), QStringLiteral("1"));
-  EXPECT_EQ(scene.settings.value(common::setting::Indentation), QStringLiteral("2"));
+  EXPECT_EQ(scene.settings.value(common::setting::UseOption), u"1"_qs);
+  EXPECT_EQ(scene.settings.value(common::setting::Indentation), u"2"_qs);
   EXPECT_TRUE(scene.boxes().empty());
 }
 
 TEST(IndentationDialog, ClosingWithTabsRemembersTabsAndLeavesTheUnit) {
   Scene scene;
-  scene.settings.setValue(common::setting::Indentation, QStringLiteral("4"));
-  scene.settings.setValue(common::setting::UseOption, QStringLiteral("1"));
+  scene.settings.setValue(common::setting::Indentation, u"4"_qs);
+  scene.settings.setValue(common::setting::UseOption, u"1"_qs);
   frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.opSpaces(0)->setChecked(true);
-  dialog.txtSpaces()->setText(QStringLiteral("8"));
+  dialog.txtSpaces()->setText(u"8"_qs);
   dialog.cmdCancel()->click();
   EXPECT_FALSE(dialog.isVisible());
-  EXPECT_EQ(scene.settings.value(common::setting::UseOption), QStringLiteral("0"));
-  EXPECT_EQ(scene.settings.value(common::setting::Indentation), QStringLiteral("4"));
+  EXPECT_EQ(scene.settings.value(common::setting::UseOption), u"0"_qs);
+  EXPECT_EQ(scene.settings.value(common::setting::Indentation), u"4"_qs);
 }
 
 TEST(IndentationDialog, WithTheOneCommandOptionNumbersFrom10000InStepsOf5) {
   Scene scene(true);
-  scene.settings.setValue(common::setting::InitialNumber, QStringLiteral("1"));  // not the numbering's
+  scene.settings.setValue(common::setting::InitialNumber, u"1"_qs);  // not the numbering's
   frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.opSpaces(1)->setChecked(true);
-  dialog.txtSpaces()->setText(QStringLiteral("3"));
+  dialog.txtSpaces()->setText(u"3"_qs);
   dialog.cmdIndent()->click();
-  EXPECT_EQ(linesOf(*scene.first),
-            (QStringList{kFirst[0], kFirst[1], QStringLiteral("10000    If x Then"),
-                         QStringLiteral("10005       y = 1"), QStringLiteral("10010    End If"), kFirst[5]}));
+  EXPECT_EQ(linesOf(*scene.first), (QStringList{kFirst[0], kFirst[1], u"10000    If x Then"_qs,
+                                                u"10005       y = 1"_qs, u"10010    End If"_qs, kFirst[5]}));
 }
 
 TEST(IndentationDialog, CancelDuringARunEndsTheWalkAndTheDialog) {
@@ -504,8 +497,8 @@ TEST(IndentationDialog, CancelDuringARunEndsTheWalkAndTheDialog) {
     caption = dialog.cmdCancel()->text();
   });
   dialog.cmdIndent()->click();
-  EXPECT_EQ(caption, QStringLiteral("&Fechar"));
-  EXPECT_EQ(linesOf(*scene.first)[2], QStringLiteral("\tIf x Then"));
+  EXPECT_EQ(caption, u"&Fechar"_qs);
+  EXPECT_EQ(linesOf(*scene.first)[2], u"\tIf x Then"_qs);
   EXPECT_EQ(linesOf(*scene.second), kSecond);
   EXPECT_FALSE(dialog.isVisible());
 }
@@ -520,7 +513,7 @@ TEST(IndentationDialog, AFailedRunShowsItsMessageAndStaysOpen) {
   EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5126), ide::mb::Information}}));
   EXPECT_TRUE(dialog.isVisible());
   EXPECT_TRUE(dialog.cmdIndent()->isEnabled());
-  EXPECT_EQ(dialog.cmdCancel()->text(), QStringLiteral("&Fechar"));
+  EXPECT_EQ(dialog.cmdCancel()->text(), u"&Fechar"_qs);
 }
 
 TEST(IndentationDialog, AModuleWalkFailureShowsTheModuleMessage) {
@@ -551,10 +544,9 @@ TEST(OpeningTheDialogs, EachOpensModallyAndReturnsWhenClosed) {
   showLineNumberingDialog(scene.ide.vbe, scene.settings, scene.options, nullptr);
   closeModal();
   showIndentationDialog(scene.ide.vbe, scene.settings, scene.options, nullptr);
-  EXPECT_EQ(titles, (QStringList{QStringLiteral("Quimbel - Numerar Linhas"),
-                                 QStringLiteral("Quimbel - Indentar Código")}));
+  EXPECT_EQ(titles, (QStringList{u"Quimbel - Numerar Linhas"_qs, u"Quimbel - Indentar Código"_qs}));
   // Closing wrote the indenter's choice.
-  EXPECT_EQ(scene.settings.value(common::setting::UseOption), QStringLiteral("0"));
+  EXPECT_EQ(scene.settings.value(common::setting::UseOption), u"0"_qs);
 }
 
 }  // namespace

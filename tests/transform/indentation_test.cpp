@@ -97,8 +97,8 @@ class IndenterStack : public ::testing::Test {
   // Opens a For level and a continued statement inside it: body at 3, For body at 6, continuation at 9.
   void openForAndContinuation() {
     indenter.beginProcedure();
-    QString forLine = QStringLiteral("For i = 1 To 2");
-    QString continuedLine = QStringLiteral("x = 1 + _");
+    QString forLine = u"For i = 1 To 2"_qs;
+    QString continuedLine = u"x = 1 + _"_qs;
     indenter.IndentLine(forLine, continued);
     indenter.IndentLine(continuedLine, continued);
   }
@@ -143,7 +143,7 @@ TEST_F(IndenterStack, PopClosesLevelsUpToTheFirstOfTheMask) {
 
 TEST_F(IndenterStack, IndentationNeverGoesBelowZero) {
   indenter.beginDeclarations();
-  QString typeLine = QStringLiteral("Type T");
+  QString typeLine = u"Type T"_qs;
   indenter.IndentDeclarationLine(typeLine, continued);
   EXPECT_EQ(indenter.current().Indentation, 3);
   indenter.PopBlock(IT_ABSOLUTE);
@@ -153,26 +153,26 @@ TEST_F(IndenterStack, IndentationNeverGoesBelowZero) {
 
 TEST_F(IndenterStack, ProcedureEndResetsTheLevelsAndIsLeftAlone) {
   indenter.beginProcedure();
-  QString ifLine = QStringLiteral("If a Then");
-  QString endLine = QStringLiteral("      End Sub");
+  QString ifLine = u"If a Then"_qs;
+  QString endLine = u"      End Sub"_qs;
   indenter.IndentLine(ifLine, continued);
   ASSERT_EQ(indenter.current().Indentation, 6);
   EXPECT_FALSE(indenter.IndentLine(endLine, continued));
-  EXPECT_EQ(endLine, QStringLiteral("      End Sub"));
+  EXPECT_EQ(endLine, u"      End Sub"_qs);
   EXPECT_TRUE(indenter.stack().empty());
   EXPECT_EQ(indenter.current().Indentation, 3);
 }
 
 TEST_F(IndenterStack, BeginProcedureClearsAPendingHeaderContinuation) {
   indenter.beginProcedure();
-  QString ifLine = QStringLiteral("If a And _");
+  QString ifLine = u"If a And _"_qs;
   indenter.IndentLine(ifLine, continued);
   ASSERT_TRUE(indenter.ifContinued());
-  indenter.beginProcedure(QStringLiteral("      "));
+  indenter.beginProcedure(u"      "_qs);
   EXPECT_FALSE(indenter.ifContinued());
   EXPECT_TRUE(indenter.stack().empty());
   EXPECT_EQ(indenter.current().Indentation, 3);
-  EXPECT_EQ(indenter.numberColumn(), QStringLiteral("      "));
+  EXPECT_EQ(indenter.numberColumn(), u"      "_qs);
 }
 
 TEST(IndenterConstruction, SpaceModeNeedsAtLeastOneSpace) {
@@ -327,12 +327,11 @@ TEST(NumberColumn, PrefixFormsAreMeasuredAsTheyAreWritten) {
 }
 
 TEST(NumberColumn, WidestPrefixOfAStatementGivesTheColumn) {
-  EXPECT_EQ(NumberColumnWidth(linesOf("10000 x = 1\ny = 2\n10: z = 3")), QStringLiteral("      "));
+  EXPECT_EQ(NumberColumnWidth(linesOf("10000 x = 1\ny = 2\n10: z = 3")), u"      "_qs);
   EXPECT_EQ(NumberColumnWidth(linesOf("x\ny")), QString());
   // Continuation lines beginning with a number carry an operand, not a label.
   EXPECT_EQ(NumberColumnWidth(linesOf("x = 1 + _\n  200000 + _\n\n300000 * y\nz = 1")), QString());
-  EXPECT_EQ(NumberColumnWidth(linesOf("10 x = _\n200000 + 1\n' nota _\n40000 palavras")),
-            QStringLiteral("   "));
+  EXPECT_EQ(NumberColumnWidth(linesOf("10 x = _\n200000 + 1\n' nota _\n40000 palavras")), u"   "_qs);
 }
 
 TEST(NumberColumn, ContinuationLinesBeginningWithANumberAreIndentedAsCode) {
@@ -376,7 +375,7 @@ TEST(NumberColumn, ColumnIsStableAcrossRunsInTabMode) {
   EXPECT_EQ(lines, expected);
   EXPECT_EQ(indentProcedure(lines, indenter), 0);
   EXPECT_EQ(lines, expected);
-  EXPECT_EQ(indenter.numberColumn(), QStringLiteral("      "));
+  EXPECT_EQ(indenter.numberColumn(), u"      "_qs);
 }
 
 // --- Declarations ---
@@ -442,16 +441,16 @@ TEST(IndentChanges, OnlyLinesWhoseTextDiffersAreReported) {
 
 TEST(IndentChanges, NumberColumnPaddingIsComparedToo) {
   Indenter indenter(IndentMode::Spaces, 3);
-  indenter.beginProcedure(QStringLiteral("      "));
+  indenter.beginProcedure(u"      "_qs);
   bool continued = false;
-  QString aligned = QStringLiteral("10000    x = 1");
-  QString narrow = QStringLiteral("5 y");
-  QString tabbed = QStringLiteral("      \tz");
+  QString aligned = u"10000    x = 1"_qs;
+  QString narrow = u"5 y"_qs;
+  QString tabbed = u"      \tz"_qs;
   EXPECT_FALSE(indenter.IndentLine(aligned, continued));
   EXPECT_TRUE(indenter.IndentLine(narrow, continued));
-  EXPECT_EQ(narrow, QStringLiteral("5        y"));
+  EXPECT_EQ(narrow, u"5        y"_qs);
   EXPECT_TRUE(indenter.IndentLine(tabbed, continued));
-  EXPECT_EQ(tabbed, QStringLiteral("         z"));
+  EXPECT_EQ(tabbed, u"         z"_qs);
 }
 
 // --- Idempotence and the number-and-indent route ---
@@ -459,7 +458,7 @@ TEST(IndentChanges, NumberColumnPaddingIsComparedToo) {
 // `pattern` with each "|" made one level in `mode`.
 QStringList inMode(const char* pattern, IndentMode mode, qint32 spaces) {
   QString text = QString::fromUtf8(pattern);
-  text.replace(u'|', mode == IndentMode::Tabs ? QStringLiteral("\t") : QString(spaces, u' '));
+  text.replace(u'|', mode == IndentMode::Tabs ? u"\t"_qs : QString(spaces, u' '));
   return text.split(u'\n');
 }
 
@@ -559,9 +558,9 @@ TEST(NumberAndIndent, RemovingNumbersThenIndentingLeavesNoColumn) {
 TEST(NumberAndIndent, RenumberingWithOtherNumbersKeepsTheLayout) {
   const QStringList first = numberedAndIndented(kCalcular, IndentMode::Tabs, 1);
   const QStringList renumbered = indented(numberProcedure(first, 1, 1), IndentMode::Tabs, 1);
-  EXPECT_EQ(renumbered[1], QStringLiteral("1  \tDim i As Long"));
-  EXPECT_EQ(renumbered[7], QStringLiteral("   \t\t\t\ti"));
-  EXPECT_EQ(renumbered[20], QStringLiteral("14 \tMsgBox Err.Description"));
+  EXPECT_EQ(renumbered[1], u"1  \tDim i As Long"_qs);
+  EXPECT_EQ(renumbered[7], u"   \t\t\t\ti"_qs);
+  EXPECT_EQ(renumbered[20], u"14 \tMsgBox Err.Description"_qs);
 }
 
 }  // namespace

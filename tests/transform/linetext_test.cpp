@@ -12,9 +12,9 @@ namespace {
 TEST(LineText, BlanksAreSpacesAndTabs) {
   EXPECT_TRUE(isBlank(u'\t'));
   EXPECT_FALSE(isBlank(u'\u00a0'));
-  EXPECT_EQ(leadingBlanks(u" \t  x = 1 ").toString(), QStringLiteral(" \t  "));
-  EXPECT_EQ(trimmedView(u"\t  x = 1 \t").toString(), QStringLiteral("x = 1"));
-  EXPECT_EQ(rightTrimmedView(u"  x \t").toString(), QStringLiteral("  x"));
+  EXPECT_EQ(leadingBlanks(u" \t  x = 1 ").toString(), u" \t  "_qs);
+  EXPECT_EQ(trimmedView(u"\t  x = 1 \t").toString(), u"x = 1"_qs);
+  EXPECT_EQ(rightTrimmedView(u"  x \t").toString(), u"  x"_qs);
   EXPECT_TRUE(isBlankLine(u" \t "));
   EXPECT_FALSE(isBlankLine(u"\t'"));
   EXPECT_EQ(indexOfBlank(u"10\tx = 1"), 2);

@@ -32,7 +32,7 @@ struct Ide {
                                       ide::ComponentType type = ide::ComponentType::StdModule) {
     auto module = project->Add(type)->CodeModule();
     if (module->CountOfLines() > 0) module->DeleteLines(1, module->CountOfLines());
-    module->AddFromString(lines.join(QStringLiteral("\r\n")));
+    module->AddFromString(lines.join(u"\r\n"_qs));
     return module;
   }
 

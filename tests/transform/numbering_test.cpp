@@ -127,8 +127,8 @@ TEST(NumberLineRules, EachKindOfLineIsNumberedOrLeftAsItIs) {
     EXPECT_EQ(n.number, sample.takesNumber ? 10000 : 9995);
     EXPECT_EQ(n.continuation, sample.continuedAfter);
   }
-  const Numbered negative = numberOne(QStringLiteral("x = 1"), -15, false, 5);
-  EXPECT_EQ(negative.line, QStringLiteral("-10 x = 1"));
+  const Numbered negative = numberOne(u"x = 1"_qs, -15, false, 5);
+  EXPECT_EQ(negative.line, u"-10 x = 1"_qs);
 }
 
 // --- Continued statements get one number, on their first line ---
@@ -136,22 +136,22 @@ TEST(NumberLineRules, EachKindOfLineIsNumberedOrLeftAsItIs) {
 TEST(NumberLineContinuation, StatementOverThreeLinesIsNumberedOnItsFirstLineOnly) {
   qint32 number = 9995;
   bool continuation = false;
-  QString first = QStringLiteral("    x = 1 + _");
-  QString second = QStringLiteral("        2 + _");
-  QString third = QStringLiteral("        3");
-  QString next = QStringLiteral("    y = x");
+  QString first = u"    x = 1 + _"_qs;
+  QString second = u"        2 + _"_qs;
+  QString third = u"        3"_qs;
+  QString next = u"    y = x"_qs;
 
   EXPECT_TRUE(NumberLine(first, number, continuation, 5));
-  EXPECT_EQ(first, QStringLiteral("10000     x = 1 + _"));
+  EXPECT_EQ(first, u"10000     x = 1 + _"_qs);
   EXPECT_TRUE(continuation);
   EXPECT_FALSE(NumberLine(second, number, continuation, 5));
-  EXPECT_EQ(second, QStringLiteral("        2 + _"));
+  EXPECT_EQ(second, u"        2 + _"_qs);
   EXPECT_TRUE(continuation);
   EXPECT_FALSE(NumberLine(third, number, continuation, 5));
-  EXPECT_EQ(third, QStringLiteral("        3"));
+  EXPECT_EQ(third, u"        3"_qs);
   EXPECT_FALSE(continuation);
   EXPECT_TRUE(NumberLine(next, number, continuation, 5));
-  EXPECT_EQ(next, QStringLiteral("10005     y = x"));
+  EXPECT_EQ(next, u"10005     y = x"_qs);
   EXPECT_EQ(number, 10005);
 }
 
@@ -193,8 +193,8 @@ TEST(NumberLineRules, AnOldNumberGivesWayToTheNewOneWithItsSeparator) {
 // --- Running numbers never wrap ---
 
 TEST(NumberLineOverflow, LastRepresentableNumberIsWritten) {
-  const Numbered n = numberOne(QStringLiteral("x = 1"), kMax - 5, false, 5);
-  EXPECT_EQ(n.line, QStringLiteral("2147483647 x = 1"));
+  const Numbered n = numberOne(u"x = 1"_qs, kMax - 5, false, 5);
+  EXPECT_EQ(n.line, u"2147483647 x = 1"_qs);
   EXPECT_EQ(n.number, kMax);
 }
 
@@ -214,7 +214,7 @@ TEST(NumberLineOverflow, PassingEitherLimitThrowsAnObjectModelOverflowAndChanges
       ADD_FAILURE() << "no overflow reported: " << sample.text;
     } catch (const LineNumberOverflow& error) {
       EXPECT_EQ(error.number(), 6);
-      EXPECT_EQ(error.description(), QStringLiteral("Overflow"));
+      EXPECT_EQ(error.description(), u"Overflow"_qs);
     }
     EXPECT_EQ(line, QString::fromUtf8(sample.text));
     EXPECT_EQ(number, sample.number);
@@ -223,11 +223,11 @@ TEST(NumberLineOverflow, PassingEitherLimitThrowsAnObjectModelOverflowAndChanges
 }
 
 TEST(NumberLineOverflow, LinesThatTakeNoNumberDoNotOverflow) {
-  Numbered n = numberOne(QStringLiteral("10 ' nota"), kMax);
-  EXPECT_EQ(n.line, QStringLiteral("' nota"));
-  n = numberOne(QStringLiteral("Case 1"), kMax);
+  Numbered n = numberOne(u"10 ' nota"_qs, kMax);
+  EXPECT_EQ(n.line, u"' nota"_qs);
+  n = numberOne(u"Case 1"_qs, kMax);
   EXPECT_FALSE(n.changed);
-  n = numberOne(QStringLiteral("10"), kMax);
+  n = numberOne(u"10"_qs, kMax);
   EXPECT_EQ(n.line, QString());
   EXPECT_EQ(n.number, kMax);
 }
@@ -270,31 +270,31 @@ TEST(UnnumberLineRules, TheNumberAndItsSeparatorGoTheRestStays) {
 
 TEST(UnnumberLineContinuation, ContinuationLinesKeepTheirLeadingNumber) {
   bool continuation = false;
-  QString first = QStringLiteral("10000 x = a + _");
-  QString second = QStringLiteral("    2 * b + _");
-  QString third = QStringLiteral("    3");
-  QString next = QStringLiteral("10005 y = 1");
+  QString first = u"10000 x = a + _"_qs;
+  QString second = u"    2 * b + _"_qs;
+  QString third = u"    3"_qs;
+  QString next = u"10005 y = 1"_qs;
   EXPECT_TRUE(UnnumberLine(first, continuation));
-  EXPECT_EQ(first, QStringLiteral("x = a + _"));
+  EXPECT_EQ(first, u"x = a + _"_qs);
   EXPECT_TRUE(continuation);
   EXPECT_FALSE(UnnumberLine(second, continuation));
-  EXPECT_EQ(second, QStringLiteral("    2 * b + _"));
+  EXPECT_EQ(second, u"    2 * b + _"_qs);
   EXPECT_TRUE(continuation);
   EXPECT_FALSE(UnnumberLine(third, continuation));
   EXPECT_FALSE(continuation);
   EXPECT_TRUE(UnnumberLine(next, continuation));
-  EXPECT_EQ(next, QStringLiteral("y = 1"));
+  EXPECT_EQ(next, u"y = 1"_qs);
 }
 
 TEST(UnnumberLineContinuation, BlankLineEndsTheContinuationAndTheSingleLineRuleTakesAnyNumber) {
   bool continuation = true;
   QString blank;
-  QString numbered = QStringLiteral("10 x");
+  QString numbered = u"10 x"_qs;
   EXPECT_FALSE(UnnumberLine(blank, continuation));
   EXPECT_FALSE(continuation);
   EXPECT_TRUE(UnnumberLine(numbered, continuation));
-  EXPECT_EQ(numbered, QStringLiteral("x"));
-  EXPECT_EQ(unnumbered(QStringLiteral("    2 * b"), true), QStringLiteral("    * b"));
+  EXPECT_EQ(numbered, u"x"_qs);
+  EXPECT_EQ(unnumbered(u"    2 * b"_qs, true), u"    * b"_qs);
 }
 
 // --- Whole procedures ---
@@ -313,7 +313,7 @@ TEST(NumberProcedureWalk, NumbersTheBodyBetweenAContinuedHeaderAndTheEndLine) {
 TEST(NumberProcedureWalk, RenumberingReplacesOldNumbersAndRestartsPerProcedure) {
   EXPECT_EQ(numberProcedure(linesOf("Sub A()\n10 x = 1\n20: y = 2\nEnd Sub"), 100, 10),
             linesOf("Sub A()\n100 x = 1\n110 y = 2\nEnd Sub"));
-  EXPECT_EQ(numberProcedure(linesOf("Sub B()\nz = 3\nEnd Sub"), 100, 10)[1], QStringLiteral("100 z = 3"));
+  EXPECT_EQ(numberProcedure(linesOf("Sub B()\nz = 3\nEnd Sub"), 100, 10)[1], u"100 z = 3"_qs);
 }
 
 TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
@@ -350,14 +350,14 @@ TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
     code << QString::fromUtf16(line);
     expected << QString::fromUtf16(numbered ? numbered : line);
   }
-  expected[7] = QStringLiteral("10030 ") + code[7];
+  expected[7] = u"10030 "_qs + code[7];
   const QStringList numbered = numberProcedure(code);
   EXPECT_EQ(numbered, expected);
   EXPECT_EQ(numberProcedure(numbered), numbered);
   // Removing numbers leaves the targets too: the code comes back as removing them from it gives.
   EXPECT_EQ(unnumberProcedure(numbered), unnumberProcedure(code));
   EXPECT_EQ(unnumberProcedure(code)[12], code[12]);
-  EXPECT_EQ(unnumberProcedure(code)[17], QStringLiteral("     y = 3"));
+  EXPECT_EQ(unnumberProcedure(code)[17], u"     y = 3"_qs);
 }
 
 TEST(NumberProcedureWalk, RemovingNumbersRestoresTheCode) {

@@ -20,17 +20,16 @@ using test::Ide;
 using test::linesOf;
 
 const QStringList kFirst = {
-    QStringLiteral("Option Explicit"), QStringLiteral("Sub Um()"), QStringLiteral("If x Then"),
-    QStringLiteral("y = 1"),           QStringLiteral("End If"),   QStringLiteral("End Sub"),
+    u"Option Explicit"_qs, u"Sub Um()"_qs, u"If x Then"_qs, u"y = 1"_qs, u"End If"_qs, u"End Sub"_qs,
 };
 const QStringList kFirstDone = {
-    QStringLiteral("Option Explicit"), QStringLiteral("Sub Um()"),       QStringLiteral("10000 \tIf x Then"),
-    QStringLiteral("10005 \t\ty = 1"), QStringLiteral("10010 \tEnd If"), QStringLiteral("End Sub"),
+    u"Option Explicit"_qs, u"Sub Um()"_qs,       u"10000 \tIf x Then"_qs,
+    u"10005 \t\ty = 1"_qs, u"10010 \tEnd If"_qs, u"End Sub"_qs,
 };
 const QStringList kSecond = {
-    QStringLiteral("Sub Dois()"),
-    QStringLiteral("z = 2"),
-    QStringLiteral("End Sub"),
+    u"Sub Dois()"_qs,
+    u"z = 2"_qs,
+    u"End Sub"_qs,
 };
 
 // Records the events of one command in the order they come.
@@ -38,9 +37,9 @@ struct Events {
   std::vector<QString> seen;
   std::vector<ide::Connection> connections;
   explicit Events(CNumIndent& command) {
-    connections.push_back(command.Begining.connect([this] { seen.push_back(QStringLiteral("Begining")); }));
+    connections.push_back(command.Begining.connect([this] { seen.push_back(u"Begining"_qs); }));
     connections.push_back(command.Error.connect([this](const QString& text) { seen.push_back(text); }));
-    connections.push_back(command.Finished.connect([this] { seen.push_back(QStringLiteral("Finished")); }));
+    connections.push_back(command.Finished.connect([this] { seen.push_back(u"Finished"_qs); }));
   }
 };
 
@@ -64,7 +63,7 @@ TEST(CNumIndent, NumbersAndIndentsTheSelectedModuleBetweenBeginingAndFinished) {
   s.command.DoIt(PROG_MODULE, &s.bar, 10000, 5, false, 1, true);
   EXPECT_EQ(linesOf(*s.first), kFirstDone);
   EXPECT_EQ(linesOf(*s.second), kSecond);
-  EXPECT_EQ(s.events.seen, (std::vector<QString>{QStringLiteral("Begining"), QStringLiteral("Finished")}));
+  EXPECT_EQ(s.events.seen, (std::vector<QString>{u"Begining"_qs, u"Finished"_qs}));
   // Lines outside the declarations: five; the procedure advances by all of them.
   EXPECT_EQ(s.bar.maximum(), 5);
   EXPECT_EQ(s.bar.value(), 5);
@@ -75,10 +74,9 @@ TEST(CNumIndent, RemovesNumbersWithSpacesOverTheActiveProject) {
   Scene s;
   s.command.DoIt(PROG_PROJECT, &s.bar, 10000, 5, true, 1, true);
   s.command.DoIt(PROG_PROJECT, &s.bar, 0, 0, true, 3, false);
-  EXPECT_EQ(linesOf(*s.first),
-            (QStringList{kFirst[0], kFirst[1], QStringLiteral("   If x Then"), QStringLiteral("      y = 1"),
-                         QStringLiteral("   End If"), kFirst[5]}));
-  EXPECT_EQ(linesOf(*s.second), (QStringList{kSecond[0], QStringLiteral("   z = 2"), kSecond[2]}));
+  EXPECT_EQ(linesOf(*s.first), (QStringList{kFirst[0], kFirst[1], u"   If x Then"_qs, u"      y = 1"_qs,
+                                            u"   End If"_qs, kFirst[5]}));
+  EXPECT_EQ(linesOf(*s.second), (QStringList{kSecond[0], u"   z = 2"_qs, kSecond[2]}));
 }
 
 TEST(CNumIndent, TheProcedureAtTheCaretAloneChangesAndACaretOutsideEveryProcedureChangesNothing) {
@@ -87,7 +85,7 @@ TEST(CNumIndent, TheProcedureAtTheCaretAloneChangesAndACaretOutsideEveryProcedur
   s.command.DoIt(PROG_PROCEDURE, &s.bar, 10000, 5, false, 1, true);
   EXPECT_EQ(linesOf(*s.first), kFirst);
   EXPECT_EQ(s.bar.value(), s.bar.maximum()) << "the bar is still filled";
-  EXPECT_EQ(s.events.seen.back(), QStringLiteral("Finished"));
+  EXPECT_EQ(s.events.seen.back(), u"Finished"_qs);
   Ide::placeCaret(s.first, 4);
   s.command.DoIt(PROG_PROCEDURE, &s.bar, 10000, 5, false, 1, true);
   EXPECT_EQ(linesOf(*s.first), kFirstDone);
@@ -104,7 +102,7 @@ TEST(CNumIndent, CancelDuringAProjectRunHidesTheBarAndRaisesNoFinished) {
   s.command.DoIt(PROG_PROJECT, &s.bar, 10000, 5, false, 1, true);
   EXPECT_EQ(linesOf(*s.second), kSecond);
   EXPECT_FALSE(s.bar.isVisible());
-  EXPECT_EQ(s.events.seen, std::vector<QString>{QStringLiteral("Begining")});
+  EXPECT_EQ(s.events.seen, std::vector<QString>{u"Begining"_qs});
 }
 
 TEST(CNumIndent, ACancelFromWorkTheLoopRunsStopsTheWalkBeforeItChangesAnything) {
@@ -114,7 +112,7 @@ TEST(CNumIndent, ACancelFromWorkTheLoopRunsStopsTheWalkBeforeItChangesAnything) 
   s.command.DoIt(PROG_PROJECT, &s.bar, 10000, 5, false, 1, true);
   EXPECT_EQ(linesOf(*s.first), kFirst);
   EXPECT_EQ(linesOf(*s.second), kSecond);
-  EXPECT_EQ(s.events.seen, std::vector<QString>{QStringLiteral("Begining")});
+  EXPECT_EQ(s.events.seen, std::vector<QString>{u"Begining"_qs});
 }
 
 TEST(CNumIndent, AFailureOfTheRunItselfIsAnErrorEventNamingDoIt) {
@@ -123,17 +121,17 @@ TEST(CNumIndent, AFailureOfTheRunItselfIsAnErrorEventNamingDoIt) {
   Events events(command);
   command.DoIt(PROG_MODULE, nullptr, 10000, 5, false, 1, true);  // no component is selected
   ASSERT_EQ(events.seen.size(), 3u);
-  EXPECT_EQ(events.seen[1], QStringLiteral("91 %1\nem CNumIndent_DoIt, linha: 0")
-                                .arg(ide::standardDescription(ide::err::ObjectVariableNotSet)));
-  EXPECT_EQ(events.seen[2], QStringLiteral("Finished"));
+  EXPECT_EQ(events.seen[1], u"91 %1\nem CNumIndent_DoIt, linha: 0"_qs.arg(
+                                ide::standardDescription(ide::err::ObjectVariableNotSet)));
+  EXPECT_EQ(events.seen[2], u"Finished"_qs);
 }
 
 TEST(CNumIndent, ANumberPastTheLargestStopsTheRunWithOneErrorNamingTheScope) {
   Scene s;
   s.command.DoIt(PROG_PROJECT, &s.bar, std::numeric_limits<qint32>::max(), 1, false, 1, true);
   ASSERT_EQ(s.events.seen.size(), 3u);
-  EXPECT_TRUE(s.events.seen[1].startsWith(QStringLiteral("6 ")));
-  EXPECT_TRUE(s.events.seen[1].endsWith(QStringLiteral("\nem CNumIndent_NumIndentProject, linha: 4")))
+  EXPECT_TRUE(s.events.seen[1].startsWith(u"6 "_qs));
+  EXPECT_TRUE(s.events.seen[1].endsWith(u"\nem CNumIndent_NumIndentProject, linha: 4"_qs))
       << s.events.seen[1].toStdString();
   // A procedure is written once it is numbered and indented whole: the one that overflowed is left as
   // it was, rather than half numbered and not indented.
@@ -142,23 +140,21 @@ TEST(CNumIndent, ANumberPastTheLargestStopsTheRunWithOneErrorNamingTheScope) {
 }
 
 TEST(CNumIndent, LinesTheIndenterCannotWriteAreErrorEventsAndTheWalkGoesOn) {
-  const QString longCode = QStringLiteral("s = \"%1\"").arg(QString(1012, u'a'));
+  const QString longCode = u"s = \"%1\""_qs.arg(QString(1012, u'a'));
   Ide ide;
-  auto module = ide.addModule({QStringLiteral("Private Type T"),
-                               QStringLiteral("x As String * 10 ' ") + QString(1000, u'c'),
-                               QStringLiteral("End Type"), QStringLiteral("Sub Um()"), longCode,
-                               QStringLiteral("y = 1"), QStringLiteral("End Sub")});
+  auto module = ide.addModule({u"Private Type T"_qs, u"x As String * 10 ' "_qs + QString(1000, u'c'),
+                               u"End Type"_qs, u"Sub Um()"_qs, longCode, u"y = 1"_qs, u"End Sub"_qs});
   ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
   CNumIndent command(ide.vbe);
   Events events(command);
   command.DoIt(PROG_MODULE, nullptr, 10000, 5, true, 8, false);
   ASSERT_EQ(events.seen.size(), 4u);
-  EXPECT_TRUE(events.seen[1].startsWith(QStringLiteral("35020 ")));
-  EXPECT_TRUE(events.seen[1].endsWith(QStringLiteral("\nIndentLine 5"))) << events.seen[1].toStdString();
-  EXPECT_TRUE(events.seen[2].endsWith(QStringLiteral("\nSource:  IndentDeclarationLine, line: 2")))
+  EXPECT_TRUE(events.seen[1].startsWith(u"35020 "_qs));
+  EXPECT_TRUE(events.seen[1].endsWith(u"\nIndentLine 5"_qs)) << events.seen[1].toStdString();
+  EXPECT_TRUE(events.seen[2].endsWith(u"\nSource:  IndentDeclarationLine, line: 2"_qs))
       << events.seen[2].toStdString();
-  EXPECT_EQ(events.seen[3], QStringLiteral("Finished"));
-  EXPECT_EQ(module->Lines(6, 1), QStringLiteral("        y = 1"));
+  EXPECT_EQ(events.seen[3], u"Finished"_qs);
+  EXPECT_EQ(module->Lines(6, 1), u"        y = 1"_qs);
 }
 
 }  // namespace

@@ -26,7 +26,7 @@ TEST(WholeNumber, RefusesWhatIsNotANumberOrDoesNotFit) {
 
 TEST(StoredOptions, AFreshUserGetsTheDefaults) {
   QTemporaryDir dir;
-  const common::SettingsStore settings(dir.filePath(QStringLiteral("Quimbel.ini")));
+  const common::SettingsStore settings(dir.filePath(u"Quimbel.ini"_qs));
   const NumberingOptions numbering = storedNumbering(settings);
   EXPECT_EQ(numbering.startNumber, 10000);
   EXPECT_EQ(numbering.interval, 5);
@@ -37,17 +37,17 @@ TEST(StoredOptions, AFreshUserGetsTheDefaults) {
 
 TEST(StoredOptions, StoredValuesAreReadAndUnusableOnesFallBack) {
   QTemporaryDir dir;
-  common::SettingsStore settings(dir.filePath(QStringLiteral("Quimbel.ini")));
-  settings.setValue(common::setting::InitialNumber, QStringLiteral("100"));
-  settings.setValue(common::setting::Interval, QStringLiteral("cinco"));
-  settings.setValue(common::setting::UseOption, QStringLiteral("1"));
-  settings.setValue(common::setting::Indentation, QStringLiteral("4"));
+  common::SettingsStore settings(dir.filePath(u"Quimbel.ini"_qs));
+  settings.setValue(common::setting::InitialNumber, u"100"_qs);
+  settings.setValue(common::setting::Interval, u"cinco"_qs);
+  settings.setValue(common::setting::UseOption, u"1"_qs);
+  settings.setValue(common::setting::Indentation, u"4"_qs);
   EXPECT_EQ(storedNumbering(settings).startNumber, 100);
   EXPECT_EQ(storedNumbering(settings).interval, 5);
   EXPECT_EQ(storedIndentation(settings).mode, IndentMode::Spaces);
   EXPECT_EQ(storedIndentation(settings).spaces, 4);
 
-  settings.setValue(common::setting::Indentation, QStringLiteral("0"));
+  settings.setValue(common::setting::Indentation, u"0"_qs);
   settings.setValue(common::setting::UseOption, QString());
   EXPECT_EQ(storedIndentation(settings).spaces, 3);
   EXPECT_EQ(storedIndentation(settings).mode, IndentMode::Tabs);  // an empty choice counts as tabs

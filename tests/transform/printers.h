@@ -12,7 +12,7 @@ QT_BEGIN_NAMESPACE
 
 inline void PrintTo(const QString& text, std::ostream* os) {
   QString shown = text;
-  shown.replace(u'\t', QStringLiteral("\\t"));
+  shown.replace(u'\t', u"\\t"_qs);
   *os << '"' << shown.toStdString() << '"';
 }
 

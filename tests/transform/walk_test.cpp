@@ -28,79 +28,79 @@ using test::linesOf;
 // A module with a continued header, blocks, a continued statement, a label, a comment, directives, a
 // blank line before End Sub and a comment after the last procedure. Indented carelessly, tabs included.
 const QStringList kModule = {
-    QStringLiteral("Option Explicit"),                      // 1
-    QStringLiteral("Private m As Long"),                    // 2
-    QString(),                                              // 3
-    QStringLiteral("Public Sub Alpha(ByVal a As Long, _"),  // 4
-    QStringLiteral("        ByVal b As Long, _"),           // 5
-    QStringLiteral("        ByVal c As Long)"),             // 6
-    QStringLiteral("Dim x As Long"),                        // 7
-    QStringLiteral("\tx = a + _"),                          // 8
-    QStringLiteral("b"),                                    // 9
-    QStringLiteral("  Select Case x"),                      // 10
-    QStringLiteral("Case 1"),                               // 11
-    QStringLiteral("x = 2"),                                // 12
-    QStringLiteral("End Select"),                           // 13
-    QStringLiteral("If x > 1 Then"),                        // 14
-    QStringLiteral("x = 3"),                                // 15
-    QStringLiteral("      Else"),                           // 16
-    QStringLiteral("x = 4"),                                // 17
-    QStringLiteral("End If"),                               // 18
-    QStringLiteral("Erro:"),                                // 19
-    QStringLiteral("' nota"),                               // 20
-    QStringLiteral("#If DEPURACAO Then"),                   // 21
-    QStringLiteral("Debug.Print x"),                        // 22
-    QStringLiteral("#End If"),                              // 23
-    QString(),                                              // 24
-    QStringLiteral("End Sub"),                              // 25
-    QString(),                                              // 26
-    QStringLiteral("Private Function Beta() As Long"),      // 27
-    QStringLiteral("    Beta = 1"),                         // 28
-    QStringLiteral("End Function"),                         // 29
-    QStringLiteral("' fim do módulo"),                      // 30
+    u"Option Explicit"_qs,                      // 1
+    u"Private m As Long"_qs,                    // 2
+    QString(),                                  // 3
+    u"Public Sub Alpha(ByVal a As Long, _"_qs,  // 4
+    u"        ByVal b As Long, _"_qs,           // 5
+    u"        ByVal c As Long)"_qs,             // 6
+    u"Dim x As Long"_qs,                        // 7
+    u"\tx = a + _"_qs,                          // 8
+    u"b"_qs,                                    // 9
+    u"  Select Case x"_qs,                      // 10
+    u"Case 1"_qs,                               // 11
+    u"x = 2"_qs,                                // 12
+    u"End Select"_qs,                           // 13
+    u"If x > 1 Then"_qs,                        // 14
+    u"x = 3"_qs,                                // 15
+    u"      Else"_qs,                           // 16
+    u"x = 4"_qs,                                // 17
+    u"End If"_qs,                               // 18
+    u"Erro:"_qs,                                // 19
+    u"' nota"_qs,                               // 20
+    u"#If DEPURACAO Then"_qs,                   // 21
+    u"Debug.Print x"_qs,                        // 22
+    u"#End If"_qs,                              // 23
+    QString(),                                  // 24
+    u"End Sub"_qs,                              // 25
+    QString(),                                  // 26
+    u"Private Function Beta() As Long"_qs,      // 27
+    u"    Beta = 1"_qs,                         // 28
+    u"End Function"_qs,                         // 29
+    u"' fim do módulo"_qs,                      // 30
 };
 
 // kModule numbered from 10000 in steps of 5.
 QStringList numberedModule() {
   QStringList lines = kModule;
-  lines[6] = QStringLiteral("10000 Dim x As Long");
-  lines[7] = QStringLiteral("10005 \tx = a + _");
-  lines[9] = QStringLiteral("10010   Select Case x");
-  lines[11] = QStringLiteral("10015 x = 2");
-  lines[12] = QStringLiteral("10020 End Select");
-  lines[13] = QStringLiteral("10025 If x > 1 Then");
-  lines[14] = QStringLiteral("10030 x = 3");
-  lines[15] = QStringLiteral("10035        Else");  // a one-word line takes two blanks
-  lines[16] = QStringLiteral("10040 x = 4");
-  lines[17] = QStringLiteral("10045 End If");
-  lines[21] = QStringLiteral("10050 Debug.Print x");
-  lines[27] = QStringLiteral("10000     Beta = 1");
+  lines[6] = u"10000 Dim x As Long"_qs;
+  lines[7] = u"10005 \tx = a + _"_qs;
+  lines[9] = u"10010   Select Case x"_qs;
+  lines[11] = u"10015 x = 2"_qs;
+  lines[12] = u"10020 End Select"_qs;
+  lines[13] = u"10025 If x > 1 Then"_qs;
+  lines[14] = u"10030 x = 3"_qs;
+  lines[15] = u"10035        Else"_qs;  // a one-word line takes two blanks
+  lines[16] = u"10040 x = 4"_qs;
+  lines[17] = u"10045 End If"_qs;
+  lines[21] = u"10050 Debug.Print x"_qs;
+  lines[27] = u"10000     Beta = 1"_qs;
   return lines;
 }
 
 // kModule indented with two spaces.
 QStringList indentedModule() {
   QStringList lines = kModule;
-  lines[4] = QStringLiteral("  ByVal b As Long, _");
-  lines[5] = QStringLiteral("  ByVal c As Long)");
-  lines[6] = QStringLiteral("  Dim x As Long");
-  lines[7] = QStringLiteral("  x = a + _");
-  lines[8] = QStringLiteral("    b");
-  lines[9] = QStringLiteral("  Select Case x");
-  lines[10] = QStringLiteral("    Case 1");
-  lines[11] = QStringLiteral("      x = 2");
-  lines[12] = QStringLiteral("  End Select");
-  lines[13] = QStringLiteral("  If x > 1 Then");
-  lines[14] = QStringLiteral("    x = 3");
-  lines[15] = QStringLiteral("  Else");
-  lines[16] = QStringLiteral("    x = 4");
-  lines[17] = QStringLiteral("  End If");
-  lines[18] = QStringLiteral("  Erro:");
-  lines[19] = QStringLiteral("  ' nota");
-  lines[20] = QStringLiteral("  #If DEPURACAO Then");
-  lines[21] = QStringLiteral("    Debug.Print x");
-  lines[22] = QStringLiteral("  #End If");
-  lines[27] = QStringLiteral("  Beta = 1");
+  lines[4] = u"  ByVal b As Long, _"_qs;
+  lines[5] = u"  ByVal c As Long)"_qs;
+  lines[6] = u"  Dim x As Long"_qs;
+  lines[7] = u"  x = a + _"_qs;
+  lines[8] = u"    b"_qs;
+  lines[9] = u"  Select Case x"_qs;
+  lines[10] = u"    Case 1"_qs;
+  lines[11] = u"      x = 2"_qs;
+  lines[12] = u"  End Select"_qs;
+  lines[13] = u"  If x > 1 Then"_qs;
+  lines[14] = u"    x = 3"_qs;
+  lines[15] = u"  Else"_qs;
+  lines[16] = u"    x = 4"_qs;
+  lines[17] = u"  End If"_qs;
+  lines[18] = u"  Erro:"_qs;
+  lines[19] = u"  ' nota"_qs;
+  lines[20] = u"  #If DEPURACAO Then"_qs;
+  lines[21] = u"    Debug.Print x"_qs;
+  lines[22] = u"  #End If"_qs;
+  lines[27] = u"  Beta = 1"_qs;
   return lines;
 }
 
@@ -108,26 +108,26 @@ QStringList indentedModule() {
 QStringList numIndentedModule() {
   const QString column(6, u' ');
   QStringList lines = kModule;
-  lines[4] = column + QStringLiteral("\tByVal b As Long, _");
-  lines[5] = column + QStringLiteral("\tByVal c As Long)");
-  lines[6] = QStringLiteral("10000 \tDim x As Long");
-  lines[7] = QStringLiteral("10005 \tx = a + _");
-  lines[8] = column + QStringLiteral("\t\tb");
-  lines[9] = QStringLiteral("10010 \tSelect Case x");
-  lines[10] = column + QStringLiteral("\t\tCase 1");
-  lines[11] = QStringLiteral("10015 \t\t\tx = 2");
-  lines[12] = QStringLiteral("10020 \tEnd Select");
-  lines[13] = QStringLiteral("10025 \tIf x > 1 Then");
-  lines[14] = QStringLiteral("10030 \t\tx = 3");
-  lines[15] = QStringLiteral("10035 \tElse");
-  lines[16] = QStringLiteral("10040 \t\tx = 4");
-  lines[17] = QStringLiteral("10045 \tEnd If");
-  lines[18] = column + QStringLiteral("\tErro:");
-  lines[19] = column + QStringLiteral("\t' nota");
-  lines[20] = column + QStringLiteral("\t#If DEPURACAO Then");
-  lines[21] = QStringLiteral("10050 \t\tDebug.Print x");
-  lines[22] = column + QStringLiteral("\t#End If");
-  lines[27] = QStringLiteral("10000 \tBeta = 1");
+  lines[4] = column + u"\tByVal b As Long, _"_qs;
+  lines[5] = column + u"\tByVal c As Long)"_qs;
+  lines[6] = u"10000 \tDim x As Long"_qs;
+  lines[7] = u"10005 \tx = a + _"_qs;
+  lines[8] = column + u"\t\tb"_qs;
+  lines[9] = u"10010 \tSelect Case x"_qs;
+  lines[10] = column + u"\t\tCase 1"_qs;
+  lines[11] = u"10015 \t\t\tx = 2"_qs;
+  lines[12] = u"10020 \tEnd Select"_qs;
+  lines[13] = u"10025 \tIf x > 1 Then"_qs;
+  lines[14] = u"10030 \t\tx = 3"_qs;
+  lines[15] = u"10035 \tElse"_qs;
+  lines[16] = u"10040 \t\tx = 4"_qs;
+  lines[17] = u"10045 \tEnd If"_qs;
+  lines[18] = column + u"\tErro:"_qs;
+  lines[19] = column + u"\t' nota"_qs;
+  lines[20] = column + u"\t#If DEPURACAO Then"_qs;
+  lines[21] = u"10050 \t\tDebug.Print x"_qs;
+  lines[22] = column + u"\t#End If"_qs;
+  lines[27] = u"10000 \tBeta = 1"_qs;
   return lines;
 }
 
@@ -144,7 +144,7 @@ struct Failures {
 struct Walk {
   test::CountingLoop loop;
   test::RecordingBar bar;
-  WalkContext context{QStringLiteral("frmLinNumbers"), &loop, &bar};
+  WalkContext context{u"frmLinNumbers"_qs, &loop, &bar};
   Failures failures;
   Walk() { failures.attach(context); }
 };
@@ -167,25 +167,24 @@ TEST(NumberingWalk, NumbersAModuleProcedureByProcedureAndRemovingTheNumbersGives
 TEST(NumberingWalk, HeaderContinuationLinesAndContinuedStatementsKeepTheirLeadingNumbers) {
   // "2 * b" continues a statement: its 2 is an operand. The header's continuation lines are parameters.
   const QStringList lines = {
-      QStringLiteral("Function Soma(ByVal a As Long, _"),
-      QStringLiteral("10 ByVal b As Long) As Long"),
-      QStringLiteral("20 Soma = a + _"),
-      QStringLiteral("    2 * b"),
-      QStringLiteral("End Function"),
+      u"Function Soma(ByVal a As Long, _"_qs,
+      u"10 ByVal b As Long) As Long"_qs,
+      u"20 Soma = a + _"_qs,
+      u"    2 * b"_qs,
+      u"End Function"_qs,
   };
   Ide ide;
   auto module = ide.addModule(lines);
   Walk run;
   NumberingWalk(run.context, 10000, 5).NumberModule(module, false);
-  EXPECT_EQ(linesOf(*module),
-            (QStringList{lines[0], lines[1], QStringLiteral("Soma = a + _"), lines[3], lines[4]}));
+  EXPECT_EQ(linesOf(*module), (QStringList{lines[0], lines[1], u"Soma = a + _"_qs, lines[3], lines[4]}));
 }
 
 TEST(NumberingWalk, RenumberingANumberedProcedureKeepsItsColumnAndIndentingTreatsItAsTheOriginal) {
   const QStringList lines = {
-      QStringLiteral("Sub Gravar()"),    QStringLiteral("10        On Error GoTo Erro"),
-      QStringLiteral("20        x = 1"), QStringLiteral("Erro:"),
-      QStringLiteral("30        y = 2"), QStringLiteral("End Sub"),
+      u"Sub Gravar()"_qs,    u"10        On Error GoTo Erro"_qs,
+      u"20        x = 1"_qs, u"Erro:"_qs,
+      u"30        y = 2"_qs, u"End Sub"_qs,
   };
   Ide ide;
   auto module = ide.addModule(lines);
@@ -193,12 +192,9 @@ TEST(NumberingWalk, RenumberingANumberedProcedureKeepsItsColumnAndIndentingTreat
   NumberingWalk(run.context, 10, 10).NumberModule(module, true);
   EXPECT_EQ(linesOf(*module), lines);
   IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
-  const QStringList indented = {lines[0],
-                                QStringLiteral("10     On Error GoTo Erro"),
-                                QStringLiteral("20     x = 1"),
-                                QStringLiteral("       Erro:"),
-                                QStringLiteral("30     y = 2"),
-                                lines[5]};
+  const QStringList indented = {lines[0],           u"10     On Error GoTo Erro"_qs,
+                                u"20     x = 1"_qs, u"       Erro:"_qs,
+                                u"30     y = 2"_qs, lines[5]};
   EXPECT_EQ(linesOf(*module), indented);
 
   // The original, indented the same way, is the same text.
@@ -209,12 +205,12 @@ TEST(NumberingWalk, RenumberingANumberedProcedureKeepsItsColumnAndIndentingTreat
 
 TEST(NumberingWalk, ADeclareStatementListedAsAMethodIsNeverNumbered) {
   const QStringList lines = {
-      QStringLiteral("Private Declare Function GetTickCount Lib \"kernel32\" _"),
-      QStringLiteral("    () As Long"),
+      u"Private Declare Function GetTickCount Lib \"kernel32\" _"_qs,
+      u"    () As Long"_qs,
       QString(),
-      QStringLiteral("Sub Main()"),
-      QStringLiteral("    x = GetTickCount"),
-      QStringLiteral("End Sub"),
+      u"Sub Main()"_qs,
+      u"    x = GetTickCount"_qs,
+      u"End Sub"_qs,
   };
   Ide ide;
   auto module = ide.addModule(lines);
@@ -222,7 +218,7 @@ TEST(NumberingWalk, ADeclareStatementListedAsAMethodIsNeverNumbered) {
   NumberingWalk walk(run.context, 100, 10);
   walk.NumberModule(module, true);
   QStringList expected = lines;
-  expected[4] = QStringLiteral("100     x = GetTickCount");
+  expected[4] = u"100     x = GetTickCount"_qs;
   EXPECT_EQ(linesOf(*module), expected);
   walk.NumberModule(module, false);
   EXPECT_EQ(linesOf(*module), lines);
@@ -230,21 +226,21 @@ TEST(NumberingWalk, ADeclareStatementListedAsAMethodIsNeverNumbered) {
 
 TEST(NumberingWalk, PropertiesAreNumberedKindByKind) {
   const QStringList lines = {
-      QStringLiteral("Private mNome As String"),
-      QStringLiteral("Public Property Let Nome(ByVal Valor As String)"),
-      QStringLiteral("    mNome = Valor"),
-      QStringLiteral("End Property"),
-      QStringLiteral("Public Property Get Nome() As String"),
-      QStringLiteral("    Nome = mNome"),
-      QStringLiteral("End Property"),
+      u"Private mNome As String"_qs,
+      u"Public Property Let Nome(ByVal Valor As String)"_qs,
+      u"    mNome = Valor"_qs,
+      u"End Property"_qs,
+      u"Public Property Get Nome() As String"_qs,
+      u"    Nome = mNome"_qs,
+      u"End Property"_qs,
   };
   Ide ide;
   auto module = ide.addModule(lines, ide::ComponentType::ClassModule);
   Walk run;
   NumberingWalk(run.context, 1, 1).NumberModule(module, true);
   QStringList expected = lines;
-  expected[2] = QStringLiteral("1     mNome = Valor");
-  expected[5] = QStringLiteral("1     Nome = mNome");
+  expected[2] = u"1     mNome = Valor"_qs;
+  expected[5] = u"1     Nome = mNome"_qs;
   EXPECT_EQ(linesOf(*module), expected);
 }
 
@@ -256,7 +252,7 @@ TEST(NumberingWalk, TheCurrentProcedureIsTheOneAtTheCaretAndNoOtherLineChanges) 
   Walk run;
   NumberingWalk(run.context, 10000, 5).NumberCurrentProcedure(*ide.vbe, true);
   QStringList expected = kModule;
-  expected[27] = QStringLiteral("10000     Beta = 1");
+  expected[27] = u"10000     Beta = 1"_qs;
   EXPECT_EQ(linesOf(*module), expected);
   // The user is about to see the procedure change.
   EXPECT_EQ(module->CodePane()->Window()->WindowState(), ide::WindowState::Normal);
@@ -275,17 +271,16 @@ TEST(NumberingWalk, WithoutACodeWindowTheCurrentProcedureFailsWithItsMessage) {
   NumberingWalk(run.context, 10000, 5).NumberCurrentProcedure(*ide.vbe, true);
   ASSERT_EQ(run.failures.walks.size(), 1u);
   EXPECT_EQ(run.failures.walks[0].messageId, 5123);
-  EXPECT_EQ(run.failures.walks[0].operation, QStringLiteral("NumberCurrentProcedure"));
+  EXPECT_EQ(run.failures.walks[0].operation, u"NumberCurrentProcedure"_qs);
   EXPECT_EQ(run.failures.walks[0].error.number(), ide::err::ObjectVariableNotSet);
 }
 
 TEST(NumberingWalk, ANumberPastTheLargestStopsTheRunWithTheMessageOfItsScope) {
   const QStringList procedure = {
-      QStringLiteral("Sub Um()"), QStringLiteral("a = 1"), QStringLiteral("b = 2"),
-      QStringLiteral("c = 3"),    QStringLiteral("d = 4"), QStringLiteral("End Sub"),
+      u"Sub Um()"_qs, u"a = 1"_qs, u"b = 2"_qs, u"c = 3"_qs, u"d = 4"_qs, u"End Sub"_qs,
   };
   QStringList lines = procedure;
-  lines << QStringLiteral("Sub Dois()") << QStringLiteral("e = 5") << QStringLiteral("End Sub");
+  lines << u"Sub Dois()"_qs << u"e = 5"_qs << u"End Sub"_qs;
   constexpr qint32 kMax = std::numeric_limits<qint32>::max();
 
   // Module scope: 5122, once, and the second procedure is not reached.
@@ -294,18 +289,18 @@ TEST(NumberingWalk, ANumberPastTheLargestStopsTheRunWithTheMessageOfItsScope) {
   Walk run;
   NumberingWalk(run.context, kMax - 10, 5).NumberModule(module, true);
   QStringList expected = lines;
-  expected[1] = QStringLiteral("2147483637 a = 1");
-  expected[2] = QStringLiteral("2147483642 b = 2");
-  expected[3] = QStringLiteral("2147483647 c = 3");
+  expected[1] = u"2147483637 a = 1"_qs;
+  expected[2] = u"2147483642 b = 2"_qs;
+  expected[3] = u"2147483647 c = 3"_qs;
   EXPECT_EQ(linesOf(*module), expected);
   ASSERT_EQ(run.failures.walks.size(), 1u);
   const WalkFailure& failure = run.failures.walks[0];
   EXPECT_EQ(failure.messageId, 5122);
-  EXPECT_EQ(failure.operation, QStringLiteral("NumberModule"));
+  EXPECT_EQ(failure.operation, u"NumberModule"_qs);
   EXPECT_TRUE(failure.stopsRun);
   EXPECT_EQ(failure.line, 5);
   EXPECT_EQ(failure.error.number(), 6);
-  EXPECT_EQ(failure.error.source(), QStringLiteral("em frmLinNumbers_NumberModule, linha: 5"));
+  EXPECT_EQ(failure.error.source(), u"em frmLinNumbers_NumberModule, linha: 5"_qs);
   EXPECT_TRUE(run.context.stopped());
 
   // Project scope: 5121, once, and the other module is left as it was.
@@ -316,7 +311,7 @@ TEST(NumberingWalk, ANumberPastTheLargestStopsTheRunWithTheMessageOfItsScope) {
   NumberingWalk(projectRun.context, kMax, 1).NumberProject(project.project, true);
   ASSERT_EQ(projectRun.failures.walks.size(), 1u);
   EXPECT_EQ(projectRun.failures.walks[0].messageId, 5121);
-  EXPECT_EQ(linesOf(*first)[1], QStringLiteral("2147483647 a = 1"));
+  EXPECT_EQ(linesOf(*first)[1], u"2147483647 a = 1"_qs);
   EXPECT_EQ(linesOf(*first)[2], procedure[2]);
   EXPECT_EQ(linesOf(*second), procedure);
 
@@ -324,25 +319,23 @@ TEST(NumberingWalk, ANumberPastTheLargestStopsTheRunWithTheMessageOfItsScope) {
   Ide single;
   auto alone = single.addModule(procedure);
   Walk memberRun;
-  NumberingWalk(memberRun.context, kMax, 1)
-      .NumberMember(alone, alone->Members()->Item(QStringLiteral("Um")), true);
+  NumberingWalk(memberRun.context, kMax, 1).NumberMember(alone, alone->Members()->Item(u"Um"_qs), true);
   ASSERT_EQ(memberRun.failures.walks.size(), 1u);
   EXPECT_EQ(memberRun.failures.walks[0].messageId, 5123);
 }
 
 TEST(NumberingWalk, ALineThatWouldGrowTooLongIsPassedOverAndTheWalkGoesOn) {
-  const QString longLine = QStringLiteral("s = \"%1\"").arg(QString(1015, u'a'));
+  const QString longLine = u"s = \"%1\""_qs.arg(QString(1015, u'a'));
   ASSERT_EQ(longLine.size(), 1021);
   Ide ide;
-  auto module = ide.addModule(
-      {QStringLiteral("Sub Longo()"), longLine, QStringLiteral("t = 1"), QStringLiteral("End Sub")});
+  auto module = ide.addModule({u"Sub Longo()"_qs, longLine, u"t = 1"_qs, u"End Sub"_qs});
   Walk run;
   NumberingWalk(run.context, 10, 10).NumberModule(module, true);
   const QStringList lines = linesOf(*module);
   EXPECT_EQ(lines[1], longLine);
-  EXPECT_EQ(lines[2], QStringLiteral("20 t = 1"));
+  EXPECT_EQ(lines[2], u"20 t = 1"_qs);
   ASSERT_EQ(run.failures.lines.size(), 1u);
-  EXPECT_EQ(run.failures.lines[0].operation, QStringLiteral("NumberLine"));
+  EXPECT_EQ(run.failures.lines[0].operation, u"NumberLine"_qs);
   EXPECT_EQ(run.failures.lines[0].line, 2);
   EXPECT_EQ(run.failures.lines[0].error.number(), ide::err::LineTooLong);
   EXPECT_TRUE(run.failures.walks.empty());
@@ -358,8 +351,8 @@ TEST(IndentationWalk, IndentsProceduresAndLeavesDeclarationsAndTrailingCommentsA
   IndentationWalk(run.context, IndentMode::Spaces, 2).IndentModule(module);
   EXPECT_EQ(linesOf(*module), indentedModule());
   // The header's continuation lines were re-indented; the procedures are still where they were.
-  EXPECT_EQ(module->ProcBodyLine(QStringLiteral("Alpha"), ide::ProcKind::Proc), 4);
-  EXPECT_EQ(module->ProcCountLines(QStringLiteral("Alpha"), ide::ProcKind::Proc), 23);
+  EXPECT_EQ(module->ProcBodyLine(u"Alpha"_qs, ide::ProcKind::Proc), 4);
+  EXPECT_EQ(module->ProcCountLines(u"Alpha"_qs, ide::ProcKind::Proc), 23);
   EXPECT_EQ(module->Members()->Count(), 3);
 }
 
@@ -379,32 +372,27 @@ TEST(IndentationWalk, IndentingTwiceChangesNothingTheSecondTime) {
 
 TEST(IndentationWalk, DeclarationsIndentTypesAndEnums) {
   const QStringList lines = {
-      QStringLiteral("Private Type Ponto"), QStringLiteral("X As Long"),
-      QStringLiteral("      Y As Long"),    QStringLiteral("   End Type"),
-      QStringLiteral("\tPublic Enum Cor"),  QStringLiteral("Vermelho = 1"),
-      QStringLiteral("End Enum"),
+      u"Private Type Ponto"_qs, u"X As Long"_qs,    u"      Y As Long"_qs, u"   End Type"_qs,
+      u"\tPublic Enum Cor"_qs,  u"Vermelho = 1"_qs, u"End Enum"_qs,
   };
   Ide ide;
   auto module = ide.addModule(lines);
   Walk run;
   IndentationWalk(run.context, IndentMode::Spaces, 4).IndentDeclarations(*module);
-  EXPECT_EQ(linesOf(*module),
-            (QStringList{lines[0], QStringLiteral("    X As Long"), QStringLiteral("    Y As Long"),
-                         QStringLiteral("End Type"), QStringLiteral("Public Enum Cor"),
-                         QStringLiteral("    Vermelho = 1"), lines[6]}));
+  EXPECT_EQ(linesOf(*module), (QStringList{lines[0], u"    X As Long"_qs, u"    Y As Long"_qs, u"End Type"_qs,
+                                           u"Public Enum Cor"_qs, u"    Vermelho = 1"_qs, lines[6]}));
 }
 
 TEST(IndentationWalk, ALineThatWouldGrowTooLongIsPassedOver) {
-  const QString longLine = QStringLiteral("s = \"%1\"").arg(QString(1015, u'a'));
+  const QString longLine = u"s = \"%1\""_qs.arg(QString(1015, u'a'));
   Ide ide;
-  auto module = ide.addModule(
-      {QStringLiteral("Sub Longo()"), longLine, QStringLiteral("t = 1"), QStringLiteral("End Sub")});
+  auto module = ide.addModule({u"Sub Longo()"_qs, longLine, u"t = 1"_qs, u"End Sub"_qs});
   Walk run;
   IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
   EXPECT_EQ(linesOf(*module)[1], longLine);
-  EXPECT_EQ(linesOf(*module)[2], QStringLiteral("    t = 1"));
+  EXPECT_EQ(linesOf(*module)[2], u"    t = 1"_qs);
   ASSERT_EQ(run.failures.lines.size(), 1u);
-  EXPECT_EQ(run.failures.lines[0].operation, QStringLiteral("IndentLine"));
+  EXPECT_EQ(run.failures.lines[0].operation, u"IndentLine"_qs);
 }
 
 TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
@@ -469,13 +457,13 @@ TEST(Walks, ACancelEndsTheWalkAtTheNextYieldAndHidesTheBar) {
 
 TEST(Walks, RelatedDocumentsAreSkippedAndCountNothing) {
   QTemporaryDir dir;
-  host::test::writeBytes(dir.filePath(QStringLiteral("Mod1.bas")),
+  host::test::writeBytes(dir.filePath(u"Mod1.bas"_qs),
                          "Attribute VB_Name = \"Mod1\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n");
-  host::test::writeBytes(dir.filePath(QStringLiteral("Leia-me.txt")), "texto\r\n");
-  host::test::writeBytes(dir.filePath(QStringLiteral("P.vbp")),
+  host::test::writeBytes(dir.filePath(u"Leia-me.txt"_qs), "texto\r\n");
+  host::test::writeBytes(dir.filePath(u"P.vbp"_qs),
                          "Type=Exe\r\nModule=Mod1; Mod1.bas\r\nRelatedDoc=Leia-me.txt\r\nName=\"P\"\r\n");
   auto vbe = host::VbeImpl::create();
-  auto project = vbe->open(dir.filePath(QStringLiteral("P.vbp"))).front();
+  auto project = vbe->open(dir.filePath(u"P.vbp"_qs)).front();
   ASSERT_EQ(project->Count(), 2);
   auto document = project->components()[1];
   ASSERT_EQ(document->Type(), ide::ComponentType::RelatedDocument);
@@ -485,7 +473,7 @@ TEST(Walks, RelatedDocumentsAreSkippedAndCountNothing) {
   vbe->selectComponent(document);
   EXPECT_EQ(CountUnits(run.context, *vbe, PROG_MODULE, ProgressUnit::Lines), 0);
   NumberingWalk(run.context, 10, 10).NumberProject(project, true);
-  EXPECT_EQ(project->components()[0]->CodeModule()->Lines(2, 1), QStringLiteral("10 x = 1"));
+  EXPECT_EQ(project->components()[0]->CodeModule()->Lines(2, 1), u"10 x = 1"_qs);
   EXPECT_TRUE(run.failures.walks.empty());
 }
 
@@ -530,7 +518,7 @@ Texts textsOf(const host::VbeImpl& vbe) {
 
 struct Opened {
   std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
-  WalkContext context{QStringLiteral("test"), nullptr, nullptr};
+  WalkContext context{u"test"_qs, nullptr, nullptr};
   Failures failures;
   explicit Opened(const QString& file) {
     vbe->open(file);
@@ -628,11 +616,10 @@ TEST(WholeProjects, LinesOutsideTheCurrentProcedureAreNeverTouched) {
     Opened opened(copy.groupFile());
     const Texts before = opened.texts();
     // AdicionarItem's header runs over three lines.
-    auto module =
-        opened.vbe->project(QStringLiteral("Loja"))->component(QStringLiteral("clsPedido"))->CodeModule();
-    const int body = module->ProcBodyLine(QStringLiteral("AdicionarItem"), ide::ProcKind::Proc);
-    const int start = module->ProcStartLine(QStringLiteral("AdicionarItem"), ide::ProcKind::Proc);
-    const int count = module->ProcCountLines(QStringLiteral("AdicionarItem"), ide::ProcKind::Proc);
+    auto module = opened.vbe->project(u"Loja"_qs)->component(u"clsPedido"_qs)->CodeModule();
+    const int body = module->ProcBodyLine(u"AdicionarItem"_qs, ide::ProcKind::Proc);
+    const int start = module->ProcStartLine(u"AdicionarItem"_qs, ide::ProcKind::Proc);
+    const int count = module->ProcCountLines(u"AdicionarItem"_qs, ide::ProcKind::Proc);
     Ide::placeCaret(module, body + 4);
     walks[w](*opened.vbe, opened.context);
     const Texts after = opened.texts();
@@ -642,7 +629,7 @@ TEST(WholeProjects, LinesOutsideTheCurrentProcedureAreNeverTouched) {
       for (qsizetype i = 0; i < it.value().size(); ++i) {
         if (lines[i] == it.value()[i]) continue;
         ++changed;
-        EXPECT_EQ(it.key(), QStringLiteral("Loja.clsPedido")) << "walk " << w;
+        EXPECT_EQ(it.key(), u"Loja.clsPedido"_qs) << "walk " << w;
         EXPECT_GT(i + 1, body) << "walk " << w;  // 1-based line after the header line
         EXPECT_LT(i + 1, start + count - 1) << "walk " << w;
       }

@@ -9,8 +9,8 @@
 int main(int argc, char** argv) {
   if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", QByteArray("offscreen"));
   QTemporaryDir home;
-  qputenv("QUIMBEL_CONFIG_DIR", home.filePath(QStringLiteral("config")).toLocal8Bit());
-  qputenv("QUIMBEL_DATA_DIR", home.filePath(QStringLiteral("data")).toLocal8Bit());
+  qputenv("QUIMBEL_CONFIG_DIR", home.filePath(u"config"_qs).toLocal8Bit());
+  qputenv("QUIMBEL_DATA_DIR", home.filePath(u"data"_qs).toLocal8Bit());
   QApplication app(argc, argv);
   ::testing::InitGoogleTest(&argc, argv);
   return RUN_ALL_TESTS();

@@ -19,22 +19,22 @@ class TestConnect final : public ide::IDTExtensibility {
  public:
   void OnConnection(const ide::Ref<ide::VBE>& vbe, ide::ConnectMode mode, const ide::Ref<ide::AddIn>& addIn,
                     QVariantList&) override {
-    log() << QStringLiteral("connect %1").arg(static_cast<int>(mode));
+    log() << u"connect %1"_qs.arg(static_cast<int>(mode));
     m_vbe = vbe;
     m_addIn = addIn;
     if (mode != ide::ConnectMode::Startup) start();
   }
   void OnStartupComplete(QVariantList&) override {
-    log() << QStringLiteral("startup");
+    log() << u"startup"_qs;
     if (qEnvironmentVariableIsSet("QUIMBEL_TEST_ADDIN_FAIL")) {
       m_addIn->setConnect(false);
       return;
     }
     start();
   }
-  void OnAddInsUpdate(QVariantList&) override { log() << QStringLiteral("update"); }
+  void OnAddInsUpdate(QVariantList&) override { log() << u"update"_qs; }
   void OnDisconnection(ide::DisconnectMode mode, QVariantList&) override {
-    log() << QStringLiteral("disconnect %1").arg(static_cast<int>(mode));
+    log() << u"disconnect %1"_qs.arg(static_cast<int>(mode));
     if (m_item) m_item->Delete();
     m_item.reset();
     m_click.disconnect();
@@ -44,14 +44,12 @@ class TestConnect final : public ide::IDTExtensibility {
 
  private:
   void start() {
-    m_item = m_vbe->CommandBars()
-                 ->Item(QStringLiteral("Add-Ins"))
-                 ->Controls()
-                 ->Add(ide::ControlType::Button, 1, {}, 0, true);
-    m_item->setCaption(QStringLiteral("Test Add-In"));
+    m_item =
+        m_vbe->CommandBars()->Item(u"Add-Ins"_qs)->Controls()->Add(ide::ControlType::Button, 1, {}, 0, true);
+    m_item->setCaption(u"Test Add-In"_qs);
     m_click = m_vbe->Events()->CommandBarEvents(m_item)->Click.connect(
-        [](const ide::Ref<ide::CommandBarControl>&, bool&, bool&) { log() << QStringLiteral("click"); });
-    m_timer = m_vbe->Platform().loop().SetTimer(100, [] { log() << QStringLiteral("tick"); });
+        [](const ide::Ref<ide::CommandBarControl>&, bool&, bool&) { log() << u"click"_qs; });
+    m_timer = m_vbe->Platform().loop().SetTimer(100, [] { log() << u"tick"_qs; });
   }
 
   ide::Ref<ide::VBE> m_vbe;
