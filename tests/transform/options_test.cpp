@@ -24,17 +24,6 @@ TEST(WholeNumber, RefusesWhatIsNotANumberOrDoesNotFit) {
     EXPECT_FALSE(wholeNumber(text).has_value()) << QString::fromUtf16(text).toStdString();
 }
 
-TEST(StoredOptions, AFreshUserGetsTheDefaults) {
-  QTemporaryDir dir;
-  const common::SettingsStore settings(dir.filePath(u"Quimbel.ini"_qs));
-  const NumberingOptions numbering = storedNumbering(settings);
-  EXPECT_EQ(numbering.startNumber, 10000);
-  EXPECT_EQ(numbering.interval, 5);
-  const IndentationOptions indentation = storedIndentation(settings);
-  EXPECT_EQ(indentation.mode, IndentMode::Tabs);
-  EXPECT_EQ(indentation.spaces, 3);
-}
-
 TEST(StoredOptions, StoredValuesAreReadAndUnusableOnesFallBack) {
   QTemporaryDir dir;
   common::SettingsStore settings(dir.filePath(u"Quimbel.ini"_qs));
