@@ -219,17 +219,6 @@ TEST(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
   EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"favorite modUm.Proc2 kind 0 line 15"_qs});
 }
 
-TEST(Commands, WithoutAnAddInsMenuTheConnectionFailsWithItsOwnNumber) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.vbe->CommandBars()->Item(u"Menu Bar"_qs)->Controls()->Item(11)->Delete();
-  addIn.connect();
-  EXPECT_EQ(addIn.connection->globals(), nullptr);
-  EXPECT_EQ(addIn.addIn->requests, std::vector<bool>{false});
-  EXPECT_EQ(common::lastError().number, static_cast<qint32>(0x80040C81u));
-  EXPECT_EQ(common::lastError().description, u"Não há menu de Add-Ins."_qs);
-}
-
 TEST(Commands, FailuresTheHandlersEndOnSilentlyAreLoggedOnceWithTheirPlace) {
   AddInEnvironment environment;
   LinkedAddIn addIn;
