@@ -93,15 +93,9 @@ struct RelatedDocumentScene {
   common::SettingsStore settings{dir.filePath(u"Quimbel.ini"_qs)};
   common::Options options;
   std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
-  std::shared_ptr<host::ProjectImpl> project;
+  std::shared_ptr<host::ProjectImpl> project = test::openWithRelatedDocument(*vbe, dir.path());
 
   RelatedDocumentScene() {
-    host::test::writeBytes(dir.filePath(u"Mod1.bas"_qs),
-                           "Attribute VB_Name = \"Mod1\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n");
-    host::test::writeBytes(dir.filePath(u"Leia-me.txt"_qs), "texto\r\n");
-    host::test::writeBytes(dir.filePath(u"P.vbp"_qs),
-                           "Type=Exe\r\nModule=Mod1; Mod1.bas\r\nRelatedDoc=Leia-me.txt\r\nName=\"P\"\r\n");
-    project = vbe->open(dir.filePath(u"P.vbp"_qs)).front();
     vbe->setActiveVBProject(project);
     vbe->selectComponent(project->components()[1]);
     options.OneCommandNumIndent = false;

@@ -5,6 +5,7 @@
 
 #include "host/model/vbe.h"
 #include "recordingbar.h"
+#include "testproject.h"
 
 #include <QStringList>
 
@@ -20,6 +21,16 @@ inline QStringList linesOf(ide::CodeModule& module) {
   for (int i = 1; i <= module.CountOfLines(); ++i)
     lines << module.Lines(i, 1);
   return lines;
+}
+
+/// Writes into `dir` and opens a project of a module (Sub A, "x = 1" on line 2) and a related document.
+inline std::shared_ptr<host::ProjectImpl> openWithRelatedDocument(host::VbeImpl& vbe, const QString& dir) {
+  host::test::writeBytes(dir + u"/Mod1.bas"_qs,
+                         "Attribute VB_Name = \"Mod1\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n");
+  host::test::writeBytes(dir + u"/Leia-me.txt"_qs, "texto\r\n");
+  host::test::writeBytes(dir + u"/P.vbp"_qs,
+                         "Type=Exe\r\nModule=Mod1; Mod1.bas\r\nRelatedDoc=Leia-me.txt\r\nName=\"P\"\r\n");
+  return vbe.open(dir + u"/P.vbp"_qs).front();
 }
 
 /// A headless IDE with one unsaved project; modules are added from lines.

@@ -324,23 +324,6 @@ TEST(NumberingWalk, ANumberPastTheLargestStopsTheRunWithTheMessageOfItsScope) {
   EXPECT_EQ(memberRun.failures.walks[0].messageId, 5123);
 }
 
-TEST(NumberingWalk, ALineThatWouldGrowTooLongIsPassedOverAndTheWalkGoesOn) {
-  const QString longLine = u"s = \"%1\""_qs.arg(QString(1015, u'a'));
-  ASSERT_EQ(longLine.size(), 1021);
-  Ide ide;
-  auto module = ide.addModule({u"Sub Longo()"_qs, longLine, u"t = 1"_qs, u"End Sub"_qs});
-  Walk run;
-  NumberingWalk(run.context, 10, 10).NumberModule(module, true);
-  const QStringList lines = linesOf(*module);
-  EXPECT_EQ(lines[1], longLine);
-  EXPECT_EQ(lines[2], u"20 t = 1"_qs);
-  ASSERT_EQ(run.failures.lines.size(), 1u);
-  EXPECT_EQ(run.failures.lines[0].operation, u"NumberLine"_qs);
-  EXPECT_EQ(run.failures.lines[0].line, 2);
-  EXPECT_EQ(run.failures.lines[0].error.number(), ide::err::LineTooLong);
-  EXPECT_TRUE(run.failures.walks.empty());
-}
-
 // ---------------------------------------------------------------------------------------------------
 // Indentation
 
@@ -381,18 +364,6 @@ TEST(IndentationWalk, DeclarationsIndentTypesAndEnums) {
   IndentationWalk(run.context, IndentMode::Spaces, 4).IndentDeclarations(*module);
   EXPECT_EQ(linesOf(*module), (QStringList{lines[0], u"    X As Long"_qs, u"    Y As Long"_qs, u"End Type"_qs,
                                            u"Public Enum Cor"_qs, u"    Vermelho = 1"_qs, lines[6]}));
-}
-
-TEST(IndentationWalk, ALineThatWouldGrowTooLongIsPassedOver) {
-  const QString longLine = u"s = \"%1\""_qs.arg(QString(1015, u'a'));
-  Ide ide;
-  auto module = ide.addModule({u"Sub Longo()"_qs, longLine, u"t = 1"_qs, u"End Sub"_qs});
-  Walk run;
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
-  EXPECT_EQ(linesOf(*module)[1], longLine);
-  EXPECT_EQ(linesOf(*module)[2], u"    t = 1"_qs);
-  ASSERT_EQ(run.failures.lines.size(), 1u);
-  EXPECT_EQ(run.failures.lines[0].operation, u"IndentLine"_qs);
 }
 
 TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
@@ -457,13 +428,8 @@ TEST(Walks, ACancelEndsTheWalkAtTheNextYieldAndHidesTheBar) {
 
 TEST(Walks, RelatedDocumentsAreSkippedAndCountNothing) {
   QTemporaryDir dir;
-  host::test::writeBytes(dir.filePath(u"Mod1.bas"_qs),
-                         "Attribute VB_Name = \"Mod1\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n");
-  host::test::writeBytes(dir.filePath(u"Leia-me.txt"_qs), "texto\r\n");
-  host::test::writeBytes(dir.filePath(u"P.vbp"_qs),
-                         "Type=Exe\r\nModule=Mod1; Mod1.bas\r\nRelatedDoc=Leia-me.txt\r\nName=\"P\"\r\n");
   auto vbe = host::VbeImpl::create();
-  auto project = vbe->open(dir.filePath(u"P.vbp"_qs)).front();
+  auto project = test::openWithRelatedDocument(*vbe, dir.path());
   ASSERT_EQ(project->Count(), 2);
   auto document = project->components()[1];
   ASSERT_EQ(document->Type(), ide::ComponentType::RelatedDocument);
@@ -475,6 +441,36 @@ TEST(Walks, RelatedDocumentsAreSkippedAndCountNothing) {
   NumberingWalk(run.context, 10, 10).NumberProject(project, true);
   EXPECT_EQ(project->components()[0]->CodeModule()->Lines(2, 1), u"10 x = 1"_qs);
   EXPECT_TRUE(run.failures.walks.empty());
+}
+
+// A line the walk would take past the IDE's limit is passed over with a line failure; the walk goes on.
+TEST(Walks, ALineThatWouldGrowTooLongIsPassedOverAndTheWalkGoesOn) {
+  const QString longLine = u"s = \"%1\""_qs.arg(QString(1015, u'a'));
+  ASSERT_EQ(longLine.size(), 1021);
+  const struct {
+    const char* operation;
+    std::function<void(WalkContext&, const ide::Ref<ide::CodeModule>&)> walk;
+    const char* next;
+  } cases[] = {
+      {"NumberLine", [](WalkContext& c, auto& m) { NumberingWalk(c, 10, 10).NumberModule(m, true); },
+       "20 t = 1"},
+      {"IndentLine",
+       [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Spaces, 4).IndentModule(m); },
+       "    t = 1"},
+  };
+  for (const auto& c : cases) {
+    Ide ide;
+    auto module = ide.addModule({u"Sub Longo()"_qs, longLine, u"t = 1"_qs, u"End Sub"_qs});
+    Walk run;
+    c.walk(run.context, module);
+    EXPECT_EQ(linesOf(*module)[1], longLine) << c.operation;
+    EXPECT_EQ(linesOf(*module)[2], QLatin1StringView(c.next)) << c.operation;
+    ASSERT_EQ(run.failures.lines.size(), 1u) << c.operation;
+    EXPECT_EQ(run.failures.lines[0].operation, QLatin1StringView(c.operation));
+    EXPECT_EQ(run.failures.lines[0].line, 2) << c.operation;
+    EXPECT_EQ(run.failures.lines[0].error.number(), ide::err::LineTooLong) << c.operation;
+    EXPECT_TRUE(run.failures.walks.empty()) << c.operation;
+  }
 }
 
 // ---------------------------------------------------------------------------------------------------
