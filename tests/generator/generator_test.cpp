@@ -81,12 +81,7 @@ class GeneratorTest : public ::testing::Test {
 };
 
 gen::GeneratorOptions options(qint64 lines, int components, int projects = 1, quint32 seed = 1) {
-  gen::GeneratorOptions result;
-  result.codeLines = lines;
-  result.components = components;
-  result.projects = projects;
-  result.seed = seed;
-  return result;
+  return {.codeLines = lines, .components = components, .projects = projects, .seed = seed};
 }
 
 TEST_F(GeneratorTest, TheSeedAloneDecidesTheBytes) {

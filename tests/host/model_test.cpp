@@ -92,12 +92,8 @@ TEST(RoundTrip, AnEditChangesOnlyTheEditedLines) {
 
 TEST(RoundTrip, GeneratedProjectsSurviveLoadAndSave) {
   QTemporaryDir dir;
-  gen::GeneratorOptions options;
-  options.codeLines = 60'000;
-  options.components = 40;
-  options.projects = 2;
-  options.seed = 7;
-  const auto generated = gen::generateProjects(dir.path(), options);
+  const auto generated =
+      gen::generateProjects(dir.path(), {.codeLines = 60'000, .components = 40, .projects = 2, .seed = 7});
   QMap<QString, QByteArray> before;
   QDirIterator it(dir.path(), QDir::Files, QDirIterator::Subdirectories);
   while (it.hasNext()) {

@@ -588,12 +588,9 @@ TEST(WholeProjects, TheExampleGroupRoundTrips) {
 TEST(WholeProjects, GeneratedProjectsRoundTrip) {
   for (const quint32 seed : {3u, 11u}) {
     QTemporaryDir dir;
-    gen::GeneratorOptions options;
-    options.codeLines = 12'000;
-    options.components = 12;
-    options.projects = 2;
-    options.seed = seed;
-    checkRoundTrips(gen::generateProjects(dir.path(), options).groupFile);
+    checkRoundTrips(gen::generateProjects(
+                        dir.path(), {.codeLines = 12'000, .components = 12, .projects = 2, .seed = seed})
+                        .groupFile);
   }
 }
 
