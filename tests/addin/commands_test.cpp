@@ -28,6 +28,18 @@ const std::map<CommandId, QString>& featureOfCommand() {
   return map;
 }
 
+/// The linked add-in, connected, in an environment of its own.
+class ConnectedAddIn : public ::testing::Test {
+ protected:
+  ConnectedAddIn() { addIn.connect(); }
+  AddInEnvironment environment;
+  LinkedAddIn addIn;
+};
+class CommandState : public ConnectedAddIn {};
+class Commands : public ConnectedAddIn {};
+class Connection : public ConnectedAddIn {};
+class IdeEvents : public ConnectedAddIn {};
+
 /// Clicks the toolbar buttons of those commands and returns what reached the feature areas.
 QStringList clickAll(LinkedAddIn& addIn) {
   addIn.takeFeatureLog();
@@ -43,10 +55,7 @@ bool contextItemsEnabled(ide::VBE& vbe) {
   return enabled;
 }
 
-TEST(CommandState, WithNoProjectOnlyBackForwardOptionsAndHelpCanRun) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(CommandState, WithNoProjectOnlyBackForwardOptionsAndHelpCanRun) {
   addIn.loop().advance(100);
   EXPECT_EQ(clickAll(addIn), QStringList{u"options"_qs});
   EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
@@ -61,10 +70,7 @@ TEST(CommandState, WithNoProjectOnlyBackForwardOptionsAndHelpCanRun) {
   EXPECT_TRUE(addIn.ui().messageBoxes().empty());
 }
 
-TEST(CommandState, AfterTheFirstProjectTheProjectCommandsWorkAtOnceAndNewProcedureWithACodeWindow) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(CommandState, AfterTheFirstProjectTheProjectCommandsWorkAtOnceAndNewProcedureWithACodeWindow) {
   addIn.loop().advance(100);
   auto project = addIn.vbe->newProject();
   auto module = addModule(project, u"modUm"_qs, 2, 10);
@@ -103,10 +109,7 @@ TEST(CommandState, AfterTheFirstProjectTheProjectCommandsWorkAtOnceAndNewProcedu
   EXPECT_EQ(addIn.globals().LastWindowType(), -1);
 }
 
-TEST(Globals, TheStartUpReadsTheNamesAndTheIdleMessage) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(Connection, TheStartUpReadsTheNamesAndTheIdleMessage) {
   Globals& globals = addIn.globals();
   EXPECT_EQ(globals.ComputerName(), addIn.vbe->Platform().computerName().left(255));
   EXPECT_EQ(globals.UserName(), addIn.vbe->Platform().userName().left(255));
@@ -118,10 +121,7 @@ TEST(Globals, TheStartUpReadsTheNamesAndTheIdleMessage) {
   EXPECT_EQ(addIn.ui().messageBoxes().size(), 0u);
 }
 
-TEST(CommandState, AMenuItemDoesWhatItsToolBarButtonDoes) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(CommandState, AMenuItemDoesWhatItsToolBarButtonDoes) {
   auto project = addIn.vbe->newProject();
   showAt(addModule(project, u"modUm"_qs, 1, 10), 1);
   addIn.loop().advance(100);
@@ -132,10 +132,7 @@ TEST(CommandState, AMenuItemDoesWhatItsToolBarButtonDoes) {
   }
 }
 
-TEST(CommandState, ClickingLeavesTheIdesClickFlagsAsTheyAre) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(CommandState, ClickingLeavesTheIdesClickFlagsAsTheyAre) {
   auto button = addIn.vbe->CommandBars()->Item(u"Quimbel 2.2"_qs)->Controls()->Item(12);
   bool handled = false;
   bool cancel = false;
@@ -146,10 +143,7 @@ TEST(CommandState, ClickingLeavesTheIdesClickFlagsAsTheyAre) {
   EXPECT_FALSE(cancel);
 }
 
-TEST(Commands, CloseWindowsClosesCodeAndDesignerWindowsAndLeavesToolWindows) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(Commands, CloseWindowsClosesCodeAndDesignerWindowsAndLeavesToolWindows) {
   auto project = addIn.vbe->newProject();
   showAt(addModule(project, u"modUm"_qs, 1, 10), 1);
   showAt(addModule(project, u"modDois"_qs, 1, 10), 1);
@@ -174,7 +168,7 @@ TEST(Commands, CloseWindowsClosesCodeAndDesignerWindowsAndLeavesToolWindows) {
   EXPECT_EQ(countOf(ide::WindowType::PropertyWindow), 1);
 }
 
-TEST(Commands, HelpOpensTheContentsPageOrSaysItCannot) {
+TEST(Help, TheMenuItemOpensTheContentsPageOrSaysItCannot) {
   AddInEnvironment environment;
   environment.writeMachineConfig(u"InstallationPath = "_qs + environment.installDir() + u'\n');
   LinkedAddIn addIn;
@@ -193,10 +187,7 @@ TEST(Commands, HelpOpensTheContentsPageOrSaysItCannot) {
   EXPECT_EQ(addIn.ui().openedDocuments().size(), 1u);
 }
 
-TEST(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
   auto project = addIn.vbe->newProject();
   auto module = addModule(project, u"modUm"_qs, 2, 10);
   module->CodeModule()->AddFromString(
@@ -219,10 +210,7 @@ TEST(Commands, AddToFavoritesHandsTheProcedureAtTheCaretToTheFavorites) {
   EXPECT_EQ(addIn.takeFeatureLog(), QStringList{u"favorite modUm.Proc2 kind 0 line 15"_qs});
 }
 
-TEST(Commands, FailuresTheHandlersEndOnSilentlyAreLoggedOnceWithTheirPlace) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(Commands, FailuresTheHandlersEndOnSilentlyAreLoggedOnceWithTheirPlace) {
   auto project = addIn.vbe->newProject();
   addIn.loop().DoEvents();
   common::lastError() = {};
@@ -253,10 +241,7 @@ TEST(Commands, FailuresTheHandlersEndOnSilentlyAreLoggedOnceWithTheirPlace) {
 // ---------------------------------------------------------------------------------------------------
 // IDE events
 
-TEST(IdeEvents, WhileTheProgramRunsComponentsAndControlsAreLeftAloneExceptForRenames) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(IdeEvents, WhileTheProgramRunsComponentsAndControlsAreLeftAloneExceptForRenames) {
   auto project = addIn.vbe->newProject();
   addIn.loop().DoEvents();
   auto form = std::dynamic_pointer_cast<host::ComponentImpl>(
@@ -281,10 +266,7 @@ TEST(IdeEvents, WhileTheProgramRunsComponentsAndControlsAreLeftAloneExceptForRen
                                                  u"component removed Module1"_qs}));
 }
 
-TEST(IdeEvents, ProjectsAreAnnouncedAndTheComponentEventsFollowTheActiveProject) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(IdeEvents, ProjectsAreAnnouncedAndTheComponentEventsFollowTheActiveProject) {
   auto& windows = addIn.vbe->windowSystem();
   const ide::HWnd main = addIn.vbe->MainWindow()->hWnd();
   const ide::WndProcRef ownProc = windows.GetWindowProc(main);
@@ -319,10 +301,7 @@ TEST(IdeEvents, ProjectsAreAnnouncedAndTheComponentEventsFollowTheActiveProject)
   EXPECT_FALSE(contextItemsEnabled(*addIn.vbe));
 }
 
-TEST(IdeEvents, AFailingProjectHandlerShowsTheUndeterminedErrorMessage) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(IdeEvents, AFailingProjectHandlerShowsTheUndeterminedErrorMessage) {
   auto project = addIn.vbe->newProject();
   addIn.loop().DoEvents();
   // The removal handler reads the IDE's mode; without "Continue" on the "Standard" bar that fails.
@@ -336,10 +315,7 @@ TEST(IdeEvents, AFailingProjectHandlerShowsTheUndeterminedErrorMessage) {
   EXPECT_EQ(addIn.ui().messageBoxes().front().title, u"Quimbel"_qs);
 }
 
-TEST(IdeEvents, AProjectFileMovingToAnotherDirectoryIsAnnounced) {
-  AddInEnvironment environment;
-  LinkedAddIn addIn;
-  addIn.connect();
+TEST_F(IdeEvents, AProjectFileMovingToAnotherDirectoryIsAnnounced) {
   auto project = addIn.vbe->newProject();
   addIn.loop().DoEvents();
   addIn.takeFeatureLog();
