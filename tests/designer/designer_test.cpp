@@ -40,7 +40,7 @@ struct Scene {
   std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
   std::shared_ptr<host::ProjectImpl> project = vbe->newProject();
   ide::Ref<ide::VBComponent> form = project->Add(ide::ComponentType::VBForm);
-  common::Options options{.ColorOnFocus = QStringLiteral("&HFFFF&")};
+  common::Options options{.ColorOnFocus = u"&HFFFF&"_qs};
   PropsChoice choice{.Cancelled = false};
   QStringList shownFor;
   std::shared_ptr<host::VbeImpl> other;
@@ -57,9 +57,9 @@ struct Scene {
   QStringList code() { return linesOf(*form->CodeModule()); }
   /// Saves the project and opens it again in another IDE: the form as the IDE reads it back.
   ide::Ref<ide::VBComponent> reloaded() {
-    project->SaveAs(dir.filePath(QStringLiteral("Projeto.vbp")));
+    project->SaveAs(dir.filePath(u"Projeto.vbp"_qs));
     other = host::VbeImpl::create();
-    return other->open(dir.filePath(QStringLiteral("Projeto.vbp"))).front()->Item(form->Name());
+    return other->open(dir.filePath(u"Projeto.vbp"_qs)).front()->Item(form->Name());
   }
 };
 
@@ -75,8 +75,8 @@ TEST(Values, TypedTextReadsAsVbReadsIt) {
   for (const char* text : {"FFFF", "abc", "&HFFFF&&", "&HG1", "1.2.3"})
     EXPECT_FALSE(isColourText(QString::fromLatin1(text))) << text;
   EXPECT_EQ(vbNumber(u"&HFFFF"), -1.0) << "four hexadecimal digits are an Integer";
-  EXPECT_EQ(colourLiteral(QColor(255, 255, 0)), QStringLiteral("&HFFFF&"));
-  EXPECT_EQ(colourLiteral(Qt::black), QStringLiteral("&H0&"));
+  EXPECT_EQ(colourLiteral(QColor(255, 255, 0)), u"&HFFFF&"_qs);
+  EXPECT_EQ(colourLiteral(Qt::black), u"&H0&"_qs);
 
   struct Case {
     const char* text;
@@ -91,7 +91,7 @@ TEST(Values, TypedTextReadsAsVbReadsIt) {
       {"true", QVariant(false), QVariant(true)},
       {"0", QVariant(true), QVariant(false)},
       {"1.25", QVariant::fromValue(1.0f), QVariant::fromValue(1.25f)},
-      {"abc", QVariant(QStringLiteral("x")), QVariant(QStringLiteral("abc"))},
+      {"abc", QVariant(u"x"_qs), QVariant(u"abc"_qs)},
       {"abc", QVariant::fromValue<qint32>(0), {}, kTypeMismatch},
       {"70000", QVariant::fromValue<qint16>(0), {}, kOverflow},
       {"Talvez", QVariant(false), {}, kTypeMismatch},
@@ -124,8 +124,8 @@ TEST(RenameInCode, OnlyTheControlsOwnReferencesOutsideStringsChange) {
 
 TEST(ControlAdded, ANewTextBoxWithTheDefaultOptionsIsEmptiedAndGetsItsProcedures) {
   Scene scene;
-  auto text = scene.add(QStringLiteral("TextBox"));
-  EXPECT_EQ(scene.shownFor, QStringList{QStringLiteral("Text1")});
+  auto text = scene.add(u"TextBox"_qs);
+  EXPECT_EQ(scene.shownFor, QStringList{u"Text1"_qs});
   EXPECT_EQ(propertyOf(text, "Text"), QString());
   const QStringList written = {u"Private Sub Text1_GotFocus()"_qs,
                                u"   On Error Resume Next"_qs,
@@ -139,8 +139,8 @@ TEST(ControlAdded, ANewTextBoxWithTheDefaultOptionsIsEmptiedAndGetsItsProcedures
 
   // A label turns transparent and gets no code; a button gets none either.
   const QStringList before = scene.code();
-  auto label = scene.add(QStringLiteral("Label"));
-  scene.add(QStringLiteral("CommandButton"));
+  auto label = scene.add(u"Label"_qs);
+  scene.add(u"CommandButton"_qs);
   EXPECT_EQ(propertyOf(label, "BackStyle"), 0);
   EXPECT_EQ(scene.code(), before);
 

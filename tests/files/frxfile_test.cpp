@@ -60,13 +60,13 @@ TEST(FrxRecords, TextsListsAndPicturesReadBackFromTheirBytes) {
   bytes += le(icon.size() + 8, 4) + QByteArray("lt\0\0", 4) + le(icon.size(), 4) + icon;  // 0x3E
   const FrxFile file(bytes);
 
-  EXPECT_EQ(file.text({{}, 0x00, true}), QStringLiteral("Observações:\r\n1ª linha"));
-  EXPECT_EQ(file.text({{}, 0x1A, false}), QStringLiteral("Fotos"));
-  EXPECT_EQ(file.text({{}, 0x20, false}), QStringLiteral("Ok!"));
-  EXPECT_EQ(file.list(0x26), (QStringList{QStringLiteral("Casa"), QString()}));
+  EXPECT_EQ(file.text({{}, 0x00, true}), u"Observações:\r\n1ª linha"_qs);
+  EXPECT_EQ(file.text({{}, 0x1A, false}), u"Fotos"_qs);
+  EXPECT_EQ(file.text({{}, 0x20, false}), u"Ok!"_qs);
+  EXPECT_EQ(file.list(0x26), (QStringList{u"Casa"_qs, QString()}));
   EXPECT_EQ(file.itemData(0x32), (QList<qint32>{7, -1}));
   EXPECT_EQ(file.picture(0x3E), icon);
-  EXPECT_EQ(pictureKind(icon), QStringLiteral("Icon"));
+  EXPECT_EQ(pictureKind(icon), u"Icon"_qs);
   EXPECT_EQ(file.recordLength({{}, 0x26, false}, FrxRecordKind::List), 12);
   EXPECT_EQ(file.recordLength({{}, 0x3E, false}, FrxRecordKind::Picture), 12 + icon.size());
 
@@ -75,7 +75,7 @@ TEST(FrxRecords, TextsListsAndPicturesReadBackFromTheirBytes) {
   EXPECT_FALSE(file.picture(0x00));
   EXPECT_FALSE(file.list(bytes.size() + 4));
   EXPECT_FALSE(FrxFile(le(9, 4) + "abc").text({{}, 0, true}));
-  EXPECT_EQ(FrxFile(le(4, 1) + "abc").text({{}, 0, false}), QStringLiteral("abc"));
+  EXPECT_EQ(FrxFile(le(4, 1) + "abc").text({{}, 0, false}), u"abc"_qs);
   EXPECT_FALSE(FrxFile(le(3, 2) + le(3, 2) + le(5, 2) + "ab").list(0));
 }
 
@@ -96,9 +96,9 @@ TEST(FrxRecords, PicturesAreNamedByTheirFormat) {
 TEST(FrxRecords, EncodedAsTheIdeWritesThem) {
   EXPECT_EQ(encodeFrxText(u"Olá\r\nmundo"), le(10, 4) + windowsFile("Olá\nmundo"));
   EXPECT_FALSE(encodeFrxText(u"\u4E2D"));
-  EXPECT_EQ(encodeFrxList({QStringLiteral("A"), QStringLiteral("Bé")}),
+  EXPECT_EQ(encodeFrxList({u"A"_qs, u"Bé"_qs}),
             le(2, 2) + le(2, 2) + le(1, 2) + "A" + le(2, 2) + windowsFile("Bé"));
-  EXPECT_EQ(encodeFrxList({QStringLiteral("A")}, 7), le(1, 2) + le(7, 2) + le(1, 2) + "A");
+  EXPECT_EQ(encodeFrxList({u"A"_qs}, 7), le(1, 2) + le(7, 2) + le(1, 2) + "A");
   EXPECT_EQ(encodeFrxPicture("GIF"), le(11, 4) + QByteArray("lt\0\0", 4) + le(3, 4) + "GIF");
 }
 
@@ -123,37 +123,35 @@ TEST(FrxRebuild, ARecordChangesAndTheOthersKeepTheirBytesInDescriptionOrder) {
   const QByteArray text = le(3, 4) + "abc";
   const QByteArray list = le(1, 2) + le(9, 2) + le(1, 2) + "Z";
   const FrxFile old(icon + text + list);
-  const std::vector<SourceLine> lines = readSourceLines(windowsFile(kForm), QStringLiteral("frmFotos.frm"));
+  const std::vector<SourceLine> lines = readSourceLines(windowsFile(kForm), u"frmFotos.frm"_qs);
   std::size_t position = 0;
-  FormDescription form = FormDescription::parse(lines, position, QStringLiteral("frmFotos.frm"));
+  FormDescription form = FormDescription::parse(lines, position, u"frmFotos.frm"_qs);
   FormNode& label = *form.root().findNode(u"lblTitulo");
 
   const auto ends = frxRecordEnds(form.root(), old);
-  label.setProperty(QStringLiteral("Caption"), formatFrxReference({QStringLiteral("frmFotos.frx"), 0, true}));
+  label.setProperty(u"Caption"_qs, formatFrxReference({u"frmFotos.frx"_qs, 0, true}));
   const QByteArray caption = *encodeFrxText(u"Título\r\nnovo");
-  const QByteArray rebuilt = rebuildFrx(form.root(), old, ends, QStringLiteral("frmFotos.frx"), &label,
-                                        u"Caption", caption, QStringLiteral("frmFotos.frx"));
+  const QByteArray rebuilt =
+      rebuildFrx(form.root(), old, ends, u"frmFotos.frx"_qs, &label, u"Caption", caption, u"frmFotos.frx"_qs);
 
   EXPECT_EQ(rebuilt, icon + caption + text + list);
-  EXPECT_EQ(form.root().property(u"Icon"), QStringLiteral("\"frmFotos.frx\":0000"));
-  EXPECT_EQ(label.property(u"Caption"), QStringLiteral("$\"frmFotos.frx\":0012"));
+  EXPECT_EQ(form.root().property(u"Icon"), u"\"frmFotos.frx\":0000"_qs);
+  EXPECT_EQ(label.property(u"Caption"), u"$\"frmFotos.frx\":0012"_qs);
   const auto moved = [&](qsizetype offset, bool longText) {
-    return formatFrxReference({QStringLiteral("frmFotos.frx"), static_cast<quint32>(offset), longText});
+    return formatFrxReference({u"frmFotos.frx"_qs, static_cast<quint32>(offset), longText});
   };
   EXPECT_EQ(form.root().findNode(u"txtNotas")->property(u"Text"), moved(0x12 + caption.size(), true));
   EXPECT_EQ(form.root().findNode(u"cboTipo")->property(u"List"),
             moved(0x12 + caption.size() + text.size(), false));
-  EXPECT_EQ(FrxFile(rebuilt).list(0x12 + caption.size() + text.size()), QStringList{QStringLiteral("Z")});
+  EXPECT_EQ(FrxFile(rebuilt).list(0x12 + caption.size() + text.size()), QStringList{u"Z"_qs});
 
   // A record the file does not hold cannot be carried over.
   const FrxFile cut(icon);
   const auto cutEnds = frxRecordEnds(form.root(), cut);
   const ide::Error error = testing::expectError([&] {
-    rebuildFrx(form.root(), cut, cutEnds, QStringLiteral("frmFotos.frx"), nullptr, {}, {},
-               QStringLiteral("/p/frmFotos.frx"));
+    rebuildFrx(form.root(), cut, cutEnds, u"frmFotos.frx"_qs, nullptr, {}, {}, u"/p/frmFotos.frx"_qs);
   });
-  EXPECT_TRUE(
-      error.description().startsWith(QStringLiteral("/p/frmFotos.frx: the value of lblTitulo.Caption")))
+  EXPECT_TRUE(error.description().startsWith(u"/p/frmFotos.frx: the value of lblTitulo.Caption"_qs))
       << error.description().toStdString();
 }
 

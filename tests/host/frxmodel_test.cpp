@@ -33,7 +33,7 @@ QByteArray ansi(const QString& text) {
 
 const QByteArray kIcon = QByteArray("\0\0\1\0\1\0\x10\x10", 8) + QByteArray(24, '\x11');
 const QByteArray kPhoto = QByteArray("BM") + QByteArray(30, '\x22');
-const QString kNotes = QStringLiteral("Fotos da loja\r\nTiradas em março");
+const QString kNotes = u"Fotos da loja\r\nTiradas em março"_qs;
 
 /// Fotos.vbp with frmFotos: an icon, a multi-line text, a caption in the short form, a list with its item
 /// data and a picture, in the order the description refers to them. A second form refers to a binary file
@@ -42,19 +42,17 @@ class BinaryValues : public ::testing::Test {
  protected:
   void SetUp() override {
     QByteArray frx;
-    const auto offset = [&] {
-      return QStringLiteral("%1").arg(frx.size(), 4, 16, QLatin1Char('0')).toUpper();
-    };
+    const auto offset = [&] { return u"%1"_qs.arg(frx.size(), 4, 16, QLatin1Char('0')).toUpper(); };
     const QString icon = offset();
     frx += le(kIcon.size() + 8, 4) + QByteArray("lt\0\0", 4) + le(kIcon.size(), 4) + kIcon;
     const QString notes = offset();
     frx += le(ansi(kNotes).size(), 4) + ansi(kNotes);
     const QString caption = offset();
-    frx += le(6, 1) + ansi(QStringLiteral("Preço:"));
+    frx += le(6, 1) + ansi(u"Preço:"_qs);
     const QString itemData = offset();
     frx += le(2, 2) + le(2, 2) + le(10, 4) + le(20, 4);
     const QString list = offset();
-    frx += le(2, 2) + le(2, 2) + le(4, 2) + "Casa" + le(6, 2) + ansi(QStringLiteral("Jardim"));
+    frx += le(2, 2) + le(2, 2) + le(4, 2) + "Casa" + le(6, 2) + ansi(u"Jardim"_qs);
     const QString photo = offset();
     frx += le(kPhoto.size() + 8, 4) + QByteArray("lt\0\0", 4) + le(kPhoto.size(), 4) + kPhoto;
     m_frx = frx;
@@ -85,7 +83,7 @@ class BinaryValues : public ::testing::Test {
                              "End\n"
                              "Attribute VB_Name = \"frmFotos\"\n")
                              .arg(icon, notes, caption, itemData, list, photo)
-                             .replace(u'\n', QStringLiteral("\r\n"));
+                             .replace(u'\n', u"\r\n"_qs);
     writeBytes(path("frmFotos.frm"), ansi(form));
     writeBytes(path("frmFotos.frx"), m_frx);
     writeBytes(path("frmSem.frm"),
@@ -99,7 +97,7 @@ class BinaryValues : public ::testing::Test {
   void open() {
     m_vbe = VbeImpl::create();
     m_vbe->open(path("Fotos.vbp"));
-    m_form = m_vbe->projects().front()->component(QStringLiteral("frmFotos"));
+    m_form = m_vbe->projects().front()->component(u"frmFotos"_qs);
     ASSERT_TRUE(m_form);
   }
   QString path(const char* name) const { return m_dir.filePath(QString::fromLatin1(name)); }
@@ -116,22 +114,21 @@ class BinaryValues : public ::testing::Test {
 };
 
 TEST_F(BinaryValues, ReadAsTextsListsAndPicturesThroughProperties) {
-  EXPECT_EQ(m_form->Properties()->Item(QStringLiteral("Icon"))->Value(), QVariant(kIcon));
-  auto notes = m_form->Designer()->VBControls()->Item(QStringLiteral("txtNotas"));
-  EXPECT_EQ(notes->Properties()->Item(QStringLiteral("Text"))->Value(), QVariant(kNotes));
-  EXPECT_EQ(value(QStringLiteral("lblPreco"), "Caption"), QVariant(QStringLiteral("Preço:")));
-  EXPECT_EQ(value(QStringLiteral("cboTipo"), "List"), QVariant(QStringList{"Casa", "Jardim"}));
-  EXPECT_EQ(value(QStringLiteral("cboTipo"), "ItemData"), QVariant(QVariantList{10, 20}));
-  EXPECT_EQ(value(QStringLiteral("imgFoto"), "Picture"), QVariant(kPhoto));
+  EXPECT_EQ(m_form->Properties()->Item(u"Icon"_qs)->Value(), QVariant(kIcon));
+  auto notes = m_form->Designer()->VBControls()->Item(u"txtNotas"_qs);
+  EXPECT_EQ(notes->Properties()->Item(u"Text"_qs)->Value(), QVariant(kNotes));
+  EXPECT_EQ(value(u"lblPreco"_qs, "Caption"), QVariant(u"Preço:"_qs));
+  EXPECT_EQ(value(u"cboTipo"_qs, "List"), QVariant(QStringList{"Casa", "Jardim"}));
+  EXPECT_EQ(value(u"cboTipo"_qs, "ItemData"), QVariant(QVariantList{10, 20}));
+  EXPECT_EQ(value(u"imgFoto"_qs, "Picture"), QVariant(kPhoto));
   // Without its binary file a form still opens; its values read as their references.
-  auto without = m_vbe->projects().front()->component(QStringLiteral("frmSem"));
-  EXPECT_EQ(without->Properties()->Item(QStringLiteral("Icon"))->Value(),
-            QVariant(QStringLiteral("\"frmSem.frx\":0000")));
+  auto without = m_vbe->projects().front()->component(u"frmSem"_qs);
+  EXPECT_EQ(without->Properties()->Item(u"Icon"_qs)->Value(), QVariant(u"\"frmSem.frx\":0000"_qs));
 
   // Saved unchanged, and saved with a change outside the binary file: the .frx keeps every byte.
   m_form->save(true);
   EXPECT_EQ(readBytes(path("frmFotos.frm")), m_frm);
-  m_form->form()->findControl(QStringLiteral("txtNotas"))->setProperty(QStringLiteral("Left"), 240);
+  m_form->form()->findControl(u"txtNotas"_qs)->setProperty(u"Left"_qs, 240);
   m_vbe->saveAll();
   EXPECT_EQ(readBytes(path("frmFotos.frx")), m_frx);
   EXPECT_EQ(readBytes(path("frmFotos.frm")),
@@ -139,9 +136,9 @@ TEST_F(BinaryValues, ReadAsTextsListsAndPicturesThroughProperties) {
 }
 
 TEST_F(BinaryValues, AChangedValueIsWrittenAsTheIdeWritesItAndReadsBackTheSame) {
-  auto notes = m_form->form()->findControl(QStringLiteral("txtNotas"));
-  const QString changed = QStringLiteral("Fotos novas\r\nda loja");
-  notes->setProperty(QStringLiteral("Text"), changed);
+  auto notes = m_form->form()->findControl(u"txtNotas"_qs);
+  const QString changed = u"Fotos novas\r\nda loja"_qs;
+  notes->setProperty(u"Text"_qs, changed);
   m_vbe->saveAll();
 
   // The new record replaces the old at its place; the records after it move by the difference.
@@ -150,8 +147,8 @@ TEST_F(BinaryValues, AChangedValueIsWrittenAsTheIdeWritesItAndReadsBackTheSame) 
   const qsizetype oldLength = 4 + ansi(kNotes).size();
   EXPECT_EQ(readBytes(path("frmFotos.frx")), m_frx.left(oldStart) + record + m_frx.mid(oldStart + oldLength));
   // In the .frm only the offsets after the changed record differ.
-  const QStringList before = decodeAnsi(m_frm).split(QStringLiteral("\r\n"));
-  const QStringList after = decodeAnsi(readBytes(path("frmFotos.frm"))).split(QStringLiteral("\r\n"));
+  const QStringList before = decodeAnsi(m_frm).split(u"\r\n"_qs);
+  const QStringList after = decodeAnsi(readBytes(path("frmFotos.frm"))).split(u"\r\n"_qs);
   ASSERT_EQ(before.size(), after.size());
   const int shift = static_cast<int>(record.size() - oldLength);
   for (int i = 0; i < before.size(); ++i) {
@@ -164,21 +161,19 @@ TEST_F(BinaryValues, AChangedValueIsWrittenAsTheIdeWritesItAndReadsBackTheSame) 
   }
 
   // A list, a picture taken away and a text back on its line; read again from the saved files.
-  auto combo = m_form->form()->findControl(QStringLiteral("cboTipo"));
-  combo->setProperty(QStringLiteral("List"), QStringList{"Sala", "Cozinha", "Quarto"});
-  m_form->form()
-      ->findControl(QStringLiteral("imgFoto"))
-      ->setProperty(QStringLiteral("Picture"), QByteArray());
-  m_form->form()->findControl(QStringLiteral("lblPreco"))->setProperty(QStringLiteral("Caption"), "Valor:");
+  auto combo = m_form->form()->findControl(u"cboTipo"_qs);
+  combo->setProperty(u"List"_qs, QStringList{"Sala", "Cozinha", "Quarto"});
+  m_form->form()->findControl(u"imgFoto"_qs)->setProperty(u"Picture"_qs, QByteArray());
+  m_form->form()->findControl(u"lblPreco"_qs)->setProperty(u"Caption"_qs, "Valor:");
   m_vbe->saveAll();
   open();
-  EXPECT_EQ(value(QStringLiteral("txtNotas"), "Text"), QVariant(changed));
-  EXPECT_EQ(value(QStringLiteral("cboTipo"), "List"), QVariant(QStringList{"Sala", "Cozinha", "Quarto"}));
-  EXPECT_EQ(value(QStringLiteral("cboTipo"), "ItemData"), QVariant(QVariantList{10, 20}));
-  EXPECT_FALSE(value(QStringLiteral("imgFoto"), "Picture").isValid());
-  EXPECT_EQ(value(QStringLiteral("lblPreco"), "Caption"), QVariant(QStringLiteral("Valor:")));
-  EXPECT_EQ(m_form->Properties()->Item(QStringLiteral("Icon"))->Value(), QVariant(kIcon));
-  EXPECT_TRUE(decodeAnsi(readBytes(path("frmFotos.frm"))).contains(QStringLiteral("\"Valor:\"")));
+  EXPECT_EQ(value(u"txtNotas"_qs, "Text"), QVariant(changed));
+  EXPECT_EQ(value(u"cboTipo"_qs, "List"), QVariant(QStringList{"Sala", "Cozinha", "Quarto"}));
+  EXPECT_EQ(value(u"cboTipo"_qs, "ItemData"), QVariant(QVariantList{10, 20}));
+  EXPECT_FALSE(value(u"imgFoto"_qs, "Picture").isValid());
+  EXPECT_EQ(value(u"lblPreco"_qs, "Caption"), QVariant(u"Valor:"_qs));
+  EXPECT_EQ(m_form->Properties()->Item(u"Icon"_qs)->Value(), QVariant(kIcon));
+  EXPECT_TRUE(decodeAnsi(readBytes(path("frmFotos.frm"))).contains(u"\"Valor:\""_qs));
 }
 
 TEST_F(BinaryValues, SavedUnderANewNameTheFormTakesItsBinaryFileAlong) {
@@ -187,18 +182,16 @@ TEST_F(BinaryValues, SavedUnderANewNameTheFormTakesItsBinaryFileAlong) {
   m_form->SaveAs(path("frmFotos2.frm"));
   EXPECT_EQ(readBytes(path("frmFotos2.frx")), m_frx);
   const QString saved = decodeAnsi(readBytes(path("frmFotos2.frm")));
-  EXPECT_FALSE(saved.contains(QStringLiteral("\"frmFotos.frx\""), Qt::CaseInsensitive));
-  EXPECT_EQ(saved.count(QStringLiteral("\"frmFotos2.frx\":")), 6);
+  EXPECT_FALSE(saved.contains(u"\"frmFotos.frx\""_qs, Qt::CaseInsensitive));
+  EXPECT_EQ(saved.count(u"\"frmFotos2.frx\":"_qs), 6);
   EXPECT_EQ(m_form->FileCount(), 2);
-  m_form->form()
-      ->findControl(QStringLiteral("cboTipo"))
-      ->setProperty(QStringLiteral("List"), QStringList{"Sala"});
+  m_form->form()->findControl(u"cboTipo"_qs)->setProperty(u"List"_qs, QStringList{"Sala"});
   m_vbe->saveAll();
   EXPECT_EQ(readBytes(path("frmFotos.frx")), m_frx);
   EXPECT_EQ(readBytes(path("frmFotos.frm")), m_frm);
   open();  // the project now lists frmFotos2.frm
-  EXPECT_EQ(value(QStringLiteral("cboTipo"), "List"), QVariant(QStringList{"Sala"}));
-  EXPECT_EQ(m_form->Properties()->Item(QStringLiteral("Icon"))->Value(), QVariant(kIcon));
+  EXPECT_EQ(value(u"cboTipo"_qs, "List"), QVariant(QStringList{"Sala"}));
+  EXPECT_EQ(m_form->Properties()->Item(u"Icon"_qs)->Value(), QVariant(kIcon));
 }
 
 // The example's About form: its real icon and logo survive a changed list, and a changed caption touches
@@ -208,51 +201,45 @@ TEST(ExampleBinaryValues, OneChangedPropertyKeepsEveryOtherByte) {
   const auto before = copy.snapshot();
   auto vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto sobre = vbe->project(QStringLiteral("Loja"))->component(QStringLiteral("frmSobre"));
+  auto sobre = vbe->project(u"Loja"_qs)->component(u"frmSobre"_qs);
   ASSERT_TRUE(sobre);
-  EXPECT_EQ(pictureKind(sobre->Properties()->Item(QStringLiteral("Icon"))->Value().toByteArray()),
-            QStringLiteral("Icon"));
+  EXPECT_EQ(pictureKind(sobre->Properties()->Item(u"Icon"_qs)->Value().toByteArray()), u"Icon"_qs);
   auto form = sobre->form();
-  form->findControl(QStringLiteral("lblVersao"))->setProperty(QStringLiteral("Caption"), "Versão 2.0");
+  form->findControl(u"lblVersao"_qs)->setProperty(u"Caption"_qs, "Versão 2.0");
   vbe->saveAll();
   auto after = copy.snapshot();
-  const QString frm = QStringLiteral("Loja/frmSobre.frm");
+  const QString frm = u"Loja/frmSobre.frm"_qs;
   for (auto it = before.cbegin(); it != before.cend(); ++it) {
     if (it.key() == frm) continue;
     EXPECT_EQ(after.value(it.key()), it.value()) << it.key().toStdString();
   }
   EXPECT_EQ(after.value(frm),
-            QByteArray(before.value(frm))
-                .replace(ansi(QStringLiteral("Versão 1.4.12")), ansi(QStringLiteral("Versão 2.0"))));
+            QByteArray(before.value(frm)).replace(ansi(u"Versão 1.4.12"_qs), ansi(u"Versão 2.0"_qs)));
 
   // A list changes size: the records before and after it keep their bytes, and the item data stays.
-  const QByteArray frx = before.value(QStringLiteral("Loja/frmSobre.frx"));
+  const QByteArray frx = before.value(u"Loja/frmSobre.frx"_qs);
   const qsizetype list = 0x49A;
   const qsizetype text = 0x4BB;
   ASSERT_EQ(frx.mid(list, 4), QByteArray("\x03\0\x03\0", 4));
-  form->findControl(QStringLiteral("cboIdioma"))->setProperty(QStringLiteral("List"), QStringList{"Galego"});
+  form->findControl(u"cboIdioma"_qs)->setProperty(u"List"_qs, QStringList{"Galego"});
   vbe->saveAll();
   after = copy.snapshot();
-  const QByteArray galego = *encodeFrxList({QStringLiteral("Galego")});
-  EXPECT_EQ(after.value(QStringLiteral("Loja/frmSobre.frx")), frx.left(list) + galego + frx.mid(text));
+  const QByteArray galego = *encodeFrxList({u"Galego"_qs});
+  EXPECT_EQ(after.value(u"Loja/frmSobre.frx"_qs), frx.left(list) + galego + frx.mid(text));
   // In the description only the references to the records after the list move.
   const auto moved = [&](qsizetype offset) {
     return "\"frmSobre.frx\":" + QByteArray::number(offset, 16).toUpper().rightJustified(4, '0');
   };
   const qsizetype shift = galego.size() - (text - list);
-  EXPECT_EQ(after.value(frm),
-            QByteArray(before.value(frm))
-                .replace(ansi(QStringLiteral("Versão 1.4.12")), ansi(QStringLiteral("Versão 2.0")))
-                .replace(moved(text), moved(text + shift))
-                .replace(moved(0x5D1), moved(0x5D1 + shift)));
+  EXPECT_EQ(after.value(frm), QByteArray(before.value(frm))
+                                  .replace(ansi(u"Versão 1.4.12"_qs), ansi(u"Versão 2.0"_qs))
+                                  .replace(moved(text), moved(text + shift))
+                                  .replace(moved(0x5D1), moved(0x5D1 + shift)));
   vbe = VbeImpl::create();
   vbe->open(copy.groupFile());
-  auto combo = vbe->project(QStringLiteral("Loja"))
-                   ->component(QStringLiteral("frmSobre"))
-                   ->form()
-                   ->findControl(QStringLiteral("cboIdioma"));
-  EXPECT_EQ(combo->property(QStringLiteral("List")), QVariant(QStringList{"Galego"}));
-  EXPECT_EQ(combo->property(QStringLiteral("ItemData")).toList().size(), 3);
+  auto combo = vbe->project(u"Loja"_qs)->component(u"frmSobre"_qs)->form()->findControl(u"cboIdioma"_qs);
+  EXPECT_EQ(combo->property(u"List"_qs), QVariant(QStringList{"Galego"}));
+  EXPECT_EQ(combo->property(u"ItemData"_qs).toList().size(), 3);
 }
 
 }  // namespace

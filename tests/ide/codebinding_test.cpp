@@ -24,10 +24,9 @@ class Binding : public ::testing::Test {
     auto project = m_ide.vbe->newProject();
     m_module = std::static_pointer_cast<host::ComponentImpl>(project->Add(ide::ComponentType::StdModule))
                    ->codeModule();
-    QString text =
-        QStringLiteral("Option Explicit\r\n\r\nPublic Sub One()\r\n    Debug.Print \"one\"\r\nEnd Sub");
+    QString text = u"Option Explicit\r\n\r\nPublic Sub One()\r\n    Debug.Print \"one\"\r\nEnd Sub"_qs;
     for (int n = 6; n <= 105; ++n)
-      text += QStringLiteral("\r\n' filler %1").arg(n);
+      text += u"\r\n' filler %1"_qs.arg(n);
     m_module->AddFromString(text);
     m_pane = m_module->pane();
     m_editor = std::make_unique<CodeEditor>();
@@ -66,72 +65,72 @@ class Binding : public ::testing::Test {
 
 TEST_F(Binding, ShowsTheLinesOfTheModule) {
   EXPECT_EQ(m_editor->document()->blockCount(), 105);
-  EXPECT_EQ(block(1), QStringLiteral("Option Explicit"));
-  EXPECT_EQ(block(4), QStringLiteral("    Debug.Print \"one\""));
-  EXPECT_EQ(block(105), QStringLiteral("' filler 105"));
+  EXPECT_EQ(block(1), u"Option Explicit"_qs);
+  EXPECT_EQ(block(4), u"    Debug.Print \"one\""_qs);
+  EXPECT_EQ(block(105), u"' filler 105"_qs);
 }
 
 TEST_F(Binding, ModelEditsReachTheEditorAsOneUndoableEdit) {
-  m_module->InsertLines(4, QStringLiteral("    x = 1\r\n    y = 2"));
-  m_module->ReplaceLine(3, QStringLiteral("Public Sub Uno()"));
+  m_module->InsertLines(4, u"    x = 1\r\n    y = 2"_qs);
+  m_module->ReplaceLine(3, u"Public Sub Uno()"_qs);
   m_module->DeleteLines(8, 1);
   EXPECT_TRUE(m_binding->hasPendingEdits());
-  EXPECT_EQ(block(3), QStringLiteral("Public Sub One()")) << "applied from the event loop, not at once";
+  EXPECT_EQ(block(3), u"Public Sub One()"_qs) << "applied from the event loop, not at once";
   m_binding->flush();
   EXPECT_EQ(m_editor->document()->blockCount(), 106);
-  EXPECT_EQ(block(3), QStringLiteral("Public Sub Uno()"));
-  EXPECT_EQ(block(4), QStringLiteral("    x = 1"));
-  EXPECT_EQ(block(5), QStringLiteral("    y = 2"));
-  EXPECT_EQ(block(6), QStringLiteral("    Debug.Print \"one\""));
-  EXPECT_EQ(block(7), QStringLiteral("End Sub"));
-  EXPECT_EQ(block(8), QStringLiteral("' filler 7"));
+  EXPECT_EQ(block(3), u"Public Sub Uno()"_qs);
+  EXPECT_EQ(block(4), u"    x = 1"_qs);
+  EXPECT_EQ(block(5), u"    y = 2"_qs);
+  EXPECT_EQ(block(6), u"    Debug.Print \"one\""_qs);
+  EXPECT_EQ(block(7), u"End Sub"_qs);
+  EXPECT_EQ(block(8), u"' filler 7"_qs);
 
   m_editor->undo();
   EXPECT_EQ(m_module->CountOfLines(), 105);
-  EXPECT_EQ(m_module->Lines(3, 1), QStringLiteral("Public Sub One()"));
-  EXPECT_EQ(m_module->Lines(4, 1), QStringLiteral("    Debug.Print \"one\""));
-  EXPECT_EQ(m_module->Lines(6, 1), QStringLiteral("' filler 6"));
+  EXPECT_EQ(m_module->Lines(3, 1), u"Public Sub One()"_qs);
+  EXPECT_EQ(m_module->Lines(4, 1), u"    Debug.Print \"one\""_qs);
+  EXPECT_EQ(m_module->Lines(6, 1), u"' filler 6"_qs);
   m_editor->redo();
   EXPECT_EQ(m_module->CountOfLines(), 106);
-  EXPECT_EQ(m_module->Lines(3, 1), QStringLiteral("Public Sub Uno()"));
+  EXPECT_EQ(m_module->Lines(3, 1), u"Public Sub Uno()"_qs);
 }
 
 TEST_F(Binding, ALongRunOfModelEditsIsShownPartByPart) {
   QStringList more;
   for (int line = 106; line <= 5000; ++line)
-    more << QStringLiteral("' filler %1").arg(line);
-  m_module->InsertLines(106, more.join(QStringLiteral("\r\n")));
+    more << u"' filler %1"_qs.arg(line);
+  m_module->InsertLines(106, more.join(u"\r\n"_qs));
   m_binding->flush();
   for (int line = 1; line <= 5000; ++line)
-    m_module->ReplaceLine(line, QStringLiteral("' linha %1").arg(line));
+    m_module->ReplaceLine(line, u"' linha %1"_qs.arg(line));
   QCoreApplication::processEvents();
-  EXPECT_EQ(block(1), QStringLiteral("' linha 1")) << "the first part is shown after one pass of the loop";
-  EXPECT_EQ(block(5000), QStringLiteral("' filler 5000")) << "the rest waits for the next passes";
+  EXPECT_EQ(block(1), u"' linha 1"_qs) << "the first part is shown after one pass of the loop";
+  EXPECT_EQ(block(5000), u"' filler 5000"_qs) << "the rest waits for the next passes";
   ASSERT_TRUE(waitFor([&] { return !m_binding->hasPendingEdits(); }));
   EXPECT_EQ(m_editor->document()->blockCount(), 5000);
-  EXPECT_EQ(block(2500), QStringLiteral("' linha 2500"));
-  EXPECT_EQ(block(5000), QStringLiteral("' linha 5000"));
+  EXPECT_EQ(block(2500), u"' linha 2500"_qs);
+  EXPECT_EQ(block(5000), u"' linha 5000"_qs);
 }
 
 TEST_F(Binding, ModelEditsAreShownFromTheEventLoop) {
-  m_module->ReplaceLine(105, QStringLiteral("' last"));
-  m_module->InsertLines(106, QStringLiteral("' appended"));
+  m_module->ReplaceLine(105, u"' last"_qs);
+  m_module->InsertLines(106, u"' appended"_qs);
   ASSERT_TRUE(waitFor([&] { return !m_binding->hasPendingEdits(); }));
-  EXPECT_EQ(block(105), QStringLiteral("' last"));
-  EXPECT_EQ(block(106), QStringLiteral("' appended"));
+  EXPECT_EQ(block(105), u"' last"_qs);
+  EXPECT_EQ(block(106), u"' appended"_qs);
   m_module->DeleteLines(100, 7);
   ASSERT_TRUE(waitFor([&] { return !m_binding->hasPendingEdits(); }));
   EXPECT_EQ(m_editor->document()->blockCount(), 99);
-  EXPECT_EQ(block(99), QStringLiteral("' filler 99"));
+  EXPECT_EQ(block(99), u"' filler 99"_qs);
 }
 
 TEST_F(Binding, AnEmptyModuleShowsEmptyAndTakesNewLines) {
   m_module->DeleteLines(1, m_module->CountOfLines());
   m_binding->flush();
   EXPECT_TRUE(m_editor->document()->isEmpty());
-  m_module->InsertLines(1, QStringLiteral("Sub A()\r\nEnd Sub"));
+  m_module->InsertLines(1, u"Sub A()\r\nEnd Sub"_qs);
   m_binding->flush();
-  EXPECT_EQ(m_editor->toPlainText(), QStringLiteral("Sub A()\nEnd Sub"));
+  EXPECT_EQ(m_editor->toPlainText(), u"Sub A()\nEnd Sub"_qs);
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -139,8 +138,8 @@ TEST_F(Binding, AnEmptyModuleShowsEmptyAndTakesNewLines) {
 
 TEST_F(Binding, TypingChangesTheModuleLine) {
   m_pane->SetSelection(4, 22, 4, 22);
-  QTest::keyClicks(m_editor.get(), QStringLiteral(" ' two"));
-  EXPECT_EQ(m_module->Lines(4, 1), QStringLiteral("    Debug.Print \"one\" ' two"));
+  QTest::keyClicks(m_editor.get(), u" ' two"_qs);
+  EXPECT_EQ(m_module->Lines(4, 1), u"    Debug.Print \"one\" ' two"_qs);
   EXPECT_EQ(m_module->CountOfLines(), 105);
 }
 
@@ -148,36 +147,36 @@ TEST_F(Binding, EnterSplitsALineAndBackspaceJoinsItAgain) {
   m_pane->SetSelection(3, 11, 3, 11);
   QTest::keyClick(m_editor.get(), Qt::Key_Return);
   EXPECT_EQ(m_module->CountOfLines(), 106);
-  EXPECT_EQ(m_module->Lines(3, 1), QStringLiteral("Public Sub"));
-  EXPECT_EQ(m_module->Lines(4, 1), QStringLiteral(" One()"));
+  EXPECT_EQ(m_module->Lines(3, 1), u"Public Sub"_qs);
+  EXPECT_EQ(m_module->Lines(4, 1), u" One()"_qs);
   QTest::keyClick(m_editor.get(), Qt::Key_Backspace);
   EXPECT_EQ(m_module->CountOfLines(), 105);
-  EXPECT_EQ(m_module->Lines(3, 1), QStringLiteral("Public Sub One()"));
+  EXPECT_EQ(m_module->Lines(3, 1), u"Public Sub One()"_qs);
 }
 
 TEST_F(Binding, InsertedTextOfSeveralLinesBecomesModuleLines) {
   QTextCursor cursor(m_editor->document());
   cursor.setPosition(position(2, 1));
-  cursor.insertText(QStringLiteral("' a\n' b\n' c"));
+  cursor.insertText(u"' a\n' b\n' c"_qs);
   EXPECT_EQ(m_module->CountOfLines(), 107);
-  EXPECT_EQ(m_module->Lines(2, 3), QStringLiteral("' a\r\n' b\r\n' c"));
-  EXPECT_EQ(m_module->Lines(5, 1), QStringLiteral("Public Sub One()"));
+  EXPECT_EQ(m_module->Lines(2, 3), u"' a\r\n' b\r\n' c"_qs);
+  EXPECT_EQ(m_module->Lines(5, 1), u"Public Sub One()"_qs);
 }
 
 TEST_F(Binding, DeletingLinesInTheEditorDeletesThemInTheModule) {
   select(6, 1, 9, 1);
   m_editor->textCursor().removeSelectedText();
   EXPECT_EQ(m_module->CountOfLines(), 102);
-  EXPECT_EQ(m_module->Lines(6, 1), QStringLiteral("' filler 9"));
+  EXPECT_EQ(m_module->Lines(6, 1), u"' filler 9"_qs);
 }
 
 TEST_F(Binding, AnEmptiedEditorLeavesAnEmptyModule) {
   m_editor->selectAll();
   m_editor->textCursor().removeSelectedText();
   EXPECT_EQ(m_module->CountOfLines(), 0);
-  QTest::keyClicks(m_editor.get(), QStringLiteral("x"));
+  QTest::keyClicks(m_editor.get(), u"x"_qs);
   EXPECT_EQ(m_module->CountOfLines(), 1);
-  EXPECT_EQ(m_module->Lines(1, 1), QStringLiteral("x"));
+  EXPECT_EQ(m_module->Lines(1, 1), u"x"_qs);
 }
 
 TEST_F(Binding, ALineTooLongIsRefusedAndTheEditorShowsTheModuleAgain) {
@@ -187,25 +186,25 @@ TEST_F(Binding, ALineTooLongIsRefusedAndTheEditorShowsTheModuleAgain) {
   cursor.setPosition(position(1, 16));
   cursor.insertText(QString(1100, u'x'));
   EXPECT_FALSE(refused.isEmpty());
-  EXPECT_EQ(m_module->Lines(1, 1), QStringLiteral("Option Explicit"));
-  EXPECT_EQ(block(1), QStringLiteral("Option Explicit"));
+  EXPECT_EQ(m_module->Lines(1, 1), u"Option Explicit"_qs);
+  EXPECT_EQ(block(1), u"Option Explicit"_qs);
   EXPECT_EQ(m_editor->document()->blockCount(), 105);
 }
 
 TEST_F(Binding, AKeyThatEditsFirstTakesInThePendingModelEdits) {
   m_pane->SetSelection(3, 1, 3, 1);
-  m_module->InsertLines(1, QStringLiteral("' novo"));
+  m_module->InsertLines(1, u"' novo"_qs);
   ASSERT_TRUE(m_binding->hasPendingEdits());
-  QTest::keyClicks(m_editor.get(), QStringLiteral("x"));
+  QTest::keyClicks(m_editor.get(), u"x"_qs);
   EXPECT_FALSE(m_binding->hasPendingEdits());
   // The caret went down with its line (now line 4), and the key landed there.
-  EXPECT_EQ(m_module->Lines(4, 1), QStringLiteral("xPublic Sub One()"));
-  EXPECT_EQ(m_module->Lines(1, 1), QStringLiteral("' novo"));
+  EXPECT_EQ(m_module->Lines(4, 1), u"xPublic Sub One()"_qs);
+  EXPECT_EQ(m_module->Lines(1, 1), u"' novo"_qs);
 }
 
 TEST_F(Binding, AKeyThatOnlyMovesNeitherWaitsForNorMisreportsPendingEdits) {
   m_pane->SetSelection(3, 1, 3, 1);
-  m_module->InsertLines(1, QStringLiteral("' novo"));
+  m_module->InsertLines(1, u"' novo"_qs);
   QTest::keyClick(m_editor.get(), Qt::Key_Right);
   EXPECT_TRUE(m_binding->hasPendingEdits());
   EXPECT_EQ(selection(), (std::array<int, 4>{4, 1, 4, 1})) << "the editor's stale position is not the pane's";
@@ -225,7 +224,7 @@ TEST_F(Binding, TheEditorSelectionIsThePaneSelection) {
 
 TEST_F(Binding, SetSelectionSelectsInTheEditor) {
   m_pane->SetSelection(4, 5, 4, 16);
-  EXPECT_EQ(m_editor->textCursor().selectedText(), QStringLiteral("Debug.Print"));
+  EXPECT_EQ(m_editor->textCursor().selectedText(), u"Debug.Print"_qs);
   m_pane->SetSelection(3, 8, 3, 8);
   EXPECT_FALSE(m_editor->textCursor().hasSelection());
   EXPECT_EQ(m_editor->textCursor().position(), position(3, 8));
@@ -263,7 +262,7 @@ TEST_F(Binding, CountOfVisibleLinesIsWhatTheEditorShows) {
 
 TEST_F(Binding, ACaretStaysOnItsTextWhenTheModuleInsertsAbove) {
   m_pane->SetSelection(10, 3, 10, 3);
-  m_module->InsertLines(1, QStringLiteral("' top"));
+  m_module->InsertLines(1, u"' top"_qs);
   m_binding->flush();
   EXPECT_EQ(selection(), (std::array<int, 4>{11, 3, 11, 3}));
   EXPECT_EQ(m_editor->textCursor().position(), position(11, 3));

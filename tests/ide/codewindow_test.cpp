@@ -17,15 +17,14 @@ namespace {
 QStringList itemsOf(const QComboBox* box) {
   QStringList items;
   for (int i = 0; i < box->count(); ++i)
-    items << box->itemText(i) +
-                 (box->itemData(i, Qt::FontRole).value<QFont>().bold() ? QStringLiteral("*") : QString());
+    items << box->itemText(i) + (box->itemData(i, Qt::FontRole).value<QFont>().bold() ? u"*"_qs : QString());
   return items;
 }
 
 class CodeWindowTest : public test::IdeTest {
  protected:
   CodeWindow* open(const char* name) {
-    QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QString::fromLatin1(name));
+    QMdiSubWindow* sub = openCode(u"Loja"_qs, QString::fromLatin1(name));
     return sub ? qobject_cast<CodeWindow*>(sub->widget()) : nullptr;
   }
   QString line(CodeWindow* window, int n) { return window->binding()->module()->Lines(n, 1); }
@@ -38,14 +37,14 @@ TEST_F(CodeWindowTest, TheBoxesListObjectsAndTheirEventsWithExistingProceduresIn
   EXPECT_EQ(itemsOf(window->objectList()),
             (QStringList{"(General)", "Form", "cboIdioma", "chkDicas", "cmdOk", "cmdSistema", "ctlPainel1",
                          "imgLogo", "lblIdioma", "lblTitulo", "lblVersao", "txtLicenca"}));
-  window->chooseObject(QStringLiteral("cmdOk"));
-  EXPECT_EQ(window->objectList()->currentText(), QStringLiteral("cmdOk"));
-  EXPECT_EQ(window->procedureList()->currentText(), QStringLiteral("Click"));
-  EXPECT_EQ(line(window, window->pane()->selection().startLine), QStringLiteral("Private Sub cmdOk_Click()"));
+  window->chooseObject(u"cmdOk"_qs);
+  EXPECT_EQ(window->objectList()->currentText(), u"cmdOk"_qs);
+  EXPECT_EQ(window->procedureList()->currentText(), u"Click"_qs);
+  EXPECT_EQ(line(window, window->pane()->selection().startLine), u"Private Sub cmdOk_Click()"_qs);
   const QStringList events = itemsOf(window->procedureList());
-  EXPECT_TRUE(events.contains(QStringLiteral("Click*")));
-  EXPECT_TRUE(events.contains(QStringLiteral("KeyPress")));
-  EXPECT_FALSE(events.contains(QStringLiteral("Change")));
+  EXPECT_TRUE(events.contains(u"Click*"_qs));
+  EXPECT_TRUE(events.contains(u"KeyPress"_qs));
+  EXPECT_FALSE(events.contains(u"Change"_qs));
 
   // A class: its own object; a module: only (General), with its procedures and the declarations.
   CodeWindow* classWindow = open("clsPedido");
@@ -54,8 +53,8 @@ TEST_F(CodeWindowTest, TheBoxesListObjectsAndTheirEventsWithExistingProceduresIn
   CodeWindow* module = open("modPrincipal");
   module->fillLists();
   EXPECT_EQ(itemsOf(module->objectList()), QStringList{"(General)"});
-  EXPECT_EQ(itemsOf(module->procedureList()).first(), QStringLiteral("(Declarations)"));
-  EXPECT_TRUE(itemsOf(module->procedureList()).contains(QStringLiteral("Main")));
+  EXPECT_EQ(itemsOf(module->procedureList()).first(), u"(Declarations)"_qs);
+  EXPECT_TRUE(itemsOf(module->procedureList()).contains(u"Main"_qs));
 }
 
 TEST_F(CodeWindowTest, ChoosingAnEventWithoutAProcedureWritesItAndPutsTheCaretInIt) {
@@ -64,22 +63,22 @@ TEST_F(CodeWindowTest, ChoosingAnEventWithoutAProcedureWritesItAndPutsTheCaretIn
   auto module = window->binding()->module();
   const int before = module->CountOfLines();
   window->fillLists();
-  window->chooseObject(QStringLiteral("txtLicenca"));  // no procedure yet: its default event, Change
-  window->chooseProcedure(QStringLiteral("KeyPress"));
-  EXPECT_EQ(module->Lines(before + 1, 8).split(QStringLiteral("\r\n")),
+  window->chooseObject(u"txtLicenca"_qs);  // no procedure yet: its default event, Change
+  window->chooseProcedure(u"KeyPress"_qs);
+  EXPECT_EQ(module->Lines(before + 1, 8).split(u"\r\n"_qs),
             (QStringList{"", "Private Sub txtLicenca_Change()", "", "End Sub", "",
                          "Private Sub txtLicenca_KeyPress(KeyAscii As Integer)", "", "End Sub"}))
       << module->Lines(before + 1, module->CountOfLines() - before).toStdString();
   const auto caret = window->pane()->selection();
   EXPECT_EQ(caret.startLine, before + 7);
   EXPECT_EQ(caret.startColumn, 1);
-  EXPECT_EQ(window->procedureList()->currentText(), QStringLiteral("KeyPress"));
-  EXPECT_TRUE(itemsOf(window->procedureList()).contains(QStringLiteral("KeyPress*")));
+  EXPECT_EQ(window->procedureList()->currentText(), u"KeyPress"_qs);
+  EXPECT_TRUE(itemsOf(window->procedureList()).contains(u"KeyPress*"_qs));
   // An element of a control array takes its Index first.
   CodeWindow* cliente = open("frmCliente");
   cliente->fillLists();
-  cliente->chooseObject(QStringLiteral("cmdAcao"));
-  cliente->chooseProcedure(QStringLiteral("MouseUp"));
+  cliente->chooseObject(u"cmdAcao"_qs);
+  cliente->chooseProcedure(u"MouseUp"_qs);
   EXPECT_EQ(
       cliente->binding()->module()->Lines(cliente->pane()->selection().startLine - 1, 1),
       QStringLiteral("Private Sub cmdAcao_MouseUp(Index As Integer, Button As Integer, Shift As Integer, "

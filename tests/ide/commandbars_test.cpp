@@ -43,71 +43,66 @@ class CommandBarsTest : public test::IdeTest {
 };
 
 TEST_F(CommandBarsTest, TheMenuBarShowsTheMenusOfTheModel) {
-  EXPECT_EQ(menuTitles(),
-            (QStringList{QStringLiteral("&File"), QStringLiteral("&Edit"), QStringLiteral("&View"),
-                         QStringLiteral("&Project"), QStringLiteral("F&ormat"), QStringLiteral("&Debug"),
-                         QStringLiteral("&Run"), QStringLiteral("&Query"), QStringLiteral("D&iagram"),
-                         QStringLiteral("&Tools"), QStringLiteral("&Add-Ins"), QStringLiteral("&Window"),
-                         QStringLiteral("&Help")}));
+  EXPECT_EQ(menuTitles(), (QStringList{u"&File"_qs, u"&Edit"_qs, u"&View"_qs, u"&Project"_qs, u"F&ormat"_qs,
+                                       u"&Debug"_qs, u"&Run"_qs, u"&Query"_qs, u"D&iagram"_qs, u"&Tools"_qs,
+                                       u"&Add-Ins"_qs, u"&Window"_qs, u"&Help"_qs}));
   QMenu* run = m_window->menuBar()->actions().at(6)->menu();
   ASSERT_NE(run, nullptr);
   QStringList items;
   for (QAction* action : run->actions())
-    items << action->text() + (action->isEnabled() ? QString() : QStringLiteral(" (off)"));
-  EXPECT_EQ(items, (QStringList{QStringLiteral("&Start"), QStringLiteral("&Continue (off)"),
-                                QStringLiteral("Brea&k (off)"), QStringLiteral("&End (off)")}));
+    items << action->text() + (action->isEnabled() ? QString() : u" (off)"_qs);
+  EXPECT_EQ(items, (QStringList{u"&Start"_qs, u"&Continue (off)"_qs, u"Brea&k (off)"_qs, u"&End (off)"_qs}));
 }
 
 TEST_F(CommandBarsTest, TheStandardToolbarHasTheVisibleButtonsWithPictures) {
-  const QStringList texts = toolBarTexts(QStringLiteral("Standard"));
+  const QStringList texts = toolBarTexts(u"Standard"_qs);
   EXPECT_EQ(texts.size(), 16) << "Continue stays hidden in design mode";
-  EXPECT_FALSE(texts.contains(QStringLiteral("Continue")));
-  EXPECT_EQ(texts.first(), QStringLiteral("Add Project"));
-  for (QAction* action : m_window->commandBars().toolBarOf(QStringLiteral("Standard"))->actions()) {
+  EXPECT_FALSE(texts.contains(u"Continue"_qs));
+  EXPECT_EQ(texts.first(), u"Add Project"_qs);
+  for (QAction* action : m_window->commandBars().toolBarOf(u"Standard"_qs)->actions()) {
     if (action->isSeparator()) continue;
     EXPECT_FALSE(action->icon().isNull()) << action->text().toStdString();
   }
-  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Edit")), nullptr)
-      << "an invisible bar is not drawn";
+  EXPECT_EQ(m_window->commandBars().toolBarOf(u"Edit"_qs), nullptr) << "an invisible bar is not drawn";
 }
 
 TEST_F(CommandBarsTest, ControlsFollowTheirChanges) {
-  auto standard = bars().bar(QStringLiteral("Standard"));
+  auto standard = bars().bar(u"Standard"_qs);
   auto control = std::static_pointer_cast<host::CommandBarControlImpl>(
       standard->Add(ide::ControlType::Button, 1, {}, 1, true));
-  control->setCaption(QStringLiteral("First"));
+  control->setCaption(u"First"_qs);
   settle();
-  EXPECT_EQ(toolBarTexts(QStringLiteral("Standard")).first(), QStringLiteral("First"));
+  EXPECT_EQ(toolBarTexts(u"Standard"_qs).first(), u"First"_qs);
   QAction* action = m_window->commandBars().actionOf(control.get());
   ASSERT_NE(action, nullptr);
   EXPECT_TRUE(action->isEnabled());
 
   control->setEnabled(false);
-  control->setCaption(QStringLiteral("Renamed"));
+  control->setCaption(u"Renamed"_qs);
   settle();
   EXPECT_EQ(m_window->commandBars().actionOf(control.get()), action) << "the action is kept, not rebuilt";
   EXPECT_FALSE(action->isEnabled());
-  EXPECT_EQ(action->text(), QStringLiteral("Renamed"));
+  EXPECT_EQ(action->text(), u"Renamed"_qs);
 
   control->setVisible(false);
   settle();
-  EXPECT_FALSE(toolBarTexts(QStringLiteral("Standard")).contains(QStringLiteral("Renamed")));
+  EXPECT_FALSE(toolBarTexts(u"Standard"_qs).contains(u"Renamed"_qs));
   control->setVisible(true);
   control->Delete();
   settle();
   EXPECT_EQ(m_window->commandBars().actionOf(control.get()), nullptr);
-  EXPECT_EQ(toolBarTexts(QStringLiteral("Standard")).size(), 16);
+  EXPECT_EQ(toolBarTexts(u"Standard"_qs).size(), 16);
 }
 
 TEST_F(CommandBarsTest, AFaceBecomesTheIcon) {
-  auto standard = bars().bar(QStringLiteral("Standard"));
+  auto standard = bars().bar(u"Standard"_qs);
   auto pictured = std::static_pointer_cast<host::CommandBarControlImpl>(
       standard->Add(ide::ControlType::Button, 1, {}, 0, true));
-  pictured->setTooltipText(QStringLiteral("Pictured"));
+  pictured->setTooltipText(u"Pictured"_qs);
   pictured->setFace(glyphPng(Glyph::Find));
   auto broken = std::static_pointer_cast<host::CommandBarControlImpl>(
       standard->Add(ide::ControlType::Button, 1, {}, 0, true));
-  broken->setTooltipText(QStringLiteral("Broken"));
+  broken->setTooltipText(u"Broken"_qs);
   broken->setFace(QByteArray("not a picture"));
   settle();
   QAction* withFace = m_window->commandBars().actionOf(pictured.get());
@@ -115,15 +110,14 @@ TEST_F(CommandBarsTest, AFaceBecomesTheIcon) {
   ASSERT_TRUE(withFace && withoutFace);
   EXPECT_FALSE(withFace->icon().isNull());
   EXPECT_TRUE(withoutFace->icon().isNull());
-  EXPECT_EQ(withFace->text(), QStringLiteral("Pictured"))
-      << "a button without caption is named by its tooltip";
+  EXPECT_EQ(withFace->text(), u"Pictured"_qs) << "a button without caption is named by its tooltip";
 }
 
 TEST_F(CommandBarsTest, AClickExecutesTheControl) {
-  auto addIns = bars().bar(QStringLiteral("Add-Ins"));
+  auto addIns = bars().bar(u"Add-Ins"_qs);
   auto control = std::static_pointer_cast<host::CommandBarControlImpl>(
       addIns->Add(ide::ControlType::Button, 1, {}, 0, true));
-  control->setCaption(QStringLiteral("Count"));
+  control->setCaption(u"Count"_qs);
   int clicks = 0;
   auto sink = m_ide.vbe->Events()->CommandBarEvents(control)->Click.connect(
       [&](const ide::Ref<ide::CommandBarControl>&, bool&, bool&) { ++clicks; });
@@ -139,20 +133,20 @@ TEST_F(CommandBarsTest, AClickExecutesTheControl) {
 }
 
 TEST_F(CommandBarsTest, ANewBarIsAToolbarUntilItIsDeleted) {
-  auto bar = bars().Add(QStringLiteral("Mine"), ide::BarPosition::Top, false, true);
-  bar->Controls()->Add(ide::ControlType::Button, 1, {}, 0, true)->setCaption(QStringLiteral("One"));
+  auto bar = bars().Add(u"Mine"_qs, ide::BarPosition::Top, false, true);
+  bar->Controls()->Add(ide::ControlType::Button, 1, {}, 0, true)->setCaption(u"One"_qs);
   settle();
-  ASSERT_NE(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
-  EXPECT_EQ(toolBarTexts(QStringLiteral("Mine")), QStringList{QStringLiteral("One")});
+  ASSERT_NE(m_window->commandBars().toolBarOf(u"Mine"_qs), nullptr);
+  EXPECT_EQ(toolBarTexts(u"Mine"_qs), QStringList{u"One"_qs});
   bar->setVisible(false);
   settle();
-  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
+  EXPECT_EQ(m_window->commandBars().toolBarOf(u"Mine"_qs), nullptr);
   bar->setVisible(true);
   settle();
-  EXPECT_NE(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
+  EXPECT_NE(m_window->commandBars().toolBarOf(u"Mine"_qs), nullptr);
   bar->Delete();
   settle();
-  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Mine")), nullptr);
+  EXPECT_EQ(m_window->commandBars().toolBarOf(u"Mine"_qs), nullptr);
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -178,7 +172,7 @@ TEST_F(CommandBarsTest, AnAddInsMenuItemAppearsWhileTheAddInIsConnected) {
   QAction* item = itemOf();
   ASSERT_NE(item, nullptr);
   item->trigger();
-  EXPECT_TRUE(takeTestAddInLog().contains(QStringLiteral("click")));
+  EXPECT_TRUE(takeTestAddInLog().contains(u"click"_qs));
   addIn->setConnect(false);
   ASSERT_TRUE(waitFor([&] { return !addIn->Connect() && itemOf() == nullptr; }));
 }
@@ -188,14 +182,14 @@ TEST_F(CommandBarsTest, AnAddInsMenuItemAppearsWhileTheAddInIsConnected) {
 class AddInEnvironment {
  public:
   AddInEnvironment() {
-    QDir(m_dir.path()).mkpath(QStringLiteral("install/help"));
-    QFile config(m_dir.filePath(QStringLiteral("quimbel.conf")));
+    QDir(m_dir.path()).mkpath(u"install/help"_qs);
+    QFile config(m_dir.filePath(u"quimbel.conf"_qs));
     config.open(QIODevice::WriteOnly);
-    config.write("InstallationPath=" + m_dir.filePath(QStringLiteral("install")).toUtf8() + "\n");
+    config.write("InstallationPath=" + m_dir.filePath(u"install"_qs).toUtf8() + "\n");
     config.close();
-    qputenv("QUIMBEL_MACHINE_CONFIG", m_dir.filePath(QStringLiteral("quimbel.conf")).toLocal8Bit());
-    qputenv("QUIMBEL_CONFIG_DIR", m_dir.filePath(QStringLiteral("config")).toLocal8Bit());
-    qputenv("QUIMBEL_DATA_DIR", m_dir.filePath(QStringLiteral("data")).toLocal8Bit());
+    qputenv("QUIMBEL_MACHINE_CONFIG", m_dir.filePath(u"quimbel.conf"_qs).toLocal8Bit());
+    qputenv("QUIMBEL_CONFIG_DIR", m_dir.filePath(u"config"_qs).toLocal8Bit());
+    qputenv("QUIMBEL_DATA_DIR", m_dir.filePath(u"data"_qs).toLocal8Bit());
   }
   ~AddInEnvironment() {
     qunsetenv("QUIMBEL_MACHINE_CONFIG");
@@ -215,7 +209,7 @@ TEST_F(CommandBarsTest, TheQuimbelAddInsMenusAndToolbarComeAndGoWithIt) {
   settle();
   ASSERT_TRUE(addIn->Connect()) << m_messages.join(u'\n').toStdString();
 
-  QToolBar* toolBar = m_window->commandBars().toolBarOf(QStringLiteral("Quimbel 2.2"));
+  QToolBar* toolBar = m_window->commandBars().toolBarOf(u"Quimbel 2.2"_qs);
   ASSERT_NE(toolBar, nullptr);
   int buttons = 0;
   for (QAction* action : toolBar->actions()) {
@@ -224,16 +218,16 @@ TEST_F(CommandBarsTest, TheQuimbelAddInsMenusAndToolbarComeAndGoWithIt) {
     EXPECT_FALSE(action->icon().isNull()) << action->text().toStdString();
   }
   EXPECT_EQ(buttons, 12);
-  EXPECT_EQ(menuTitles().at(10), QStringLiteral("Quimbel")) << "the popup stands before the Add-Ins menu";
+  EXPECT_EQ(menuTitles().at(10), u"Quimbel"_qs) << "the popup stands before the Add-Ins menu";
   QMenu context;
-  m_window->commandBars().fillMenu(&context, bars().bar(QStringLiteral("Code Window")));
-  EXPECT_EQ(context.actions().first()->text(), QStringLiteral("Adicionar aos Favoritos"));
+  m_window->commandBars().fillMenu(&context, bars().bar(u"Code Window"_qs));
+  EXPECT_EQ(context.actions().first()->text(), u"Adicionar aos Favoritos"_qs);
 
   addIn->setConnect(false);
   ASSERT_TRUE(waitFor([&] { return !addIn->Connect(); }));
   settle();
-  EXPECT_EQ(m_window->commandBars().toolBarOf(QStringLiteral("Quimbel 2.2")), nullptr);
-  EXPECT_FALSE(menuTitles().contains(QStringLiteral("Quimbel")));
+  EXPECT_EQ(m_window->commandBars().toolBarOf(u"Quimbel 2.2"_qs), nullptr);
+  EXPECT_FALSE(menuTitles().contains(u"Quimbel"_qs));
   EXPECT_EQ(menuTitles().size(), 13);
 }
 #endif

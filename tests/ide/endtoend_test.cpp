@@ -36,18 +36,18 @@ Session runIde(const QString& script, const QProcessEnvironment& extra, const QS
     environment.insert(key, extra.value(key));
   QString program = QStringLiteral(QUIMBEL_IDE_PROGRAM);
   QStringList arguments = options;
-  arguments << QStringLiteral("--script") << script;
+  arguments << u"--script"_qs << script;
   Session session;
-  const QString xvfb = QStandardPaths::findExecutable(QStringLiteral("xvfb-run"));
+  const QString xvfb = QStandardPaths::findExecutable(u"xvfb-run"_qs);
   if (!xvfb.isEmpty() && qEnvironmentVariable("QUIMBEL_E2E_PLATFORM") != QLatin1StringView("offscreen")) {
     arguments.prepend(program);
-    arguments.prepend(QStringLiteral("-a"));
+    arguments.prepend(u"-a"_qs);
     program = xvfb;
-    environment.insert(QStringLiteral("QT_QPA_PLATFORM"), QStringLiteral("xcb"));
-    session.platform = QStringLiteral("xcb (Xvfb)");
+    environment.insert(u"QT_QPA_PLATFORM"_qs, u"xcb"_qs);
+    session.platform = u"xcb (Xvfb)"_qs;
   } else {
-    environment.insert(QStringLiteral("QT_QPA_PLATFORM"), QStringLiteral("offscreen"));
-    session.platform = QStringLiteral("offscreen");
+    environment.insert(u"QT_QPA_PLATFORM"_qs, u"offscreen"_qs);
+    session.platform = u"offscreen"_qs;
   }
   QProcess process;
   process.setProcessEnvironment(environment);
@@ -74,7 +74,7 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
   ExampleCopy copy;
   QTemporaryDir work;
   const auto before = copy.snapshot();
-  writeBytes(copy.path(QStringLiteral("Broken.vbp")), "Type=Exe\r\nName=\"Broken\"\r\nForm=\r\n");
+  writeBytes(copy.path(u"Broken.vbp"_qs), "Type=Exe\r\nName=\"Broken\"\r\nForm=\r\n");
 
   QString script = QStringLiteral(
       "# The example group, a broken project, a new module typed in, saved.\n"
@@ -131,30 +131,29 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
         "expect line 2 \"    Dobro = n * 2\"\n"
         "press cmdClose\n");
   else
-    script += QStringLiteral("expect no-control \"Menu Bar\" Quimbel\n");
+    script += u"expect no-control \"Menu Bar\" Quimbel\n"_qs;
   script += QStringLiteral(
       "save\n"
       "screenshot main \"${OUT}/saved.png\"\n");
-  const QString scriptPath = work.filePath(QStringLiteral("session.qis"));
+  const QString scriptPath = work.filePath(u"session.qis"_qs);
   writeBytes(scriptPath, script.toUtf8());
 
   QProcessEnvironment environment;
-  environment.insert(QStringLiteral("DEMO"), QDir(copy.path(QStringLiteral("."))).absolutePath());
-  environment.insert(QStringLiteral("OUT"), work.filePath(QStringLiteral("shots")));
-  environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), work.filePath(QStringLiteral("config")));
-  environment.insert(QStringLiteral("QUIMBEL_DATA_DIR"), work.filePath(QStringLiteral("data")));
+  environment.insert(u"DEMO"_qs, QDir(copy.path(u"."_qs)).absolutePath());
+  environment.insert(u"OUT"_qs, work.filePath(u"shots"_qs));
+  environment.insert(u"QUIMBEL_CONFIG_DIR"_qs, work.filePath(u"config"_qs));
+  environment.insert(u"QUIMBEL_DATA_DIR"_qs, work.filePath(u"data"_qs));
   QStringList options;
   if (hasAddIn()) {
 #ifdef QUIMBEL_ADDIN_LIBRARY
-    QDir(work.path()).mkpath(QStringLiteral("install/help"));
-    writeBytes(work.filePath(QStringLiteral("quimbel.conf")),
-               "InstallationPath=" + work.filePath(QStringLiteral("install")).toUtf8() + "\n");
-    environment.insert(QStringLiteral("QUIMBEL_MACHINE_CONFIG"),
-                       work.filePath(QStringLiteral("quimbel.conf")));
-    options << QStringLiteral("--addin") << QStringLiteral(QUIMBEL_ADDIN_LIBRARY);
+    QDir(work.path()).mkpath(u"install/help"_qs);
+    writeBytes(work.filePath(u"quimbel.conf"_qs),
+               "InstallationPath=" + work.filePath(u"install"_qs).toUtf8() + "\n");
+    environment.insert(u"QUIMBEL_MACHINE_CONFIG"_qs, work.filePath(u"quimbel.conf"_qs));
+    options << u"--addin"_qs << QStringLiteral(QUIMBEL_ADDIN_LIBRARY);
 #endif
   } else {
-    options << QStringLiteral("--no-addin");
+    options << u"--no-addin"_qs;
   }
   const Session session = runIde(scriptPath, environment, options);
   ASSERT_EQ(session.exitCode, 0) << "platform " << session.platform.toStdString() << "\nstdout:\n"
@@ -162,18 +161,17 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
                                  << session.err.toStdString();
 
   // The refused project was told once, with its file and line, and nothing else was.
-  const QStringList boxes = session.out.split(u'\n').filter(QStringLiteral("msgbox: "));
+  const QStringList boxes = session.out.split(u'\n').filter(u"msgbox: "_qs);
   ASSERT_EQ(boxes.size(), 1) << session.out.toStdString();
-  EXPECT_TRUE(boxes.front().contains(QStringLiteral("Broken.vbp"))) << boxes.front().toStdString();
-  EXPECT_TRUE(boxes.front().contains(QStringLiteral("line 3"))) << boxes.front().toStdString();
+  EXPECT_TRUE(boxes.front().contains(u"Broken.vbp"_qs)) << boxes.front().toStdString();
+  EXPECT_TRUE(boxes.front().contains(u"line 3"_qs)) << boxes.front().toStdString();
 
   // The new module and its entry in the project.
   EXPECT_EQ(
-      readBytes(copy.path(QStringLiteral("Loja/Module1.bas"))),
+      readBytes(copy.path(u"Loja/Module1.bas"_qs)),
       QByteArray("Attribute VB_Name = \"Module1\"\r\n"
                  "Public Function Dobro(ByVal n As Long) As Long\r\n    Dobro = n * 2\r\nEnd Function\r\n"));
-  EXPECT_TRUE(
-      readBytes(copy.path(QStringLiteral("Loja/Loja.vbp"))).contains("Module=Module1; Module1.bas\r\n"));
+  EXPECT_TRUE(readBytes(copy.path(u"Loja/Loja.vbp"_qs)).contains("Module=Module1; Module1.bas\r\n"));
 
   const auto after = copy.snapshot();
   QStringList changed;
@@ -181,21 +179,20 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
     if (after.value(it.key()) != it.value()) changed << it.key();
   if (hasAddIn()) {
     // The add-in gave each project its identifier module, saved with it.
-    EXPECT_EQ(changed, (QStringList{QStringLiteral("Loja/Loja.vbp"), QStringLiteral("Loja/modPrincipal.bas"),
-                                    QStringLiteral("Utilitarios/Utilitarios.vbp")}));
-    EXPECT_TRUE(after.contains(QStringLiteral("Loja/basQMInf000001.bas")));
-    EXPECT_TRUE(after.contains(QStringLiteral("Utilitarios/basQMInf000002.bas")));
-    const QStringList lines = QString::fromLatin1(after.value(QStringLiteral("Loja/modPrincipal.bas")))
-                                  .split(QStringLiteral("\r\n"));
+    EXPECT_EQ(changed, (QStringList{u"Loja/Loja.vbp"_qs, u"Loja/modPrincipal.bas"_qs,
+                                    u"Utilitarios/Utilitarios.vbp"_qs}));
+    EXPECT_TRUE(after.contains(u"Loja/basQMInf000001.bas"_qs));
+    EXPECT_TRUE(after.contains(u"Utilitarios/basQMInf000002.bas"_qs));
+    const QStringList lines = QString::fromLatin1(after.value(u"Loja/modPrincipal.bas"_qs)).split(u"\r\n"_qs);
     // Indenting renumbers too (numbering and indenting run as one command by default), from 10000 in steps
     // of 5, and indents with tabs.
-    EXPECT_FALSE(lines.filter(QRegularExpression(QStringLiteral("^10000 \\t\\S"))).isEmpty());
-    EXPECT_FALSE(lines.filter(QRegularExpression(QStringLiteral("^10005 \\t\\S"))).isEmpty());
-    EXPECT_EQ(lines[1], QStringLiteral("' modPrincipal: Revisado"));
-    EXPECT_TRUE(QFileInfo::exists(work.filePath(QStringLiteral("shots/numbering.png"))));
-    EXPECT_TRUE(QFileInfo::exists(work.filePath(QStringLiteral("shots/find.png"))));
+    EXPECT_FALSE(lines.filter(QRegularExpression(u"^10000 \\t\\S"_qs)).isEmpty());
+    EXPECT_FALSE(lines.filter(QRegularExpression(u"^10005 \\t\\S"_qs)).isEmpty());
+    EXPECT_EQ(lines[1], u"' modPrincipal: Revisado"_qs);
+    EXPECT_TRUE(QFileInfo::exists(work.filePath(u"shots/numbering.png"_qs)));
+    EXPECT_TRUE(QFileInfo::exists(work.filePath(u"shots/find.png"_qs)));
   } else {
-    EXPECT_EQ(changed, QStringList{QStringLiteral("Loja/Loja.vbp")});
+    EXPECT_EQ(changed, QStringList{u"Loja/Loja.vbp"_qs});
   }
   for (const char* shot : {"shots/typed.png", "shots/saved.png"}) {
     const QImage image(work.filePath(QLatin1StringView(shot)));
@@ -206,27 +203,26 @@ TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
 
 TEST(EndToEnd, WithoutItsAddInTheIdeStartsAndSaysSo) {
   QTemporaryDir work;
-  const QString scriptPath = work.filePath(QStringLiteral("noaddin.qis"));
+  const QString scriptPath = work.filePath(u"noaddin.qis"_qs);
   writeBytes(scriptPath,
              "expect status \"add-in was not found at /nonexistent/libquimbel-addin.so\"\n"
              "expect no-control \"Menu Bar\" Quimbel\n"
              "expect control \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n");
   QProcessEnvironment environment;
-  environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), work.filePath(QStringLiteral("config")));
+  environment.insert(u"QUIMBEL_CONFIG_DIR"_qs, work.filePath(u"config"_qs));
   const Session session =
-      runIde(scriptPath, environment,
-             {QStringLiteral("--addin"), QStringLiteral("/nonexistent/libquimbel-addin.so")});
+      runIde(scriptPath, environment, {u"--addin"_qs, u"/nonexistent/libquimbel-addin.so"_qs});
   EXPECT_EQ(session.exitCode, 0) << session.err.toStdString();
-  EXPECT_FALSE(session.out.contains(QStringLiteral("msgbox:"))) << "said in the status bar, not in a box";
+  EXPECT_FALSE(session.out.contains(u"msgbox:"_qs)) << "said in the status bar, not in a box";
 }
 
 TEST(EndToEnd, AScriptMistakeIsReportedWithItsLineBeforeAnythingRuns) {
   QTemporaryDir work;
-  const QString scriptPath = work.filePath(QStringLiteral("bad.qis"));
+  const QString scriptPath = work.filePath(u"bad.qis"_qs);
   writeBytes(scriptPath, "open x.vbp\npress\n");
-  const Session session = runIde(scriptPath, {}, {QStringLiteral("--no-addin")});
+  const Session session = runIde(scriptPath, {}, {u"--no-addin"_qs});
   EXPECT_EQ(session.exitCode, 2);
-  EXPECT_TRUE(session.err.contains(scriptPath + QStringLiteral(":2: \"press\" takes 1 argument, not 0")))
+  EXPECT_TRUE(session.err.contains(scriptPath + u":2: \"press\" takes 1 argument, not 0"_qs))
       << session.err.toStdString();
 }
 
@@ -234,14 +230,14 @@ TEST(EndToEnd, AScriptMistakeIsReportedWithItsLineBeforeAnythingRuns) {
 /// `work`.
 QProcessEnvironment addInEnvironment(ExampleCopy& copy, QTemporaryDir& work) {
   QProcessEnvironment environment;
-  environment.insert(QStringLiteral("DEMO"), QDir(copy.path(QStringLiteral("."))).absolutePath());
-  environment.insert(QStringLiteral("QUIMBEL_CONFIG_DIR"), work.filePath(QStringLiteral("config")));
-  environment.insert(QStringLiteral("QUIMBEL_DATA_DIR"), work.filePath(QStringLiteral("data")));
-  environment.insert(QStringLiteral("TMPDIR"), work.path());
-  QDir(work.path()).mkpath(QStringLiteral("install"));
-  writeBytes(work.filePath(QStringLiteral("quimbel.conf")),
-             "InstallationPath=" + work.filePath(QStringLiteral("install")).toUtf8() + "\n");
-  environment.insert(QStringLiteral("QUIMBEL_MACHINE_CONFIG"), work.filePath(QStringLiteral("quimbel.conf")));
+  environment.insert(u"DEMO"_qs, QDir(copy.path(u"."_qs)).absolutePath());
+  environment.insert(u"QUIMBEL_CONFIG_DIR"_qs, work.filePath(u"config"_qs));
+  environment.insert(u"QUIMBEL_DATA_DIR"_qs, work.filePath(u"data"_qs));
+  environment.insert(u"TMPDIR"_qs, work.path());
+  QDir(work.path()).mkpath(u"install"_qs);
+  writeBytes(work.filePath(u"quimbel.conf"_qs),
+             "InstallationPath=" + work.filePath(u"install"_qs).toUtf8() + "\n");
+  environment.insert(u"QUIMBEL_MACHINE_CONFIG"_qs, work.filePath(u"quimbel.conf"_qs));
   return environment;
 }
 
@@ -251,10 +247,9 @@ TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
   QTemporaryDir work;
   const QProcessEnvironment environment = addInEnvironment(copy, work);
   auto session = [&](const QByteArray& script) {
-    const QString path = work.filePath(QStringLiteral("session.qis"));
+    const QString path = work.filePath(u"session.qis"_qs);
     writeBytes(path, script);
-    const Session run =
-        runIde(path, environment, {QStringLiteral("--addin"), QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
+    const Session run = runIde(path, environment, {u"--addin"_qs, QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
     EXPECT_EQ(run.exitCode, 0) << run.out.toStdString() << run.err.toStdString();
     return run;
   };
@@ -280,8 +275,8 @@ TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
       "key Return\n"
       "wait closed\n"
       "saveas \"${DEMO}/Copia/Loja.vbp\"\n");
-  EXPECT_TRUE(QFileInfo::exists(copy.path(QStringLiteral("Copia/qm000001.qmi"))));
-  EXPECT_FALSE(QFileInfo::exists(copy.path(QStringLiteral("Loja/qm000001.qmi"))));
+  EXPECT_TRUE(QFileInfo::exists(copy.path(u"Copia/qm000001.qmi"_qs)));
+  EXPECT_FALSE(QFileInfo::exists(copy.path(u"Loja/qm000001.qmi"_qs)));
   // The next session, and the command-line tool, find both beside the saved copy.
   session(
       "open \"${DEMO}/Copia/Loja.vbp\"\n"
@@ -293,18 +288,17 @@ TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
       "set lvFavorites Main\n"
       "key Escape\n");
   QProcess tool;
-  tool.start(QStringLiteral(QUIMBEL_BINARY),
-             {QStringLiteral("tasks"), copy.path(QStringLiteral("Copia/Loja.vbp"))});
+  tool.start(QStringLiteral(QUIMBEL_BINARY), {u"tasks"_qs, copy.path(u"Copia/Loja.vbp"_qs)});
   ASSERT_TRUE(tool.waitForFinished(60000));
-  EXPECT_TRUE(QString::fromUtf8(tool.readAllStandardOutput())
-                  .contains(QStringLiteral("[ ]  Conferir o frete (urgente)")));
+  EXPECT_TRUE(
+      QString::fromUtf8(tool.readAllStandardOutput()).contains(u"[ ]  Conferir o frete (urgente)"_qs));
 }
 
 TEST(EndToEnd, AFormDesignedWithTheAddInGetsItsPropertiesAndProceduresSaved) {
   if (!hasAddIn()) GTEST_SKIP() << "the add-in is not built";
   ExampleCopy copy;
   QTemporaryDir work;
-  const QString script = work.filePath(QStringLiteral("design.qis"));
+  const QString script = work.filePath(u"design.qis"_qs);
   // A new form, a text box from the toolbox with its property dialog, a label, a rename in the properties
   // window (carried into the code once the option is on).
   writeBytes(script,
@@ -334,10 +328,10 @@ TEST(EndToEnd, AFormDesignedWithTheAddInGetsItsPropertiesAndProceduresSaved) {
              "control txtNome\n"
              "property Name txtCliente\n"
              "save\n");
-  const Session run = runIde(script, addInEnvironment(copy, work),
-                             {QStringLiteral("--addin"), QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
+  const Session run =
+      runIde(script, addInEnvironment(copy, work), {u"--addin"_qs, QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
   ASSERT_EQ(run.exitCode, 0) << run.out.toStdString() << run.err.toStdString();
-  const QString form = QString::fromLatin1(readBytes(copy.path(QStringLiteral("Loja/Form1.frm"))));
+  const QString form = QString::fromLatin1(readBytes(copy.path(u"Loja/Form1.frm"_qs)));
   for (const char* line :
        {"   BorderStyle     =   1  'Fixed Single\r\n", "   StartUpPosition =   2  'CenterScreen\r\n",
         "   Begin VB.TextBox txtCliente \r\n", "      MaxLength       =   30\r\n",
@@ -348,8 +342,8 @@ TEST(EndToEnd, AFormDesignedWithTheAddInGetsItsPropertiesAndProceduresSaved) {
         "Private Sub txtCliente_LostFocus()\r\n   txtCliente.BackColor = &H80000005&\r\nEnd Sub\r\n"
         "Private Sub txtCliente_KeyPress(KeyAscii As Integer)\r\n"})
     EXPECT_TRUE(form.contains(QString::fromLatin1(line))) << line << "\n" << form.toStdString();
-  EXPECT_FALSE(form.contains(QStringLiteral("txtNome")));
-  EXPECT_FALSE(form.contains(QStringLiteral("ToolTipText"))) << "the dialog wrote only what changed";
+  EXPECT_FALSE(form.contains(u"txtNome"_qs));
+  EXPECT_FALSE(form.contains(u"ToolTipText"_qs)) << "the dialog wrote only what changed";
 }
 
 }  // namespace

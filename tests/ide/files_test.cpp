@@ -36,9 +36,7 @@ using test::waitFor;
 class FilesTest : public test::IdeTest {
  protected:
   IdeCommands& commands() { return m_window->commands(); }
-  void selectLoja() {
-    m_window->explorer().selectComponent(component(QStringLiteral("Loja"), QStringLiteral("modPrincipal")));
-  }
+  void selectLoja() { m_window->explorer().selectComponent(component(u"Loja"_qs, u"modPrincipal"_qs)); }
 };
 
 TEST_F(FilesTest, AddModuleAddsToTheCurrentProjectAndOpensItsCode) {
@@ -48,25 +46,25 @@ TEST_F(FilesTest, AddModuleAddsToTheCurrentProjectAndOpensItsCode) {
       [&](const ide::Ref<ide::VBComponent>& c) { added << c->Name(); });
   commands().run(host::BuiltinCommand::AddModule);
   settle();
-  EXPECT_EQ(added, QStringList{QStringLiteral("Module1")});
-  auto module = component(QStringLiteral("Loja"), QStringLiteral("Module1"));
+  EXPECT_EQ(added, QStringList{u"Module1"_qs});
+  auto module = component(u"Loja"_qs, u"Module1"_qs);
   ASSERT_TRUE(module);
   EXPECT_EQ(m_ide.vbe->ActiveCodePane(), module->codeModule()->pane());
   commands().run(host::BuiltinCommand::AddForm);
   settle();
-  auto form = component(QStringLiteral("Loja"), QStringLiteral("Form1"));
+  auto form = component(u"Loja"_qs, u"Form1"_qs);
   ASSERT_TRUE(form);
   EXPECT_EQ(m_ide.vbe->ActiveWindow(), form->designerWindow());
 }
 
 TEST_F(FilesTest, SaveWritesWhatWasTyped) {
-  auto principal = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
-  openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  auto principal = component(u"Loja"_qs, u"modPrincipal"_qs);
+  openCode(u"Loja"_qs, u"modPrincipal"_qs);
   principal->codeModule()->pane()->SetSelection(1, 1, 1, 1);
   auto* code = m_window->windows().activeCodeWindow();
   ASSERT_NE(code, nullptr);
   QTextCursor cursor = code->editor()->textCursor();
-  cursor.insertText(QStringLiteral("' gravado pela IDE\n"));
+  cursor.insertText(u"' gravado pela IDE\n"_qs);
   const auto before = m_copy.snapshot();
   ASSERT_TRUE(commands().saveAll());
   const auto after = m_copy.snapshot();
@@ -75,7 +73,7 @@ TEST_F(FilesTest, SaveWritesWhatWasTyped) {
     EXPECT_EQ(after.value(it.key()), it.value()) << it.key().toStdString();
   }
   EXPECT_TRUE(
-      after.value(QStringLiteral("Loja/modPrincipal.bas"))
+      after.value(u"Loja/modPrincipal.bas"_qs)
           .contains("Attribute VB_Name = \"modPrincipal\"\r\n' gravado pela IDE\r\nOption Explicit\r\n"));
   EXPECT_FALSE(principal->IsDirty());
 }
@@ -84,52 +82,51 @@ TEST_F(FilesTest, SaveAsMovesTheProjectFileAndFiresTheEvent) {
   QStringList changes;
   auto sink = m_ide.vbe->events().files->AfterChangeFileName.connect(
       [&](const ide::Ref<ide::VBProject>&, ide::FileType type, const QString& newName, const QString&) {
-        changes << QStringLiteral("%1 %2").arg(static_cast<int>(type)).arg(QFileInfo(newName).fileName());
+        changes << u"%1 %2"_qs.arg(static_cast<int>(type)).arg(QFileInfo(newName).fileName());
       });
-  auto project = m_ide.vbe->project(QStringLiteral("Loja"));
-  const QString target = m_copy.path(QStringLiteral("Loja/LojaNova.vbp"));
+  auto project = m_ide.vbe->project(u"Loja"_qs);
+  const QString target = m_copy.path(u"Loja/LojaNova.vbp"_qs);
   ASSERT_TRUE(commands().saveProjectAs(project, target));
-  EXPECT_EQ(changes, QStringList{QStringLiteral("3 LojaNova.vbp")});
+  EXPECT_EQ(changes, QStringList{u"3 LojaNova.vbp"_qs});
   EXPECT_TRUE(QFileInfo::exists(target));
   EXPECT_EQ(project->FileName(), target);
 }
 
 TEST_F(FilesTest, RemovingAChangedComponentAsksFirst) {
-  auto clientes = component(QStringLiteral("Loja"), QStringLiteral("clsClientes"));
-  clientes->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  auto clientes = component(u"Loja"_qs, u"clsClientes"_qs);
+  clientes->codeModule()->InsertLines(1, u"' mudado"_qs);
   m_window->explorer().selectComponent(clientes);
   m_ide.ui->queueAnswer(ide::mb::Cancel);
   commands().run(host::BuiltinCommand::RemoveComponent);
-  EXPECT_TRUE(component(QStringLiteral("Loja"), QStringLiteral("clsClientes")));
+  EXPECT_TRUE(component(u"Loja"_qs, u"clsClientes"_qs));
   ASSERT_EQ(m_messages.size(), 1);
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("clsClientes")));
+  EXPECT_TRUE(m_messages.front().contains(u"clsClientes"_qs));
   m_ide.ui->queueAnswer(ide::mb::No);
   commands().run(host::BuiltinCommand::RemoveComponent);
-  EXPECT_FALSE(component(QStringLiteral("Loja"), QStringLiteral("clsClientes")));
+  EXPECT_FALSE(component(u"Loja"_qs, u"clsClientes"_qs));
 }
 
 TEST_F(FilesTest, ClosingAProjectWithChangesAsksAndCancelKeepsIt) {
-  auto project = m_ide.vbe->project(QStringLiteral("Utilitarios"));
-  project->component(QStringLiteral("modApi"))->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  auto project = m_ide.vbe->project(u"Utilitarios"_qs);
+  project->component(u"modApi"_qs)->codeModule()->InsertLines(1, u"' mudado"_qs);
   m_ide.ui->queueAnswer(ide::mb::Cancel);
   EXPECT_FALSE(commands().closeProject(project));
   EXPECT_EQ(m_ide.vbe->projects().size(), 2u);
   ASSERT_EQ(m_messages.size(), 1);
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("modApi.bas"))) << m_messages.front().toStdString();
-  const QByteArray onDisk = readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas")));
+  EXPECT_TRUE(m_messages.front().contains(u"modApi.bas"_qs)) << m_messages.front().toStdString();
+  const QByteArray onDisk = readBytes(m_copy.path(u"Utilitarios/modApi.bas"_qs));
   m_ide.ui->queueAnswer(ide::mb::No);
   EXPECT_TRUE(commands().closeProject(project));
   EXPECT_EQ(m_ide.vbe->projects().size(), 1u);
-  EXPECT_EQ(readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas"))), onDisk)
-      << "No discards the change";
+  EXPECT_EQ(readBytes(m_copy.path(u"Utilitarios/modApi.bas"_qs)), onDisk) << "No discards the change";
 }
 
 TEST_F(FilesTest, AnAnswerOfYesSavesBeforeClosing) {
-  auto project = m_ide.vbe->project(QStringLiteral("Utilitarios"));
-  project->component(QStringLiteral("modApi"))->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  auto project = m_ide.vbe->project(u"Utilitarios"_qs);
+  project->component(u"modApi"_qs)->codeModule()->InsertLines(1, u"' mudado"_qs);
   m_ide.ui->queueAnswer(ide::mb::Yes);
   EXPECT_TRUE(commands().closeProject(project));
-  EXPECT_TRUE(readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas"))).contains("' mudado\r\n"));
+  EXPECT_TRUE(readBytes(m_copy.path(u"Utilitarios/modApi.bas"_qs)).contains("' mudado\r\n"));
 }
 
 TEST_F(FilesTest, NewProjectReplacesTheProjectsWithAFreshOneAndItsForm) {
@@ -138,22 +135,20 @@ TEST_F(FilesTest, NewProjectReplacesTheProjectsWithAFreshOneAndItsForm) {
   settle();
   ASSERT_EQ(m_ide.vbe->projects().size(), 1u);
   auto project = m_ide.vbe->projects().front();
-  EXPECT_EQ(project->Name(), QStringLiteral("Project1"));
+  EXPECT_EQ(project->Name(), u"Project1"_qs);
   ASSERT_EQ(project->components().size(), 1u);
-  EXPECT_EQ(project->components().front()->Name(), QStringLiteral("Form1"));
+  EXPECT_EQ(project->components().front()->Name(), u"Form1"_qs);
   EXPECT_EQ(m_ide.vbe->ActiveWindow(), project->components().front()->designerWindow());
 }
 
 TEST_F(FilesTest, ClosingTheWindowAsksAboutChanges) {
   m_window->show();
-  component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))
-      ->codeModule()
-      ->InsertLines(1, QStringLiteral("' x"));
+  component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule()->InsertLines(1, u"' x"_qs);
   m_ide.ui->queueAnswer(ide::mb::Cancel);
   EXPECT_FALSE(m_window->close());
   EXPECT_TRUE(m_window->isVisible());
   ASSERT_EQ(m_messages.size(), 1);
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("modPrincipal.bas")));
+  EXPECT_TRUE(m_messages.front().contains(u"modPrincipal.bas"_qs));
   m_ide.ui->queueAnswer(ide::mb::No);
   EXPECT_TRUE(m_window->close());
 }
@@ -163,49 +158,48 @@ TEST_F(FilesTest, ClosingTheWindowAsksAboutChanges) {
 
 TEST_F(FilesTest, ABrokenProjectIsNamedWithItsLineAndNothingOpens) {
   QTemporaryDir dir;
-  writeBytes(dir.filePath(QStringLiteral("Broken.vbp")),
+  writeBytes(dir.filePath(u"Broken.vbp"_qs),
              "Type=Exe\r\nModule=modA; modA.bas\r\nForm=Pasta.frm\r\nName=\"Broken\"\r\n");
-  writeBytes(dir.filePath(QStringLiteral("modA.bas")), "Attribute VB_Name = \"modA\"\r\nOption Explicit\r\n");
-  QDir(dir.path()).mkdir(QStringLiteral("Pasta.frm"));
+  writeBytes(dir.filePath(u"modA.bas"_qs), "Attribute VB_Name = \"modA\"\r\nOption Explicit\r\n");
+  QDir(dir.path()).mkdir(u"Pasta.frm"_qs);
   m_ide.ui->queueAnswer(ide::mb::OK);
-  EXPECT_FALSE(commands().open(dir.filePath(QStringLiteral("Broken.vbp")), false));
+  EXPECT_FALSE(commands().open(dir.filePath(u"Broken.vbp"_qs), false));
   EXPECT_EQ(m_ide.vbe->projects().size(), 2u);
   ASSERT_EQ(m_messages.size(), 1);
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Broken.vbp"))) << m_messages.front().toStdString();
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("line 3"))) << m_messages.front().toStdString();
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Pasta.frm"))) << m_messages.front().toStdString();
+  EXPECT_TRUE(m_messages.front().contains(u"Broken.vbp"_qs)) << m_messages.front().toStdString();
+  EXPECT_TRUE(m_messages.front().contains(u"line 3"_qs)) << m_messages.front().toStdString();
+  EXPECT_TRUE(m_messages.front().contains(u"Pasta.frm"_qs)) << m_messages.front().toStdString();
 }
 
 TEST_F(FilesTest, AnUnreadableFileIsNamed) {
   QTemporaryDir dir;
-  QDir(dir.path()).mkdir(QStringLiteral("Pasta.vbp"));
+  QDir(dir.path()).mkdir(u"Pasta.vbp"_qs);
   m_ide.ui->queueAnswer(ide::mb::OK);
-  EXPECT_FALSE(commands().open(dir.filePath(QStringLiteral("Pasta.vbp")), false));
+  EXPECT_FALSE(commands().open(dir.filePath(u"Pasta.vbp"_qs), false));
   ASSERT_EQ(m_messages.size(), 1);
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("Pasta.vbp")));
-  EXPECT_TRUE(m_messages.front().contains(QStringLiteral("directory")));
+  EXPECT_TRUE(m_messages.front().contains(u"Pasta.vbp"_qs));
+  EXPECT_TRUE(m_messages.front().contains(u"directory"_qs));
   EXPECT_EQ(m_ide.vbe->projects().size(), 2u);
 }
 
 TEST_F(FilesTest, AFailedSaveKeepsTheFilesOnDiskAndSaysWhatFailed) {
-  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
-  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  auto api = component(u"Utilitarios"_qs, u"modApi"_qs);
+  api->codeModule()->InsertLines(1, u"' mudado"_qs);
   // The file's folder is a plain file: nobody, not even root, can write there.
-  writeBytes(m_copy.path(QStringLiteral("bloqueio")), "x");
-  api->setFilePath(m_copy.path(QStringLiteral("bloqueio/modApi.bas")));
+  writeBytes(m_copy.path(u"bloqueio"_qs), "x");
+  api->setFilePath(m_copy.path(u"bloqueio/modApi.bas"_qs));
   const auto before = m_copy.snapshot();
   m_ide.ui->queueAnswer(ide::mb::OK);
   EXPECT_FALSE(commands().saveAll());
   ASSERT_FALSE(m_messages.isEmpty());
-  EXPECT_TRUE(m_messages.last().contains(QStringLiteral("bloqueio/modApi.bas")))
-      << m_messages.last().toStdString();
+  EXPECT_TRUE(m_messages.last().contains(u"bloqueio/modApi.bas"_qs)) << m_messages.last().toStdString();
   EXPECT_EQ(m_copy.snapshot(), before);
   EXPECT_TRUE(api->IsDirty());
 }
 
 TEST_F(FilesTest, AFileAnotherProgramChangedIsOverwrittenOnlyWhenTheUserSaysSo) {
-  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
-  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  auto api = component(u"Utilitarios"_qs, u"modApi"_qs);
+  api->codeModule()->InsertLines(1, u"' mudado"_qs);
   const QByteArray theirs = "Attribute VB_Name = \"modApi\"\r\n' de outro programa\r\n";
   writeBytes(api->filePath(), theirs);
   m_ide.ui->queueAnswer(ide::mb::No);
@@ -221,10 +215,10 @@ TEST_F(FilesTest, AFileAnotherProgramChangedIsOverwrittenOnlyWhenTheUserSaysSo) 
 }
 
 TEST_F(FilesTest, ASaveThatCannotBeUndoneSaysWhichFileHoldsTheNewText) {
-  auto principal = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
-  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
-  principal->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
-  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  auto principal = component(u"Loja"_qs, u"modPrincipal"_qs);
+  auto api = component(u"Utilitarios"_qs, u"modApi"_qs);
+  principal->codeModule()->InsertLines(1, u"' mudado"_qs);
+  api->codeModule()->InsertLines(1, u"' mudado"_qs);
   host::setFileFaultHook([&](host::FileStep step, const QString& path) {
     const bool replace = step == host::FileStep::Replace && path == api->filePath();
     return replace || (step == host::FileStep::Restore && path == principal->filePath()) ? EIO : 0;
@@ -233,8 +227,8 @@ TEST_F(FilesTest, ASaveThatCannotBeUndoneSaysWhichFileHoldsTheNewText) {
   EXPECT_FALSE(commands().saveAll());
   host::setFileFaultHook({});
   ASSERT_FALSE(m_messages.isEmpty());
-  EXPECT_FALSE(m_messages.last().contains(QStringLiteral("unchanged"))) << m_messages.last().toStdString();
-  EXPECT_TRUE(m_messages.last().contains(principal->filePath() + QStringLiteral(" holds the new text")));
+  EXPECT_FALSE(m_messages.last().contains(u"unchanged"_qs)) << m_messages.last().toStdString();
+  EXPECT_TRUE(m_messages.last().contains(principal->filePath() + u" holds the new text"_qs));
   EXPECT_FALSE(principal->IsDirty());
   EXPECT_TRUE(api->IsDirty());
 }
@@ -243,17 +237,15 @@ TEST_F(FilesTest, ASaveThatCannotBeUndoneSaysWhichFileHoldsTheNewText) {
 class SmallDisk {
  public:
   SmallDisk() {
-    m_mounted = QProcess::execute(QStringLiteral("mount"),
-                                  {QStringLiteral("-t"), QStringLiteral("tmpfs"), QStringLiteral("-o"),
-                                   QStringLiteral("size=64k"), QStringLiteral("tmpfs"), m_dir.path()}) == 0;
+    m_mounted = QProcess::execute(u"mount"_qs, {u"-t"_qs, u"tmpfs"_qs, u"-o"_qs, u"size=64k"_qs, u"tmpfs"_qs,
+                                                m_dir.path()}) == 0;
   }
   ~SmallDisk() {
-    if (m_mounted) QProcess::execute(QStringLiteral("umount"), {m_dir.path()});
+    if (m_mounted) QProcess::execute(u"umount"_qs, {m_dir.path()});
   }
   bool mounted() const { return m_mounted; }
   bool makeReadOnly() {
-    return QProcess::execute(QStringLiteral("mount"),
-                             {QStringLiteral("-o"), QStringLiteral("remount,ro"), m_dir.path()}) == 0;
+    return QProcess::execute(u"mount"_qs, {u"-o"_qs, u"remount,ro"_qs, m_dir.path()}) == 0;
   }
   QString path(const QString& name) const { return m_dir.filePath(name); }
 
@@ -265,37 +257,36 @@ class SmallDisk {
 TEST_F(FilesTest, AWriteToAFullDiskKeepsTheOldFile) {
   SmallDisk disk;
   if (!disk.mounted()) GTEST_SKIP() << "cannot mount a small file system here";
-  const QByteArray original = readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas")));
-  writeBytes(disk.path(QStringLiteral("modApi.bas")), original);
-  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
-  api->setFilePath(disk.path(QStringLiteral("modApi.bas")));
+  const QByteArray original = readBytes(m_copy.path(u"Utilitarios/modApi.bas"_qs));
+  writeBytes(disk.path(u"modApi.bas"_qs), original);
+  auto api = component(u"Utilitarios"_qs, u"modApi"_qs);
+  api->setFilePath(disk.path(u"modApi.bas"_qs));
   QStringList lines;
   for (int i = 0; i < 2000; ++i)
-    lines << QStringLiteral("' linha de enchimento número %1 para encher o disco").arg(i);
-  api->codeModule()->InsertLines(1, lines.join(QStringLiteral("\r\n")));
+    lines << u"' linha de enchimento número %1 para encher o disco"_qs.arg(i);
+  api->codeModule()->InsertLines(1, lines.join(u"\r\n"_qs));
   m_ide.ui->queueAnswer(ide::mb::OK);
   EXPECT_FALSE(commands().saveComponent(api, false));
   ASSERT_FALSE(m_messages.isEmpty());
-  EXPECT_TRUE(m_messages.last().contains(QStringLiteral("modApi"))) << m_messages.last().toStdString();
-  EXPECT_EQ(readBytes(disk.path(QStringLiteral("modApi.bas"))), original);
+  EXPECT_TRUE(m_messages.last().contains(u"modApi"_qs)) << m_messages.last().toStdString();
+  EXPECT_EQ(readBytes(disk.path(u"modApi.bas"_qs)), original);
 }
 
 TEST_F(FilesTest, ASaveIntoAReadOnlyFolderKeepsTheOldFile) {
   SmallDisk disk;
   if (!disk.mounted()) GTEST_SKIP() << "cannot mount a small file system here";
-  const QByteArray original = readBytes(m_copy.path(QStringLiteral("Utilitarios/modApi.bas")));
-  writeBytes(disk.path(QStringLiteral("modApi.bas")), original);
+  const QByteArray original = readBytes(m_copy.path(u"Utilitarios/modApi.bas"_qs));
+  writeBytes(disk.path(u"modApi.bas"_qs), original);
   // Root may write into any folder whose mode forbids it; a file system mounted read-only stops everyone.
   ASSERT_TRUE(disk.makeReadOnly());
-  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
-  api->setFilePath(disk.path(QStringLiteral("modApi.bas")));
-  api->codeModule()->InsertLines(1, QStringLiteral("' mudado"));
+  auto api = component(u"Utilitarios"_qs, u"modApi"_qs);
+  api->setFilePath(disk.path(u"modApi.bas"_qs));
+  api->codeModule()->InsertLines(1, u"' mudado"_qs);
   m_ide.ui->queueAnswer(ide::mb::OK);
   EXPECT_FALSE(commands().saveComponent(api, false));
   ASSERT_FALSE(m_messages.isEmpty());
-  EXPECT_TRUE(m_messages.last().contains(disk.path(QStringLiteral("modApi.bas"))))
-      << m_messages.last().toStdString();
-  EXPECT_EQ(readBytes(disk.path(QStringLiteral("modApi.bas"))), original);
+  EXPECT_TRUE(m_messages.last().contains(disk.path(u"modApi.bas"_qs))) << m_messages.last().toStdString();
+  EXPECT_EQ(readBytes(disk.path(u"modApi.bas"_qs)), original);
   EXPECT_TRUE(api->IsDirty());
 }
 
@@ -306,16 +297,16 @@ TEST_F(FilesTest, TheAddInManagerLoadsAndUnloadsAnAddIn) {
   auto addIn = m_ide.vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_TEST_ADDIN), false);
   {
     AddInManagerDialog dialog(m_ide.vbe->addIns(), m_window.get());
-    dialog.findChild<QCheckBox*>(QStringLiteral("loadedCheck"))->setChecked(true);
-    dialog.findChild<QCheckBox*>(QStringLiteral("startupCheck"))->setChecked(true);
+    dialog.findChild<QCheckBox*>(u"loadedCheck"_qs)->setChecked(true);
+    dialog.findChild<QCheckBox*>(u"startupCheck"_qs)->setChecked(true);
     dialog.apply({});
   }
   EXPECT_TRUE(addIn->Connect());
   EXPECT_TRUE(addIn->loadOnStartup());
   {
     AddInManagerDialog dialog(m_ide.vbe->addIns(), m_window.get());
-    EXPECT_TRUE(dialog.findChild<QCheckBox*>(QStringLiteral("loadedCheck"))->isChecked());
-    dialog.findChild<QCheckBox*>(QStringLiteral("loadedCheck"))->setChecked(false);
+    EXPECT_TRUE(dialog.findChild<QCheckBox*>(u"loadedCheck"_qs)->isChecked());
+    dialog.findChild<QCheckBox*>(u"loadedCheck"_qs)->setChecked(false);
     dialog.apply({});
   }
   EXPECT_TRUE(waitFor([&] { return !addIn->Connect(); }));

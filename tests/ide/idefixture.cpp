@@ -45,9 +45,8 @@ DesktopVbe::DesktopVbe() {
 
 void IdeTest::SetUp() {
   m_window = std::make_unique<MainWindow>(m_ide.vbe, *m_ide.ui);
-  m_ide.ui->setMessageObserver([this](const QString& title, const QString& text) {
-    m_messages << title + QStringLiteral(": ") + text;
-  });
+  m_ide.ui->setMessageObserver(
+      [this](const QString& title, const QString& text) { m_messages << title + u": "_qs + text; });
   m_ide.vbe->open(m_copy.groupFile());
   settle();
 }

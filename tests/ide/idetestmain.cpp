@@ -9,7 +9,7 @@
 int main(int argc, char** argv) {
   if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", QByteArray("offscreen"));
   QApplication app(argc, argv);
-  QApplication::setStyle(QStringLiteral("Fusion"));
+  QApplication::setStyle(u"Fusion"_qs);
   ::testing::InitGoogleTest(&argc, argv);
   return RUN_ALL_TESTS();
 }

@@ -37,41 +37,40 @@ TEST_F(MainWindowTest, TheExplorerListsProjectsAndComponentsByType) {
   explorer.refresh();
   ASSERT_EQ(explorer.topLevelItemCount(), 2);
   QTreeWidgetItem* loja = explorer.topLevelItem(0);
-  EXPECT_EQ(loja->text(0), QStringLiteral("Loja (Loja.vbp)"));
+  EXPECT_EQ(loja->text(0), u"Loja (Loja.vbp)"_qs);
   QStringList folders;
   for (int i = 0; i < loja->childCount(); ++i)
     folders << loja->child(i)->text(0);
-  EXPECT_EQ(folders, (QStringList{QStringLiteral("Forms"), QStringLiteral("Modules"),
-                                  QStringLiteral("Class Modules"), QStringLiteral("User Controls")}));
+  EXPECT_EQ(folders, (QStringList{u"Forms"_qs, u"Modules"_qs, u"Class Modules"_qs, u"User Controls"_qs}));
   QTreeWidgetItem* forms = loja->child(0);
   ASSERT_EQ(forms->childCount(), 4);
-  EXPECT_EQ(forms->child(0)->text(0), QStringLiteral("frmPrincipal (frmPrincipal.frm)"));
+  EXPECT_EQ(forms->child(0)->text(0), u"frmPrincipal (frmPrincipal.frm)"_qs);
 }
 
 TEST_F(MainWindowTest, SelectingAComponentSelectsItInTheIdeAndFiresTheEvent) {
   QStringList selected;
   auto connection = m_ide.vbe->events().components->ItemSelected.connect(
       [&](const ide::Ref<ide::VBComponent>& c) { selected << c->Name(); });
-  auto clientes = component(QStringLiteral("Loja"), QStringLiteral("clsClientes"));
+  auto clientes = component(u"Loja"_qs, u"clsClientes"_qs);
   m_window->explorer().refresh();
   m_window->explorer().setCurrentItem(m_window->explorer().itemOf(clientes.get()));
   EXPECT_EQ(m_ide.vbe->SelectedVBComponent(), clientes);
-  EXPECT_EQ(selected, QStringList{QStringLiteral("clsClientes")});
+  EXPECT_EQ(selected, QStringList{u"clsClientes"_qs});
 }
 
 TEST_F(MainWindowTest, TheExplorerFollowsTheSelectionOfTheModel) {
-  auto api = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  auto api = component(u"Utilitarios"_qs, u"modApi"_qs);
   m_ide.vbe->selectComponent(api);
   settle();
   EXPECT_EQ(m_window->explorer().componentOf(m_window->explorer().currentItem()), api);
 }
 
 TEST_F(MainWindowTest, AddedAndRemovedComponentsAppearAndVanish) {
-  auto project = m_ide.vbe->project(QStringLiteral("Utilitarios"));
+  auto project = m_ide.vbe->project(u"Utilitarios"_qs);
   auto added = std::static_pointer_cast<host::ComponentImpl>(project->Add(ide::ComponentType::ClassModule));
   settle();
   ASSERT_NE(m_window->explorer().itemOf(added.get()), nullptr);
-  EXPECT_EQ(m_window->explorer().itemOf(added.get())->text(0), QStringLiteral("Class1"));
+  EXPECT_EQ(m_window->explorer().itemOf(added.get())->text(0), u"Class1"_qs);
   project->Remove(added);
   settle();
   EXPECT_EQ(m_window->explorer().itemOf(added.get()), nullptr);
@@ -81,35 +80,33 @@ TEST_F(MainWindowTest, AddedAndRemovedComponentsAppearAndVanish) {
 // Windows
 
 TEST_F(MainWindowTest, DoubleClickingAModuleOpensItsCodeWindow) {
-  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
   ASSERT_NE(sub, nullptr);
-  EXPECT_EQ(sub->windowTitle(), QStringLiteral("Loja - modPrincipal (Code)"));
-  auto pane = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane();
+  EXPECT_EQ(sub->windowTitle(), u"Loja - modPrincipal (Code)"_qs);
+  auto pane = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule()->pane();
   EXPECT_EQ(m_ide.vbe->ActiveCodePane(), pane);
   EXPECT_EQ(m_ide.vbe->ActiveWindow(), pane->window());
   EXPECT_EQ(m_window->mdiArea()->activeSubWindow(), sub);
 }
 
 TEST_F(MainWindowTest, ActivationFollowsBothWays) {
-  QMdiSubWindow* principal = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
-  QMdiSubWindow* api = openCode(QStringLiteral("Utilitarios"), QStringLiteral("modApi"));
+  QMdiSubWindow* principal = openCode(u"Loja"_qs, u"modPrincipal"_qs);
+  QMdiSubWindow* api = openCode(u"Utilitarios"_qs, u"modApi"_qs);
   ASSERT_TRUE(principal && api);
-  auto principalPane =
-      component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane();
-  auto apiPane = component(QStringLiteral("Utilitarios"), QStringLiteral("modApi"))->codeModule()->pane();
+  auto principalPane = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule()->pane();
+  auto apiPane = component(u"Utilitarios"_qs, u"modApi"_qs)->codeModule()->pane();
   EXPECT_EQ(m_ide.vbe->ActiveCodePane(), apiPane);
   m_window->mdiArea()->setActiveSubWindow(principal);
   EXPECT_EQ(m_ide.vbe->ActiveCodePane(), principalPane);
-  EXPECT_EQ(m_ide.vbe->ActiveVBProject()->Name(), QStringLiteral("Loja"));
+  EXPECT_EQ(m_ide.vbe->ActiveVBProject()->Name(), u"Loja"_qs);
   apiPane->Show();
   EXPECT_EQ(m_window->mdiArea()->activeSubWindow(), api);
 }
 
 TEST_F(MainWindowTest, MinimisedStateFollowsBothWays) {
-  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
   ASSERT_NE(sub, nullptr);
-  auto window =
-      component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane()->window();
+  auto window = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule()->pane()->window();
   window->setWindowState(ide::WindowState::Minimize);
   EXPECT_TRUE(sub->isMinimized());
   window->setWindowState(ide::WindowState::Normal);
@@ -121,17 +118,16 @@ TEST_F(MainWindowTest, MinimisedStateFollowsBothWays) {
 }
 
 TEST_F(MainWindowTest, ClosingWorksFromEitherSide) {
-  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
   ASSERT_NE(sub, nullptr);
-  auto window =
-      component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane()->window();
+  auto window = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule()->pane()->window();
   QPointer<QMdiSubWindow> guard = sub;
   window->Close();
   settle();
   EXPECT_TRUE(guard.isNull());
   EXPECT_TRUE(m_window->mdiArea()->subWindowList().isEmpty());
 
-  sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
   ASSERT_NE(sub, nullptr);
   EXPECT_TRUE(window->isOpen());
   sub->close();
@@ -142,7 +138,7 @@ TEST_F(MainWindowTest, ClosingWorksFromEitherSide) {
 
 TEST_F(MainWindowTest, TheKeyboardFocusIsTheWindowOfTheFocusedWidget) {
   activate();
-  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
   ASSERT_NE(sub, nullptr);
   auto* code = qobject_cast<CodeWindow*>(sub->widget());
   auto window = code->window();
@@ -156,22 +152,22 @@ TEST_F(MainWindowTest, TheKeyboardFocusIsTheWindowOfTheFocusedWidget) {
 
 TEST_F(MainWindowTest, EditCommandsWorkOnTheFocusedEditor) {
   activate();
-  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
   ASSERT_NE(sub, nullptr);
   auto* code = qobject_cast<CodeWindow*>(sub->widget());
   code->editor()->setFocus();
   ASSERT_TRUE(waitFor([&] { return code->editor()->hasFocus(); }));
-  auto module = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule();
+  auto module = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule();
   code->pane()->SetSelection(1, 1, 1, 7);  // "Option"
   m_window->commands().run(host::BuiltinCommand::Copy);
   code->pane()->SetSelection(2, 1, 2, 1);
   m_window->commands().run(host::BuiltinCommand::Paste);
   if (module->Lines(2, 1).isEmpty()) GTEST_SKIP() << "no clipboard on this platform";
-  EXPECT_EQ(module->Lines(2, 1), QStringLiteral("Option"));
+  EXPECT_EQ(module->Lines(2, 1), u"Option"_qs);
   m_window->commands().run(host::BuiltinCommand::Undo);
   EXPECT_EQ(module->Lines(2, 1), QString());
   m_window->commands().run(host::BuiltinCommand::Redo);
-  EXPECT_EQ(module->Lines(2, 1), QStringLiteral("Option"));
+  EXPECT_EQ(module->Lines(2, 1), u"Option"_qs);
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -205,7 +201,7 @@ class HotKeys : public test::IdeTest {
   void SetUp() override {
     IdeTest::SetUp();
     activate();
-    QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+    QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
     ASSERT_NE(sub, nullptr);
     m_code = qobject_cast<CodeWindow*>(sub->widget());
     m_code->editor()->setFocus();
@@ -267,7 +263,7 @@ TEST_F(HotKeys, ARegisteredHotKeyGoesBeforeAMenuShortcut) {
 
 TEST(MainWindowSettings, TheWindowRemembersItsGeometry) {
   QTemporaryDir dir;
-  const QString settings = dir.filePath(QStringLiteral("quimbel-ide.ini"));
+  const QString settings = dir.filePath(u"quimbel-ide.ini"_qs);
   test::DesktopVbe first;
   {
     MainWindowOptions options;
@@ -292,44 +288,43 @@ TEST(MainWindowSettings, TheWindowRemembersItsGeometry) {
 TEST_F(MainWindowTest, RunCommandsSwitchTheModeAndTheTitle) {
   auto run = [&](const QString& caption) {
     m_window->commandBars().syncNow();
-    auto control = m_ide.vbe->commandBars()->bar(QStringLiteral("Run"))->findControl(caption);
+    auto control = m_ide.vbe->commandBars()->bar(u"Run"_qs)->findControl(caption);
     ASSERT_TRUE(control);
     m_window->commandBars().click(control);
     settle();
   };
-  QMdiSubWindow* sub = openCode(QStringLiteral("Loja"), QStringLiteral("modPrincipal"));
+  QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
   ASSERT_NE(sub, nullptr);
   CodeEditor* editor = qobject_cast<CodeWindow*>(sub->widget())->editor();
-  EXPECT_TRUE(m_window->windowTitle().endsWith(QStringLiteral("[design]")));
-  run(QStringLiteral("Start"));
+  EXPECT_TRUE(m_window->windowTitle().endsWith(u"[design]"_qs));
+  run(u"Start"_qs);
   EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Run);
-  EXPECT_TRUE(m_window->windowTitle().endsWith(QStringLiteral("[run]")));
+  EXPECT_TRUE(m_window->windowTitle().endsWith(u"[run]"_qs));
   EXPECT_TRUE(editor->isReadOnly()) << "running code is not typed into";
-  run(QStringLiteral("Break"));
+  run(u"Break"_qs);
   EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Break);
   EXPECT_FALSE(editor->isReadOnly()) << "in break mode it is";
-  EXPECT_EQ(m_window->codeWindowMenuName(), QStringLiteral("Code Window (Break)"));
-  run(QStringLiteral("End"));
+  EXPECT_EQ(m_window->codeWindowMenuName(), u"Code Window (Break)"_qs);
+  run(u"End"_qs);
   EXPECT_EQ(m_ide.vbe->mode(), ide::IdeMode::Design);
-  EXPECT_EQ(m_window->codeWindowMenuName(), QStringLiteral("Code Window"));
+  EXPECT_EQ(m_window->codeWindowMenuName(), u"Code Window"_qs);
 }
 
 TEST_F(MainWindowTest, TheTitleNamesTheActiveProject) {
-  EXPECT_EQ(m_window->windowTitle(), QStringLiteral("Utilitarios - Quimbel IDE [design]"));
-  m_ide.vbe->setActiveVBProject(m_ide.vbe->project(QStringLiteral("Loja")));
+  EXPECT_EQ(m_window->windowTitle(), u"Utilitarios - Quimbel IDE [design]"_qs);
+  m_ide.vbe->setActiveVBProject(m_ide.vbe->project(u"Loja"_qs));
   settle();
-  EXPECT_EQ(m_window->windowTitle(), QStringLiteral("Loja - Quimbel IDE [design]"));
+  EXPECT_EQ(m_window->windowTitle(), u"Loja - Quimbel IDE [design]"_qs);
 }
 
 TEST_F(MainWindowTest, AContextMenuHoldsTheControlsOfItsBar) {
-  auto bar = m_ide.vbe->commandBars()->bar(QStringLiteral("Code Window (Break)"));
+  auto bar = m_ide.vbe->commandBars()->bar(u"Code Window (Break)"_qs);
   QMenu menu;
   m_window->commandBars().fillMenu(&menu, bar);
   QStringList captions;
   for (QAction* action : menu.actions())
     if (!action->isSeparator()) captions << action->text();
-  EXPECT_EQ(captions, (QStringList{QStringLiteral("Cu&t"), QStringLiteral("&Copy"), QStringLiteral("&Paste"),
-                                   QStringLiteral("Add &Watch...")}));
+  EXPECT_EQ(captions, (QStringList{u"Cu&t"_qs, u"&Copy"_qs, u"&Paste"_qs, u"Add &Watch..."_qs}));
   EXPECT_FALSE(menu.actions().last()->isEnabled());
 }
 

@@ -37,17 +37,17 @@ TEST(QtLoop, TimersFireUntilKilledEvenFromTheirOwnCallback) {
 TEST(QtLoop, PostedWorkRunsLaterInOrder) {
   QtEventLoop loop;
   QStringList order;
-  loop.post([&] { order << QStringLiteral("one"); });
-  loop.post([&] { order << QStringLiteral("two"); });
+  loop.post([&] { order << u"one"_qs; });
+  loop.post([&] { order << u"two"_qs; });
   EXPECT_TRUE(order.isEmpty());
   loop.DoEvents();
-  EXPECT_EQ(order, (QStringList{QStringLiteral("one"), QStringLiteral("two")}));
+  EXPECT_EQ(order, (QStringList{u"one"_qs, u"two"_qs}));
 }
 
 TEST(QtLoop, AThrowingCallbackDoesNotStopTheLoop) {
   QtEventLoop loop;
   bool after = false;
-  loop.post([] { throw ide::Error(5, QStringLiteral("boom")); });
+  loop.post([] { throw ide::Error(5, u"boom"_qs); });
   loop.post([&] { after = true; });
   settle();
   EXPECT_TRUE(after);
@@ -58,8 +58,8 @@ TEST(QtUi, AQueuedAnswerIsGivenWithoutShowingTheBox) {
   QStringList seen;
   ui.setMessageObserver([&](const QString& title, const QString& text) { seen << title + u'|' + text; });
   ui.queueAnswer(ide::mb::No);
-  EXPECT_EQ(ui.MsgBox(QStringLiteral("Salvar?"), ide::mb::YesNo, QStringLiteral("Quimbel")), ide::mb::No);
-  EXPECT_EQ(seen, QStringList{QStringLiteral("Quimbel|Salvar?")});
+  EXPECT_EQ(ui.MsgBox(u"Salvar?"_qs, ide::mb::YesNo, u"Quimbel"_qs), ide::mb::No);
+  EXPECT_EQ(seen, QStringList{u"Quimbel|Salvar?"_qs});
   EXPECT_EQ(QApplication::activeModalWidget(), nullptr);
 }
 
@@ -77,9 +77,8 @@ TEST(QtUi, AShownBoxReturnsTheButtonClicked) {
     EXPECT_EQ(box->parentWidget(), &parent);
     box->button(QMessageBox::Retry)->click();
   });
-  EXPECT_EQ(ui.MsgBox(QStringLiteral("Tentar de novo?"), ide::mb::RetryCancel | ide::mb::Critical, {}),
-            ide::mb::Retry);
-  EXPECT_EQ(shownText, QStringLiteral("Tentar de novo?"));
+  EXPECT_EQ(ui.MsgBox(u"Tentar de novo?"_qs, ide::mb::RetryCancel | ide::mb::Critical, {}), ide::mb::Retry);
+  EXPECT_EQ(shownText, u"Tentar de novo?"_qs);
 }
 
 TEST(QtUi, TheCursorReturnsTheOneItReplaced) {
@@ -109,17 +108,16 @@ TEST(ModelHooks, WindowsTellWhenTheyOpenAndAreActivated) {
   auto vbe = host::VbeImpl::create();
   vbe->open(copy.groupFile());
   QStringList log;
-  auto opened = vbe->childWindowOpened.connect(
-      [&](host::WindowImpl* w) { log << QStringLiteral("opened ") + w->Caption(); });
-  auto activated = vbe->windowActivated.connect(
-      [&](host::WindowImpl* w) { log << QStringLiteral("active ") + w->Caption(); });
-  auto pane =
-      vbe->project(QStringLiteral("Loja"))->component(QStringLiteral("modPrincipal"))->codeModule()->pane();
+  auto opened =
+      vbe->childWindowOpened.connect([&](host::WindowImpl* w) { log << u"opened "_qs + w->Caption(); });
+  auto activated =
+      vbe->windowActivated.connect([&](host::WindowImpl* w) { log << u"active "_qs + w->Caption(); });
+  auto pane = vbe->project(u"Loja"_qs)->component(u"modPrincipal"_qs)->codeModule()->pane();
   pane->Show();
   pane->Show();
-  EXPECT_EQ(log, (QStringList{QStringLiteral("opened Loja - modPrincipal (Code)"),
-                              QStringLiteral("active Loja - modPrincipal (Code)"),
-                              QStringLiteral("active Loja - modPrincipal (Code)")}));
+  EXPECT_EQ(log,
+            (QStringList{u"opened Loja - modPrincipal (Code)"_qs, u"active Loja - modPrincipal (Code)"_qs,
+                         u"active Loja - modPrincipal (Code)"_qs}));
 }
 
 TEST(ModelHooks, TheWindowSystemTellsWhichHotKeysAWindowHolds) {

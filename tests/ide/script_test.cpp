@@ -28,7 +28,7 @@ class ScriptTest : public test::IdeTest {
     runner.setExitOnFinish(false);
     runner.setPatience(3000);
     QString error;
-    if (!runner.parse(text, QStringLiteral("test.qis"), &error)) {
+    if (!runner.parse(text, u"test.qis"_qs, &error)) {
       m_error = error;
       return 2;
     }
@@ -42,23 +42,20 @@ class ScriptTest : public test::IdeTest {
   QString parseError(const QString& text) {
     ScriptRunner runner(*m_window, *m_ide.ui);
     QString error;
-    runner.parse(text, QStringLiteral("s.qis"), &error);
+    runner.parse(text, u"s.qis"_qs, &error);
     return error;
   }
   QString m_error;
 };
 
 TEST_F(ScriptTest, MistakesAreFoundBeforeRunningAndNameTheLine) {
-  EXPECT_EQ(parseError(QStringLiteral("# comment\n\nclik Standard Save\n")),
-            QStringLiteral("s.qis:3: unknown command \"clik\""));
-  EXPECT_EQ(parseError(QStringLiteral("caret 1\n")),
-            QStringLiteral("s.qis:1: \"caret\" takes 2 arguments, not 1"));
-  EXPECT_EQ(parseError(QStringLiteral("save\ntype \"abc\n")), QStringLiteral("s.qis:2: unclosed quote"));
-  EXPECT_EQ(parseError(QStringLiteral("open ${NO_SUCH_VARIABLE_HERE}/x.vbp\n")),
-            QStringLiteral("s.qis:1: unknown variable ${NO_SUCH_VARIABLE_HERE}"));
-  EXPECT_EQ(
-      parseError(QStringLiteral("answer Maybe\n")),
-      QStringLiteral("s.qis:1: \"Maybe\" is not an answer (OK, Cancel, Yes, No, Abort, Retry, Ignore)"));
+  EXPECT_EQ(parseError(u"# comment\n\nclik Standard Save\n"_qs), u"s.qis:3: unknown command \"clik\""_qs);
+  EXPECT_EQ(parseError(u"caret 1\n"_qs), u"s.qis:1: \"caret\" takes 2 arguments, not 1"_qs);
+  EXPECT_EQ(parseError(u"save\ntype \"abc\n"_qs), u"s.qis:2: unclosed quote"_qs);
+  EXPECT_EQ(parseError(u"open ${NO_SUCH_VARIABLE_HERE}/x.vbp\n"_qs),
+            u"s.qis:1: unknown variable ${NO_SUCH_VARIABLE_HERE}"_qs);
+  EXPECT_EQ(parseError(u"answer Maybe\n"_qs),
+            u"s.qis:1: \"Maybe\" is not an answer (OK, Cancel, Yes, No, Abort, Retry, Ignore)"_qs);
 }
 
 TEST_F(ScriptTest, WordsAreSplitWithQuotesEscapesAndVariables) {
@@ -68,14 +65,13 @@ TEST_F(ScriptTest, WordsAreSplitWithQuotesEscapesAndVariables) {
   ASSERT_TRUE(runner.parse(
       QStringLiteral("type \"a \\\"b\\\"\\nc\" # comment\nopen ${QUIMBEL_SCRIPT_TEST_DIR}/p.vbp\n"
                      "click \"Menu Bar\" \"&File\" Save#1\n"),
-      QStringLiteral("s"), &error))
+      u"s"_qs, &error))
       << error.toStdString();
   qunsetenv("QUIMBEL_SCRIPT_TEST_DIR");
   ASSERT_EQ(runner.steps().size(), 3u);
-  EXPECT_EQ(runner.steps()[0].arguments, QStringList{QStringLiteral("a \"b\"\nc")});
-  EXPECT_EQ(runner.steps()[1].arguments, QStringList{QStringLiteral("/tmp/x y/p.vbp")});
-  EXPECT_EQ(runner.steps()[2].arguments,
-            (QStringList{QStringLiteral("Menu Bar"), QStringLiteral("&File"), QStringLiteral("Save#1")}));
+  EXPECT_EQ(runner.steps()[0].arguments, QStringList{u"a \"b\"\nc"_qs});
+  EXPECT_EQ(runner.steps()[1].arguments, QStringList{u"/tmp/x y/p.vbp"_qs});
+  EXPECT_EQ(runner.steps()[2].arguments, (QStringList{u"Menu Bar"_qs, u"&File"_qs, u"Save#1"_qs}));
   EXPECT_EQ(runner.steps()[2].line, 3);
 }
 
@@ -106,9 +102,9 @@ TEST_F(ScriptTest, TheBoxesOfTheActiveCodeWindowAreFilledBeforeUse) {
                          "expect value procedureList KeyPress\n"
                          "expect value objectList cmdOk\n"));
   EXPECT_EQ(code, 0) << m_error.toStdString();
-  auto module = component(QStringLiteral("Loja"), QStringLiteral("frmSobre"))->codeModule();
+  auto module = component(u"Loja"_qs, u"frmSobre"_qs)->codeModule();
   EXPECT_EQ(module->Lines(module->CountOfLines() - 2, 1),
-            QStringLiteral("Private Sub cmdOk_KeyPress(KeyAscii As Integer)"));
+            u"Private Sub cmdOk_KeyPress(KeyAscii As Integer)"_qs);
 }
 
 TEST_F(ScriptTest, AMessyProjectOpensWithoutItsMissingFileAndKeepsItsLineEnds) {
@@ -121,22 +117,22 @@ TEST_F(ScriptTest, AMessyProjectOpensWithoutItsMissingFileAndKeepsItsLineEnds) {
                            .arg(project));
   EXPECT_EQ(code, 0) << m_error.toStdString();
   EXPECT_EQ(host::test::readBytes(project), before);
-  EXPECT_EQ(host::test::readBytes(dir.filePath(QStringLiteral("Fontes/modMisto.bas"))),
+  EXPECT_EQ(host::test::readBytes(dir.filePath(u"Fontes/modMisto.bas"_qs)),
             QByteArray("Attribute VB_Name = \"modMisto\"\nOption Explicit\n' Vers\xE3o antiga\rSub Velha()\r"
                        "    x = 1\r\r\r    y = 2\rEnd Sub\n\n"));
 }
 
 TEST_F(ScriptTest, AFailingStepEndsTheScriptWithItsLine) {
-  EXPECT_EQ(run(QStringLiteral("echo one\nselect Loja.naoExiste\necho never\n")), 1);
-  EXPECT_EQ(m_error, QStringLiteral("test.qis:2: no component \"Loja.naoExiste\" is open"));
-  EXPECT_EQ(run(QStringLiteral("code Loja.modPrincipal\nexpect line 1 \"Outra coisa\"\n")), 1);
-  EXPECT_EQ(m_error, QStringLiteral("test.qis:2: line 1 is \"Option Explicit\", not \"Outra coisa\""));
+  EXPECT_EQ(run(u"echo one\nselect Loja.naoExiste\necho never\n"_qs), 1);
+  EXPECT_EQ(m_error, u"test.qis:2: no component \"Loja.naoExiste\" is open"_qs);
+  EXPECT_EQ(run(u"code Loja.modPrincipal\nexpect line 1 \"Outra coisa\"\n"_qs), 1);
+  EXPECT_EQ(m_error, u"test.qis:2: line 1 is \"Option Explicit\", not \"Outra coisa\""_qs);
 }
 
 TEST_F(ScriptTest, AModalDialogIsDrivenWhileItIsOpen) {
   auto addIn = m_ide.vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_TEST_ADDIN), false);
   QTemporaryDir dir;
-  const QString shot = dir.filePath(QStringLiteral("manager.png"));
+  const QString shot = dir.filePath(u"manager.png"_qs);
   const int code = run(QStringLiteral("click \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n"
                                       "set addInList \"Add-in of the IDE model's tests\"\n"
                                       "set loadedCheck true\n"
@@ -160,7 +156,7 @@ TEST_F(ScriptTest, MessageBoxesAreAnsweredAndRemembered) {
                          "expect message \"Quimbel IDE\"\n"));
   EXPECT_EQ(code, 0) << m_error.toStdString();
   ASSERT_EQ(m_messages.size(), 1);
-  EXPECT_TRUE(m_messages.front().startsWith(QStringLiteral("About Quimbel IDE: Quimbel IDE ")));
+  EXPECT_TRUE(m_messages.front().startsWith(u"About Quimbel IDE: Quimbel IDE "_qs));
 }
 
 TEST_F(ScriptTest, TheFindDialogSelectsWhatItFinds) {
@@ -173,17 +169,17 @@ TEST_F(ScriptTest, TheFindDialogSelectsWhatItFinds) {
                          "press findNextButton\n"
                          "wait closed\n"));
   ASSERT_EQ(code, 0) << m_error.toStdString();
-  auto pane = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule()->pane();
+  auto pane = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule()->pane();
   const auto& s = pane->selection();
-  auto module = component(QStringLiteral("Loja"), QStringLiteral("modPrincipal"))->codeModule();
+  auto module = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule();
   EXPECT_EQ(s.startLine, s.endLine);
   EXPECT_EQ(module->Lines(s.startLine, 1).mid(s.startColumn - 1, s.endColumn - s.startColumn),
-            QStringLiteral("GetTickCount"));
+            u"GetTickCount"_qs);
 }
 
 TEST_F(ScriptTest, AScriptThatLeavesADialogOpenFails) {
-  EXPECT_EQ(run(QStringLiteral("click \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n")), 1);
-  EXPECT_TRUE(m_error.contains(QStringLiteral("Add-In Manager"))) << m_error.toStdString();
+  EXPECT_EQ(run(u"click \"Menu Bar\" \"Add-Ins\" \"Add-In Manager...\"\n"_qs), 1);
+  EXPECT_TRUE(m_error.contains(u"Add-In Manager"_qs)) << m_error.toStdString();
 }
 
 }  // namespace

@@ -32,7 +32,7 @@ QString rangesOf(VbHighlighter& highlighter, const QString& text, bool inComment
   for (const auto& range : formats) {
     const QColor color = range.format.foreground().color();
     const char kind = color == QColor(0x00, 0x80, 0x00) ? 'c' : color == QColor(0x00, 0x00, 0x80) ? 'k' : 'e';
-    parts << QStringLiteral("%1+%2:%3").arg(range.start).arg(range.length).arg(QLatin1Char(kind));
+    parts << u"%1+%2:%3"_qs.arg(range.start).arg(range.length).arg(QLatin1Char(kind));
   }
   return parts.join(u' ');
 }
@@ -44,31 +44,28 @@ class Colours : public ::testing::Test {
 };
 
 TEST_F(Colours, KeywordsStringsAndCommentsOfALine) {
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("Dim s As String ' nota")),
-            QStringLiteral("0+3:k 6+2:k 9+6:k 16+6:c"));
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("x = \"a\"\"b\" & y")), QString())
-      << "strings have no colour";
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("If x = \"Don't Then")), QStringLiteral("0+18:e"))
+  EXPECT_EQ(rangesOf(highlighter(), u"Dim s As String ' nota"_qs), u"0+3:k 6+2:k 9+6:k 16+6:c"_qs);
+  EXPECT_EQ(rangesOf(highlighter(), u"x = \"a\"\"b\" & y"_qs), QString()) << "strings have no colour";
+  EXPECT_EQ(rangesOf(highlighter(), u"If x = \"Don't Then"_qs), u"0+18:e"_qs)
       << "a string left open is a syntax error: the whole line";
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("#If Win32 Then")), QStringLiteral("0+3:k 10+4:k"));
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("rs.Close: Rem feito")), QStringLiteral("10+9:c"))
+  EXPECT_EQ(rangesOf(highlighter(), u"#If Win32 Then"_qs), u"0+3:k 10+4:k"_qs);
+  EXPECT_EQ(rangesOf(highlighter(), u"rs.Close: Rem feito"_qs), u"10+9:c"_qs)
       << "a member after a dot is no keyword; Rem after a colon starts a comment";
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("10010 Rem numerada")), QStringLiteral("6+12:c"));
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("Lembrete = 1")), QString()) << "Rem only as a word";
+  EXPECT_EQ(rangesOf(highlighter(), u"10010 Rem numerada"_qs), u"6+12:c"_qs);
+  EXPECT_EQ(rangesOf(highlighter(), u"Lembrete = 1"_qs), QString()) << "Rem only as a word";
 }
 
 TEST_F(Colours, TheOptionsChangeTheColoursOfEveryCodeWindowAndRememberThem) {
   QTemporaryDir dir;
-  QSettings settings(dir.filePath(QStringLiteral("quimbel-ide.ini")), QSettings::IniFormat);
+  QSettings settings(dir.filePath(u"quimbel-ide.ini"_qs), QSettings::IniFormat);
   OptionsDialog dialog(&settings);
-  dialog.findChild<QListWidget*>(QStringLiteral("codeColorList"))
-      ->setCurrentRow(static_cast<int>(CodeText::Keyword));
-  auto* foreground = dialog.findChild<QComboBox*>(QStringLiteral("foregroundColor"));
+  dialog.findChild<QListWidget*>(u"codeColorList"_qs)->setCurrentRow(static_cast<int>(CodeText::Keyword));
+  auto* foreground = dialog.findChild<QComboBox*>(u"foregroundColor"_qs);
   EXPECT_EQ(foreground->currentData().value<QColor>(), QColor(0x00, 0x00, 0x80)) << "the IDE's dark blue";
-  foreground->setCurrentIndex(foreground->findText(QStringLiteral("#ff0000")));
+  foreground->setCurrentIndex(foreground->findText(u"#ff0000"_qs));
   dialog.accept();
   QList<QTextLayout::FormatRange> formats;
-  highlighter().colour(QStringLiteral("Dim"), false, &formats);
+  highlighter().colour(u"Dim"_qs, false, &formats);
   ASSERT_EQ(formats.size(), 1);
   EXPECT_EQ(formats.front().format.foreground().color(), QColor(0xff, 0x00, 0x00));
   CodeColours::instance().resetToDefaults();
@@ -80,19 +77,18 @@ TEST_F(Colours, TheOptionsChangeTheColoursOfEveryCodeWindowAndRememberThem) {
 
 TEST_F(Colours, ACommentContinuedWithAnUnderscoreGoesOnOnTheNextLine) {
   bool continued = false;
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("x = 1 ' primeira _"), false, &continued),
-            QStringLiteral("6+12:c"));
+  EXPECT_EQ(rangesOf(highlighter(), u"x = 1 ' primeira _"_qs, false, &continued), u"6+12:c"_qs);
   EXPECT_TRUE(continued);
-  EXPECT_EQ(rangesOf(highlighter(), QStringLiteral("  segunda"), true, &continued), QStringLiteral("0+9:c"));
+  EXPECT_EQ(rangesOf(highlighter(), u"  segunda"_qs, true, &continued), u"0+9:c"_qs);
   EXPECT_FALSE(continued);
-  rangesOf(highlighter(), QStringLiteral("x = 1 + _"), false, &continued);
+  rangesOf(highlighter(), u"x = 1 + _"_qs, false, &continued);
   EXPECT_FALSE(continued) << "a continued statement is not a comment";
 }
 
 TEST_F(Colours, OnlyTheLinesNearTheViewAreColouredUntilTheyComeIntoView) {
   QStringList lines;
   for (int i = 1; i <= 2000; ++i)
-    lines << QStringLiteral("Dim v%1 As Long").arg(i);
+    lines << u"Dim v%1 As Long"_qs.arg(i);
   m_editor.resize(500, 300);
   m_editor.show();
   m_editor.setPlainText(lines.join(u'\n'));
@@ -110,13 +106,13 @@ TEST_F(Colours, OnlyTheLinesNearTheViewAreColouredUntilTheyComeIntoView) {
 TEST_F(Colours, AnEditedLineIsColouredAgainAndTheLinesItContinuesInto) {
   m_editor.resize(500, 300);
   m_editor.show();
-  m_editor.setPlainText(QStringLiteral("x = 1\ny = 2\nz = 3"));
+  m_editor.setPlainText(u"x = 1\ny = 2\nz = 3"_qs);
   settle();
   QTextDocument* document = m_editor.document();
   EXPECT_TRUE(document->findBlockByNumber(1).layout()->formats().isEmpty());
   QTextCursor cursor(document->findBlockByNumber(0));
   cursor.movePosition(QTextCursor::EndOfBlock);
-  cursor.insertText(QStringLiteral(" ' nota _"));
+  cursor.insertText(u" ' nota _"_qs);
   EXPECT_EQ(document->findBlockByNumber(0).userState(), VbHighlighter::kInComment);
   ASSERT_EQ(document->findBlockByNumber(1).layout()->formats().size(), 1);
   EXPECT_EQ(document->findBlockByNumber(1).layout()->formats().front().length, 5)
