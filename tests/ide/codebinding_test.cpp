@@ -222,15 +222,13 @@ TEST_F(Binding, TheEditorSelectionIsThePaneSelection) {
   EXPECT_EQ(selection(), (std::array<int, 4>{3, 1, 4, 1}));
 }
 
-TEST_F(Binding, SetSelectionSelectsInTheEditor) {
+TEST_F(Binding, SetSelectionSelectsInTheEditorUpToTheLineEnd) {
   m_pane->SetSelection(4, 5, 4, 16);
   EXPECT_EQ(m_editor->textCursor().selectedText(), u"Debug.Print"_qs);
   m_pane->SetSelection(3, 8, 3, 8);
   EXPECT_FALSE(m_editor->textCursor().hasSelection());
   EXPECT_EQ(m_editor->textCursor().position(), position(3, 8));
-}
-
-TEST_F(Binding, AColumnPastTheLineEndStopsAtTheEnd) {
+  // A column past the line's end stops at the end.
   m_pane->SetSelection(5, 40, 5, 40);
   EXPECT_EQ(m_editor->textCursor().position(), position(5, 8));
   EXPECT_EQ(selection(), (std::array<int, 4>{5, 8, 5, 8}));
