@@ -6,10 +6,15 @@
 #include <QByteArray>
 #include <QMap>
 #include <QString>
+#include <QStringList>
 #include <QTemporaryDir>
 
 #include <functional>
 #include <memory>
+
+namespace ide {
+class VBComponent;
+}
 
 namespace host::test {
 
@@ -35,6 +40,11 @@ QMap<QString, QByteArray> snapshot(const QString& directory);
 
 QByteArray readBytes(const QString& path);
 void writeBytes(const QString& path, const QByteArray& bytes);
+
+/// What VB's compiler would refuse in the component's code (compilecheck.cpp), one text per fault: a Friend
+/// procedure in a standard module, a control's focus events or BackColor on a class without them, a member
+/// named like a control, an Enum, an Enum member or a Type of the module.
+QStringList uncompilableLines(ide::VBComponent& component);
 
 /// The number of the ide::Error the action throws (0 when it throws none), and its description.
 long errorNumberOf(const std::function<void()>& action, QString* description = nullptr);
