@@ -252,9 +252,10 @@ void frmNewProc::Form_Load() {
   m_opType[1]->setChecked(true);
   m_opScope[0]->setChecked(true);
   try {
-    const auto selected = m_services.vbe->SelectedVBComponent();
-    // A standard module has no Friend procedures.
-    m_opScope[2]->setEnabled(!selected || selected->Type() != ide::ComponentType::StdModule);
+    // A standard module has no Friend procedures. What counts is the module the procedure goes into,
+    // the active code pane's, not the component selected in the Project window.
+    const auto target = pane->CodeModule()->Parent();
+    m_opScope[2]->setEnabled(!target || target->Type() != ide::ComponentType::StdModule);
   } catch (const ide::Error&) {
   }
   m_cboDataType->setEditText(QStringLiteral("String"));

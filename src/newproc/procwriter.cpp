@@ -6,6 +6,8 @@
 #include "common/uiutils.h"
 #include "textins/textinsertion.h"
 
+#include <QStringList>
+
 #include <algorithm>
 #include <set>
 
@@ -27,6 +29,54 @@ bool procedureExists(ide::CodeModule& module, const QString& name, ide::ProcKind
   }
 }
 
+// The names the module's declarations give that its Members leave out: each Enum, its members, and each
+// Type. VB refuses a procedure or variable of the module named like any of them.
+QStringList typeAndEnumNames(ide::CodeModule& module) {
+  QStringList names;
+  const int count = module.CountOfDeclarationLines();
+  const QString text = count > 0 ? module.Lines(1, count) : QString();
+  bool inEnum = false;
+  bool continued = false;
+  for (const QString& line : text.split(QStringLiteral("\r\n"))) {
+    const bool statementStart = !continued;
+    continued = line.endsWith(QStringLiteral(" _"));
+    if (!statementStart) continue;
+    QStringList words = line.simplified().split(u' ', Qt::SkipEmptyParts);
+    if (words.isEmpty() || words[0].startsWith(u'\'') || sameName(words[0], QStringLiteral("Rem"))) continue;
+    if (words.size() >= 2 && sameName(words[0], QStringLiteral("End"))) {
+      if (sameName(words[1], QStringLiteral("Enum"))) inEnum = false;
+      continue;
+    }
+    if (inEnum) {
+      // A member: its name first, in brackets when it is no plain identifier.
+      QString name = words[0].section(u'=', 0, 0);
+      if (name.startsWith(u'[')) name = line.trimmed().section(u']', 0, 0).mid(1);
+      if (!name.isEmpty()) names << name;
+      continue;
+    }
+    for (const char* scope : {"Public", "Private", "Global"})
+      if (words.size() > 1 && sameName(words[0], QLatin1StringView(scope))) words.removeFirst();
+    const bool isEnum = sameName(words[0], QStringLiteral("Enum"));
+    if (words.size() >= 2 && (isEnum || sameName(words[0], QStringLiteral("Type")))) {
+      names << words[1].section(u'\'', 0, 0);
+      inEnum = isEnum;
+    }
+  }
+  return names;
+}
+
+// The names of the controls on the module's form (or user control ...); none for a module without one.
+QStringList controlNames(ide::CodeModule& module) {
+  QStringList names;
+  try {
+    if (const auto designer = module.Parent()->Designer())
+      for (const auto& control : designer->VBControls()->items())
+        names << control->name();
+  } catch (const ide::Error&) {
+  }
+  return names;
+}
+
 // Puts the caret at column 1 of `line` and inserts the template there as whole lines.
 void insertTemplate(ide::CodePane& pane, textins::TextInsertion& insertion, int line, const QString& text) {
   pane.SetSelection(line, 1, line, 1);
@@ -39,19 +89,23 @@ std::optional<Refusal> CheckNamesFree(ide::CodeModule& module, const NewProcChoi
   const QString name = choices.name.trimmed();
   const bool property = choices.type == ProcType::Property;
   const QString member = choices.memberVariable.trimmed();
+  const auto inUse = [](int message, Field field) {
+    return Refusal{common::LoadResString(message), ide::mb::Exclamation, field};
+  };
+  // Controls, Enums, Enum members and Types are no members, but VB takes them as names of the module.
+  for (const QString& taken : typeAndEnumNames(module) + controlNames(module)) {
+    if (sameName(taken, name)) return inUse(kNameInUse, Field::Name);
+    if (property && sameName(taken, member)) return inUse(kMemberVariableInUse, Field::MemberVariable);
+  }
   for (const auto& existing : module.Members()->items()) {
     const QString existingName = existing->Name();
     if (sameName(existingName, name)) {
       // A property may gain the accessors it lacks; anything else of that name is a duplicate.
-      if (!property || existing->Type() != ide::MemberType::Property)
-        return Refusal{common::LoadResString(kNameInUse), ide::mb::Exclamation, Field::Name};
+      if (!property || existing->Type() != ide::MemberType::Property) return inUse(kNameInUse, Field::Name);
       for (const ide::ProcKind kind : KindsToWrite(choices))
-        if (procedureExists(module, name, kind))
-          return Refusal{common::LoadResString(kNameInUse), ide::mb::Exclamation, Field::Name};
+        if (procedureExists(module, name, kind)) return inUse(kNameInUse, Field::Name);
     }
-    if (property && sameName(existingName, member))
-      return Refusal{common::LoadResString(kMemberVariableInUse), ide::mb::Exclamation,
-                     Field::MemberVariable};
+    if (property && sameName(existingName, member)) return inUse(kMemberVariableInUse, Field::MemberVariable);
   }
   return std::nullopt;
 }

@@ -23,7 +23,8 @@ struct Templates {
 
 /// Refuses a name the module already uses where the new code would not compile: the procedure's name
 /// taken by another member (for a property: by anything but the same property, or by one of the
-/// accessors to write), 5117; the member variable's name taken by any member, 5118.
+/// accessors to write), 5117; the member variable's name taken by any member, 5118. The controls of the
+/// module's form, its Enums, their members and its Types count as names in use too.
 std::optional<Refusal> CheckNamesFree(ide::CodeModule& module, const NewProcChoices& choices);
 
 /// The line of the `End` statement of the procedure written at `startLine`: the procedure's last line as

@@ -40,7 +40,15 @@ struct Workspace {
                                     QLocale(QLocale::Portuguese, QLocale::Brazil),
                                     [] { return QDateTime(QDate(2024, 3, 7), QTime(14, 5, 9)); }}};
 
-  Workspace() {
+  std::optional<host::test::ExampleCopy> examples;
+
+  /// With `onExamples`, the example group instead of the project below.
+  explicit Workspace(bool onExamples = false) {
+    if (onExamples) {
+      vbe->setActiveVBProject(vbe->open(examples.emplace().groupFile()).front());
+      appInfo.OpenFile(dir.path());
+      return;
+    }
     // clang-format off
     host::test::writeBytes(dir.filePath(u"VENDAS.BAS"_qs), QStringEncoder("Windows-1252")(
         u"Attribute VB_Name = \"modVendas\"\r\nOption Explicit\r\n' Módulo de vendas: preços em R$\r\n"
@@ -70,7 +78,8 @@ struct Workspace {
   ide::Ref<ide::CodeModule> reopened(const QString& component) {
     vbe->saveAll();
     fresh = host::VbeImpl::create();
-    return fresh->open(dir.filePath(u"Loja.vbp"_qs)).front()->VBComponents()->Item(component)->CodeModule();
+    const QString file = examples ? examples->groupFile() : dir.filePath(u"Loja.vbp"_qs);
+    return fresh->open(file).front()->VBComponents()->Item(component)->CodeModule();
   }
   QString file(const QString& name) const {
     return QStringDecoder("Windows-1252")(host::test::readBytes(dir.filePath(name)));
@@ -291,8 +300,46 @@ TEST(NewProcDialog, OpensOnFunctionAndPrivateWithTheStoredOptionsThenItsRulesEna
   d.cmdCancel()->click();
   EXPECT_EQ(d.result(), QDialog::Rejected);
   EXPECT_EQ(work.settings.value(common::setting::ErrorHandlerOnNewProc), u"0"_qs);
-  work.open(u"Clientes"_qs);
-  EXPECT_TRUE(frmNewProc(work.services()).opScope(2)->isEnabled());  // Friend, in a class
+}
+
+// Friend is offered by the module that receives the code, whichever component the Project window selects;
+// the names of a form's controls and of a module's Enums, their members and Types are names in use.
+TEST(NewProcDialog, OnTheExamplesFriendFollowsTheReceivingModuleAndNamesInUseAreRefused) {
+  Workspace work(true);
+  const auto select = [&](const char16_t* name) {
+    work.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(
+        work.vbe->ActiveVBProject()->VBComponents()->Item(QString::fromUtf16(name))));
+  };
+  work.open(u"frmCliente"_qs);
+  select(u"modConstantes");
+  EXPECT_TRUE(frmNewProc(work.services()).opScope(2)->isEnabled());
+  work.open(u"modConstantes"_qs);
+  select(u"clsCliente");
+  frmNewProc d(work.services());
+  EXPECT_FALSE(d.opScope(2)->isEnabled());
+  d.opType(2)->click();
+  d.ckPropGet()->setChecked(true);
+  const std::tuple<const char16_t*, const char16_t*, const char16_t*, int> cases[] = {
+      // clang-format off
+      {u"modConstantes", u"SituacaoPedido", u"mX", 5117}, {u"modConstantes", u"spCancelado", u"mX", 5117},
+      {u"modConstantes", u"registroCliente", u"mX", 5117}, {u"modConstantes", u"Tipo", u"TPFISICA", 5118},
+      {u"modConstantes", u"Tipo", u"mTipo", 0}, {u"frmCliente", u"txtNome", u"mX", 5117},
+      {u"frmCliente", u"Nome", u"cboUF", 5118}, {u"frmCliente", u"Nome", u"mNome", 0}};
+  // clang-format on
+  for (const auto& [module, name, member, message] : cases) {
+    work.open(QString::fromUtf16(module));
+    d.txtName()->setText(QString::fromUtf16(name));
+    d.txtVariable()->setText(QString::fromUtf16(member));
+    ok(work, d, ide::mb::Yes);
+    EXPECT_EQ(work.prompts(), QStringList{message ? common::LoadResString(message) : kCreated})
+        << QString::fromUtf16(name).toStdString();
+  }
+  for (const QString& module : {u"modConstantes"_qs, u"frmCliente"_qs})
+    EXPECT_EQ(host::test::uncompilableLines(*work.reopened(module)->Parent()), QStringList());
+  // What the checker refuses: Friend in a standard module, and an Enum member's name.
+  const auto constants = work.reopened(u"modConstantes"_qs);
+  constants->AddFromString(u"Friend Sub spAberto()\r\nEnd Sub"_qs);
+  EXPECT_EQ(host::test::uncompilableLines(*constants->Parent()).size(), 2);
 }
 
 TEST(NewProcDialog, PublicSubTesteWithBothTemplatesThenYesKeepsTheChoices) {
