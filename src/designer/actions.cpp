@@ -3,9 +3,11 @@
 
 #include "common/errors.h"
 #include "common/uiutils.h"
+#include "designer/values.h"
 
 #include <QStringList>
 
+#include <optional>
 #include <utility>
 #include <vector>
 
@@ -50,6 +52,26 @@ Target targetOf(ide::VBControl& ctl) {
     target.array = false;
   }
   return target;
+}
+
+// Intrinsic classes that never take the focus, and so have no GotFocus or LostFocus event.
+const QStringList kNoFocusEvents = {QStringLiteral("Label"), QStringLiteral("Frame"), QStringLiteral("Image"),
+                                    QStringLiteral("Timer"), QStringLiteral("Shape"), QStringLiteral("Line"),
+                                    QStringLiteral("Menu"),  QStringLiteral("Data")};
+
+/// The control's BackColor as a VB literal ("&H8000000F&"), as the form holds it; nothing when the
+/// control has no BackColor (a Timer, an Image, a scroll bar) or it cannot be read.
+std::optional<QString> backColorLiteral(ide::VBControl& ctl) {
+  try {
+    const QVariant value = ctl.Properties()->Item(QStringLiteral("BackColor"))->Value();
+    bool ok = false;
+    std::optional<double> number = value.toDouble(&ok);
+    if (!ok) number = vbNumber(value.toString());  // a control the tables do not know keeps its text
+    if (!number) return std::nullopt;
+    return QStringLiteral("&H%1&").arg(QString::number(quint32(qint64(*number)), 16).toUpper());
+  } catch (const std::exception&) {
+    return std::nullopt;
+  }
 }
 
 bool hasMember(ide::CodeModule& module, const QString& name) {
@@ -218,6 +240,11 @@ void DesignerActions::IncluirCodigoGotLostFocus(ide::VBControl& ctl, bool applyC
   try {
     const Target target = targetOf(ctl);
     const bool selectText = selectsText(target.className);
+    // The colour comes and goes only on a control that has a BackColor and focus events to change it
+    // in; the LostFocus gives back the colour the control had, not always the window's white.
+    const std::optional<QString> ownColour =
+        applyColour && !kNoFocusEvents.contains(target.className) ? backColorLiteral(ctl) : std::nullopt;
+    applyColour = ownColour.has_value();
     if (!applyColour && !selectText) return;
     if (hasMember(*target.module, target.name + QStringLiteral("_GotFocus")) ||
         hasMember(*target.module, target.name + QStringLiteral("_LostFocus")))
@@ -238,7 +265,7 @@ void DesignerActions::IncluirCodigoGotLostFocus(ide::VBControl& ctl, bool applyC
       lines << QStringLiteral("Private Sub ") + target.name +
                    (target.array ? QStringLiteral("_LostFocus(Index As Integer)")
                                  : QStringLiteral("_LostFocus()"));
-      lines << QStringLiteral("   ") + self + QStringLiteral(".BackColor = &H80000005&");
+      lines << QStringLiteral("   ") + self + QStringLiteral(".BackColor = ") + *ownColour;
       lines << QStringLiteral("End Sub");
     }
     append(*target.module, lines);

@@ -51,7 +51,8 @@ class DesignerActions {
   // module has them already.
   /// Name_KeyDown turning Enter into Tab (not for labels, frames, pictures, images, buttons and timers).
   void IncluirCodigoDeTabParaKeyReturn(ide::VBControl& ctl);
-  /// Name_GotFocus colouring the box and selecting its text, and Name_LostFocus taking the colour back.
+  /// Name_GotFocus colouring the box and selecting its text, and Name_LostFocus giving it back the
+  /// colour the form gave it. The colour only on a control with a BackColor and focus events.
   void IncluirCodigoGotLostFocus(ide::VBControl& ctl, bool applyColour, const QString& colour);
   /// Name_KeyPress turning typed letters into capitals.
   void IncluirCodigoTextUcase(ide::VBControl& ctl);
