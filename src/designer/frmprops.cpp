@@ -24,6 +24,7 @@ namespace {
 
 const QString kModule = QStringLiteral("frmProps");
 constexpr int kVisibleListItems = 6;
+constexpr long kInvalidValue = 380;  // "Invalid property value"
 
 /// Letters typed or pasted into the colour box become capitals.
 class UpperCaseValidator final : public QValidator {
@@ -45,11 +46,42 @@ bool isIndex(const CVBCTProperty& row) {
   return row.PropertyName.compare(QLatin1StringView("Index"), Qt::CaseInsensitive) == 0;
 }
 
+/// Name and Index are written together (writeIdentity).
+bool isIdentity(const CVBCTProperty& row) {
+  return isIndex(row) || row.PropertyName.compare(QLatin1StringView("Name"), Qt::CaseInsensitive) == 0;
+}
+
+/// What a row writes: its value, -1 for an emptied Index.
+QVariant valueToWrite(const CVBCTProperty& row) {
+  if (isIndex(row) && valueText(row.SelectedValue.Value).isEmpty()) return -1;
+  return row.SelectedValue.Value;
+}
+
 /// Focus that leaves or comes back with the whole window (a message box, another application) is no
 /// move between the dialog's fields.
 bool isWindowFocusChange(QEvent* event) {
   const Qt::FocusReason reason = static_cast<QFocusEvent*>(event)->reason();
   return reason == Qt::ActiveWindowFocusReason || reason == Qt::PopupFocusReason;
+}
+
+/// The model's failure to write a property, whose texts are the IDE's English ones, in the dialog's
+/// language: the numbers writing a typed value can meet. `text` is what was typed (for Name and Index,
+/// the name with the index of an array element).
+ide::Error inDialogLanguage(const std::exception& failure, const QString& property, const QString& text) {
+  const auto* error = dynamic_cast<const ide::Error*>(&failure);
+  if (!error) return ide::Error(ide::err::InvalidProcedureCall, QString::fromLocal8Bit(failure.what()));
+  switch (error->number()) {
+    case kOverflow:
+    case kTypeMismatch:
+    case kInvalidValue:
+      return ide::Error(error->number(), QString::fromUtf16(kInvalidPropertyValue).arg(property, text));
+    case ide::err::NameConflict:
+      return ide::Error(error->number(), QString::fromUtf16(kControlNameInUse).arg(text));
+    case ide::err::InvalidName:
+      return ide::Error(error->number(), QString::fromUtf16(kInvalidControlName).arg(text));
+    default:
+      return *error;
+  }
 }
 
 void setBase(QWidget* widget, const QColor& colour) {
@@ -329,30 +361,97 @@ bool frmProps::commitRow(int row) {
   const QString text = box->text().trimmed();
   box->setText(text);
   const CPropValue before = property.SelectedValue;
-  try {
-    if (!text.isEmpty()) {
-      QVariant value;
-      try {
-        const QVariant current = m_control->Properties()->Item(property.PropertyName)->Value();
-        value = ToValueType(text, current);
-      } catch (const ide::Error& error) {
-        if (error.number() != kTypeMismatch && error.number() != kOverflow) throw;
-        throw ide::Error(error.number(),
-                         QString::fromUtf16(kInvalidPropertyValue).arg(property.PropertyName, text));
-      }
-      property.SelectedValue = {text, value};
-    } else {
-      property.SelectedValue = property.DefaultValue.value_or(CPropValue{});
-    }
-    QVariant value = property.SelectedValue.Value;
-    if (isIndex(property) && valueText(value).isEmpty()) value = -1;
-    if (value.isValid()) writeProperty(property.PropertyName, value);
-    return true;
-  } catch (const std::exception& failure) {
+  const auto refuse = [&](const std::exception& failure) {
     property.SelectedValue = before;
     box->setText(property.shownText());
     report(failure, "txtValor_LostFocus", __LINE__);
     return false;
+  };
+  try {
+    if (!text.isEmpty()) {
+      const QVariant current = m_control->Properties()->Item(property.PropertyName)->Value();
+      property.SelectedValue = {text, ToValueType(text, current)};
+    } else {
+      property.SelectedValue = property.DefaultValue.value_or(CPropValue{});
+    }
+  } catch (const std::exception& failure) {
+    return refuse(inDialogLanguage(failure, property.PropertyName, text));
+  }
+  try {
+    if (!isIdentity(property)) {
+      writeRow(property);
+    } else {
+      try {
+        writeIdentity();
+      } catch (const ide::Error& error) {
+        // A name in use waits for OK: the other of the two boxes may be about to make the control an
+        // element of that control array.
+        if (error.number() != ide::err::NameConflict) throw;
+      }
+    }
+    return true;
+  } catch (const std::exception& failure) {
+    return refuse(failure);
+  }
+}
+
+void frmProps::writeRow(const CVBCTProperty& row) {
+  // A row whose property could not be read holds nothing to write.
+  const QVariant value = valueToWrite(row);
+  if (!value.isValid()) return;
+  try {
+    writeProperty(row.PropertyName, value);
+  } catch (const std::exception& failure) {
+    throw inDialogLanguage(failure, row.PropertyName, row.shownText());
+  }
+}
+
+void frmProps::writeIdentity() {
+  const QString name = QStringLiteral("Name");
+  const QString index = QStringLiteral("Index");
+  if (!m_properties.contains(name) || !m_properties.contains(index)) {
+    for (const auto& row : m_properties)
+      if (isIdentity(*row)) writeRow(*row);
+    return;
+  }
+  const QVariant newName = valueToWrite(m_properties.Item(name));
+  const QVariant newIndex = valueToWrite(m_properties.Item(index));
+  const auto properties = m_control->Properties();
+  const QVariant oldName = properties->Item(name)->Value();
+  const QVariant oldIndex = properties->Item(index)->Value();
+  QString failing = index;
+  try {
+    // Index first: the control becomes an element of an array under its old name, then takes the
+    // array's name, which Name first would find in use. Name first when the new index is one the old
+    // name's array has already.
+    bool indexWritten = true;
+    try {
+      writeProperty(index, newIndex);
+    } catch (const ide::Error& error) {
+      if (error.number() != ide::err::NameConflict) throw;
+      indexWritten = false;
+    }
+    failing = name;
+    writeProperty(name, newName);
+    failing = index;
+    if (!indexWritten) writeProperty(index, newIndex);
+  } catch (const std::exception& failure) {
+    // Half written is neither what the control was nor what was asked: back to what it was.
+    for (const auto& [property, value] : {std::pair(index, oldIndex), std::pair(name, oldName)}) {
+      try {
+        writeProperty(property, value);
+      } catch (const std::exception& restoring) {
+        common::logFailure(restoring, kModule, QStringLiteral("writeIdentity"), __LINE__);
+      }
+    }
+    const auto* error = dynamic_cast<const ide::Error*>(&failure);
+    if (error && error->number() == ide::err::NameConflict) {
+      const int element = newIndex.toInt();
+      throw inDialogLanguage(
+          failure, name,
+          valueText(newName) + (element >= 0 ? QStringLiteral("(%1)").arg(element) : QString()));
+    }
+    throw inDialogLanguage(failure, failing, m_properties.Item(failing).shownText());
   }
 }
 
@@ -423,12 +522,15 @@ void frmProps::cmdOk_Click() {
       return;
     }
     if (!colour.isEmpty()) m_focusColor = colour;  // an empty box keeps the previous colour
-    for (const auto& row : m_properties) {
-      QVariant value = row->SelectedValue.Value;
-      if (isIndex(*row) && valueText(value).isEmpty()) value = -1;
-      // A row whose property could not be read holds nothing to write.
-      if (value.isValid()) writeProperty(row->PropertyName, value);
+    try {
+      writeIdentity();
+    } catch (const std::exception& failure) {
+      report(failure, "cmdOk_Click", __LINE__);
+      m_txtValor[0]->setFocus();  // the Name row
+      return;
     }
+    for (const auto& row : m_properties)
+      if (!isIdentity(*row)) writeRow(*row);
     accept();
   } catch (const std::exception& failure) {
     report(failure, "cmdOk_Click", __LINE__);

@@ -70,6 +70,12 @@ class frmProps final : public QDialog {
   bool commitRow(int row);
   /// Writes the value to the control's property, unless the property holds it already.
   void writeProperty(const QString& name, const QVariant& value);
+  /// Writes a row's value; raises the failure in the dialog's language.
+  void writeRow(const CVBCTProperty& row);
+  /// Writes the Name and Index rows together, in the order that lets a control join a control array;
+  /// on a failure the control keeps its name and index, and the failure is raised in the dialog's
+  /// language.
+  void writeIdentity();
   void cmdSeta_Click();
   void lstColeta_Click(int item);
   /// The list closed: hidden, and the focus back in its row's box.

@@ -31,6 +31,9 @@ inline constexpr char16_t kPropsColourNotNumeric[] =
     u"Erro: valor não numérico informado para a cor do controle no ganho do foco.";
 /// A typed value that is no value of the property's type: %1 the property, %2 the text.
 inline constexpr char16_t kInvalidPropertyValue[] = u"Valor inválido para %1: \"%2\".";
+/// A name (with its index, for an element of a control array) another control of the form has.
+inline constexpr char16_t kControlNameInUse[] = u"Já existe neste formulário um controle chamado \"%1\".";
+inline constexpr char16_t kInvalidControlName[] = u"Nome de controle inválido: \"%1\".";
 
 // Both
 inline constexpr char16_t kColourButton[] = u"...";

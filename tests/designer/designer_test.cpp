@@ -349,6 +349,56 @@ TEST(PropertyDialog, EmptiedBoxesTakeTheirDefaults) {
   EXPECT_TRUE(scene.vbe->headlessUi()->messageBoxes().empty());
 }
 
+// On the example group's frmCliente, through the dialog: the focus colour goes only to controls with a
+// BackColor and focus events, and comes back as the control had it; a new button joins the cmdAcao array
+// by its boxes filled one by one; a name in use is refused in the dialog's language. The form compiles.
+TEST(PropertyDialog, OnTheExampleFormWritesWhatCompiles) {
+  host::test::ExampleCopy copy;
+  const auto vbe = host::VbeImpl::create();
+  const auto form = vbe->open(copy.groupFile()).front()->VBComponents()->Item(u"frmCliente"_qs);
+  const common::Options options{.ColorOnFocus = u"&HFFFF&"_qs};
+  ide::UserInterface& ui = *vbe->headlessUi();
+  QStringList typed;  // the Name and Index boxes, filled in one by one
+  DesignerActions actions(ui, options, [&](const ide::Ref<ide::VBControl>& control) {
+    frmProps d(control, options, ui);
+    showActive(d);
+    for (int row = 0; row < typed.size(); ++row) {
+      d.txtValor(row)->setFocus();
+      d.txtValor(row)->setText(typed[row]);
+    }
+    d.ckBackColor()->click();
+    d.cmdOK()->click();
+    return PropsChoice{d.Cancelled(), d.EnterAsTab(), d.BackColorOnFocus(), d.FocusColor()};
+  });
+  for (const char16_t* className : {u"Timer", u"Image", u"CommandButton", u"TextBox"})
+    actions.ControlAdded(form->Designer()->VBControls()->Add(QString::fromUtf16(className)));
+  typed = QStringList{u"cmdAcao"_qs, u"3"_qs};
+  actions.ControlAdded(form->Designer()->VBControls()->Add(u"CommandButton"_qs));
+  EXPECT_TRUE(vbe->headlessUi()->messageBoxes().empty());
+  const QStringList code = linesOf(*form->CodeModule());
+  for (const QString& line :
+       {u"   Command1.BackColor = &H8000000F&"_qs, u"   Text1.BackColor = &H80000005&"_qs,
+        u"   cmdAcao(Index).BackColor = &H8000000F&"_qs})
+    EXPECT_TRUE(code.contains(line)) << line.toStdString();
+
+  frmProps d(form->Designer()->VBControls()->Add(u"CommandButton"_qs), options, ui);
+  showActive(d);
+  d.txtValor(0)->setText(u"txtNome"_qs);
+  d.txtValor(1)->setText(u"1"_qs);
+  d.cmdOK()->click();
+  EXPECT_TRUE(d.isVisible());
+  EXPECT_EQ(vbe->headlessUi()->messageBoxes().back().prompt,
+            u"35010 Já existe neste formulário um controle chamado \"txtNome(1)\"."_qs);
+  d.cmdCancel()->click();
+
+  vbe->saveAll();
+  const auto other = host::VbeImpl::create();
+  const auto saved = other->open(copy.groupFile()).front()->VBComponents()->Item(u"frmCliente"_qs);
+  EXPECT_EQ(host::test::uncompilableLines(*saved), QStringList());
+  EXPECT_EQ(propertyOf(saved->Designer()->VBControls()->Item(u"Command2"_qs), "Index"),
+            QVariant::fromValue<qint16>(-1));
+}
+
 TEST(OptionsDialog, ShowsTheSettingsAndOkSavesThemIntoTheGlobals) {
   Scene scene;
   common::SettingsStore settings(scene.dir.filePath(u"Quimbel.ini"_qs));
