@@ -94,7 +94,8 @@ class AddInFeatures final : public Features {
     if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfProject(project->Name());
   }
   void findWindowComponentRemoved(const ide::Ref<ide::VBComponent>& component) override {
-    if (m_findForm && m_findForm->isVisible()) m_findForm->RemoveItemsOfComponent(component->Name());
+    if (m_findForm && m_findForm->isVisible())
+      m_findForm->RemoveItemsOfComponent(component->Name(), component->Collection()->Parent());
   }
   void showNewProcedure() override;
   // The options dialog and the designer actions.

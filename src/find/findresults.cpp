@@ -71,16 +71,18 @@ const CItemFound* FindResults::item(const QString& key) const {
   return found == m_items.constEnd() ? nullptr : &found.value();
 }
 
-int FindResults::RemoveItemsOfComponent(const QString& name) {
-  return removeWhere(name, &FoundRow::module);
+int FindResults::RemoveItemsOfComponent(const QString& name, const ide::Ref<ide::VBProject>& project) {
+  return removeWhere([&](const FoundRow& row) {
+    return row.item.Project == project && transform::trimmedView(row.module) == name;
+  });
 }
 
 int FindResults::RemoveItemsOfProject(const QString& name) {
-  return removeWhere(name, &FoundRow::project);
+  return removeWhere([&](const FoundRow& row) { return transform::trimmedView(row.project) == name; });
 }
 
-int FindResults::removeWhere(const QString& name, QString FoundRow::*column) {
-  const auto matches = [&](size_t i) { return transform::trimmedView(m_rows[i].row.*column) == name; };
+int FindResults::removeWhere(const std::function<bool(const FoundRow&)>& rowMatches) {
+  const auto matches = [&](size_t i) { return rowMatches(m_rows[i].row); };
   int removed = 0;
   // The rows of one module lie together: each run of them goes at once.
   for (size_t i = 0; i < m_rows.size();) {

@@ -9,6 +9,7 @@
 #include <QAbstractTableModel>
 #include <QHash>
 
+#include <functional>
 #include <vector>
 
 namespace find {
@@ -38,9 +39,11 @@ class FindResults final : public QAbstractTableModel {
   const CItemFound* item(const QString& key) const;
   const FoundRow& row(int row) const { return m_rows[size_t(row)].row; }
 
-  /// Removes every row whose module (column 2) or project (column 1), trimmed, is `name`, from the list
-  /// and from the collection. Returns the number removed.
-  int RemoveItemsOfComponent(const QString& name);
+  /// Removes every row of the module `name` of `project` (column 2, trimmed, and the project searched),
+  /// from the list and from the collection: a module of that name in another project keeps its rows.
+  /// Returns the number removed.
+  int RemoveItemsOfComponent(const QString& name, const ide::Ref<ide::VBProject>& project);
+  /// Removes every row whose project (column 1), trimmed, is `name`. Returns the number removed.
   int RemoveItemsOfProject(const QString& name);
 
  private:
@@ -48,7 +51,7 @@ class FindResults final : public QAbstractTableModel {
     QString key;
     FoundRow row;
   };
-  int removeWhere(const QString& name, QString FoundRow::*column);
+  int removeWhere(const std::function<bool(const FoundRow&)>& matches);
 
   std::vector<Entry> m_rows;
   QHash<QString, CItemFound> m_items;

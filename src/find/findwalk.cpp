@@ -23,12 +23,27 @@ QString declarationsText() {
   return QStringLiteral("(Declarations)");
 }
 
+bool FindWalk::stillOpen(const ide::Ref<ide::VBProject>& project,
+                         const ide::Ref<ide::VBComponent>& component) {
+  try {
+    // Asked after every yield: the component's own tie first, then the projects without copying them.
+    if (component && component->Collection()->Parent() != project) return false;
+    const auto projects = m_vbe.VBProjects();
+    for (int i = projects->Count(); i >= 1; --i)
+      if (projects->Item(i) == project) return true;
+  } catch (const std::exception&) {
+    // A removed component belongs to no project any more.
+  }
+  return false;
+}
+
 void FindWalk::Search(SearchScope scope, const FindOptions& options) {
   m_rows = 0;
   switch (scope) {
     case SearchScope::AllProjects:
       for (const auto& project : m_vbe.VBProjects()->items()) {
         if (m_context.cancelled()) return;
+        if (!stillOpen(project)) continue;  // removed while an earlier one was searched
         m_report.status(text(kSearching));
         m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
         searchProject(project, options);
@@ -51,7 +66,7 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
           module = component->CodeModule();
       } catch (const std::exception&) {
       }
-      if (module) searchModule(project, module, options);
+      if (module && stillOpen(project, module->Parent())) searchModule(project, module, options);
       m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
       return;
     }
@@ -59,9 +74,19 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
 }
 
 void FindWalk::searchProject(const ide::Ref<ide::VBProject>& project, const FindOptions& options) {
-  transform::forEachCodeModule(m_context, *project, [&](const ide::Ref<ide::CodeModule>& module) {
-    searchModule(project, module, options);
-  });
+  // The components as they were when the project's turn came: one removed meanwhile is passed over, and
+  // the project's walk ends when the project itself leaves the IDE.
+  for (const auto& component : project->VBComponents()->items()) {
+    if (m_context.yieldAndCheck() || !stillOpen(project)) return;
+    if (!stillOpen(project, component)) continue;
+    ide::Ref<ide::CodeModule> module;
+    try {
+      if (component->Type() != ide::ComponentType::RelatedDocument) module = component->CodeModule();
+    } catch (const std::exception&) {
+      continue;  // a component that cannot be read is left as it is
+    }
+    if (module && !searchModule(project, module, options)) return;
+  }
 }
 
 bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::Ref<ide::CodeModule>& module,
@@ -86,9 +111,12 @@ bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::
       line = stretchEnd + 1;
       column = 1;
       if (m_context.yieldAndCheck()) return false;
+      if (!stillOpen(project, component)) return true;
       continue;
     }
     if (m_context.yieldAndCheck()) return false;
+    // What the loop ran may have taken the module or its project out of the IDE.
+    if (!stillOpen(project, component)) return true;
     ide::ProcKind kind = ide::ProcKind::Proc;
     QString procedure = module->ProcOfLine(startLine, kind);
     if (procedure.isEmpty()) procedure = declarationsText();

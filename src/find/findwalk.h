@@ -64,6 +64,8 @@ class FindWalk {
   int rows() const { return m_rows; }
 
  private:
+  /// The project is still open, and the component (when given) still one of its components.
+  bool stillOpen(const ide::Ref<ide::VBProject>& project, const ide::Ref<ide::VBComponent>& component = {});
   void searchProject(const ide::Ref<ide::VBProject>& project, const FindOptions& options);
   /// False when the search was cancelled inside the module.
   bool searchModule(const ide::Ref<ide::VBProject>& project, const ide::Ref<ide::CodeModule>& module,

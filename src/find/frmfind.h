@@ -62,7 +62,9 @@ class frmFind final : public QWidget, private FindReport {
   bool cancelled() const;
 
   /// A module or project left the IDE: its rows go.
-  void RemoveItemsOfComponent(const QString& name) { m_results->RemoveItemsOfComponent(name); }
+  void RemoveItemsOfComponent(const QString& name, const ide::Ref<ide::VBProject>& project) {
+    m_results->RemoveItemsOfComponent(name, project);
+  }
   void RemoveItemsOfProject(const QString& name) { m_results->RemoveItemsOfProject(name); }
 
  protected:

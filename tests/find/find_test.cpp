@@ -8,6 +8,7 @@
 #include "host/platform/manualloop.h"
 #include "modelfixture.h"
 #include "printers.h"
+#include "testproject.h"
 
 #include <gtest/gtest.h>
 
@@ -118,15 +119,19 @@ TEST(FindResults, RemovalTakesTheRowsOfAModuleOrProjectAndKeepsTheOtherKeys) {
   FindResults results;
   for (const char* project : {"Loja", "Dados", "Loja"})
     for (const char* module : {"modA", "modB", "modA"})
-      results.add({QString::fromLatin1(project), QString::fromLatin1(module), {}, {}, {}});
-  EXPECT_EQ(results.RemoveItemsOfComponent(u"modA"_qs), 6);
-  EXPECT_EQ(results.rowCount(), 3);
+      results.add({QString::fromLatin1(project),
+                   QString::fromLatin1(module),
+                   {},
+                   {},
+                   {*project == 'L' ? scene.ide.project : scene.other}});
+  EXPECT_EQ(results.RemoveItemsOfComponent(u"modA"_qs, scene.ide.project), 4);  // not Dados's modA
+  EXPECT_EQ(results.rowCount(), 5);
   EXPECT_EQ(results.keyOf(0), u"_2"_qs);
-  EXPECT_EQ(results.keyOf(2), u"_8"_qs);
+  EXPECT_EQ(results.keyOf(4), u"_8"_qs);
   EXPECT_EQ(results.item(u"_1"_qs), nullptr);
-  EXPECT_NE(results.item(u"_5"_qs), nullptr);
+  EXPECT_NE(results.item(u"_6"_qs), nullptr);
   EXPECT_EQ(results.RemoveItemsOfProject(u"Loja"_qs), 2);
-  EXPECT_EQ(results.keyOf(0), u"_5"_qs);
+  EXPECT_EQ(results.keyOf(0), u"_4"_qs);
   results.clear();
   EXPECT_EQ(results.add({}), u"_1"_qs);
   EXPECT_EQ(results.headerData(3, Qt::Horizontal).toString(), u"Texto Localizado"_qs);
@@ -273,6 +278,41 @@ TEST(FindWindow, ADoubleClickOpensTheOccurrenceAndMinimisesTheWindow) {
   pane->GetSelection(sl, sc, el, ec);
   EXPECT_EQ((std::array{sl, sc, el, ec}), (std::array{6, 7, 6, 12}));
   EXPECT_TRUE(window.form.isMinimized());
+}
+
+// On the example group, as the add-in tells the window: a module removed takes only its own rows, a
+// project removed while all projects are searched gives no rows after its own have gone.
+TEST(FindWindow, RowsFollowTheModulesAndProjectsThatAreReallyOpen) {
+  host::test::ExampleCopy copy;
+  const auto vbe = host::VbeImpl::create();
+  const auto projects = vbe->open(copy.groupFile());  // Loja, Utilitarios
+  const auto twin = projects[1]->Add(ide::ComponentType::StdModule);
+  twin->setName(u"modPrincipal"_qs);
+  twin->CodeModule()->AddFromString(u"Dim x"_qs);
+  frmFind form(vbe);
+  form.txtSearch()->setText(u"Dim"_qs);
+  form.cmdFind()->click();
+  const auto rowsOf = [&](const QString& module) {
+    return form.results()
+        .match(form.results().index(0, 1), Qt::DisplayRole, module, -1, Qt::MatchExactly)
+        .size();
+  };
+  ASSERT_GT(rowsOf(u"modPrincipal"_qs), 1);
+  const auto main = projects[0]->VBComponents()->Item(u"modPrincipal"_qs);
+  form.RemoveItemsOfComponent(main->Name(), projects[0]);
+  projects[0]->Remove(main);
+  EXPECT_EQ(rowsOf(u"modPrincipal"_qs), 1);
+
+  QObject::connect(&form.results(), &QAbstractItemModel::rowsInserted, [&] {
+    if (form.results().rowCount() == 1 && vbe->VBProjects()->Count() == 2)
+      vbe->manualLoop()->post([&] {
+        form.RemoveItemsOfProject(u"Loja"_qs);
+        vbe->removeProject(projects[0]);
+      });
+  });
+  form.cmdFind()->click();
+  EXPECT_EQ(form.results().match(form.results().index(0, 0), Qt::DisplayRole, u"Loja"_qs, -1).size(), 0);
+  EXPECT_EQ(rowsOf(u"modPrincipal"_qs), 1);
 }
 
 TEST(FindWindow, AWindowDestroyedWhileItsSearchYieldsEndsTheSearch) {
