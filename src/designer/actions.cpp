@@ -66,7 +66,10 @@ std::optional<QString> backColorLiteral(ide::VBControl& ctl) {
     const QVariant value = ctl.Properties()->Item(QStringLiteral("BackColor"))->Value();
     bool ok = false;
     std::optional<double> number = value.toDouble(&ok);
-    if (!ok) number = vbNumber(value.toString());  // a control the tables do not know keeps its text
+    if (!ok) {  // a control the tables do not know keeps the literal of its description
+      const QString literal = value.toString();
+      number = vbNumber(literal.endsWith(u'&') ? literal.chopped(1) : literal);
+    }
     if (!number) return std::nullopt;
     return QStringLiteral("&H%1&").arg(QString::number(quint32(qint64(*number)), 16).toUpper());
   } catch (const std::exception&) {
