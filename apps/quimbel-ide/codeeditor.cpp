@@ -7,6 +7,7 @@
 #include "vbfonts.h"
 #include "vbhighlighter.h"
 
+#include <QGuiApplication>
 #include <QKeyEvent>
 #include <QPainter>
 #include <QScrollBar>
@@ -63,9 +64,18 @@ void CodeEditor::setHotKeyTarget(host::WindowSystemImpl* windows, std::function<
   m_window = std::move(window);
 }
 
+namespace {
+
+NativeKeyCodes nativeKeyCodes() {
+  static const NativeKeyCodes codes = nativeKeyCodesOf(QGuiApplication::platformName());
+  return codes;
+}
+
+}  // namespace
+
 bool CodeEditor::isRegisteredHotKey(QKeyEvent* event) const {
   if (!m_windows || !m_window) return false;
-  const VirtualKey key = virtualKeyOf(event->key(), event->modifiers());
+  const VirtualKey key = virtualKeyOf(*event, nativeKeyCodes());
   return key.key != 0 && m_windows->hasHotKey(m_window(), key.modifiers, key.key);
 }
 
@@ -111,7 +121,7 @@ void CodeEditor::keyPressEvent(QKeyEvent* event) {
   // a long run of the module's edits to be shown.
   if (m_beforeInput && !onlyMoves(event)) m_beforeInput();
   if (m_windows && m_window) {
-    const VirtualKey key = virtualKeyOf(event->key(), event->modifiers());
+    const VirtualKey key = virtualKeyOf(*event, nativeKeyCodes());
     if (key.key != 0 && m_windows->deliverHotKey(m_window(), key.modifiers, key.key)) {
       event->accept();
       return;

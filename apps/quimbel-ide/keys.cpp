@@ -3,6 +3,8 @@
 
 #include "ide/platform.h"
 
+#include <QKeyEvent>
+
 namespace desktop {
 namespace {
 
@@ -42,7 +44,8 @@ constexpr KeyCode kKeys[] = {
     {Qt::Key_Backslash, 0xDC},
     {Qt::Key_BracketRight, 0xDD},
     {Qt::Key_Apostrophe, 0xDE},
-    // Shifted symbols of the US layout, on the keys that carry them.
+    // Shifted symbols of the US layout, on the keys that carry them (the digits' ones only when the
+    // event has no native codes to tell the key by).
     {Qt::Key_Exclam, '1'},
     {Qt::Key_At, '2'},
     {Qt::Key_NumberSign, '3'},
@@ -66,7 +69,58 @@ constexpr KeyCode kKeys[] = {
     {Qt::Key_QuoteDbl, 0xDE},
 };
 
+/// XKB key codes of the main block's digit keys, 1 to 9 then 0 (Linux input codes 2 to 11, plus 8).
+constexpr quint32 kXkbDigitOne = 10;
+constexpr quint32 kXkbDigitZero = 19;
+
+bool isShiftedUsDigit(int qtKey) {
+  for (const int key :
+       {Qt::Key_Exclam, Qt::Key_At, Qt::Key_NumberSign, Qt::Key_Dollar, Qt::Key_Percent, Qt::Key_AsciiCircum,
+        Qt::Key_Ampersand, Qt::Key_Asterisk, Qt::Key_ParenLeft, Qt::Key_ParenRight})
+    if (key == qtKey) return true;
+  return false;
+}
+
+/// The digit ('0' to '9') of the main block's key that was pressed, when the native codes tell it.
+unsigned physicalDigit(const QKeyEvent& event, NativeKeyCodes codes) {
+  switch (codes) {
+    case NativeKeyCodes::Xkb: {
+      const quint32 code = event.nativeScanCode();
+      if (code < kXkbDigitOne || code > kXkbDigitZero) return 0;
+      return code == kXkbDigitZero ? '0' : '1' + (code - kXkbDigitOne);
+    }
+    case NativeKeyCodes::Windows: {
+      const quint32 vk = event.nativeVirtualKey();
+      return vk >= '0' && vk <= '9' ? vk : 0;
+    }
+    case NativeKeyCodes::None:
+      break;
+  }
+  return 0;
+}
+
 }  // namespace
+
+NativeKeyCodes nativeKeyCodesOf(const QString& platformName) {
+  if (platformName == QLatin1StringView("xcb") || platformName.startsWith(QLatin1StringView("wayland")))
+    return NativeKeyCodes::Xkb;
+  if (platformName == QLatin1StringView("windows")) return NativeKeyCodes::Windows;
+  return NativeKeyCodes::None;
+}
+
+VirtualKey virtualKeyOf(const QKeyEvent& event, NativeKeyCodes codes) {
+  const bool native = codes != NativeKeyCodes::None && event.nativeScanCode() != 0;
+  VirtualKey result = virtualKeyOf(event.key(), event.modifiers());
+  if (!native) return result;
+  if (const unsigned digit = physicalDigit(event, codes)) {
+    result.key = digit;
+  } else if ((event.key() >= Qt::Key_0 && event.key() <= Qt::Key_9) || isShiftedUsDigit(event.key())) {
+    // A digit or a US digit's symbol typed on another key (the keypad, or a layout's own place for it)
+    // is not the digit key.
+    result.key = 0;
+  }
+  return result;
+}
 
 VirtualKey virtualKeyOf(int qtKey, Qt::KeyboardModifiers modifiers) {
   VirtualKey result;

@@ -179,14 +179,20 @@ int main(int argc, char** argv) {
     window.show();
     window.activateWindow();
     window.raise();
-    vbe->startup();
-    window.restoreLayout();
-
+    // A script runs from before the add-in starts: a message box it shows at start-up is the script's to
+    // answer (or to fail on), like any other.
     if (scripted) {
       QObject::connect(&runner, &desktop::ScriptRunner::finished, &app,
                        [&exitCode](int code) { exitCode = code; });
+      runner.setStarting(true);
       runner.start();
-      app.exec();
+    }
+    vbe->startup();
+    runner.setStarting(false);
+    window.restoreLayout();
+
+    if (scripted) {
+      if (!runner.isFinished()) app.exec();
       window.closeWithoutPrompt();
     } else {
       exitCode = app.exec();

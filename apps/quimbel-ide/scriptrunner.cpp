@@ -720,7 +720,9 @@ void ScriptRunner::start() {
   const qint64 startedAt = QDateTime::currentMSecsSinceEpoch();
   auto waitForActivation = std::make_shared<std::function<void()>>();
   *waitForActivation = [this, startedAt, waitForActivation] {
-    if (!m_window.isActiveWindow() && QDateTime::currentMSecsSinceEpoch() - startedAt < 5000) {
+    // A message box (or dialog) open already, say one the add-in shows at start-up, is the active window.
+    if (!m_window.isActiveWindow() && !QApplication::activeModalWidget() &&
+        QDateTime::currentMSecsSinceEpoch() - startedAt < 5000) {
       m_window.activateWindow();
       QTimer::singleShot(50, this, *waitForActivation);
       return;
@@ -749,6 +751,7 @@ bool ScriptRunner::answerOpenMessageBox() {
 
 void ScriptRunner::tick() {
   if (m_finished) return;
+  if (m_starting && !QApplication::activeModalWidget()) return schedule(10);
   if (answerOpenMessageBox()) return schedule(10);
   if (m_next >= m_steps.size()) return finish(0);
   const size_t index = m_next++;
@@ -781,7 +784,11 @@ void ScriptRunner::finish(int exitCode, const QString& error) {
     if (QWidget* open = QApplication::activeModalWidget()) {
       exitCode = 1;
       const QString title = open->windowTitle().isEmpty() ? open->objectName() : open->windowTitle();
-      m_error = QStringLiteral("%1: the script ended while the dialog \"%2\" is open").arg(m_name, title);
+      if (auto* box = qobject_cast<QMessageBox*>(open))
+        m_error = QStringLiteral("%1: the script ended while a message box is open: %2: %3")
+                      .arg(m_name, title, QString(box->text()).replace(u'\n', QStringLiteral("\\n")));
+      else
+        m_error = QStringLiteral("%1: the script ended while the dialog \"%2\" is open").arg(m_name, title);
       std::fprintf(stderr, "%s\n", qPrintable(m_error));
     }
   }

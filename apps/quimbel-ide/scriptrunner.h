@@ -46,6 +46,10 @@ class ScriptRunner final : public QObject {
   void setExitOnFinish(bool exit) { m_exitOnFinish = exit; }
   /// Why the script failed ("<file>:<line>: <what>"), empty while it has not.
   const QString& error() const { return m_error; }
+  bool isFinished() const { return m_finished; }
+  /// While the IDE starts (its add-ins too), the steps wait, except for a dialog or message box that the
+  /// start-up opens: that one is theirs to deal with.
+  void setStarting(bool starting) { m_starting = starting; }
 
  Q_SIGNALS:
   void finished(int exitCode);
@@ -72,6 +76,7 @@ class ScriptRunner final : public QObject {
   std::vector<ScriptStep> m_steps;
   size_t m_next = 0;
   bool m_finished = false;
+  bool m_starting = false;
   int m_patienceMs = 10000;
   qint64 m_waitingSince = -1;
   QString m_lastMessage;

@@ -25,6 +25,7 @@ enum ExitCode : int {
   kOutputError = 4,    // a file could not be written (nothing on disk was damaged), or standard output
   kMissingFiles = 5,   // files a group or project lists are missing: each was named, the rest was done
   kPartlyWritten = 6,  // a save failed half way and could not be undone (the message lists the files)
+  kNoInfoFile = 7,     // tasks, favorites: the project has no info file (no identifier module, or no file)
 };
 
 /// Opens a group, project or module file given on the command line in `vbe`; module files given on their

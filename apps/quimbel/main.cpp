@@ -271,7 +271,7 @@ static int runTool(int argc, char** argv) {
       "written, is read-only or was changed by another program since it was read (what was on disk is\n"
       "kept) or standard output failed, 5 files that a group or project lists are missing (each is\n"
       "named; the rest was done), 6 a save failed half way and could not be undone (the message names\n"
-      "the files)."};
+      "the files), 7 tasks or favorites: the project has no info file."};
   parser.require_subcommand(1);
   parser.set_version_flag("--version", "quimbel " QUIMBEL_VERSION, "Print the version and exit");
 

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
 // `quimbel tasks` and `quimbel favorites`: a project's task list and favourites, read from (and for tasks
 // written to) the same info file the add-in keeps beside the project. The tool finds the file through the
-// project's identifier module and never inserts one: a project without it has no tasks yet.
+// project's identifier module and never inserts one. A project without the module, or whose file is not
+// beside it, has no info file: listing says so with an exit code of its own, not as an empty list.
 #include "cli.h"
 #include "host/model/vbe.h"
 #include "projinfo/projinfo.h"
@@ -50,6 +51,19 @@ QString noIdentity(const QString& file) {
       .arg(file);
 }
 
+/// A listing of a project without an info file: told, not taken for an empty list.
+int noInfoFile(const OpenedProject& opened, const QString& file) {
+  if (!opened.identity) {
+    printError(noIdentity(file));
+  } else {
+    printError(QStringLiteral("%1: the project has no info file: %2 is not in its folder (it was never "
+                              "written, or was moved or deleted; a project saved elsewhere while the "
+                              "add-in was not loaded left it behind)")
+                   .arg(file, shown(opened.infoFile)));
+  }
+  return kNoInfoFile;
+}
+
 /// Every record of one storage of the info file, by name; unreadable ones are reported and counted.
 struct Records {
   std::vector<std::pair<QString, QString>> texts;
@@ -80,10 +94,6 @@ Records readRecords(const QString& infoFile, const char* storageName) {
 }
 
 int listTasks(const OpenedProject& opened) {
-  if (!QFileInfo::exists(opened.infoFile)) {
-    printLine(QStringLiteral("%1: no tasks").arg(opened.project->Name()));
-    return kSuccess;
-  }
   Records records = readRecords(opened.infoFile, "TaskList");
   std::vector<projinfo::TaskRecord> tasks;
   for (const auto& [name, text] : records.texts) {
@@ -185,11 +195,9 @@ QString placeOf(host::ProjectImpl& project, const projinfo::FavoriteRecord& favo
 
 int runTasks(const TaskOptions& options) {
   const OpenedProject opened = openProject(options.project);
+  if (options.action.isEmpty() && (!opened.identity || !QFileInfo::exists(opened.infoFile)))
+    return noInfoFile(opened, options.project);
   if (!opened.identity) {
-    if (options.action.isEmpty()) {
-      printLine(noIdentity(options.project));
-      return kSuccess;
-    }
     printError(noIdentity(options.project));
     return kInputError;
   }
@@ -203,14 +211,7 @@ int runTasks(const TaskOptions& options) {
 
 int runFavorites(const TaskOptions& options) {
   const OpenedProject opened = openProject(options.project);
-  if (!opened.identity) {
-    printLine(noIdentity(options.project));
-    return kSuccess;
-  }
-  if (!QFileInfo::exists(opened.infoFile)) {
-    printLine(QStringLiteral("%1: no favorites").arg(opened.project->Name()));
-    return kSuccess;
-  }
+  if (!opened.identity || !QFileInfo::exists(opened.infoFile)) return noInfoFile(opened, options.project);
   Records records;
   try {
     records = readRecords(opened.infoFile, "Favorites");

@@ -28,7 +28,15 @@ void Connect::OnStartupComplete(QVariantList&) {
 
 void Connect::OnAddInsUpdate(QVariantList&) {}
 
-void Connect::OnDisconnection(ide::DisconnectMode, QVariantList&) {
+void Connect::OnDisconnection(ide::DisconnectMode mode, QVariantList&) {
+  // Unloaded by the user, the add-in leaves projects that stay open and may still be saved.
+  if (m_globals && mode == ide::DisconnectMode::UserClosed) {
+    try {
+      m_globals->features().projectsStayOpen();
+    } catch (const std::exception& failure) {
+      common::logFailure(failure, QStringLiteral("Connect"), QStringLiteral("OnDisconnection"), __LINE__);
+    }
+  }
   // Each part takes itself out of the IDE when released, in the order the members of Globals give; none
   // of them lets a failure stop the others.
   m_globals.reset();

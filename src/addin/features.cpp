@@ -103,6 +103,7 @@ class AddInFeatures final : public Features {
     designer::showOptionsDialog(m_settings, m_options, m_vbe->Platform().ui(), dialogParent());
   }
   void componentAdded(const ide::Ref<ide::VBComponent>& component) override {
+    m_projInfos.componentAdded(component);
     m_designer.FormAdded(component);
   }
   void controlAdded(const ide::Ref<ide::VBControl>& control) override { m_designer.ControlAdded(control); }
@@ -125,6 +126,7 @@ class AddInFeatures final : public Features {
     return m_projInfos.isIdentityModule(component);
   }
   void allProjectsClosed() override { m_projInfos.closeAll(); }
+  void projectsStayOpen() override { m_projInfos.detachAll(); }
   void componentRemoved(const ide::Ref<ide::VBComponent>& component) override {
     m_projInfos.componentRemoved(component);
   }

@@ -63,6 +63,9 @@ class Features {
   virtual bool isIdentityModule(const ide::Ref<ide::VBComponent>& component) = 0;
   /// Every project's info file is closed: no project is left.
   virtual void allProjectsClosed() = 0;
+  /// The add-in is unloaded while the IDE runs on: the projects stay open and may still be saved, so every
+  /// info file is closed and none is deleted.
+  virtual void projectsStayOpen() {}
 
   // Components and controls.
   virtual void componentAdded(const ide::Ref<ide::VBComponent>& component) = 0;

@@ -23,9 +23,33 @@
 namespace appdata {
 namespace {
 
-// SQLCipher 2's key derivation: 4,000 PBKDF2 rounds instead of 3.x's 64,000. The password ships with the
-// program, so stretching it protects nothing, while 64,000 rounds alone cost some 30 ms at every start.
-constexpr int kKdfIterations = 4000;
+/// One setting of the cipher that the file's bytes depend on, pinned so that every SQLCipher version reads
+/// and writes the same format: each version has defaults of its own (3.x and 4.x differ in page size, key
+/// derivation and HMAC), and a file written with one version's defaults is "not a database" to the other.
+struct CipherSetting {
+  const char* pragma;
+  const char* value;
+  /// What reading the pragma back gives once it took.
+  const char* readBack;
+  /// The library versions (major) that have the setting; the others fix it at the same value.
+  int fromMajor;
+  int untilMajor;
+};
+
+// AES-256-CBC with 1,024-byte pages, a PBKDF2-HMAC-SHA1 key from 4,000 rounds (SQLCipher 2's count: the
+// password ships with the program, so stretching it protects nothing, while 3.x's 64,000 rounds alone
+// cost some 30 ms at every start), HMAC-SHA1 on every page, no plain-text header. SQLCipher 3 has no
+// pragmas for the two algorithms (they are fixed there), SQLCipher 4 none for the HMAC key's rounds
+// (fixed at 2, 3.x's default).
+constexpr CipherSetting kCipherSettings[] = {
+    {"cipher_page_size", "1024", "1024", 3, 99},
+    {"kdf_iter", "4000", "4000", 3, 99},
+    {"cipher_use_hmac", "ON", "1", 3, 99},
+    {"fast_kdf_iter", "2", "2", 3, 3},
+    {"cipher_kdf_algorithm", "PBKDF2_HMAC_SHA1", "PBKDF2_HMAC_SHA1", 4, 99},
+    {"cipher_hmac_algorithm", "HMAC_SHA1", "HMAC_SHA1", 4, 99},
+    {"cipher_plaintext_header_size", "0", "0", 4, 99},
+};
 
 constexpr char kSchema[] = R"(BEGIN;
 CREATE TABLE "Macros" ("MacroId" VARCHAR(20) COLLATE NOCASE CHECK (length("MacroId") <= 20),
@@ -50,6 +74,11 @@ constexpr char16_t kCannotCreate[] = u"não foi possível criar o arquivo";
 constexpr char16_t kNoEncryption[] =
     u"a cifragem do SQLCipher não está ativa (o programa foi ligado a outra biblioteca SQLite)";
 constexpr char16_t kNotOpen[] = u"o banco de dados não está aberto";
+constexpr char16_t kUnknownCipher[] =
+    u"a versão %1 do SQLCipher não é suportada (é preciso a 3 ou mais nova)";
+constexpr char16_t kCipherSettingIgnored[] =
+    u"o SQLCipher %1 não aceitou a configuração \"%2\" (ficou \"%3\"), sem a qual o arquivo não teria o "
+    u"formato do Quimbel";
 constexpr char16_t kNoRow[] = u"nenhuma linha de \"%1\" tem %2 = '%3'";
 constexpr char16_t kInvalidText[] =
     u"o texto tem caracteres que não são Unicode válido (metades de pares substitutos) e não foi gravado";
@@ -93,6 +122,23 @@ class Connection {
   sqlite3* m_db;
 };
 
+/// Sets every cipher setting of kCipherSettings that the library has, before the first page is read, and
+/// checks that each took: a library that ignored one would read nothing, or write another format.
+void pinCipherSettings(sqlite3* db, const QString& version) {
+  const int major = version.section(u'.', 0, 0).toInt();
+  if (major < 3) throw ide::Error(SQLITE_MISUSE, QString::fromUtf16(kUnknownCipher).arg(version));
+  for (const CipherSetting& setting : kCipherSettings) {
+    if (major < setting.fromMajor || major > setting.untilMajor) continue;
+    const QByteArray set = QByteArray("PRAGMA ") + setting.pragma + " = " + setting.value;
+    exec(db, set.constData());
+    const QString value = firstValue(db, (QByteArray("PRAGMA ") + setting.pragma).constData());
+    if (value != QLatin1StringView(setting.readBack))
+      throw ide::Error(
+          SQLITE_MISUSE,
+          QString::fromUtf16(kCipherSettingIgnored).arg(version, QString::fromLatin1(set), value));
+  }
+}
+
 /// An existing file, opened read-write (never created) with the key set. The key itself is checked only
 /// by the first read.
 Connection openKeyed(const QString& path) {
@@ -102,10 +148,10 @@ Connection openKeyed(const QString& path) {
   check(db.get(), rc);
   sqlite3_extended_result_codes(db.get(), 1);
   check(db.get(), sqlite3_key(db.get(), kPassword, static_cast<int>(sizeof kPassword - 1)));
-  exec(db.get(), QByteArray("PRAGMA kdf_iter = ").append(QByteArray::number(kKdfIterations)).constData());
   // Linked against plain SQLite the key would be ignored and the file written in clear.
-  if (firstValue(db.get(), "PRAGMA cipher_version").isEmpty())
-    throw ide::Error(SQLITE_MISUSE, QString::fromUtf16(kNoEncryption));
+  const QString version = firstValue(db.get(), "PRAGMA cipher_version");
+  if (version.isEmpty()) throw ide::Error(SQLITE_MISUSE, QString::fromUtf16(kNoEncryption));
+  pinCipherSettings(db.get(), version);
   sqlite3_busy_timeout(db.get(), kBusyTimeoutMs);
   return db;
 }
@@ -263,8 +309,10 @@ struct KeyedStatements {
       : table(table),
         key(key),
         withState(withState),
-        find(db, QStringLiteral(R"(SELECT rowid, "Text"%3 FROM "%1" WHERE "%2" = ?1 ORDER BY rowid LIMIT 1)")
-                     .arg(table, key, withState ? QStringLiteral(R"(, "Enabled")") : QString())),
+        find(db,
+             QStringLiteral(
+                 R"(SELECT rowid, "Text"%3 FROM "%1" WHERE "%2" = ?1 COLLATE NOCASE ORDER BY rowid LIMIT 1)")
+                 .arg(table, key, withState ? QStringLiteral(R"(, "Enabled")") : QString())),
         insert(db,
                withState
                    ? QStringLiteral(R"(INSERT INTO "%1" ("%2", "Text", "Enabled") VALUES (?1, ?2, ?3))")

@@ -6,10 +6,12 @@
 // arbitrate (writers wait up to kBusyTimeoutMs for each other) and every change is committed durably
 // before an operation returns.
 //
-// The file is SQLCipher-encrypted with a fixed password (kPassword) and SQLCipher 2's key-derivation
-// settings; to look inside it:
+// The file is SQLCipher-encrypted with a fixed password (kPassword) and cipher settings pinned whatever the
+// SQLCipher version (3.x and 4.x have different defaults): AES-256-CBC, 1,024-byte pages, PBKDF2-HMAC-SHA1
+// with 4,000 rounds, HMAC-SHA1 per page, no plain-text header. To look inside it:
 //   sqlcipher Quimbel.inf
-//   PRAGMA key = '$468$468$468'; PRAGMA kdf_iter = 4000;
+//   PRAGMA key = '$468$468$468'; PRAGMA kdf_iter = 4000;                      (SQLCipher 3)
+//   ... and PRAGMA cipher_compatibility = 3; PRAGMA kdf_iter = 4000;          (SQLCipher 4)
 //
 // Tables (no indexes; a row is found by its key, the first in insertion order when there are several):
 //   Macros       (MacroId VARCHAR(20), Text TEXT, Enabled BOOLEAN)

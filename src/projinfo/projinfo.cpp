@@ -88,22 +88,26 @@ QString infoFileTitle(const QString& id) {
 CProjInfo::CProjInfo(ProjInfoServices services) : m_services(std::move(services)) {}
 
 CProjInfo::~CProjInfo() {
-  const bool owned = m_ownsFile;
+  CloseFile();
+}
+
+void CProjInfo::ProjectClosed() {
+  bool discard = false;
   try {
-    if (m_FileInfo) m_FileInfo->Commit(0);
-  } catch (const std::exception&) {
-  }
-  release();
-  // A project closed without ever being saved leaves no info file behind.
-  try {
+    const bool projectSaved = !m_project->FileName().isEmpty();
     bool moduleSaved = true;
-    if (basProjInfo) {
+    if (basProjInfo && !m_tieLost) {
       const QString file = basProjInfo->FileNames(1);
       moduleSaved = !file.isEmpty() && QFileInfo::exists(file);
     }
-    if (owned && !moduleSaved) QFile::remove(path());
-  } catch (const std::exception&) {
+    discard = m_ownsFile && (!projectSaved || !moduleSaved);
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QString::fromLatin1(kModule), QStringLiteral("ProjectClosed"), __LINE__);
   }
+  const QString file = path();
+  CloseFile();
+  if (discard) QFile::remove(file);
+  m_ownsFile = false;
 }
 
 void CProjInfo::tell(const QString& text, const ide::Error& failure) {
@@ -116,7 +120,8 @@ bool CProjInfo::Initialize() {
     std::optional<ProjectIdentity> identity = FindProjectId(m_project);
     if (identity) {
       basProjInfo = identity->module;
-      FileTitle = infoFileTitle(identity->id);
+      m_id = identity->id;
+      FileTitle = infoFileTitle(m_id);
     } else {
       if (!m_services.appInfo) {
         // The user was told at start-up that new projects get no identifier in this session.
@@ -126,6 +131,7 @@ bool CProjInfo::Initialize() {
       common::CLockWindowUpdate lock(m_services.vbe->Platform().windows());
       lock.LockWindow(m_services.vbe->MainWindow()->hWnd());
       const QString id = m_services.appInfo->GetNextProjId();
+      m_id = id;
       FileTitle = infoFileTitle(id);
       auto module = m_project->VBComponents()->Add(ide::ComponentType::StdModule);
       module->setName(QLatin1StringView(kIdentityModulePrefix) + id);
@@ -136,6 +142,7 @@ bool CProjInfo::Initialize() {
       } catch (const std::exception&) {
       }
     }
+    m_moduleName = basProjInfo->Name();
     findFilePath();
   } catch (const std::exception& failure) {
     m_unavailable = asError(failure).description();
@@ -149,7 +156,9 @@ bool CProjInfo::InitializeExisting() {
   std::optional<ProjectIdentity> identity = FindProjectId(m_project);
   if (!identity) return false;
   basProjInfo = identity->module;
-  FileTitle = infoFileTitle(identity->id);
+  m_id = identity->id;
+  m_moduleName = basProjInfo->Name();
+  FileTitle = infoFileTitle(m_id);
   findFilePath();
   OpenFile();
   return true;
@@ -165,7 +174,33 @@ void CProjInfo::findFilePath() {
   }
 }
 
+void CProjInfo::adoptTemporaryFile() {
+  const QString temporary = QDir::temp().filePath(FileTitle);
+  if (!Saved || QFileInfo::exists(path()) || QDir(FilePath) == QDir::temp() || !QFileInfo::exists(temporary))
+    return;
+  try {
+    DocFile::open(temporary, DocFile::Access::ReadWrite)->moveTo(path());
+  } catch (const std::exception& failure) {
+    // Held by another IDE, or damaged: it stays where it is, and the project gets a file of its own.
+    common::logFailure(failure, QString::fromLatin1(kModule), QStringLiteral("adoptTemporaryFile"), __LINE__);
+  }
+}
+
 void CProjInfo::OpenFile() {
+  if (m_services.projectHolding) {
+    if (const QString other = m_services.projectHolding(*this, path()); !other.isEmpty()) {
+      // Opening it would hand one project's tasks to the other, and its writes would replace the first's.
+      m_unavailable =
+          QString::fromUtf16(kSharedIdentifier)
+              .arg(other, m_project->Name(), m_id, m_moduleName, QDir::toNativeSeparators(path()));
+      common::logFailure(ide::Error(stg::LockViolation, m_unavailable), QString::fromLatin1(kModule),
+                         QStringLiteral("OpenFile"), __LINE__);
+      m_ownsFile = false;
+      tell(m_unavailable, ide::Error(stg::LockViolation, m_unavailable));
+      return;
+    }
+  }
+  adoptTemporaryFile();
   bool isNew = true;
   try {
     m_FileInfo = OpenOrCreateDocFile(path(), isNew, true, false);
@@ -173,6 +208,7 @@ void CProjInfo::OpenFile() {
     m_Favorites = m_FileInfo->CreateStorage(QStringLiteral("Favorites"), kElementMode);
   } catch (const std::exception& failure) {
     release();
+    m_ownsFile = false;
     const ide::Error error = asError(failure);
     m_unavailable = QString::fromUtf16(kCannotOpenInfoFile)
                         .arg(m_project->Name(), QDir::toNativeSeparators(path()), reasonFor(error));
@@ -247,6 +283,22 @@ void CProjInfo::ProjectMoved(const QString& directory) {
            failure);
     }
   } else if (!m_FileInfo) {
+    // A file closed when the tie was lost still follows the project, so that it is there if the module
+    // comes back.
+    if (m_tieLost && QDir(FilePath) != QDir(target) && QFileInfo::exists(path())) {
+      try {
+        DocFile::open(path(), DocFile::Access::ReadWrite)->moveTo(target + u'/' + FileTitle);
+      } catch (const ide::Error& failure) {
+        common::recordError(failure, QString::fromLatin1(kModule), QStringLiteral("ProjectMoved"), __LINE__);
+        common::logLastError();
+        tell(QString::fromUtf16(kCannotMoveInfoFile)
+                 .arg(m_project->Name(), QDir::toNativeSeparators(path()),
+                      QDir::toNativeSeparators(target + u'/' + FileTitle), reasonFor(failure)),
+             failure);
+        Saved = true;
+        return;
+      }
+    }
     FilePath = target;
   }
   Saved = true;
@@ -254,14 +306,24 @@ void CProjInfo::ProjectMoved(const QString& directory) {
 
 void CProjInfo::TieLost() {
   if (!m_FileInfo) return;
-  const QString module = basProjInfo ? basProjInfo->Name() : QString();
   CloseFile();
   // Kept whatever becomes of the project: the module may come back.
-  m_ownsFile = false;
+  m_tieLost = true;
   m_unavailable =
-      QString::fromUtf16(kTieLost).arg(module, m_project->Name(), QDir::toNativeSeparators(path()));
+      QString::fromUtf16(kTieLost).arg(m_moduleName, m_project->Name(), QDir::toNativeSeparators(path()));
   if (m_services.tellUser && m_services.vbe)
     m_services.vbe->Platform().ui().MsgBox(m_unavailable, ide::mb::Information, common::title());
+}
+
+bool CProjInfo::Retie(const ide::Ref<ide::VBComponent>& component) {
+  if (!m_tieLost) return false;
+  const std::optional<QString> id = IdentityOf(component);
+  if (!id || *id != m_id) return false;
+  m_tieLost = false;
+  basProjInfo = component;
+  m_moduleName = component->Name();
+  OpenFile();
+  return true;
 }
 
 // ---------------------------------------------------------------------------------------------------

@@ -79,6 +79,9 @@ struct ProjInfoServices {
   /// The add-in tells the user about a file that cannot be read or written (once) and works on; the
   /// command-line tool gets every such failure raised instead.
   bool tellUser = true;
+  /// The name of another open project whose info object holds the file at `path` (two projects with one
+  /// identifier: a copied project, say); empty when none does.
+  std::function<QString(const CProjInfo& asking, const QString& path)> projectHolding;
 };
 
 /// The identifier module of a project and the identifier it holds.
@@ -98,8 +101,8 @@ QString infoFileTitle(const QString& id);
 class CProjInfo {
  public:
   explicit CProjInfo(ProjInfoServices services);
-  /// Closes the file (with failures ignored); deletes it when the identifier module was never saved to
-  /// a file (the project was closed without being saved).
+  /// Closes the file (with failures ignored) and deletes nothing: the project may stay open and be saved
+  /// later (the add-in unloaded while the IDE runs on). ProjectClosed says when the file goes.
   ~CProjInfo();
   CProjInfo(const CProjInfo&) = delete;
   CProjInfo& operator=(const CProjInfo&) = delete;
@@ -145,6 +148,15 @@ class CProjInfo {
   void ProjectMoved(const QString& directory);
   /// The identifier module was removed or renamed: the file is closed and kept.
   void TieLost();
+  /// `component` (added, or renamed) identifies the project again after its tie was lost: the file is
+  /// opened again. False, changing nothing, for any other component.
+  bool Retie(const ide::Ref<ide::VBComponent>& component);
+  bool tieLost() const { return m_tieLost; }
+  /// The identifier module kept its tie under a new name.
+  void moduleRenamed() { m_moduleName = basProjInfo ? basProjInfo->Name() : QString(); }
+  /// The project leaves the IDE: the file is closed, and deleted when the project was never saved or its
+  /// new identifier module was not (they go with the project).
+  void ProjectClosed();
   /// The info file's path.
   QString path() const { return FilePath + u'/' + FileTitle; }
   bool isOpen() const { return m_FileInfo != nullptr; }
@@ -164,6 +176,9 @@ class CProjInfo {
   /// The highest identifier among the record streams of `storage` named prefix + number.
   static qint32 highestId(Storage& storage, const char* prefix);
   void findFilePath();
+  /// A file of this identifier left in the temporary directory (the add-in was unloaded and the project
+  /// first saved meanwhile) comes to the project's folder, when nobody holds it.
+  void adoptTemporaryFile();
   /// Writes the file; a failure is told once (and the changes stay in memory) or raised for the tool.
   void commitChanges();
   /// Tells the user `text`, or raises `failure` for the tool.
@@ -175,9 +190,13 @@ class CProjInfo {
   QString m_unavailable;
   qint32 m_highestTask = 0;
   qint32 m_highestFavorite = 0;
-  /// The file was opened here (and the tie to the project not lost since): it goes with a project that is
-  /// closed without being saved.
+  /// The project's identifier, and the name of its module while it ties the project to the file.
+  QString m_id;
+  QString m_moduleName;
+  /// The file at path() is this project's (open, or closed because the tie was lost): it goes with a
+  /// project that is closed without being saved.
   bool m_ownsFile = false;
+  bool m_tieLost = false;
   bool m_writeFailed = false;
 };
 

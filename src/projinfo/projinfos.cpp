@@ -1,10 +1,19 @@
 // SPDX-License-Identifier: MIT
 #include "projinfo/projinfos.h"
 
-#include <QFile>
 #include <QFileInfo>
 
 namespace projinfo {
+
+ProjInfos::ProjInfos(ProjInfoServices services) : m_services(std::move(services)) {
+  m_services.projectHolding = [this](const CProjInfo& asking, const QString& path) {
+    for (const auto& info : m_items)
+      if (info.get() != &asking && (info->isOpen() || info->tieLost()) &&
+          QFileInfo(info->path()) == QFileInfo(path))
+        return info->Project()->Name();
+    return QString();
+  };
+}
 
 ProjInfos::~ProjInfos() {
   closeAll();
@@ -37,10 +46,7 @@ void ProjInfos::projectRemoved(const ide::Ref<ide::VBProject>& project) {
     if ((*it)->Project() != project) continue;
     std::unique_ptr<CProjInfo> info = std::move(*it);
     m_items.erase(it);
-    const bool neverSaved = project->FileName().isEmpty() && info->isOpen();
-    const QString path = info->path();
-    info->CloseFile();
-    if (neverSaved) QFile::remove(path);
+    info->ProjectClosed();
     return;
   }
 }
@@ -55,6 +61,10 @@ bool ProjInfos::isIdentityModule(const ide::Ref<ide::VBComponent>& component) co
   return false;
 }
 
+void ProjInfos::componentAdded(const ide::Ref<ide::VBComponent>& component) {
+  if (CProjInfo* info = owner(component)) info->Retie(component);
+}
+
 void ProjInfos::componentRemoved(const ide::Ref<ide::VBComponent>& component) {
   CProjInfo* info = owner(component);
   if (!info) return;
@@ -65,8 +75,13 @@ void ProjInfos::componentRemoved(const ide::Ref<ide::VBComponent>& component) {
 void ProjInfos::componentRenamed(const ide::Ref<ide::VBComponent>& component) {
   CProjInfo* info = owner(component);
   if (!info) return;
+  if (info->Retie(component)) return;
   if (info->basProjInfo == component) {
-    if (!IdentityOf(component)) info->TieLost();
+    if (info->tieLost()) return;
+    if (IdentityOf(component))
+      info->moduleRenamed();
+    else
+      info->TieLost();
     return;
   }
   if (InfoRecordList* favorites = info->Favorites()) favorites->componentRenamed(component);
@@ -76,11 +91,12 @@ void ProjInfos::closeAll() {
   while (!m_items.empty()) {
     std::unique_ptr<CProjInfo> info = std::move(m_items.front());
     m_items.erase(m_items.begin());
-    const bool neverSaved = info->Project()->FileName().isEmpty() && info->isOpen();
-    const QString path = info->path();
-    info->CloseFile();
-    if (neverSaved) QFile::remove(path);
+    info->ProjectClosed();
   }
+}
+
+void ProjInfos::detachAll() {
+  m_items.clear();
 }
 
 }  // namespace projinfo

@@ -3,7 +3,8 @@
 // Closing a project closes its info file and deletes no task and no favourite (only a project that was
 // never saved takes its file with it); only a component really removed from its project takes its
 // favourites along. The identifier module's removal or renaming loses the tie to the file, which is
-// closed and kept.
+// closed and kept, and opened again when the module comes back (renamed back, or added again). Two open
+// projects with one identifier never share the file: the first keeps it.
 #pragma once
 
 #include "projinfo/projinfo.h"
@@ -15,7 +16,7 @@ namespace projinfo {
 
 class ProjInfos {
  public:
-  explicit ProjInfos(ProjInfoServices services) : m_services(std::move(services)) {}
+  explicit ProjInfos(ProjInfoServices services);
   /// Closes every info file.
   ~ProjInfos();
   ProjInfos(const ProjInfos&) = delete;
@@ -33,10 +34,15 @@ class ProjInfos {
   /// The project file now is `newFileName`: the info file goes to its folder.
   void projectFileMoved(const ide::Ref<ide::VBProject>& project, const QString& newFileName);
   bool isIdentityModule(const ide::Ref<ide::VBComponent>& component) const;
+  void componentAdded(const ide::Ref<ide::VBComponent>& component);
   void componentRemoved(const ide::Ref<ide::VBComponent>& component);
   void componentRenamed(const ide::Ref<ide::VBComponent>& component);
-  /// No project is left: every info file is closed.
+  /// No project is left (or the IDE closes them all): every info file is closed, and those of projects
+  /// never saved are deleted.
   void closeAll();
+  /// The add-in is unloaded while the projects stay open: every info file is closed and kept, since its
+  /// project may still be saved.
+  void detachAll();
 
  private:
   CProjInfo* owner(const ide::Ref<ide::VBComponent>& component) const;

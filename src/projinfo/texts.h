@@ -23,6 +23,14 @@ inline constexpr char16_t kTieLost[] =
     u"O arquivo foi fechado e mantido; as tarefas e os favoritos voltam quando o módulo voltar ao "
     u"projeto.";
 
+/// %1 the project that has the file, %2 the one refused it, %3 the identifier, %4 its module, %5 the file.
+inline constexpr char16_t kSharedIdentifier[] =
+    u"Os projetos %1 e %2 têm o mesmo identificador, %3 (no módulo %4), e por isso o mesmo arquivo de "
+    u"informações, %5 (isso acontece quando um projeto é copiado com o seu módulo de identificação). O "
+    u"arquivo fica com %1; as tarefas e os favoritos de %2 ficam indisponíveis nesta sessão, e o arquivo não "
+    u"é alterado "
+    u"por ele.";
+
 // Reasons.
 inline constexpr char16_t kInUse[] = u"ele está em uso por outro programa (%1)";
 inline constexpr char16_t kNotAnInfoFile[] = u"ele não é um arquivo de informações do Quimbel";

@@ -3,6 +3,7 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "host/files/ansi.h"
 
 #include <QLoggingCategory>
 
@@ -17,6 +18,10 @@ namespace {
 Q_LOGGING_CATEGORY(lcInsertion, "quimbel.textins", QtInfoMsg)
 
 constexpr int kInsertionFailedText = 5096;
+/// %1 the character (empty when it has no picture of its own), %2 its code.
+constexpr char16_t kNotAnsi[] =
+    u"O caractere \u201C%1\u201D (U+%2) não existe na página de código do Windows (1252) em que o VB grava "
+    u"o código: um módulo com ele não poderia ser salvo.";
 
 enum class Token {
   ProjectName,
@@ -168,6 +173,22 @@ std::pair<int, int> placeOf(QStringView text, qsizetype position, int startColum
 
 }  // namespace
 
+std::optional<char32_t> firstNonAnsi(QStringView text) {
+  qsizetype bad = -1;
+  if (host::encodeAnsi(text, &bad) || bad < 0 || bad >= text.size()) return std::nullopt;
+  const QChar high = text[bad];
+  if (high.isHighSurrogate() && bad + 1 < text.size() && text[bad + 1].isLowSurrogate())
+    return QChar::surrogateToUcs4(high, text[bad + 1]);
+  return high.unicode();
+}
+
+QString nonAnsiMessage(char32_t character) {
+  const bool printable = QChar::isPrint(character) && !QChar::isSurrogate(character);
+  return QString::fromUtf16(kNotAnsi).arg(
+      printable ? QString::fromUcs4(&character, 1) : QString(),
+      QStringLiteral("%1").arg(static_cast<uint>(character), 4, 16, QChar(u'0')).toUpper());
+}
+
 ProcInfo GetProcInfo(const ide::Ref<ide::VBComponent>& component, int line) {
   ProcInfo info;
   ide::Ref<ide::CodeModule> module;
@@ -300,11 +321,15 @@ void TextInsertion::InsertCode(const ide::Ref<ide::CodeModule>& CodeModule, cons
     const QString replacement = before + Text + last.mid(endColumn - 1);
     // A selection that ends at the start of an empty line leaves that line.
     const int removed = last.isEmpty() ? endLine - startLine - 1 : endLine - startLine;
-    if (removed > 0) CodeModule->DeleteLines(startLine + 1, removed);
+    // The replacement goes in before the lines below it go: a module that refuses it (the joined line
+    // too long, the program running) then still has every line it had.
+    const int countBefore = CodeModule->CountOfLines();
     if (first.isEmpty())
       CodeModule->InsertLines(startLine, replacement);
     else
       CodeModule->ReplaceLine(startLine, replacement);
+    const int added = CodeModule->CountOfLines() - countBefore;
+    if (removed > 0) CodeModule->DeleteLines(startLine + 1 + added, removed);
   } catch (const std::exception& failure) {
     throw common::recordError(failure, QStringLiteral("basTextInsertion"), QStringLiteral("InsertCode"),
                               __LINE__);
@@ -320,6 +345,13 @@ void TextInsertion::InsertText(const QString& Text) {
     selected->CodePane()->GetSelection(startLine, startColumn, endLine, endColumn);
     // A failed expansion ends here, before the selection is touched.
     QString text = ExpandPlaceholders(Text, component, startLine);
+    // Code the IDE could not save is not put in: a text stored elsewhere, or a name it expanded to.
+    if (const std::optional<char32_t> character = firstNonAnsi(text)) {
+      m_vbe.Platform().ui().MsgBox(
+          common::LoadResString(kInsertionFailedText) + QStringLiteral("\n\n") + nonAnsiMessage(*character),
+          ide::mb::Exclamation, common::title());
+      return;
+    }
     const auto pane = m_vbe.ActiveCodePane();
     if (!pane) ide::raise(ide::err::ObjectVariableNotSet);
     const auto module = pane->CodeModule();

@@ -13,6 +13,7 @@
 #include <QString>
 
 #include <functional>
+#include <optional>
 
 namespace textins {
 
@@ -42,6 +43,12 @@ struct InsertionContext {
   std::function<QDateTime()> now = &QDateTime::currentDateTime;
 };
 
+/// The first character of `text` that the IDE's code page (Windows-1252) has no byte for, as a code point
+/// (a pair of surrogates as one); nothing when every character fits. Code holding one cannot be saved.
+std::optional<char32_t> firstNonAnsi(QStringView text);
+/// What the user is told about such a character: it names the character and its code.
+QString nonAnsiMessage(char32_t character);
+
 /// The procedure of `component` that holds `line`. A Sub or Function statement gets its kind from the
 /// keyword, also when the statement starts with it («Sub Main()»). Failures of the IDE are ignored: a field
 /// the IDE could not give stays empty.
@@ -54,8 +61,9 @@ class TextInsertion {
 
   /// Puts `Text` at the selection of the active code pane, expanded for the selected component and the
   /// line where the selection starts. Never raises: a failure records the last error and shows "Erro na
-  /// inserção de código.", and when it happens before anything was changed (the expansion failed, say)
-  /// the code and the selection stay as they were.
+  /// inserção de código."; the code and the selection stay as they were when the expansion fails, when
+  /// the text holds a character the code page cannot (the message names it) and when the module refuses
+  /// the text.
   void InsertText(const QString& Text);
 
   /// `Text` with its placeholders replaced for `Component` (may be empty) and the 1-based `Line` where it
@@ -67,7 +75,8 @@ class TextInsertion {
 
   /// Replaces the selection of `CodeModule`'s code pane with `Text`. On an empty line with nothing
   /// selected the text goes in as new lines above it; a selection over several lines that ends at the
-  /// start of an empty line keeps that line. Raises what the IDE raised.
+  /// start of an empty line keeps that line. Raises what the IDE raised; the lines of a selection are
+  /// removed only once the text is in, so a refused text leaves the module as it was.
   void InsertCode(const ide::Ref<ide::CodeModule>& CodeModule, const QString& Text);
 
  private:

@@ -4,6 +4,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "textins/hotkey.h"
+#include "textins/textinsertion.h"
 
 #include <QAction>
 #include <QClipboard>
@@ -18,6 +19,8 @@
 #include <QSignalBlocker>
 #include <QToolBar>
 #include <QVBoxLayout>
+
+#include <algorithm>
 
 namespace textins {
 namespace {
@@ -181,6 +184,20 @@ void TextsWindow::textChanged() {
   if (m_loading || m_current < 0) return;
   const QString text = m_text->toPlainText();
   if (text == m_shown) return;
+  if (const std::optional<char32_t> character = firstNonAnsi(text)) {
+    // Typed or pasted, it would go into code that cannot be saved: the text stays as it was.
+    const int caret = std::clamp(m_text->textCursor().position() - int(text.size() - m_shown.size()), 0,
+                                 int(m_shown.size()));
+    m_loading = true;
+    m_text->setPlainText(m_shown);
+    QTextCursor cursor = m_text->textCursor();
+    cursor.setPosition(caret);
+    m_text->setTextCursor(cursor);
+    m_loading = false;
+    m_typedTo = -1;
+    m_ui.MsgBox(nonAnsiMessage(*character), ide::mb::Exclamation, common::title());
+    return;
+  }
   // One character typed next to the previous one continues the same edit.
   const int caret = m_text->textCursor().position();
   const bool typedOne = text.size() == m_shown.size() + 1 && caret > 0 &&

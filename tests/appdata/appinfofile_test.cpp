@@ -183,6 +183,80 @@ TEST_F(AppInfoFileTest, AFileThatCannotBeUsedIsNamedAndLeftAsItWas) {
   }
 }
 
+// The four tables as another tool makes them from their description: no collation, keys as typed.
+constexpr char kPlainSchema[] =
+    "CREATE TABLE Macros (MacroId VARCHAR(20), Text TEXT, Enabled BOOLEAN);"
+    "CREATE TABLE CopyBuffers (CopyBufferId VARCHAR(20), Text TEXT, Enabled BOOLEAN DEFAULT 1);"
+    "CREATE TABLE CodeChunks (Name VARCHAR(40) NOT NULL, Text TEXT);"
+    "CREATE TABLE ProjIds (ProjId INTEGER PRIMARY KEY AUTOINCREMENT);"
+    "INSERT INTO Macros VALUES ('CTRL+ALT+D', 'Debug.Print', 1);";
+
+TEST_F(AppInfoFileTest, KeysInAnotherToolsFileAreFoundWithoutRegardToCase) {
+  const QString key = u"PRAGMA key = '$468$468$468'; PRAGMA kdf_iter = 4000;\n"_qs;
+  sqlcipher(file(), key + QLatin1StringView(kPlainSchema) + u'\n');
+  {
+    CAppInfoFile db;
+    db.OpenFile(dir.path());
+    EXPECT_EQ(db.GetMacroText(u"Ctrl+Alt+D"_qs), u"Debug.Print"_qs);
+    db.WriteMacroText(u"ctrl+alt+d"_qs, u"Stop"_qs);
+  }
+  EXPECT_EQ(sqlcipher(file(), key + u"SELECT MacroId, Text FROM Macros;\n"_qs).second,
+            u"CTRL+ALT+D|Stop\n"_qs);
+}
+
+/// A program's exit code and output.
+std::pair<int, QString> run(const QString& program, const QStringList& arguments) {
+  QProcess process;
+  process.setProcessChannelMode(QProcess::MergedChannels);
+  process.start(program, arguments);
+  process.waitForFinished(60000);
+  return {process.exitCode(), QString::fromUtf8(process.readAll())};
+}
+
+#ifdef QUIMBEL_SQLCIPHER4_ORACLE
+TEST_F(AppInfoFileTest, SqlCipher4ReadsAndWritesTheFileWithThePinnedSettingsAsOurCodeDoesOnIt) {
+  const QString oracle = QStringLiteral(QUIMBEL_SQLCIPHER4_ORACLE);
+  const QString worker4 = QStringLiteral(QUIMBEL_APPDATA_WORKER_SQLCIPHER4);
+  const QStringList pinned = {u"PRAGMA key = '$468$468$468'"_qs, u"PRAGMA cipher_page_size = 1024"_qs,
+                              u"PRAGMA kdf_iter = 4000"_qs, u"PRAGMA cipher_hmac_algorithm = HMAC_SHA1"_qs,
+                              u"PRAGMA cipher_kdf_algorithm = PBKDF2_HMAC_SHA1"_qs};
+  const QString select = u"SELECT Text FROM Macros"_qs;
+  {
+    CAppInfoFile db;
+    db.OpenFile(dir.path());
+    db.WriteMacroText(u"Ctrl+Alt+E"_qs, u"Olá"_qs);
+  }
+  const auto read = run(oracle, QStringList{file()} + pinned + QStringList{select});
+  EXPECT_TRUE(read.first == 0 && read.second.endsWith(u"Olá\n"_qs)) << read.second.toStdString();
+  // What the README tells SQLCipher 4's users reads it too; SQLCipher 4's own defaults do not.
+  const auto documented = run(oracle, {file(), pinned[0], u"PRAGMA cipher_compatibility = 3"_qs,
+                                       u"PRAGMA kdf_iter = 4000"_qs, select});
+  EXPECT_TRUE(documented.second.endsWith(u"Olá\n"_qs)) << documented.second.toStdString();
+  EXPECT_NE(run(oracle, {file(), pinned[0], select}).first, 0);
+  // Our code built on SQLCipher 4 shares the file with ours on SQLCipher 3, and the reverse.
+  EXPECT_EQ(run(worker4, {dir.path(), u"ids"_qs, u"1"_qs}), std::make_pair(0, u"000001\n"_qs));
+  QTemporaryDir fromFour;
+  EXPECT_EQ(run(worker4, {fromFour.path(), u"ids"_qs, u"1"_qs}), std::make_pair(0, u"000001\n"_qs));
+  for (const QString& folder : {dir.path(), fromFour.path()}) {
+    CAppInfoFile db;
+    db.OpenFile(folder);
+    EXPECT_EQ(db.GetNextProjId(), u"000002"_qs);
+  }
+  // A file SQLCipher 4 made with the pinned settings, from the tables' description, is ours to use.
+  QTemporaryDir other;
+  const auto written = run(oracle, QStringList{other.filePath(u"Quimbel.inf"_qs)} + pinned +
+                                       QStringList{QLatin1StringView(kPlainSchema)});
+  EXPECT_EQ(written.first, 0) << written.second.toStdString();
+  CAppInfoFile db;
+  db.OpenFile(other.path());
+  EXPECT_EQ(db.GetMacroText(u"Ctrl+Alt+D"_qs), u"Debug.Print"_qs);
+}
+#else
+TEST_F(AppInfoFileTest, SqlCipher4ReadsAndWritesTheFileWithThePinnedSettingsAsOurCodeDoesOnIt) {
+  GTEST_SKIP() << "SQLCipher 4's amalgamation was not built in (scripts/fetch-sqlcipher4.sh fetches it)";
+}
+#endif
+
 TEST_F(AppInfoFileTest, ProcessesDrawingIdentifiersAtOnceNeverGetTheSameOne) {
   CAppInfoFile db;
   db.OpenFile(dir.path());

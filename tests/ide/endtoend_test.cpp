@@ -70,6 +70,39 @@ bool hasAddIn() {
 #endif
 }
 
+TEST(EndToEnd, AMessageBoxTheAddInShowsAtStartUpIsTheScriptsToAnswer) {
+#ifdef QUIMBEL_ADDIN_LIBRARY
+  // A database the add-in cannot use: it says so in a box as it starts.
+  QTemporaryDir work;
+  QDir(work.path()).mkpath(u"install/help"_qs);
+  writeBytes(work.filePath(u"install/Quimbel.inf"_qs), "não é um banco de dados");
+  writeBytes(work.filePath(u"quimbel.conf"_qs), "InstallationPath=" + work.filePath(u"install"_qs).toUtf8());
+  QProcessEnvironment environment;
+  environment.insert(u"QUIMBEL_CONFIG_DIR"_qs, work.filePath(u"config"_qs));
+  environment.insert(u"QUIMBEL_DATA_DIR"_qs, work.filePath(u"data"_qs));
+  environment.insert(u"QUIMBEL_MACHINE_CONFIG"_qs, work.filePath(u"quimbel.conf"_qs));
+  const struct {
+    const char* script;
+    int exitCode;
+    const char* told;
+  } kCases[] = {
+      {"answer OK\nexpect message \"banco de dados\"\n", 0, ""},
+      {"echo sem resposta\n", 1, "a message box is open: Quimbel: Não foi possível abrir o banco de dados"},
+  };
+  for (const auto& c : kCases) {
+    writeBytes(work.filePath(u"s.qis"_qs), c.script);
+    const Session session = runIde(work.filePath(u"s.qis"_qs), environment,
+                                   {u"--addin"_qs, QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
+    EXPECT_EQ(session.exitCode, c.exitCode) << c.script << session.err.toStdString();
+    EXPECT_TRUE(session.out.contains(u"msgbox: Quimbel: Não foi possível abrir o banco de dados"_qs))
+        << session.out.toStdString();
+    EXPECT_TRUE(session.err.contains(QString::fromUtf8(c.told))) << session.err.toStdString();
+  }
+#else
+  GTEST_SKIP() << "the add-in is not built";
+#endif
+}
+
 TEST(EndToEnd, AScriptedSessionWorksOnTheExampleGroupAndSavesIt) {
   ExampleCopy copy;
   QTemporaryDir work;

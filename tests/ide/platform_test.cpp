@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 
 #include <QApplication>
+#include <QKeyEvent>
 #include <QMessageBox>
 #include <QPushButton>
 #include <QTimer>
@@ -100,6 +101,38 @@ TEST(VirtualKeys, KeysMapToTheirWin32Codes) {
   EXPECT_EQ(shifted.key, 0x30u) << "Shift+0 is typed as ')'";
   EXPECT_EQ(shifted.modifiers, ide::mod::Control | ide::mod::Shift);
   EXPECT_EQ(virtualKeyOf(Qt::Key_Shift, Qt::ShiftModifier).key, 0u);
+}
+
+TEST(VirtualKeys, TheDigitKeysAreToldByTheKeyWhateverTheLayoutTypesOnThem) {
+  constexpr Qt::KeyboardModifiers kCtrlShift = Qt::ControlModifier | Qt::ShiftModifier;
+  const struct {
+    const char* what;
+    int qtKey;
+    Qt::KeyboardModifiers modifiers;
+    quint32 scanCode;
+    quint32 nativeKey;
+    NativeKeyCodes codes;
+    unsigned vk;
+  } kCases[] = {
+      {"US, Shift+1", Qt::Key_Exclam, kCtrlShift, 10, 0x21, NativeKeyCodes::Xkb, '1'},
+      {"Brazilian, Shift+6 is a dead key", Qt::Key_Dead_Diaeresis, kCtrlShift, 15, 0xFE57,
+       NativeKeyCodes::Xkb, '6'},
+      {"German, Shift+3", Qt::Key_section, kCtrlShift, 12, 0xA7, NativeKeyCodes::Xkb, '3'},
+      {"German, Shift+0", Qt::Key_Equal, kCtrlShift, 19, 0x3D, NativeKeyCodes::Xkb, '0'},
+      {"German, '*' on the '+' key", Qt::Key_Asterisk, kCtrlShift, 35, 0x2A, NativeKeyCodes::Xkb, 0},
+      {"French, the 1 key types '&'", Qt::Key_Ampersand, Qt::ControlModifier, 10, 0x26, NativeKeyCodes::Xkb,
+       '1'},
+      {"the keypad's 0", Qt::Key_0, Qt::ControlModifier | Qt::KeypadModifier, 90, 0xFFB0, NativeKeyCodes::Xkb,
+       0},
+      {"Windows, UK Shift+2", Qt::Key_QuoteDbl, kCtrlShift, 3, '2', NativeKeyCodes::Windows, '2'},
+      {"no native codes", Qt::Key_Exclam, kCtrlShift, 0, 0, NativeKeyCodes::None, '1'},
+  };
+  for (const auto& c : kCases) {
+    const QKeyEvent event(QEvent::KeyPress, c.qtKey, c.modifiers, c.scanCode, c.nativeKey, 0);
+    const VirtualKey key = virtualKeyOf(event, c.codes);
+    EXPECT_EQ(key.key, c.vk) << c.what;
+    EXPECT_EQ(key.modifiers, virtualKeyOf(c.qtKey, c.modifiers).modifiers) << c.what;
+  }
 }
 
 // The model's hooks for the desktop host, on the headless model.

@@ -30,14 +30,17 @@ TEST(Tool, TasksAreListedAndChangedInTheFileTheAddInUses) {
   Scene scene;
   const QString bare = scene.writeProject(u"Sem"_qs, {{u"modA"_qs, u"Option Explicit\r\n"_qs}});
   const QByteArray bareBytes = host::test::readBytes(bare);
-  EXPECT_EQ(quimbel({u"tasks"_qs, bare}).exitCode, 0);
+  EXPECT_EQ(quimbel({u"tasks"_qs, bare}).exitCode, 7);
   const ToolRun refused = quimbel({u"tasks"_qs, bare, u"add"_qs, u"Nova"_qs});
   EXPECT_EQ(refused.exitCode, 3);
   EXPECT_TRUE(refused.err.contains(u"no identifier module"_qs)) << refused.err.toStdString();
   EXPECT_EQ(host::test::readBytes(bare), bareBytes) << "the tool never inserts the module";
 
   const QString vbp = scene.writeProject(u"Loja"_qs, {{u"basQMInf000600"_qs, u"'PROJID=000600\r\n"_qs}});
-  EXPECT_EQ(quimbel({u"tasks"_qs, vbp}).out, QStringList{u"Loja: no tasks"_qs});
+  // No info file is not an empty list.
+  const ToolRun none = quimbel({u"tasks"_qs, vbp});
+  EXPECT_EQ(none.exitCode, 7);
+  EXPECT_TRUE(none.err.contains(u"qm000600.qmi is not in its folder"_qs)) << none.err.toStdString();
   for (const QStringList& change :
        {QStringList{u"add"_qs, u"Revisar (frete)"_qs, u"--text"_qs, u"Tabela\nnova"_qs},
         QStringList{u"add"_qs, u"Conferir ação"_qs}, QStringList{u"done"_qs, u"2"_qs},

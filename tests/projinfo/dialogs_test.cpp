@@ -213,5 +213,39 @@ TEST(AddInEvents, AClosedProjectKeepsItsFavouritesAndASavedOneCarriesItsFileAlon
   connection.OnDisconnection(ide::DisconnectMode::HostShutdown, custom);
 }
 
+TEST(AddInEvents, AnAddInUnloadedWhileTheIdeRunsOnLeavesTheFilesOfProjectsThatMayStillBeSaved) {
+  addin::test::AddInEnvironment environment;
+  host::test::ExampleCopy copy;
+  const QByteArray oldTemp = qgetenv("TMPDIR");
+  QDir().mkpath(environment.path(u"tmp"_qs));
+  qputenv("TMPDIR", environment.path(u"tmp"_qs).toLocal8Bit());
+  auto vbe = host::VbeImpl::create();
+  auto addIn = std::make_shared<addin::test::FakeAddIn>(vbe);
+  auto saved = vbe->openProject(copy.path(u"Loja/Loja.vbp"_qs));
+  auto fresh = vbe->newProject();
+  QVariantList custom;
+  {
+    addin::Connect connection{addin::Environment{}};
+    connection.OnConnection(vbe, ide::ConnectMode::AfterStartup, addIn, custom);
+    connection.OnDisconnection(ide::DisconnectMode::UserClosed, custom);
+  }
+  // Both modules are new and not saved yet; the files stay, and come along when the add-in is back.
+  const QString file = copy.path(u"Loja/"_qs) + infoFileTitle(FindProjectId(saved)->id);
+  const QString freshTitle = infoFileTitle(FindProjectId(fresh)->id);
+  EXPECT_TRUE(QFileInfo::exists(file));
+  EXPECT_TRUE(QFileInfo::exists(environment.path(u"tmp/"_qs) + freshTitle));
+  saved->save();
+  QDir().mkpath(copy.path(u"Novo"_qs));
+  fresh->SaveAs(copy.path(u"Novo/Novo.vbp"_qs));
+  addin::Connect again{addin::Environment{}};
+  again.OnConnection(vbe, ide::ConnectMode::AfterStartup, addIn, custom);
+  EXPECT_TRUE(QFileInfo::exists(file));
+  EXPECT_TRUE(QFileInfo::exists(copy.path(u"Novo/"_qs) + freshTitle));
+  EXPECT_FALSE(QFileInfo::exists(environment.path(u"tmp/"_qs) + freshTitle));
+  EXPECT_TRUE(vbe->headlessUi()->messageBoxes().empty());
+  again.OnDisconnection(ide::DisconnectMode::HostShutdown, custom);
+  qputenv("TMPDIR", oldTemp);
+}
+
 }  // namespace
 }  // namespace projinfo::test

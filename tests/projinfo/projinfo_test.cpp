@@ -94,14 +94,50 @@ TEST(LifeCycle, ANewProjectGetsAModuleAndAFileThatFollowItsSaves) {
   EXPECT_FALSE(QFile::exists(scene.path(u"Antigo/qm000003.qmi"_qs)));
   EXPECT_TRUE(scene.takeMessages().isEmpty());
 
-  // The module removed: the tie is lost, the file closed and kept.
-  auto identity = scene.info(again).basProjInfo;
+  // The module removed or renamed: the tie is lost (the message names the module it had), the file
+  // closed and kept; the module back, added again or renamed back, brings the tasks back.
+  CProjInfo& info = scene.info(again);
+  auto identity = info.basProjInfo;
   scene.infos->componentRemoved(identity);
   again->Remove(identity);
-  EXPECT_FALSE(scene.info(again).isOpen());
-  EXPECT_EQ(scene.takeMessages().size(), 1);
+  EXPECT_FALSE(info.isOpen());
+  identity = again->VBComponents()->AddFile(scene.path(u"Trabalho/basQMInf000001.bas"_qs));
+  scene.infos->componentAdded(identity);
+  EXPECT_EQ(info.TaskList()->Tasks.Count(), 2);
+  identity->setName(u"modOutro"_qs);
+  scene.infos->componentRenamed(identity);
+  EXPECT_FALSE(info.isOpen());
+  identity->setName(u"basQMInf000001"_qs);
+  scene.infos->componentRenamed(identity);
+  EXPECT_EQ(info.TaskList()->Tasks.Count(), 2);
+  const QStringList messages = scene.takeMessages();
+  ASSERT_EQ(messages.size(), 2);
+  EXPECT_TRUE(messages[1].contains(u"módulo basQMInf000001,"_qs)) << messages[1].toStdString();
+  scene.infos->componentRemoved(identity);
+  again->Remove(identity);
   scene.close(again);
   EXPECT_TRUE(QFile::exists(moved));
+  // Never saved, the project takes its file along even when its module went first.
+  auto fresh = scene.newProject();
+  scene.infos->componentRemoved(scene.info(fresh).basProjInfo);
+  scene.close(fresh);
+  EXPECT_TRUE(QDir(scene.path(u"tmp"_qs)).isEmpty());
+}
+
+TEST(LifeCycle, TwoProjectsWithOneIdentifierDoNotShareTheFile) {
+  Scene scene;
+  const QString vbp = scene.writeProject(u"Loja"_qs, {{u"basQMInf000700"_qs, u"'PROJID=000700\r\n"_qs}});
+  auto first = scene.open(vbp);
+  scene.addTask(first, u"Da primeira"_qs);
+  writeBytes(scene.path(u"Loja/Copia.vbp"_qs), readBytes(vbp).replace("\"Loja\"", "\"Copia\""));
+  auto second = scene.open(scene.path(u"Loja/Copia.vbp"_qs));
+  const QStringList messages = scene.takeMessages();
+  ASSERT_EQ(messages.size(), 1);
+  EXPECT_TRUE(messages[0].contains(u"mesmo identificador, 000700"_qs)) << messages[0].toStdString();
+  EXPECT_FALSE(scene.info(second).isOpen());
+  scene.close(second);
+  EXPECT_EQ(scene.tasks(first).Tasks.Count(), 1);
+  EXPECT_EQ(streamsOf(scene.path(u"Loja/qm000700.qmi"_qs), u"TaskList"_qs), QStringList{u"Task1"_qs});
 }
 
 TEST(Records, ValuesComeBackWhateverTheyHoldAndOldRecordsReadAsBefore) {

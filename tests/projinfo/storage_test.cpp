@@ -16,6 +16,7 @@
 #include <QRandomGenerator>
 #include <QTemporaryDir>
 #include <QThread>
+#include <QtEndian>
 
 #include <csignal>
 
@@ -108,6 +109,20 @@ TEST(StreamLayout, AStringCountTheStreamCannotHoldIsDamage) {
   }
 }
 
+TEST(StreamLayout, ADateOutsideTheYears100To9999IsRefused) {
+  QTemporaryDir dir;
+  auto stream = createFile(dir.filePath(u"a.qmi"_qs))->CreateStream(u"Date"_qs, kElementMode);
+  for (const double days : {-657434.5, 2958465.99, -657435.0, 2958466.0, 1e300, -1e300, qQNaN(), qInf()}) {
+    const bool inRange = days > -657435 && days < 2958466;
+    EXPECT_EQ(dateFromAutomation(days).isValid(), inRange) << days;
+    stream->SetSize(0);
+    stream->SSeek(0);
+    stream->WriteData(days);
+    stream->SSeek(0);
+    EXPECT_EQ(failure([&] { stream->ReadData(vbDate); }), inRange ? 0 : 6) << days;
+  }
+}
+
 TEST(Storages, ElementsAreCreatedOpenedListedMovedAndDestroyed) {
   QTemporaryDir dir;
   auto root = createFile(dir.filePath(u"a.qmi"_qs));
@@ -175,6 +190,72 @@ TEST(DocFiles, AnExistingFileIsOpenedAsItIsAndHeldByItsFirstWriter) {
   EXPECT_FALSE(QFile::exists(dir.filePath(u".qm000001.qmi.lock"_qs)));
 }
 
+/// Where the directory of a file we wrote begins (its sectors follow each other).
+qsizetype directoryOf(const QByteArray& file) {
+  return (qsizetype(qFromLittleEndian<quint32>(file.constData() + 0x30)) + 1) * 512;
+}
+
+std::shared_ptr<Element> storageNamed(const QString& name) {
+  auto storage = std::make_shared<Element>();
+  storage->name = name;
+  storage->kind = ElementKind::Storage;
+  return storage;
+}
+
+/// A file whose storages nest `depth` deep: written side by side, then linked each into the one before.
+QByteArray nested(int depth) {
+  Element root;
+  root.kind = ElementKind::Root;
+  for (int i = 0; i < depth; ++i)
+    root.children.emplace(ElementKey(u"S%1"_qs.arg(i)), storageNamed(u"S%1"_qs.arg(i)));
+  QByteArray bytes = writeCompoundFile(root);
+  for (int i = 0; i <= depth; ++i) {
+    char* entry = bytes.data() + directoryOf(bytes) + 128 * qsizetype(i);
+    qToLittleEndian<quint64>(~quint64(0), entry + 0x44);
+    qToLittleEndian<quint32>(i < depth ? i + 1 : 0xFFFFFFFFu, entry + 0x4C);
+  }
+  return bytes;
+}
+
+/// Every element of a tree by its path, with its data.
+QStringList contentsOf(const Element& element, const QString& path = {}) {
+  QStringList all;
+  for (const auto& [key, child] : element.children)
+    all << path + child->name + u' ' + QString::fromLatin1(child->data.toHex())
+        << contentsOf(*child, path + child->name + u'/');
+  return all;
+}
+
+TEST(DocFiles, TreesNestAsDeepAsTheLimitAndAnyDeeperOneIsRefusedWithoutRecursion) {
+  Element root;
+  root.kind = ElementKind::Root;
+  Element* deepest = &root;
+  for (int depth = 1; depth <= kMaxNesting; ++depth)
+    deepest = deepest->children.emplace(ElementKey(u"S"_qs), storageNamed(u"S"_qs)).first->second.get();
+  EXPECT_EQ(contentsOf(*readCompoundFile(writeCompoundFile(root))), contentsOf(root));
+  deepest->children.emplace(ElementKey(u"S"_qs), storageNamed(u"S"_qs));
+  EXPECT_EQ(failure([&] { writeCompoundFile(root); }), stg::WriteFault);
+  // A tree far deeper than any stack goes as a whole.
+  for (int depth = 0; depth < 200000; ++depth)
+    deepest = deepest->children.emplace(ElementKey(u"S"_qs), storageNamed(u"S"_qs)).first->second.get();
+}
+
+TEST(DocFiles, AnyTreeLinkCutOrBentIsDamageNeverALostElement) {
+  QTemporaryDir dir;
+  writeSample(dir.filePath(u"good.qmi"_qs));
+  const QByteArray sample = readBytes(dir.filePath(u"good.qmi"_qs));
+  const QStringList contents = contentsOf(*readCompoundFile(sample));
+  int refused = 0;
+  for (qsizetype offset = 0; offset + 4 <= sample.size(); offset += 4) {
+    std::shared_ptr<Element> read;
+    if (failure([&] { read = readCompoundFile(QByteArray(sample).replace(offset, 4, "\xFF\xFF\xFF\xFF")); }))
+      ++refused;
+    else
+      EXPECT_EQ(contentsOf(*read).size(), contents.size()) << "offset " << offset;
+  }
+  EXPECT_GT(refused, 0);
+}
+
 TEST(DocFiles, DamagedFilesAreRefusedWithAReasonAndLeftAsTheyAre) {
   QTemporaryDir dir;
   const QString good = dir.filePath(u"good.qmi"_qs);
@@ -183,11 +264,14 @@ TEST(DocFiles, DamagedFilesAreRefusedWithAReasonAndLeftAsTheyAre) {
   auto patched = [&](int offset, QByteArray bytes) {
     return QByteArray(sample).replace(offset, bytes.size(), bytes);
   };
+  const qsizetype root = directoryOf(sample);
   const struct {
     const char* what;
     QByteArray bytes;
     long number;
   } kCases[] = {
+      {"storages nested 30,000 deep", nested(30000), stg::DocFileCorrupt},
+      {"the root's children cut off", patched(root + 0x4C, QByteArray(4, '\xFF')), stg::DocFileCorrupt},
       {"empty", {}, stg::InvalidHeader},
       {"text", "Type=Exe\r\nName=\"Loja\"\r\n", stg::InvalidHeader},
       {"cut in the header", sample.left(300), stg::DocFileCorrupt},

@@ -279,6 +279,13 @@ TEST(HotKeyWindows, TheTextBoxKeysButtonsAndReservedWords) {
   EXPECT_FALSE(window.button(u"Cut"_qs)->isEnabled());
 
   QTest::keyClicks(box, u"If x Then"_qs);
+  // A character the code page cannot hold is refused where it is typed (or pasted), and named.
+  box->insertPlainText(u"中"_qs);
+  EXPECT_EQ(box->toPlainText(), u"If x Then"_qs);
+  EXPECT_EQ(box->textCursor().position(), 9);
+  ASSERT_EQ(scene.prompts().size(), 1);
+  EXPECT_TRUE(scene.prompts()[0].contains(u"\u201C中\u201D (U+4E2D)"_qs)) << scene.prompts()[0].toStdString();
+  scene.ui().clearMessageBoxes();
   QTest::keyClick(box, Qt::Key_Z, Qt::ControlModifier);
   EXPECT_EQ(box->toPlainText(), QString()) << "typing is one edit";
   QTest::keyClick(box, Qt::Key_Z, Qt::ControlModifier);

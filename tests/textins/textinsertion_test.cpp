@@ -120,22 +120,38 @@ TEST(TextInsertion, PlaceholdersAndMarkersLandWhereTheTextSays) {
 }
 
 TEST(TextInsertion, AFailureLeavesTheCodeAndTheSelectionAsTheyWereAndIsReported) {
-  Editor editor;
-  auto component = editor.open(QString::fromUtf16(kModule));
-  const QString before = component->CodeModule()->Lines(1, component->CodeModule()->CountOfLines());
-  editor.vbe->ActiveCodePane()->SetSelection(4, 5, 4, 6);
-  TextInsertion insertion(*editor.vbe, editor.context);
-  // {ProjectName} out of reach fails the expansion, rather than giving an empty text that would replace
-  // the selection.
-  EXPECT_THROW(insertion.ExpandPlaceholders(u"' {ProjectName}"_qs, nullptr, 1), ide::Error);
-  // A line the IDE refuses (longer than 1023 characters): the caret does not go where "{C}" was.
-  insertion.InsertText(QString(1100, u'x') + u"{C}"_qs);
-  EXPECT_EQ(component->CodeModule()->Lines(1, component->CodeModule()->CountOfLines()), before);
-  EXPECT_EQ(editor.selection(), (Selection{4, 5, 4, 6}));
-  const auto& boxes = editor.vbe->headlessUi()->messageBoxes();
-  ASSERT_EQ(boxes.size(), 1u);
-  EXPECT_EQ(boxes.front().prompt, common::LoadResString(5096));
-  EXPECT_EQ(ide::mb::iconOf(boxes.front().style), ide::mb::Exclamation);
+  const struct {
+    Selection selection;
+    QString text;
+    const char16_t* told;
+  } cases[] = {
+      // A line the IDE refuses (longer than 1023 characters): the caret does not go where "{C}" was.
+      {{4, 5, 4, 6}, QString(1100, u'x') + u"{C}"_qs, u""},
+      // Over three lines, the joined line is refused before any of them goes.
+      {{3, 5, 6, 3}, QString(1100, u'x'), u""},
+      // A character without a byte in the code page would make the module impossible to save.
+      {{4, 5, 4, 5}, u"' 中文"_qs, u"\u201C中\u201D (U+4E2D)"},
+  };
+  for (const auto& c : cases) {
+    Editor editor;
+    auto component = editor.open(QString::fromUtf16(kModule));
+    const QString before = component->CodeModule()->Lines(1, component->CodeModule()->CountOfLines());
+    editor.vbe->ActiveCodePane()->SetSelection(c.selection[0], c.selection[1], c.selection[2],
+                                               c.selection[3]);
+    TextInsertion insertion(*editor.vbe, editor.context);
+    insertion.InsertText(c.text);
+    EXPECT_EQ(component->CodeModule()->Lines(1, component->CodeModule()->CountOfLines()), before);
+    EXPECT_EQ(editor.selection(), c.selection);
+    const auto& boxes = editor.vbe->headlessUi()->messageBoxes();
+    ASSERT_EQ(boxes.size(), 1u);
+    EXPECT_TRUE(boxes.front().prompt.startsWith(common::LoadResString(5096)));
+    EXPECT_TRUE(boxes.front().prompt.contains(QString::fromUtf16(c.told)))
+        << boxes.front().prompt.toStdString();
+    EXPECT_EQ(ide::mb::iconOf(boxes.front().style), ide::mb::Exclamation);
+    // {ProjectName} out of reach fails the expansion, rather than giving an empty text that would replace
+    // the selection.
+    EXPECT_THROW(insertion.ExpandPlaceholders(u"' {ProjectName}"_qs, nullptr, 1), ide::Error);
+  }
 }
 
 }  // namespace

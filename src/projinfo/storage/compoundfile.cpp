@@ -98,7 +98,7 @@ class Reader {
     element->clsid = root.clsid;
     element->stateBits = root.stateBits;
     element->modified = root.modified;
-    readChildren(root, *element);
+    readTree(*element);
     return element;
   }
 
@@ -229,20 +229,27 @@ class Reader {
     }
   }
 
-  void readChildren(const DirEntry& parent, Element& into) {
-    // The children form a binary tree through the left and right links; it is walked without recursion,
-    // since a damaged file may make it as deep as it is long.
-    std::vector<quint32> pending;
-    if (parent.child != kNoStream) pending.push_back(parent.child);
+  /// Builds the tree below the root. Siblings form a binary tree through their left and right links, and
+  /// storages nest through their child link; both are walked with a list of pending links rather than by
+  /// recursion, since a damaged file may make either as deep as the file is long.
+  void readTree(Element& rootElement) {
+    struct Pending {
+      quint32 id;
+      Element* parent;
+      int depth;
+    };
+    std::vector<Pending> pending;
+    if (m_entries[0].child != kNoStream) pending.push_back({m_entries[0].child, &rootElement, 1});
     while (!pending.empty()) {
-      const quint32 id = pending.back();
+      const Pending link = pending.back();
       pending.pop_back();
+      const quint32 id = link.id;
       if (id >= m_entries.size()) corrupt(QStringLiteral("a directory link points past the directory"));
       if (m_seen[id]) corrupt(QStringLiteral("directory entry %1 is linked twice").arg(id));
       m_seen[id] = true;
       const DirEntry& entry = m_entries[id];
-      if (entry.left != kNoStream) pending.push_back(entry.left);
-      if (entry.right != kNoStream) pending.push_back(entry.right);
+      if (entry.left != kNoStream) pending.push_back({entry.left, link.parent, link.depth});
+      if (entry.right != kNoStream) pending.push_back({entry.right, link.parent, link.depth});
       if (entry.type != 1 && entry.type != 2)
         corrupt(QStringLiteral("directory entry %1 has an invalid type").arg(id));
       auto element = std::make_shared<Element>();
@@ -263,12 +270,20 @@ class Reader {
             corrupt(what + QStringLiteral(" is larger than the file"));
           element->data = chainBytes(entry.start, m_fat, m_sectorSize, entry.size, what);
         }
-      } else {
-        readChildren(entry, *element);
+      } else if (entry.child != kNoStream) {
+        if (link.depth >= kMaxNesting)
+          corrupt(QStringLiteral("its storages are nested more than %1 deep").arg(kMaxNesting));
+        pending.push_back({entry.child, element.get(), link.depth + 1});
       }
-      if (!into.children.emplace(ElementKey(element->name), element).second)
+      if (!link.parent->children.emplace(ElementKey(element->name), element).second)
         corrupt(QStringLiteral("two elements are named \"%1\"").arg(entry.name));
     }
+    // An element in use that no link reaches would be lost without a word by the next write.
+    for (size_t id = 1; id < m_entries.size(); ++id)
+      if (m_entries[id].type != 0 && !m_seen[id])
+        corrupt(QStringLiteral("directory entry %1 (\"%2\") is not reached from the root")
+                    .arg(id)
+                    .arg(m_entries[id].name));
   }
 
   const QByteArray& m_bytes;
@@ -445,23 +460,32 @@ class Writer {
   }
 
  private:
-  /// Gives the children of entry `parent` consecutive ids, links them as a balanced tree, then does the
-  /// same below each child that is a storage.
-  void addChildren(size_t parent) {
-    const Element& element = *m_entries[parent].element;
-    if (element.children.empty()) return;
-    const size_t first = m_entries.size();
-    for (const auto& [key, child] : element.children)
-      m_entries.push_back({child.get()});
-    const size_t count = element.children.size();
-    int height = 0;
-    while ((size_t(2) << height) - 1 < count)
-      ++height;
-    // A tree whose last level is incomplete keeps every path equally black by making that level red.
-    const bool full = (size_t(2) << height) - 1 == count;
-    m_entries[parent].child = link(first, 0, count, 0, height, full);
-    for (size_t i = first; i < first + count; ++i)
-      if (m_entries[i].element->isStorage()) addChildren(i);
+  /// Gives the children of each storage consecutive ids and links them as a balanced tree, storage by
+  /// storage in depth-first order (a storage's children, then everything below its first child storage,
+  /// then below the next), with a list of pending storages instead of recursion.
+  void addChildren(size_t rootEntry) {
+    std::vector<std::pair<size_t, int>> pending{{rootEntry, 0}};
+    while (!pending.empty()) {
+      const auto [parent, depth] = pending.back();
+      pending.pop_back();
+      const Element& element = *m_entries[parent].element;
+      if (element.children.empty()) continue;
+      if (depth >= kMaxNesting)
+        throw ide::Error(stg::WriteFault,
+                         QStringLiteral("the storages would be nested more than %1 deep").arg(kMaxNesting));
+      const size_t first = m_entries.size();
+      for (const auto& [key, child] : element.children)
+        m_entries.push_back({child.get()});
+      const size_t count = element.children.size();
+      int height = 0;
+      while ((size_t(2) << height) - 1 < count)
+        ++height;
+      // A tree whose last level is incomplete keeps every path equally black by making that level red.
+      const bool full = (size_t(2) << height) - 1 == count;
+      m_entries[parent].child = link(first, 0, count, 0, height, full);
+      for (size_t i = first + count; i-- > first;)
+        if (m_entries[i].element->isStorage()) pending.emplace_back(i, depth + 1);
+    }
   }
 
   quint32 link(size_t first, size_t lo, size_t hi, int depth, int height, bool full) {
@@ -478,6 +502,21 @@ class Writer {
 };
 
 }  // namespace
+
+Element::~Element() {
+  // Children that nobody else holds are emptied here before they go, so that no destructor runs inside
+  // another one more than a level deep.
+  std::vector<std::shared_ptr<Element>> pending;
+  for (auto& [key, child] : children)
+    pending.push_back(std::move(child));
+  while (!pending.empty()) {
+    std::shared_ptr<Element> element = std::move(pending.back());
+    pending.pop_back();
+    if (element.use_count() != 1) continue;
+    for (auto& [key, child] : element->children)
+      pending.push_back(std::move(child));
+  }
+}
 
 bool isValidElementName(const QString& name) {
   if (name.isEmpty() || name.size() > kMaxElementName) return false;

@@ -59,6 +59,14 @@ using ElementMap = std::map<ElementKey, std::shared_ptr<Element>>;
 
 /// One element of a compound file: a storage (or the root) with its children, or a stream with its bytes.
 struct Element {
+  Element() = default;
+  Element(const Element&) = default;
+  Element(Element&&) = default;
+  Element& operator=(const Element&) = default;
+  Element& operator=(Element&&) = default;
+  /// Takes the tree below apart level by level: a damaged file's tree may be as deep as it is long.
+  ~Element();
+
   QString name;
   ElementKind kind = ElementKind::Stream;
   QUuid clsid;
@@ -74,16 +82,23 @@ struct Element {
   bool isStorage() const { return kind != ElementKind::Stream; }
 };
 
+/// How many storages may nest inside each other (the root's children are at depth 1). The format sets no
+/// limit, but nothing real comes near it: deeper trees are damage, refused on reading and on writing.
+inline constexpr int kMaxNesting = 256;
+
 /// The longest element name the format holds, in UTF-16 code units.
 inline constexpr int kMaxElementName = 31;
 /// Whether a name may be given to an element: 1 to 31 code units, none of / \ : !
 bool isValidElementName(const QString& name);
 
 /// Parses a whole file; raises ide::Error stg::InvalidHeader when the bytes are not a compound file and
-/// stg::DocFileCorrupt, with what is wrong, when it is damaged or truncated.
+/// stg::DocFileCorrupt, with what is wrong, when it is damaged or truncated: a broken chain or size, a
+/// directory link out of range or in a circle, an element in use that no link reaches, storages nested
+/// deeper than kMaxNesting.
 std::shared_ptr<Element> readCompoundFile(const QByteArray& bytes);
 
-/// Lays out `root` and everything under it as the bytes of a compound file.
+/// Lays out `root` and everything under it as the bytes of a compound file. Raises stg::WriteFault for a
+/// tree nested deeper than kMaxNesting or too large for the format.
 QByteArray writeCompoundFile(const Element& root);
 
 }  // namespace projinfo

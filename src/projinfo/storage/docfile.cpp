@@ -8,6 +8,8 @@
 #include <QFileInfo>
 #include <QLockFile>
 
+#include <vector>
+
 namespace projinfo {
 namespace {
 
@@ -23,9 +25,14 @@ QString lockPathOf(const QString& path) {
 }  // namespace
 
 void markGone(Element& element) {
-  for (auto& [key, child] : element.children) {
-    child->gone = true;
-    markGone(*child);
+  std::vector<Element*> pending{&element};
+  while (!pending.empty()) {
+    Element* next = pending.back();
+    pending.pop_back();
+    for (auto& [key, child] : next->children) {
+      child->gone = true;
+      pending.push_back(child.get());
+    }
   }
 }
 

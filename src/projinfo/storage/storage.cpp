@@ -12,6 +12,7 @@
 #include <cmath>
 #include <cstring>
 #include <limits>
+#include <vector>
 
 namespace projinfo {
 namespace {
@@ -30,19 +31,36 @@ QHash<QUuid, std::function<PersistStreamRef()>>& persistentClasses() {
 }
 
 const QDate kAutomationEpoch(1899, 12, 30);
+// 1 January 100 and 31 December 9999, the first and last days an automation date can name.
+constexpr double kFirstAutomationDate = -657434;
+constexpr double kLastAutomationDate = 2958465;
+constexpr long kOverflow = 6;
 
+/// A deep copy, level by level without recursion.
 std::shared_ptr<Element> copyOf(const Element& element) {
   auto copy = std::make_shared<Element>(element);
-  copy->gone = false;
-  for (auto& [key, child] : copy->children)
-    child = copyOf(*child);
+  std::vector<Element*> pending{copy.get()};
+  while (!pending.empty()) {
+    Element* next = pending.back();
+    pending.pop_back();
+    next->gone = false;
+    for (auto& [key, child] : next->children) {
+      child = std::make_shared<Element>(*child);
+      pending.push_back(child.get());
+    }
+  }
   return copy;
 }
 
 bool contains(const Element& outer, const Element& inner) {
-  if (&outer == &inner) return true;
-  for (const auto& [key, child] : outer.children)
-    if (child->isStorage() && contains(*child, inner)) return true;
+  std::vector<const Element*> pending{&outer};
+  while (!pending.empty()) {
+    const Element* next = pending.back();
+    pending.pop_back();
+    if (next == &inner) return true;
+    for (const auto& [key, child] : next->children)
+      if (child->isStorage()) pending.push_back(child.get());
+  }
   return false;
 }
 
@@ -60,6 +78,7 @@ void registerPersistentClass(const QUuid& classId, std::function<PersistStreamRe
 }
 
 QDateTime dateFromAutomation(double days) {
+  if (!(days > kFirstAutomationDate - 1 && days < kLastAutomationDate + 1)) return {};
   // The whole part counts days (negative before the epoch); the fraction is always the time after
   // midnight, also for negative values.
   const double whole = std::trunc(days);
@@ -382,8 +401,16 @@ QVariant Stream::ReadData(qint32 typeCode) {
       return QVariant::fromValue(qFromLittleEndian<double>(fixed(8).constData()));
     case vbCurrency:
       return QVariant::fromValue(Currency{qFromLittleEndian<qint64>(fixed(8).constData())});
-    case vbDate:
-      return QVariant::fromValue(dateFromAutomation(qFromLittleEndian<double>(fixed(8).constData())));
+    case vbDate: {
+      const double days = qFromLittleEndian<double>(fixed(8).constData());
+      const QDateTime date = dateFromAutomation(days);
+      // Not a date at all (damage, or bytes of another type): refused as a conversion would refuse it.
+      if (!date.isValid())
+        throw ide::Error(kOverflow, QStringLiteral("Overflow (the date value %1 in the stream \"%2\")")
+                                        .arg(days)
+                                        .arg(element().name));
+      return QVariant::fromValue(date);
+    }
     case vbBoolean:
       return QVariant::fromValue(qFromLittleEndian<qint16>(fixed(2).constData()) != 0);
     case vbString: {

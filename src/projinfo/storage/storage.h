@@ -79,7 +79,8 @@ using PersistStreamRef = std::shared_ptr<PersistStream>;
 /// Makes a class known to ReadObject by its class identifier.
 void registerPersistentClass(const QUuid& classId, std::function<PersistStreamRef()> create);
 
-/// An automation date as a date and time, and back.
+/// An automation date as a date and time, and back. A value outside the years 100 to 9999 (or not a
+/// number) gives an invalid date.
 QDateTime dateFromAutomation(double days);
 double automationFromDate(const QDateTime& date);
 
@@ -200,7 +201,8 @@ class Stream {
   /// Null for an object record of sixteen zero bytes.
   PersistStreamRef ReadObject();
   /// A value of type `typeCode`; an empty value for codes it does not read (objects, bytes and others). A
-  /// string whose count is negative or runs past the end of the stream raises stg::ReadFault.
+  /// string whose count is negative or runs past the end of the stream raises stg::ReadFault, a date
+  /// outside the years 100 to 9999 error 6 (overflow).
   QVariant ReadData(qint32 typeCode);
   qint64 SSeek(qint64 position);
   VBSTATSTG Stat() const;
