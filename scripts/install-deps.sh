@@ -12,7 +12,7 @@ packages=(
   libsqlcipher-dev sqlcipher
   libgsf-1-dev python3-olefile
   libgtest-dev libgmock-dev libbenchmark-dev
-  libcli11-dev
+  libcli11-dev libeditorconfig-dev
 )
 
 missing=()
