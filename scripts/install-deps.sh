@@ -13,7 +13,7 @@ packages=(
   libsqlcipher-dev sqlcipher
   libgsf-1-dev python3-olefile
   libgtest-dev libgmock-dev libbenchmark-dev
-  libcli11-dev libssl-dev
+  libcli11-dev libssl-dev libeditorconfig-dev
 )
 
 missing=()

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "diff.h"
 
+#include <QByteArrayList>
+
 #include <algorithm>
 #include <vector>
 
@@ -16,7 +18,7 @@ struct Change {
   qsizetype newCount = 0;
 };
 
-std::vector<Change> changesBetween(const QStringList& before, const QStringList& after) {
+std::vector<Change> changesBetween(const QByteArrayList& before, const QByteArrayList& after) {
   std::vector<Change> changes;
   if (before.size() == after.size()) {
     for (qsizetype i = 0; i < before.size(); ++i) {
@@ -42,24 +44,39 @@ std::vector<Change> changesBetween(const QStringList& before, const QStringList&
 }
 
 // "l,s" of a hunk header; an empty range names the line before it, a one-line range drops its count.
-QString range(qsizetype start, qsizetype count) {
-  if (count == 1) return QString::number(start + 1);
-  return QStringLiteral("%1,%2").arg(count == 0 ? start : start + 1).arg(count);
+QByteArray range(qsizetype start, qsizetype count) {
+  if (count == 1) return QByteArray::number(start + 1);
+  return QByteArray::number(count == 0 ? start : start + 1) + ',' + QByteArray::number(count);
 }
+
+/// A file's lines as `diff` sees them: split after each line feed, whatever comes before it.
+struct Side {
+  QByteArrayList lines;
+  bool missingFinalNewline = false;
+  explicit Side(const QByteArray& bytes) {
+    if (bytes.isEmpty()) return;
+    lines = bytes.split('\n');
+    if (bytes.endsWith('\n'))
+      lines.removeLast();
+    else
+      missingFinalNewline = true;
+  }
+};
 
 }  // namespace
 
-QStringList unifiedDiff(const QString& path, const DiffSide& before, const DiffSide& after, int context) {
+QByteArray unifiedDiff(const QByteArray& path, const QByteArray& beforeBytes, const QByteArray& afterBytes,
+                       int context) {
+  const Side before(beforeBytes);
+  const Side after(afterBytes);
   const std::vector<Change> changes = changesBetween(before.lines, after.lines);
   if (changes.empty() && before.missingFinalNewline == after.missingFinalNewline) return {};
 
-  QStringList out{QStringLiteral("--- a/") + path, QStringLiteral("+++ b/") + path};
-  const auto emit = [&](QChar mark, const DiffSide& side, qsizetype i) {
-    out << mark + side.lines[i];
-    if (side.missingFinalNewline && i == side.lines.size() - 1)
-      out << QStringLiteral("\\ No newline at end of file");
+  QByteArray out = "--- a/" + path + "\n+++ b/" + path + '\n';
+  const auto emit = [&](char mark, const Side& side, qsizetype i) {
+    out += mark + side.lines[i] + '\n';
+    if (side.missingFinalNewline && i == side.lines.size() - 1) out += "\\ No newline at end of file\n";
   };
-
   size_t next = 0;
   while (next < changes.size()) {
     // Changes closer than two contexts share a hunk.
@@ -75,21 +92,21 @@ QStringList unifiedDiff(const QString& path, const DiffSide& before, const DiffS
     const qsizetype trail = std::min<qsizetype>(context, before.lines.size() - (end.oldStart + end.oldCount));
     const qsizetype oldCount = end.oldStart + end.oldCount + trail - oldStart;
     const qsizetype newCount = end.newStart + end.newCount + trail - newStart;
-    out << QStringLiteral("@@ -%1 +%2 @@").arg(range(oldStart, oldCount), range(newStart, newCount));
+    out += "@@ -" + range(oldStart, oldCount) + " +" + range(newStart, newCount) + " @@\n";
 
     qsizetype oldLine = oldStart;
     qsizetype newLine = newStart;
     for (size_t c = next; c <= last; ++c) {
       const Change& change = changes[c];
       for (; oldLine < change.oldStart; ++oldLine, ++newLine)
-        emit(u' ', before, oldLine);
+        emit(' ', before, oldLine);
       for (qsizetype i = 0; i < change.oldCount; ++i)
-        emit(u'-', before, oldLine++);
+        emit('-', before, oldLine++);
       for (qsizetype i = 0; i < change.newCount; ++i)
-        emit(u'+', after, newLine++);
+        emit('+', after, newLine++);
     }
     for (qsizetype i = 0; i < trail; ++i, ++oldLine, ++newLine)
-      emit(u' ', before, oldLine);
+      emit(' ', before, oldLine);
     next = last + 1;
   }
   return out;

@@ -12,7 +12,6 @@
 // IDE's ProcOfLine gives it, and the matcher behind Find decides every occurrence. Wildcard searches, and
 // files whose header this quick reading does not recognise, are read whole.
 #include "cli.h"
-#include "common/strings.h"
 #include "find/findwalk.h"
 #include "host/code/codetext.h"
 #include "host/code/findmatcher.h"
@@ -29,6 +28,10 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QHash>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QSet>
 #include <QStringBuilder>
 
 #include <algorithm>
@@ -51,8 +54,10 @@ struct ModuleEntry {
 struct Inputs {
   std::vector<ModuleEntry> modules;
   QStringList projectNames;
-  /// A group or project lists a file that is missing (named on standard error as it was met).
-  bool missing = false;
+  /// Files a group or project lists that are missing (named on standard error as they were met).
+  int missing = 0;
+  /// Module files left out (--exclude).
+  Exclusions exclusions;
 
   /// Reads a group, project or module file given on the command line; throws what cannot be read.
   void add(const QString& file) {
@@ -87,7 +92,7 @@ struct Inputs {
     for (int n = 2; projectNames.contains(name, Qt::CaseInsensitive); ++n)
       name = QStringLiteral("Project%1").arg(n);
     projectNames << name;
-    modules.push_back({name, absolute, file});
+    addModule({name, absolute, file});
   }
 
  private:
@@ -109,7 +114,7 @@ struct Inputs {
       if (components[i].kind == host::ComponentKind::RelatedDocument ||
           components[i].kind == host::ComponentKind::ResourceFile)
         continue;  // no code
-      modules.push_back({name, path, here.relativeFilePath(path)});
+      addModule({name, path, here.relativeFilePath(path)});
     }
   }
 
@@ -119,8 +124,19 @@ struct Inputs {
                    .arg(QDir::current().relativeFilePath(listedIn))
                    .arg(lineIndex + 1)
                    .arg(entry));
-    missing = true;
+    ++missing;
   }
+
+  /// Each module file once, however often it was named.
+  void addModule(ModuleEntry module) {
+    if (exclusions.excludes(module.path)) return;
+    const QString identity = fileIdentity(module.path);
+    if (m_seen.contains(identity)) return;
+    m_seen.insert(identity);
+    modules.push_back(std::move(module));
+  }
+
+  QSet<QString> m_seen;
 };
 
 /// The search text as Windows-1252 bytes, each standing for every byte of the same letter in the other
@@ -200,6 +216,8 @@ struct Occurrence {
 
 struct ScannedModule {
   QString name;
+  /// The file is UTF-8 with letters outside ASCII, read in the ANSI code page.
+  bool looksLikeUtf8 = false;
   std::vector<Occurrence> occurrences;
   QByteArray rows;  // as printed
 };
@@ -516,9 +534,11 @@ const QByteArray& readInto(QByteArray& buffer, const QString& path) {
 ScannedModule scanModule(const QString& path, const Search& search) {
   thread_local QByteArray buffer;
   const KeptLines kept = keptLines(readInto(buffer, path), path, search);
+  const bool utf8 = host::sourceEncoding() == host::SourceEncoding::Ansi && host::looksLikeUtf8(buffer);
 
   host::ModuleSource source = host::parseModuleLines(kept.lines, path);
   ScannedModule result;
+  result.looksLikeUtf8 = utf8;
   result.name = host::moduleName(source);
   if (result.name.isEmpty()) result.name = QFileInfo(path).completeBaseName();
   const size_t codeCount = source.code.size();
@@ -572,6 +592,19 @@ QByteArray formatRows(const ModuleEntry& module, const ScannedModule& scanned, b
   return rows.toLocal8Bit();
 }
 
+/// The module's occurrences as JSON objects, each line named for what it counts.
+void appendJson(QJsonArray& out, const ModuleEntry& module, const ScannedModule& scanned) {
+  for (const Occurrence& hit : scanned.occurrences)
+    out.append(QJsonObject{{QStringLiteral("path"), module.shownPath},
+                           {QStringLiteral("project"), module.project},
+                           {QStringLiteral("module"), scanned.name},
+                           {QStringLiteral("procedure"), hit.procedure},
+                           {QStringLiteral("file_line"), hit.fileLine},
+                           {QStringLiteral("code_line"), hit.line},
+                           {QStringLiteral("column"), hit.column},
+                           {QStringLiteral("text"), hit.text}});
+}
+
 }  // namespace
 
 int runFind(const FindCommandOptions& options) {
@@ -579,6 +612,7 @@ int runFind(const FindCommandOptions& options) {
     printError(QStringLiteral("the search text is empty"));
     return kUsageError;
   }
+  useEncoding(options.input);
   std::optional<Search> search;
   try {
     search.emplace(
@@ -587,14 +621,18 @@ int runFind(const FindCommandOptions& options) {
     printError(QStringLiteral("not a valid pattern: %1 (%2)").arg(options.text, error.description()));
     return kUsageError;
   }
-  if (!options.pattern) search->needle.emplace(options.text, options.matchCase);
+  // The quick scan compares code-page bytes; UTF-8 files are read whole.
+  if (!options.pattern && !options.input.utf8) search->needle.emplace(options.text, options.matchCase);
 
+  const auto files = expandInputs(options.input);
+  if (!files) return kInputError;
   Inputs inputs;
-  for (const QString& file : options.files) {
+  inputs.exclusions = options.input.exclusions;
+  for (const QString& file : *files) {
     try {
       inputs.add(file);
     } catch (const ide::Error& error) {
-      printError(QStringLiteral("%1: %2").arg(file, error.description()));
+      printError(namingFileOnce(file, error.description()));
       return kInputError;
     }
   }
@@ -605,7 +643,7 @@ int runFind(const FindCommandOptions& options) {
       modules.size(),
       [&](size_t i) {
         scanned[i] = scanModule(modules[i].path, *search);
-        scanned[i].rows = formatRows(modules[i], scanned[i], options.tsv);
+        if (!options.json) scanned[i].rows = formatRows(modules[i], scanned[i], options.tsv);
       },
       failures);
   for (const std::exception_ptr& failure : failures) {
@@ -621,26 +659,33 @@ int runFind(const FindCommandOptions& options) {
   bool moduleFound = options.module.isEmpty();
   int rows = 0;
   QByteArray out;
+  QJsonArray json;
   for (size_t i = 0; i < modules.size(); ++i) {
     if (!options.module.isEmpty()) {
       if (scanned[i].name.compare(options.module, Qt::CaseInsensitive) != 0) continue;
       moduleFound = true;
     }
-    out += scanned[i].rows;
+    if (scanned[i].looksLikeUtf8) warnUtf8(modules[i].shownPath);
+    if (options.json)
+      appendJson(json, modules[i], scanned[i]);
+    else
+      out += scanned[i].rows;
     rows += int(scanned[i].occurrences.size());
   }
   if (!moduleFound) {
     printError(QStringLiteral("no module '%1' in the files given").arg(options.module));
     return kUsageError;
   }
-  std::fwrite(out.constData(), 1, size_t(out.size()), stdout);
-  std::fflush(stdout);
-  // The summary the add-in's window shows when a search ends.
-  const QByteArray summary = (common::LoadResString(5133) + u' ' + QString::number(rows) + u' ' +
-                              common::LoadResString(5134) + u'\n')
-                                 .toLocal8Bit();
-  std::fwrite(summary.constData(), 1, size_t(summary.size()), stderr);
-  return withMissingFiles(rows > 0 ? kSuccess : kNothingFound, inputs.missing);
+  if (!options.quiet) {
+    printBytes(options.json ? jsonText(QJsonDocument(json)) : out);
+    std::fflush(stdout);
+    // What the add-in's window says when a search ends, and what the run left out.
+    printSummary(QStringLiteral("%1 %2 found%3")
+                     .arg(rows)
+                     .arg(rows == 1 ? QStringLiteral("occurrence") : QStringLiteral("occurrences"))
+                     .arg(inputs.missing ? QStringLiteral(", %1 missing").arg(inputs.missing) : QString()));
+  }
+  return withMissingFiles(rows > 0 ? kSuccess : kNothingFound, inputs.missing > 0);
 }
 
 }  // namespace cli

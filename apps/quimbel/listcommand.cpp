@@ -5,8 +5,13 @@
 #include "host/model/vbe.h"
 
 #include <QDir>
+#include <QFile>
 #include <QFileInfo>
 #include <QHash>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QSet>
 
 #include <vector>
 
@@ -67,28 +72,98 @@ QString procedureKeyword(const host::ProcInfo& proc) {
   }
 }
 
+/// The procedures of each member, found by name once: a member does not search the whole module.
+QHash<QString, std::vector<const host::ProcInfo*>> proceduresByMember(host::CodeText& text) {
+  QHash<QString, std::vector<const host::ProcInfo*>> byMember;
+  for (const host::ProcInfo& proc : text.procedures())
+    byMember[proc.name.toCaseFolded()].push_back(&proc);
+  return byMember;
+}
+
+/// A component as a JSON object: kinds by name, and every line both as the code window counts it and as
+/// the file does.
+QJsonObject componentJson(host::ComponentImpl& component, const QString& path) {
+  QJsonObject object{{QStringLiteral("name"), component.Name()},
+                     {QStringLiteral("type"), host::componentTypeName(component.Type())},
+                     {QStringLiteral("file"), path}};
+  auto module = component.codeModule();
+  if (!module) return object;
+  auto& text = module->text();
+  const std::vector<int> fileLines = fileLinesOf(component);
+  const auto fileLine = [&](int codeLine) {
+    return codeLine >= 1 && size_t(codeLine) <= fileLines.size() ? QJsonValue(fileLines[size_t(codeLine) - 1])
+                                                                 : QJsonValue();
+  };
+  object.insert(QStringLiteral("code_lines"), text.countOfLines());
+  object.insert(QStringLiteral("declaration_lines"), text.countOfDeclarationLines());
+  const auto byMember = proceduresByMember(text);
+  QJsonArray members;
+  for (const host::MemberInfo& member : text.members()) {
+    QJsonArray procedures;
+    for (const host::ProcInfo* procedure : byMember.value(member.name.toCaseFolded())) {
+      const int start = text.procStartLine(procedure->name, procedure->kind);
+      procedures.append(
+          QJsonObject{{QStringLiteral("kind"), procedureKeyword(*procedure)},
+                      {QStringLiteral("start_code_line"), start},
+                      {QStringLiteral("start_file_line"), fileLine(start)},
+                      {QStringLiteral("body_code_line"), procedure->bodyLine},
+                      {QStringLiteral("body_file_line"), fileLine(procedure->bodyLine)},
+                      {QStringLiteral("line_count"), text.procCountLines(procedure->name, procedure->kind)}});
+    }
+    members.append(QJsonObject{{QStringLiteral("name"), member.name},
+                               {QStringLiteral("type"), memberTypeName(member.type)},
+                               {QStringLiteral("scope"), scopeName(member.scope)},
+                               {QStringLiteral("procedures"), procedures}});
+  }
+  object.insert(QStringLiteral("members"), members);
+  return object;
+}
+
 }  // namespace
 
 int runList(const ListOptions& options) {
+  useEncoding(options.input);
+  const auto files = expandInputs(options.input);
+  if (!files) return kInputError;
   auto vbe = host::VbeImpl::create();
-  // Module files are listed under the path the user gave; the rest under their path from here.
+  // Module files are listed under the path the user gave; the rest under their path from here. A module
+  // file that an open project holds is listed with that project only.
   QHash<QString, QString> givenPaths;
-  for (const QString& file : options.files)
+  QSet<QString> opened;
+  for (const QString& file : *files) {
+    if (opened.contains(fileIdentity(file))) continue;
     if (!openInput(*vbe, file, givenPaths)) return kInputError;
-  const bool missing = reportMissingFiles(*vbe);
+    for (const auto& project : vbe->projects()) {
+      if (!project->FileName().isEmpty()) opened.insert(fileIdentity(project->FileName()));
+      for (const auto& component : project->components())
+        opened.insert(fileIdentity(component->filePath()));
+    }
+  }
+  const bool missing = reportMissingFiles(*vbe) > 0;
   const QDir here = QDir::current();
   auto shownPath = [&](const QString& path) { return givenPaths.value(path, here.relativeFilePath(path)); };
 
+  QJsonArray projects;
   for (const auto& project : vbe->projects()) {
-    if (!options.tsv) {
-      const QString file =
-          project->FileName().isEmpty() ? QString() : QStringLiteral("  ") + shownPath(project->FileName());
-      printLine(
-          QStringLiteral("Project %1 (%2)%3").arg(project->Name(), projectTypeName(project->Type()), file));
+    const QString projectFile = project->FileName().isEmpty() ? QString() : shownPath(project->FileName());
+    if (!options.tsv && !options.json) {
+      printLine(QStringLiteral("Project %1 (%2)%3")
+                    .arg(project->Name(), projectTypeName(project->Type()),
+                         projectFile.isEmpty() ? QString() : QStringLiteral("  ") + projectFile));
     }
+    QJsonArray components;
     for (const auto& component : project->components()) {
+      if (options.input.exclusions.excludes(component->filePath())) continue;
       const QString path = shownPath(component->filePath());
       auto module = component->codeModule();
+      if (module) {
+        QFile file(component->filePath());
+        if (file.open(QIODevice::ReadOnly)) warnIfUtf8(path, file.readAll());
+      }
+      if (options.json) {
+        components.append(componentJson(*component, path));
+        continue;
+      }
       if (options.tsv) {
         if (!module) continue;
         auto& text = module->text();
@@ -111,10 +186,7 @@ int runList(const ListOptions& options) {
       printLine(QStringLiteral("    %1 lines, declarations 1-%2")
                     .arg(text.countOfLines())
                     .arg(text.countOfDeclarationLines()));
-      // The procedures of each member, found by name once: a member does not search the whole module.
-      QHash<QString, std::vector<const host::ProcInfo*>> byMember;
-      for (const host::ProcInfo& proc : text.procedures())
-        byMember[proc.name.toCaseFolded()].push_back(&proc);
+      const auto byMember = proceduresByMember(text);
       for (const host::MemberInfo& member : text.members()) {
         printLine(QStringLiteral("    %1 %2 %3")
                       .arg(scopeName(member.scope), memberTypeName(member.type), member.name));
@@ -128,7 +200,14 @@ int runList(const ListOptions& options) {
         }
       }
     }
+    if (options.json)
+      projects.append(QJsonObject{
+          {QStringLiteral("name"), project->Name()},
+          {QStringLiteral("type"), projectTypeName(project->Type())},
+          {QStringLiteral("file"), projectFile.isEmpty() ? QJsonValue() : QJsonValue(projectFile)},
+          {QStringLiteral("components"), components}});
   }
+  if (options.json) printBytes(jsonText(QJsonDocument(QJsonObject{{QStringLiteral("projects"), projects}})));
   return withMissingFiles(kSuccess, missing);
 }
 

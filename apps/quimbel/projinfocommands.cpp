@@ -12,6 +12,9 @@
 
 #include <QDir>
 #include <QFileInfo>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
 #include <QRegularExpression>
 
 #include <algorithm>
@@ -93,7 +96,13 @@ Records readRecords(const QString& infoFile, const char* storageName) {
   return records;
 }
 
-int listTasks(const OpenedProject& opened) {
+/// The list as one JSON document: {"project": name, "<key>": [items]}.
+void printJson(const QString& project, const char* key, const QJsonArray& items) {
+  printBytes(jsonText(
+      QJsonDocument(QJsonObject{{QStringLiteral("project"), project}, {QLatin1StringView(key), items}})));
+}
+
+int listTasks(const OpenedProject& opened, bool json) {
   Records records = readRecords(opened.infoFile, "TaskList");
   std::vector<projinfo::TaskRecord> tasks;
   for (const auto& [name, text] : records.texts) {
@@ -105,6 +114,16 @@ int listTasks(const OpenedProject& opened) {
     }
   }
   std::sort(tasks.begin(), tasks.end(), [](const auto& a, const auto& b) { return a.ItemId < b.ItemId; });
+  if (json) {
+    QJsonArray items;
+    for (const auto& task : tasks)
+      items.append(QJsonObject{{QStringLiteral("id"), task.ItemId},
+                               {QStringLiteral("done"), task.Done},
+                               {QStringLiteral("name"), task.Name},
+                               {QStringLiteral("text"), task.Text}});
+    printJson(opened.project->Name(), "tasks", items);
+    return records.unreadable ? kInputError : kSuccess;
+  }
   printLine(tasks.empty()
                 ? QStringLiteral("%1: no tasks").arg(opened.project->Name())
                 : QStringLiteral("Tasks of %1 (%2):").arg(opened.project->Name(), shown(opened.infoFile)));
@@ -151,7 +170,7 @@ int changeTasks(const OpenedProject& opened, const TaskOptions& options) {
         tasks.Tasks.Item(QLatin1StringView(projinfo::kTaskPrefix) + QString::number(options.id));
     if (!task) {
       printError(QStringLiteral("%1: no task %2").arg(shown(opened.infoFile)).arg(options.id));
-      return kInputError;
+      return kNoSuchTask;
     }
     if (options.action == QLatin1StringView("remove")) {
       tasks.DeleteTask(task->ItemId);
@@ -170,30 +189,41 @@ int changeTasks(const OpenedProject& opened, const TaskOptions& options) {
   return kSuccess;
 }
 
-/// The line in the module a favourite stands for, as the add-in's window opens it.
-QString placeOf(host::ProjectImpl& project, const projinfo::FavoriteRecord& favorite, QString* procedure) {
-  static const char* const kKinds[] = {"", " (Property Let)", " (Property Set)", " (Property Get)"};
-  *procedure = favorite.ProcedureName;
-  if (favorite.ProcKind >= 1 && favorite.ProcKind <= 3)
-    *procedure += QLatin1StringView(kKinds[favorite.ProcKind]);
+/// The line in the module (the code window's) a favourite stands for, as the add-in's window opens it, or
+/// why there is none.
+struct Place {
+  int line = 0;
+  QString missing;
+};
+
+Place placeOf(host::ProjectImpl& project, const projinfo::FavoriteRecord& favorite) {
   auto component = project.component(favorite.ComponentName);
   auto module = component ? component->codeModule() : nullptr;
-  if (!module) return QStringLiteral("(module not in the project)");
+  if (!module) return {0, QStringLiteral("module not in the project")};
   if (favorite.ProcedureName == QLatin1StringView("General Declarations"))
-    return QStringLiteral("line %1").arg(std::min(favorite.Line, module->CountOfDeclarationLines()));
+    return {std::min(favorite.Line, module->CountOfDeclarationLines()), {}};
   try {
     const auto kind = static_cast<ide::ProcKind>(favorite.ProcKind);
     const int start = module->ProcStartLine(favorite.ProcedureName, kind);
     const int count = module->ProcCountLines(favorite.ProcedureName, kind);
-    return QStringLiteral("line %1").arg(favorite.Line < count ? start + favorite.Line : start + count - 1);
+    return {favorite.Line < count ? start + favorite.Line : start + count - 1, {}};
   } catch (const ide::Error&) {
-    return QStringLiteral("(procedure not found)");
+    return {0, QStringLiteral("procedure not found")};
   }
+}
+
+/// A project file is needed: tasks and favourites belong to a project, not to a module.
+bool isProjectFile(const QString& file) {
+  if (QFileInfo(file).suffix().compare(QLatin1StringView("vbp"), Qt::CaseInsensitive) == 0) return true;
+  printError(
+      QStringLiteral("%1: tasks and favorites belong to a project; give its project file (.vbp)").arg(file));
+  return false;
 }
 
 }  // namespace
 
 int runTasks(const TaskOptions& options) {
+  if (!isProjectFile(options.project)) return kUsageError;
   const OpenedProject opened = openProject(options.project);
   if (options.action.isEmpty() && (!opened.identity || !QFileInfo::exists(opened.infoFile)))
     return noInfoFile(opened, options.project);
@@ -202,7 +232,7 @@ int runTasks(const TaskOptions& options) {
     return kInputError;
   }
   try {
-    return options.action.isEmpty() ? listTasks(opened) : changeTasks(opened, options);
+    return options.action.isEmpty() ? listTasks(opened, options.json) : changeTasks(opened, options);
   } catch (const ide::Error& error) {
     printError(error.description());
     return kInputError;
@@ -210,6 +240,7 @@ int runTasks(const TaskOptions& options) {
 }
 
 int runFavorites(const TaskOptions& options) {
+  if (!isProjectFile(options.project)) return kUsageError;
   const OpenedProject opened = openProject(options.project);
   if (!opened.identity || !QFileInfo::exists(opened.infoFile)) return noInfoFile(opened, options.project);
   Records records;
@@ -230,13 +261,38 @@ int runFavorites(const TaskOptions& options) {
   }
   std::sort(favorites.begin(), favorites.end(),
             [](const auto& a, const auto& b) { return a.ItemId < b.ItemId; });
+  static const char* const kKinds[] = {"Procedure", "Property Let", "Property Set", "Property Get"};
+  const auto kindOf = [](const projinfo::FavoriteRecord& favorite) {
+    return favorite.ProcedureName == QLatin1StringView("General Declarations")
+               ? QStringLiteral("Declarations")
+           : favorite.ProcKind >= 0 && favorite.ProcKind <= 3 ? QString::fromLatin1(kKinds[favorite.ProcKind])
+                                                              : QString::number(favorite.ProcKind);
+  };
+  if (options.json) {
+    QJsonArray items;
+    for (const auto& favorite : favorites) {
+      const Place place = placeOf(*opened.project, favorite);
+      items.append(QJsonObject{
+          {QStringLiteral("id"), favorite.ItemId},
+          {QStringLiteral("module"), favorite.ComponentName},
+          {QStringLiteral("procedure"), favorite.ProcedureName},
+          {QStringLiteral("kind"), kindOf(favorite)},
+          {QStringLiteral("code_line"), place.missing.isEmpty() ? QJsonValue(place.line) : QJsonValue()}});
+    }
+    printJson(opened.project->Name(), "favorites", items);
+    return records.unreadable ? kInputError : kSuccess;
+  }
   printLine(
       favorites.empty()
           ? QStringLiteral("%1: no favorites").arg(opened.project->Name())
           : QStringLiteral("Favorites of %1 (%2):").arg(opened.project->Name(), shown(opened.infoFile)));
   for (const auto& favorite : favorites) {
-    QString procedure;
-    const QString place = placeOf(*opened.project, favorite, &procedure);
+    QString procedure = favorite.ProcedureName;
+    if (favorite.ProcKind >= 1 && favorite.ProcKind <= 3)
+      procedure += QStringLiteral(" (%1)").arg(QLatin1StringView(kKinds[favorite.ProcKind]));
+    const Place found = placeOf(*opened.project, favorite);
+    const QString place = found.missing.isEmpty() ? QStringLiteral("line %1").arg(found.line)
+                                                  : QStringLiteral("(%1)").arg(found.missing);
     printLine(QStringLiteral("%1  %2  %3  %4")
                   .arg(favorite.ItemId, 5)
                   .arg(favorite.ComponentName, -20)

@@ -1,15 +1,24 @@
 // SPDX-License-Identifier: MIT
-#include "transformjob.h"
-
+// What the numbering and indentation commands share: opening the files (or standard input), finding the
+// scope and the style in force for each module, walking it with a progress bar, and then writing the
+// changed files, printing a diff or checking.
+#include "cli.h"
 #include "diff.h"
+#include "host/files/fileio.h"
 #include "host/files/modulefile.h"
 #include "host/files/parallel.h"
 #include "host/files/sourcelines.h"
 #include "host/model/vbe.h"
 #include "terminalprogress.h"
+#include "transform/indentwalk.h"
+#include "transform/numberwalk.h"
+#include "transform/numindent.h"
 
 #include <QDir>
 #include <QFile>
+#include <QFileInfo>
+#include <QSet>
+#include <QTemporaryDir>
 
 #include <algorithm>
 #include <atomic>
@@ -35,7 +44,7 @@ struct Input {
   }
 };
 
-// Where a walk starts: a project, a module or a member of a module.
+// Where a walk starts: a module, or a member of a module.
 struct Target {
   Input* input = nullptr;
   ide::Ref<ide::VBProject> project;
@@ -84,17 +93,23 @@ std::vector<std::shared_ptr<host::ComponentImpl>> codeComponents(const Input& in
   return components;
 }
 
-// The modules named `name` (case aside) in every input.
-std::vector<Target> findModules(std::vector<Input>& inputs, const QString& name) {
+host::ComponentImpl* componentOf(const ide::Ref<ide::CodeModule>& module) {
+  auto impl = std::dynamic_pointer_cast<host::CodeModuleImpl>(module);
+  return impl ? impl->component().get() : nullptr;
+}
+
+// The modules named `name` (case aside) among `walked`.
+std::vector<Target> findModules(const std::vector<Walked>& walked, const QString& name) {
   std::vector<Target> targets;
-  for (Input& input : inputs)
-    for (const auto& component : codeComponents(input))
-      if (component->Name().compare(name, Qt::CaseInsensitive) == 0)
-        targets.push_back({&input, component->project(), component->codeModule(), {}});
+  for (const Walked& module : walked)
+    if (module.component->Name().compare(name, Qt::CaseInsensitive) == 0)
+      targets.push_back({module.input, module.component->project(), module.component->codeModule(), {}});
   return targets;
 }
 
-std::optional<std::vector<Target>> findTargets(std::vector<Input>& inputs, const TransformOptions& options) {
+/// Every module of the scope, or the members --procedure names.
+std::optional<std::vector<Target>> findTargets(const std::vector<Walked>& walked,
+                                               const TransformOptions& options) {
   std::vector<Target> targets;
   if (!options.procedure.isEmpty()) {
     const qsizetype dot = options.procedure.indexOf(u'.');
@@ -104,7 +119,7 @@ std::optional<std::vector<Target>> findTargets(std::vector<Input>& inputs, const
       printError(QStringLiteral("--procedure takes MODULE.NAME, not '%1'").arg(options.procedure));
       return std::nullopt;
     }
-    for (Target& module : findModules(inputs, moduleName)) {
+    for (Target& module : findModules(walked, moduleName)) {
       try {
         module.member = module.module->Members()->Item(memberName);
       } catch (const ide::Error&) {
@@ -116,29 +131,76 @@ std::optional<std::vector<Target>> findTargets(std::vector<Input>& inputs, const
     if (targets.empty())
       printError(QStringLiteral("no procedure '%1' in the files given").arg(options.procedure));
   } else if (!options.module.isEmpty()) {
-    targets = findModules(inputs, options.module);
+    targets = findModules(walked, options.module);
     if (targets.empty()) printError(QStringLiteral("no module '%1' in the files given").arg(options.module));
   } else {
-    for (Input& input : inputs)
-      for (const auto& project : input.vbe->projects())
-        targets.push_back({&input, project, {}, {}});
+    for (const Walked& module : walked)
+      targets.push_back({module.input, module.component->project(), module.component->codeModule(), {}});
   }
   if (targets.empty()) return std::nullopt;
   return targets;
 }
 
-qint64 unitsOf(const ide::Ref<ide::CodeModule>& module, transform::ProgressUnit unit) {
-  if (unit == transform::ProgressUnit::Members) return module->Members()->Count();
-  return module->CountOfLines() - module->CountOfDeclarationLines();
+/// The walk a module gets: the command's, or number-and-indent where the style joins the two.
+struct Effective {
+  TransformKind kind;
+  bool add = true;
+};
+
+Effective effectiveKind(TransformKind kind, const codestyle::Style& style, bool remove) {
+  if (kind == TransformKind::NumIndent) return {kind, !remove};
+  if (!style.numIndent.value) return {kind, kind != TransformKind::Unnumber};
+  return {TransformKind::NumIndent, kind != TransformKind::Unnumber};
+}
+
+transform::ProgressUnit progressUnitOf(const Effective& walk) {
+  return walk.kind == TransformKind::Number || walk.kind == TransformKind::Unnumber
+             ? transform::ProgressUnit::Members
+             : transform::ProgressUnit::Lines;
 }
 
 qint64 unitsOf(const Target& target, transform::ProgressUnit unit) {
   if (target.member) return 1;
-  if (target.module) return unitsOf(target.module, unit);
-  qint64 units = 0;
-  for (const auto& component : codeComponents(*target.input))
-    if (component->project() == target.project) units += unitsOf(component->codeModule(), unit);
-  return units;
+  if (unit == transform::ProgressUnit::Members) return target.module->Members()->Count();
+  return target.module->CountOfLines() - target.module->CountOfDeclarationLines();
+}
+
+/// Walks one module (or one member of it) as `walk` says, with `style`. With `numberOf`, numbered lines
+/// get the number it gives their module line.
+void walkTarget(transform::WalkContext& context, const Target& target, const Effective& walk,
+                const codestyle::Style& style, std::function<qint32(int)> numberOf) {
+  const transform::NumberingOptions numbering = style.numbering();
+  const transform::IndentationOptions indentation = style.indentation();
+  switch (walk.kind) {
+    case TransformKind::Number:
+    case TransformKind::Unnumber: {
+      transform::NumberingWalk numberingWalk(context, numbering.startNumber, numbering.interval);
+      numberingWalk.setLineNumbers(std::move(numberOf));
+      if (target.member)
+        numberingWalk.NumberMember(target.module, target.member, walk.add);
+      else
+        numberingWalk.NumberModule(target.module, walk.add);
+      return;
+    }
+    case TransformKind::Indent: {
+      transform::IndentationWalk indentationWalk(context, indentation.mode, indentation.spaces);
+      if (target.member)
+        indentationWalk.IndentMember(target.module, target.member);
+      else
+        indentationWalk.IndentModule(target.module);
+      return;
+    }
+    case TransformKind::NumIndent: {
+      transform::NumIndentWalk both(context, numbering.startNumber, numbering.interval, indentation.mode,
+                                    indentation.spaces, walk.add);
+      both.numbering().setLineNumbers(std::move(numberOf));
+      if (target.member)
+        both.NumIndentMember(target.module, target.member);
+      else
+        both.NumIndentModule(target.module);
+      return;
+    }
+  }
 }
 
 QString failureText(const transform::WalkFailure& failure) {
@@ -149,17 +211,41 @@ QString failureText(const transform::WalkFailure& failure) {
   return where.isEmpty() ? what : where + QStringLiteral(": ") + what;
 }
 
-DiffSide diffSide(const QByteArray& bytes, const QString& path) {
-  DiffSide side;
-  const std::vector<host::SourceLine> lines = host::readSourceLines(bytes, path);
-  for (const host::SourceLine& line : lines)
-    side.lines << line.text;
-  side.missingFinalNewline = !lines.empty() && lines.back().end == host::LineEnd::None;
-  return side;
+// The file as saving the component would write it.
+QByteArray fileAfter(host::ComponentImpl& component) {
+  host::ModuleSource source = component.source();
+  component.codeModule()->text().store(source.code, source.memberAttributes);
+  return host::writeModule(source, component.filePath());
 }
 
-// The line of the module's file that holds each code line (index 0: code line 1), as saving writes it:
-// below the header, with the hidden attribute lines in between.
+/// Standard input: one module, put in a folder of its own under the name it stands for.
+struct StandardInput {
+  QTemporaryDir folder;
+  QString name;  // as given, or a standard module in the current folder
+  QString path;  // the copy that the IDE opens
+  QByteArray bytes;
+};
+
+bool readStandardInput(StandardInput& input, const QString& stdinName) {
+  input.name = stdinName.isEmpty() ? QStringLiteral("stdin.bas") : stdinName;
+  QFile in;
+  if (!in.open(stdin, QIODevice::ReadOnly) || !input.folder.isValid()) {
+    printError(QStringLiteral("cannot read standard input"));
+    return false;
+  }
+  input.bytes = in.readAll();
+  input.path = input.folder.filePath(QFileInfo(input.name).fileName());
+  QFile copy(input.path);
+  if (!copy.open(QIODevice::WriteOnly) || copy.write(input.bytes) != input.bytes.size() || !copy.flush()) {
+    printError(
+        QStringLiteral("cannot keep standard input in %1: %2").arg(input.folder.path(), copy.errorString()));
+    return false;
+  }
+  return true;
+}
+
+}  // namespace
+
 std::vector<int> fileLinesOf(host::ComponentImpl& component) {
   host::ModuleSource source = component.source();
   component.codeModule()->text().store(source.code, source.memberAttributes);
@@ -180,73 +266,77 @@ std::vector<int> fileLinesOf(host::ComponentImpl& component) {
   return lines;
 }
 
-// The file as saving the component would write it.
-QByteArray fileAfter(host::ComponentImpl& component) {
-  host::ModuleSource source = component.source();
-  component.codeModule()->text().store(source.code, source.memberAttributes);
-  return host::writeModule(source, component.filePath());
-}
-
-int printDiff(const Walked& changed) {
-  QFile file(changed.component->filePath());
-  if (!file.open(QIODevice::ReadOnly)) {
-    printError(QStringLiteral("%1: cannot read: %2")
-                   .arg(changed.input->shownPath(*changed.component), file.errorString()));
-    return kInputError;
-  }
-  const QString path = changed.input->shownPath(*changed.component);
-  for (const QString& line :
-       unifiedDiff(path, diffSide(file.readAll(), path), diffSide(fileAfter(*changed.component), path)))
-    printLine(line);
-  return kSuccess;
-}
-
-}  // namespace
-
-int runTransform(const TransformOptions& options,
-                 const std::function<Walks(transform::WalkContext&)>& makeWalks) {
+int runTransform(const TransformOptions& options, TransformKind kind) {
+  useEncoding(options.input);
   // Made first: whether the run is long enough for a bar counts from the start, loading included.
   TerminalProgress bar;
+  const bool fromStdin = options.input.files == QStringList{QStringLiteral("-")};
+  std::optional<StandardInput> standardInput;
+  QStringList files;
+  if (fromStdin) {
+    if (!readStandardInput(standardInput.emplace(), options.stdinName)) return kInputError;
+    files << standardInput->path;
+  } else if (const auto expanded = expandInputs(options.input)) {
+    files = *expanded;
+  } else {
+    return kInputError;
+  }
+
   // Deliberately never freed: the process ends right after the run, and taking a million lines apart one
   // by one would only delay its exit.
-  std::vector<Input>& inputs = *new std::vector<Input>(size_t(options.files.size()));
-  bool missing = false;
-  for (qsizetype i = 0; i < options.files.size(); ++i) {
+  std::vector<Input>& inputs = *new std::vector<Input>(size_t(files.size()));
+  int missing = 0;
+  for (qsizetype i = 0; i < files.size(); ++i) {
     Input& input = inputs[size_t(i)];
-    input.file = options.files[i];
-    if (!openInput(*input.vbe, input.file, input.givenPaths)) return kInputError;
-    missing = reportMissingFiles(*input.vbe) || missing;
+    input.file = files[i];
+    if (!openInput(*input.vbe, input.file, input.givenPaths, fromStdin ? standardInput->name : QString()))
+      return kInputError;
+    missing += reportMissingFiles(*input.vbe);
   }
-  const auto targets = findTargets(inputs, options);
-  if (!targets) return kUsageError;
 
+  // Each module once, however often it was named (directly, by several projects, through a link).
   std::vector<Walked> walked;
+  QSet<QString> seen;
   for (Input& input : inputs)
-    for (const auto& component : codeComponents(input))
+    for (const auto& component : codeComponents(input)) {
+      if (options.input.exclusions.excludes(component->filePath())) continue;
+      const QString identity = fileIdentity(component->filePath());
+      if (seen.contains(identity)) continue;
+      seen.insert(identity);
       walked.push_back({&input, component});
-
-  // Whole projects are walked module by module: a project walk is nothing but the walks of its modules.
-  // Each module's walk touches that module alone, so the modules are walked side by side on every core.
-  std::vector<Target> units;
-  for (const Target& target : *targets) {
-    if (target.module) {
-      units.push_back(target);
-      continue;
     }
-    for (const auto& component : codeComponents(*target.input))
-      if (component->project() == target.project)
-        units.push_back({target.input, target.project, component->codeModule(), {}});
-  }
+  const auto found = findTargets(walked, options);
+  if (!found) return kUsageError;
+  const std::vector<Target>& units = *found;
 
+  // The style in force for each module: the command line, its .editorconfig files, the settings.
+  const common::SettingsStore settings(common::SettingsStore::userStorePath());
+  const codestyle::Resolver resolver(options.style, &settings);
+  std::vector<codestyle::Style> styles;
+  std::vector<Effective> walks;
   qint64 totalUnits = 0;
-  transform::ProgressUnit progressUnit = transform::ProgressUnit::Lines;
-  {
-    transform::WalkContext counting(QStringLiteral("quimbel"), nullptr, nullptr);
-    progressUnit = makeWalks(counting).unit;
+  for (const Target& unit : units) {
+    host::ComponentImpl* component = componentOf(unit.module);
+    const QString stylePath =
+        fromStdin ? QFileInfo(standardInput->name).absoluteFilePath() : component->filePath();
+    const auto style = resolver.styleFor(stylePath);
+    if (const auto* error = std::get_if<codestyle::StyleError>(&style)) {
+      printError(styleErrorText(*error));
+      printError(QStringLiteral("nothing was written"));
+      return kInputError;
+    }
+    styles.push_back(std::get<codestyle::Style>(style));
+    walks.push_back(effectiveKind(kind, styles.back(), options.remove));
+    totalUnits += unitsOf(unit, progressUnitOf(walks.back()));
   }
-  for (const Target& unit : units)
-    totalUnits += unitsOf(unit, progressUnit);
   const qint32 range = qint32(std::min<qint64>(totalUnits, std::numeric_limits<qint32>::max()));
+  if (!fromStdin)
+    for (const Walked& module : walked) {
+      QFile file(module.component->filePath());
+      if (file.open(QIODevice::ReadOnly))
+        warnIfUtf8(module.input->shownPath(*module.component), file.readAll());
+    }
+  if (fromStdin) warnIfUtf8(standardInput->name, standardInput->bytes);
 
   struct Report {
     size_t unit;
@@ -269,6 +359,7 @@ int runTransform(const TransformOptions& options,
   bar.setMaximum(std::max(1, std::min<qint32>(range, transform::ProgressScale::kMaxSteps)));
   bar.setValue(0);
   bar.setVisible(true);
+  // Each module's walk touches that module alone, so the modules are walked side by side on every core.
   host::WorkQueue queue(units.size());
   host::runWorkers(workers, [&](size_t worker) {
     transform::WalkContext context(QStringLiteral("quimbel"), nullptr, counters[worker].get());
@@ -279,15 +370,16 @@ int runTransform(const TransformOptions& options,
     };
     context.onFailure = report;
     context.onLineSkipped = report;
-    const Walks walks = makeWalks(context);
     context.SetProgressRange(range);
     while (queue.take(current)) {
       if (context.stopped()) break;
       const Target& unit = units[current];
-      if (unit.member)
-        walks.member(unit.module, unit.member);
-      else
-        walks.module(unit.module);
+      std::function<qint32(int)> numberOf;
+      if (options.fileLines && walks[current].add && walks[current].kind != TransformKind::Indent) {
+        auto lines = std::make_shared<std::vector<int>>(fileLinesOf(*componentOf(unit.module)));
+        numberOf = [lines](int moduleLine) { return qint32(lines->at(size_t(moduleLine) - 1)); };
+      }
+      walkTarget(context, unit, walks[current], styles[current], std::move(numberOf));
     }
   });
   bar.setVisible(false);
@@ -298,12 +390,12 @@ int runTransform(const TransformOptions& options,
   std::vector<int> fileLines;
   for (const Report& report : reports) {
     const Target& unit = units[report.unit];
-    auto module = std::dynamic_pointer_cast<host::CodeModuleImpl>(unit.module);
-    auto component = module ? module->component() : nullptr;
+    host::ComponentImpl* component = componentOf(unit.module);
     const int line = report.failure.line;
     if (!component || line <= 0 ||
         report.failure.module.compare(component->Name(), Qt::CaseInsensitive) != 0) {
-      printError(QStringLiteral("%1: %2").arg(unit.input->file, failureText(report.failure)));
+      printError(QStringLiteral("%1: %2").arg(
+          component ? unit.input->shownPath(*component) : unit.input->file, failureText(report.failure)));
       continue;
     }
     if (linesOfUnit != report.unit) {
@@ -316,8 +408,7 @@ int runTransform(const TransformOptions& options,
                    .arg(size_t(line) <= fileLines.size() ? fileLines[size_t(line) - 1] : 0)
                    .arg(failureText(report.failure)));
   }
-  const size_t failures = reports.size();
-  if (failures) {
+  if (!reports.empty()) {
     printError(QStringLiteral("nothing was written"));
     return kInputError;
   }
@@ -327,15 +418,39 @@ int runTransform(const TransformOptions& options,
   for (const Walked& module : walked)
     if (module.component->IsDirty()) changed.push_back(&module);
 
+  if (fromStdin && !options.check && !options.diff) {
+    printBytes(changed.empty() ? standardInput->bytes : fileAfter(*changed.front()->component));
+    return kSuccess;
+  }
   if (options.diff) {
-    for (const Walked* module : changed)
-      if (const int code = printDiff(*module)) return code;
+    for (const Walked* module : changed) {
+      const QString path = module->input->shownPath(*module->component);
+      QByteArray before;
+      try {
+        before = fromStdin ? standardInput->bytes : host::readFileBytes(module->component->filePath());
+      } catch (const ide::Error& error) {
+        printError(namingFileOnce(path, error.description()));
+        return kInputError;
+      }
+      printBytes(unifiedDiff(QFile::encodeName(path), before, fileAfter(*module->component)));
+    }
   } else if (options.check) {
     for (const Walked* module : changed)
       printLine(QStringLiteral("would change %1").arg(module->input->shownPath(*module->component)));
   }
-  if (options.check) return withMissingFiles(changed.empty() ? kSuccess : kWouldChange, missing);
-  if (options.diff) return withMissingFiles(kSuccess, missing);
+  // With files missing, the exit code says so; the result of the run is told here.
+  const auto summary = [&](const char* what) {
+    if (missing)
+      printSummary(QStringLiteral("%1 %2 %3, %4 missing")
+                       .arg(changed.size())
+                       .arg(changed.size() == 1 ? QStringLiteral("file") : QStringLiteral("files"))
+                       .arg(QLatin1StringView(what))
+                       .arg(missing));
+  };
+  if (options.check || options.diff) {
+    summary("would change");
+    return withMissingFiles(options.check && !changed.empty() ? kWouldChange : kSuccess, missing > 0);
+  }
 
   // All files are replaced together, once every one of them is written: a failure changes none.
   host::SaveBatch batch;
@@ -359,26 +474,8 @@ int runTransform(const TransformOptions& options,
     printError(error.description());
     return kOutputError;
   }
-  return withMissingFiles(kSuccess, missing);
-}
-
-transform::NumberingOptions numberingOf(const TransformOptions& options) {
-  const common::SettingsStore settings(common::SettingsStore::userStorePath());
-  transform::NumberingOptions numbering = transform::storedNumbering(settings);
-  if (options.start) numbering.startNumber = *options.start;
-  if (options.interval) numbering.interval = *options.interval;
-  return numbering;
-}
-
-transform::IndentationOptions indentationOf(const TransformOptions& options) {
-  const common::SettingsStore settings(common::SettingsStore::userStorePath());
-  transform::IndentationOptions indentation = transform::storedIndentation(settings);
-  if (options.tabs) indentation.mode = transform::IndentMode::Tabs;
-  if (options.spaces) {
-    indentation.mode = transform::IndentMode::Spaces;
-    indentation.spaces = *options.spaces;
-  }
-  return indentation;
+  summary("changed");
+  return withMissingFiles(kSuccess, missing > 0);
 }
 
 }  // namespace cli

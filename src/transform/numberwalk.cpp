@@ -82,6 +82,7 @@ void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name
     m_context.setLine(line);
     try {
       QString& code = text.lines[size_t(i)];
+      if (m_numberOf) number = m_numberOf(line) - m_interval;
       if (NumberLine(code, number, continuation, m_interval, targets)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
       m_context.lineSkipped(failure, u"NumberLine", module, line);
@@ -119,6 +120,7 @@ void NumberingWalk::numberText(ProcedureText& text, bool add) const {
     bool continuation = false;
     for (qsizetype i = text.first; i < text.stop; ++i) {
       m_context.setLine(text.moduleLine(i));  // where an overflow is reported
+      if (m_numberOf) number = m_numberOf(text.moduleLine(i)) - m_interval;
       NumberLine(text.lines[size_t(i)], number, continuation, m_interval, targets);
     }
     return;

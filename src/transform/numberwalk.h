@@ -5,6 +5,8 @@
 
 #include "transform/walk.h"
 
+#include <functional>
+
 namespace transform {
 
 /// Adds or removes line numbers. Walks report their failures through the context with their fixed
@@ -36,6 +38,10 @@ class NumberingWalk {
   /// number-and-indent writes each line once, numbered and indented.
   void numberText(ProcedureText& text, bool add) const;
 
+  /// Gives each numbered line the number `numberOf` returns for its module line, instead of counting from
+  /// the start number (the command-line tool's numbers that are the lines of the file).
+  void setLineNumbers(std::function<qint32(int moduleLine)> numberOf) { m_numberOf = std::move(numberOf); }
+
   /// One procedure, adding or removing.
   void numberOrUnnumber(ide::CodeModule& module, const QString& name, ide::ProcKind kind, bool add) {
     add ? NumberProcedure(module, name, kind) : UnnumberProcedure(module, name, kind);
@@ -48,6 +54,7 @@ class NumberingWalk {
   WalkContext& m_context;
   qint32 m_startNumber;
   qint32 m_interval;
+  std::function<qint32(int)> m_numberOf;
 };
 
 }  // namespace transform

@@ -28,6 +28,8 @@ class NumIndentWalk {
   /// The procedure at the active code pane's selection; a selection outside every procedure fills the
   /// bar and changes nothing.
   void NumIndentCurrentProcedure(ide::VBE& vbe, qint32 totalUnits);
+  /// The numbering step, for its options.
+  NumberingWalk& numbering() { return m_numbering; }
 
  private:
   void memberProcedures(const ide::Ref<ide::CodeModule>& module, const ide::Ref<ide::Member>& member);

@@ -14,7 +14,11 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
 #include <QProcess>
+#include <QRegularExpression>
 #include <QStandardPaths>
 #include <QTemporaryDir>
 
@@ -31,29 +35,34 @@ struct Result {
   int code = -1;
   QString out;
   QString err;
+  QByteArray bytes;  // standard output as written
 };
 
 // The tool with a settings directory of its own.
 class Tool {
  public:
-  Result run(const QStringList& arguments, const QString& directory = {}) {
-    return runProgram(QStringLiteral(QUIMBEL_BINARY), arguments, directory);
+  Result run(const QStringList& arguments, const QString& directory = {}, const QByteArray& input = {}) {
+    return runProgram(QStringLiteral(QUIMBEL_BINARY), arguments, directory, input);
   }
 
-  /// Runs another program with the tool's environment.
-  Result runProgram(const QString& program, const QStringList& arguments, const QString& directory = {}) {
+  /// Runs another program with the tool's environment (the built tool first on its path).
+  Result runProgram(const QString& program, const QStringList& arguments, const QString& directory = {},
+                    const QByteArray& input = {}) {
     QProcess process;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     environment.insert(u"QUIMBEL_CONFIG_DIR"_qs, m_home.filePath(u"config"_qs));
     environment.insert(u"QUIMBEL_DATA_DIR"_qs, m_home.filePath(u"data"_qs));
     environment.insert(u"LC_ALL"_qs, u"C.UTF-8"_qs);
+    environment.insert(u"PATH"_qs, QFileInfo(QUIMBEL_BINARY).absolutePath() + u':' + environment.value(u"PATH"_qs));
     process.setProcessEnvironment(environment);
     if (!directory.isEmpty()) process.setWorkingDirectory(directory);
     process.start(program, arguments);
+    process.write(input);
+    process.closeWriteChannel();
     EXPECT_TRUE(process.waitForFinished(120000));
-    return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1,
-            QString::fromUtf8(process.readAllStandardOutput()),
-            QString::fromUtf8(process.readAllStandardError())};
+    const QByteArray out = process.readAllStandardOutput();
+    return {process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1, QString::fromUtf8(out),
+            QString::fromUtf8(process.readAllStandardError()), out};
   }
 
   /// The settings the dialogs would have left.
@@ -153,6 +162,26 @@ TEST(CommandLine, HelpListsTheCommandsAndTheirOptions) {
   for (const char* option : {"--module", "--procedure", "--start", "--interval", "--tabs", "--spaces",
                              "--remove", "--check", "--diff"})
     EXPECT_TRUE(result.out.contains(QString::fromLatin1(option))) << option;
+}
+
+TEST(CommandLine, MessagesNameWhatIsWrongOnceAndUsageNamesTheTool) {
+  Workspace work;
+  Tool tool;
+  const std::tuple<QStringList, int, QString> runs[] = {
+      {{u"frobnicate"_qs}, 2, u"quimbel: unknown command 'frobnicate'\n"_qs},
+      {{u"list"_qs, u"Nada.bas"_qs}, 3, u"quimbel: Nada.bas: File not found\n"_qs},
+      {{u"tasks"_qs, u"Calculo.bas"_qs}, 2,
+       u"quimbel: Calculo.bas: tasks and favorites belong to a project; give its project file (.vbp)\n"_qs},
+      {{u"number"_qs, u"--file-lines"_qs, u"--start"_qs, u"5"_qs, u"Calculo.bas"_qs}, 2, {}},
+      {{u"number"_qs, u"-"_qs, u"--stdin-filename"_qs, u"Leiame.txt"_qs}, 3, {}}};
+  for (const auto& [arguments, code, message] : runs) {
+    const Result result = tool.run(arguments, work.dir.path());
+    EXPECT_EQ(result.code, code) << arguments.join(u' ').toStdString();
+    if (!message.isEmpty()) {
+      EXPECT_EQ(result.err.section(u'\n', 0, 0) + u'\n', message);
+    }
+  }
+  EXPECT_TRUE(tool.run({u"number"_qs, u"--help"_qs}).out.contains(u"Usage: quimbel number"_qs));
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -390,31 +419,32 @@ TEST(CheckAndDiff, DiffPrintsTheChangedLinesWithThreeLinesOfContext) {
       {u"number"_qs, u"--start"_qs, u"10"_qs, u"--interval"_qs, u"10"_qs, u"--diff"_qs, u"Calculo.bas"_qs},
       work.dir.path());
   EXPECT_EQ(result.code, 0) << result.err.toStdString();
-  EXPECT_EQ(result.out, QStringLiteral("--- a/Calculo.bas\n"
-                                       "+++ b/Calculo.bas\n"
-                                       "@@ -2,9 +2,9 @@\n"
-                                       " Option Explicit\n"
-                                       " ' Cálculo de preços\n"
-                                       " Public Function Preco(ByVal x As Currency) As Currency\n"
-                                       "-    If x > 0 Then\n"
-                                       "-        Preco = x * 1.1 ' acréscimo\n"
-                                       "-    Else\n"
-                                       "-        Preco = 0\n"
-                                       "-    End If\n"
-                                       "+10     If x > 0 Then\n"
-                                       "+20         Preco = x * 1.1 ' acréscimo\n"
-                                       "+30      Else\n"
-                                       "+40         Preco = 0\n"
-                                       "+50     End If\n"
-                                       " End Function\n"));
+  // The file's own bytes: code page and line ends as they are.
+  EXPECT_EQ(result.bytes, QByteArray("--- a/Calculo.bas\n"
+                                     "+++ b/Calculo.bas\n"
+                                     "@@ -2,9 +2,9 @@\n"
+                                     " Option Explicit\r\n"
+                                     " ' C\xE1lculo de pre\xE7os\r\n"
+                                     " Public Function Preco(ByVal x As Currency) As Currency\r\n"
+                                     "-    If x > 0 Then\r\n"
+                                     "-        Preco = x * 1.1 ' acr\xE9scimo\r\n"
+                                     "-    Else\r\n"
+                                     "-        Preco = 0\r\n"
+                                     "-    End If\r\n"
+                                     "+10     If x > 0 Then\r\n"
+                                     "+20         Preco = x * 1.1 ' acr\xE9scimo\r\n"
+                                     "+30      Else\r\n"
+                                     "+40         Preco = 0\r\n"
+                                     "+50     End If\r\n"
+                                     " End Function\r\n"));
   EXPECT_EQ(work.bytes(), kCalculo);
 }
 
 TEST(CheckAndDiff, DistantChangesMakeSeparateHunks) {
-  QByteArray module = "Attribute VB_Name = \"Dois\"\r\nSub A()\r\nx = 1\r\nEnd Sub\r\n";
+  QByteArray module = "Attribute VB_Name = \"Dois\"\nSub A()\nx = 1\nEnd Sub\n";
   for (int i = 1; i <= 8; ++i)
-    module += "' " + QByteArray::number(i) + "\r\n";
-  module += "Sub B()\r\n    y = 2\r\nz = 3\r\nEnd Sub";  // no line end after the last line
+    module += "' " + QByteArray::number(i) + "\n";
+  module += "Sub B()\n    y = 2\nz = 3\nEnd Sub";  // no line end after the last line
   Workspace work(module);
   Tool tool;
   const Result result =
@@ -470,8 +500,8 @@ TEST(MessyInput, MissingFilesAreNamedAndWhatIsNotVb6CodeOrOutputThatFailsIsRefus
       {"indent Leiame.txt", 3, "not a project group, project or module file"},
       {"list Fila.bas", 3, "it is a FIFO"},
       {"list Zero.bas", 3, "it is a device"},
-      {"list Pasta.bas", 3, "it is a directory"},
-      {"number --check Pasta.bas", 3, "it is a directory"},
+      {"list Pasta.bas", 3, "Pasta.bas: no project or module files in this folder"},
+      {"number --check Pasta.bas", 3, "Pasta.bas: no project or module files in this folder"},
       {"number Pasta.vbp", 3, "Pasta.vbp, line 2: Cannot read"},
       {"list Entrada.vbp", 5, "Entrada.vbp, line 4: file not found: Classes\\clsFalta.cls"},
       {"number Entrada.vbp", 5, "Entrada.vbp, line 4: file not found: Classes\\clsFalta.cls"}};
@@ -566,7 +596,7 @@ TEST(FindCommand, ListsWhatTheAddInListsInTheSameOrder) {
       const QStringList expected = modelRows(file, search);
       EXPECT_EQ(lines(result.out), expected) << arguments.join(u' ').toStdString();
       EXPECT_EQ(result.code, expected.isEmpty() ? 1 : 0);
-      EXPECT_EQ(result.err, u"Pesquisa completada ... %1 linhas localizadas\n"_qs.arg(expected.size()));
+      EXPECT_EQ(result.err, u"%1 occurrence%2 found\n"_qs.arg(expected.size()).arg(expected.size() == 1 ? "" : "s"));
     }
   }
 }
@@ -610,7 +640,7 @@ TEST(FindCommand, BadSearchesAndBadInput) {
   const QString find = u"find"_qs;
   Result result = tool.run({find, u"Nada"_qs, work.file});
   EXPECT_EQ(result.code, 1);
-  EXPECT_EQ(result.err, u"Pesquisa completada ... 0 linhas localizadas\n"_qs);
+  EXPECT_EQ(result.err, u"0 occurrences found\n"_qs);
   for (const QStringList& arguments :
        {QStringList{find, u"--pattern"_qs, u"--match-case"_qs, u"P*"_qs, work.file},
         QStringList{find, QString(), work.file}, QStringList{find, u"--pattern"_qs, u"[abc"_qs, work.file},
@@ -628,6 +658,297 @@ TEST(FindCommand, BadSearchesAndBadInput) {
   EXPECT_EQ(result.code, 3);
   EXPECT_TRUE(result.err.contains(u"Binario.bas, line 3: not a text file"_qs)) << result.err.toStdString();
   EXPECT_TRUE(result.out.isEmpty());
+}
+
+// ---------------------------------------------------------------------------------------------------
+// Where VB6 teams keep their code: git, pre-commit, editors, pipelines
+
+/// A git repository over a copy of the example group (Windows-1252, CRLF), everything committed.
+struct Repository {
+  ExampleCopy copy;
+  Tool& tool;
+  QString root = copy.path({});
+
+  explicit Repository(Tool& user, const QByteArray& editorConfig = {}) : tool(user) {
+    if (!editorConfig.isEmpty()) writeBytes(copy.path(u".editorconfig"_qs), editorConfig);
+    for (const QStringList& arguments :
+         {QStringList{u"init"_qs, u"-q"_qs}, {u"config"_qs, u"user.name"_qs, u"Teste"_qs},
+          {u"config"_qs, u"user.email"_qs, u"teste@example.invalid"_qs}, {u"config"_qs, u"core.autocrlf"_qs, u"false"_qs}})
+      git(arguments);
+  }
+  Result git(const QStringList& arguments, const QByteArray& input = {}) {
+    const Result result = tool.runProgram(u"git"_qs, arguments, root, input);
+    EXPECT_EQ(result.code, 0) << arguments.join(u' ').toStdString() << result.err.toStdString();
+    return result;
+  }
+  void commitAll() {
+    git({u"add"_qs, u"-A"_qs});
+    git({u"commit"_qs, u"-qm"_qs, u"fontes"_qs});
+  }
+};
+
+TEST(Git, DiffsApplyWithGitAndPatch) {
+  Tool tool;
+  Repository repository(tool);
+  repository.commitAll();
+  QTemporaryDir patches;
+  for (const QStringList& command :
+       {QStringList{u"number"_qs, u"--start"_qs, u"10"_qs}, {u"indent"_qs, u"--spaces"_qs, u"2"_qs},
+        {u"numindent"_qs, u"--file-lines"_qs}}) {
+    const QString patch = patches.filePath(command.front());
+    const Result diff = tool.run(command + QStringList{u"--diff"_qs, u"Demo.vbg"_qs}, repository.root);
+    ASSERT_EQ(diff.code, 0) << diff.err.toStdString();
+    EXPECT_TRUE(diff.bytes.contains("\r\n")) << "line ends as in the files";
+    writeBytes(patch, diff.bytes);
+    repository.git({u"apply"_qs, u"--check"_qs, patch});
+  }
+  // Applied with patch, the diff gives what the command writes.
+  const Result applied = tool.runProgram(u"patch"_qs, {u"-s"_qs, u"-p1"_qs, u"-i"_qs, patches.filePath(u"number"_qs)}, repository.root);
+  ASSERT_EQ(applied.code, 0) << applied.out.toStdString();
+  const auto patched = repository.copy.snapshot();
+  repository.git({u"checkout"_qs, u"-q"_qs, u"--"_qs, u"."_qs});
+  ASSERT_EQ(tool.run({u"number"_qs, u"--start"_qs, u"10"_qs, u"Demo.vbg"_qs}, repository.root).code, 0);
+  EXPECT_EQ(repository.copy.snapshot(), patched);
+}
+
+TEST(Git, AFilterKeepsNumbersOutOfTheRepositoryAndInTheWorkingTree) {
+  Tool tool;
+  // The numbering comes from the project, not from whoever checks it out.
+  tool.setSetting(common::setting::InitialNumber, u"7"_qs);
+  Repository repository(tool, "root = true\n[*]\nquimbel_number_start = 100\nquimbel_number_interval = 10\n");
+  repository.git({u"config"_qs, u"filter.vbnumbers.clean"_qs, u"quimbel unnumber --stdin-filename %f -"_qs});
+  repository.git({u"config"_qs, u"filter.vbnumbers.smudge"_qs, u"quimbel number --stdin-filename %f -"_qs});
+  repository.git({u"config"_qs, u"filter.vbnumbers.required"_qs, u"true"_qs});
+  writeBytes(repository.copy.path(u".gitattributes"_qs),
+             "*.bas filter=vbnumbers -text\n*.cls filter=vbnumbers -text\n*.frm filter=vbnumbers -text\n"
+             "*.ctl filter=vbnumbers -text\n");
+  ASSERT_EQ(tool.run({u"number"_qs, u"Demo.vbg"_qs}, repository.root).code, 0);
+  const auto numbered = repository.copy.snapshot();
+  repository.commitAll();
+
+  const QString module = u"Loja/modPrincipal.bas"_qs;
+  const QByteArray stored = repository.git({u"show"_qs, u"HEAD:"_qs + module}).bytes;
+  const Result unnumbered = tool.run({u"unnumber"_qs, u"-"_qs}, repository.root, numbered.value(module));
+  EXPECT_EQ(stored, unnumbered.bytes);
+  EXPECT_NE(stored, numbered.value(module));
+  EXPECT_TRUE(numbered.value(module).contains("\r\n100 ")) << "numbered from the .editorconfig's start";
+
+  for (const QString& file : numbered.keys())
+    if (!file.startsWith(u'.')) QFile::remove(repository.copy.path(file));
+  repository.git({u"checkout"_qs, u"-q"_qs, u"--"_qs, u"."_qs});
+  EXPECT_EQ(repository.copy.snapshot(), numbered);
+}
+
+TEST(Git, ThePreCommitHooksCheckFixAndUnnumberTheFilesGiven) {
+  // The hooks as the repository offers them: id, entry, and the file pattern.
+  QMap<QString, QPair<QString, QRegularExpression>> hooks;
+  QString id;
+  for (const QByteArray& line : readBytes(QUIMBEL_SOURCE_DIR "/.pre-commit-hooks.yaml").split('\n')) {
+    const QString text = QString::fromUtf8(line).trimmed();
+    if (text.startsWith(u"- id:"_qs)) id = text.section(u':', 1).trimmed();
+    if (text.startsWith(u"entry:"_qs)) hooks[id].first = text.section(u':', 1).trimmed();
+    if (text.startsWith(u"files:"_qs))
+      hooks[id].second = QRegularExpression(text.section(u':', 1).trimmed().remove(u'\''));
+  }
+  ASSERT_EQ(hooks.keys(), (QStringList{u"quimbel-indent"_qs, u"quimbel-unnumber"_qs}));
+  for (const auto& [entry, files] : hooks) {
+    EXPECT_TRUE(files.match(u"Fontes/MODULO.BAS"_qs).hasMatch());
+    EXPECT_TRUE(files.match(u"frmA.frm"_qs).hasMatch());
+    EXPECT_FALSE(files.match(u"frmA.frx"_qs).hasMatch());
+  }
+
+  Tool tool;
+  Repository repository(tool);
+  const QString file = u"Loja/modPersistencia.bas"_qs;
+  repository.commitAll();
+  const auto run = [&](const QString& hook, const QStringList& arguments) {
+    return tool.runProgram(u"/bin/sh"_qs, QStringList{u"-c"_qs, hooks[hook].first + u" \"$@\""_qs, u"hook"_qs} + arguments,
+                           repository.root);
+  };
+  const QByteArray before = readBytes(repository.copy.path(file));
+  EXPECT_EQ(run(u"quimbel-indent"_qs, {u"--check"_qs, file}).code, 1);
+  EXPECT_EQ(readBytes(repository.copy.path(file)), before);
+  EXPECT_EQ(run(u"quimbel-indent"_qs, {file}).code, 0);
+  EXPECT_EQ(run(u"quimbel-indent"_qs, {u"--check"_qs, file}).code, 0);
+  EXPECT_EQ(run(u"quimbel-unnumber"_qs, {file}).code, 0);
+  EXPECT_FALSE(QRegularExpression(u"\\n\\s*\\d+ "_qs).match(QString::fromLatin1(readBytes(repository.copy.path(file)))).hasMatch());
+  EXPECT_NE(repository.git({u"status"_qs, u"--porcelain"_qs}).out, QString());
+}
+
+TEST(Style, AnEditorConfigGivesEveryoneTheSameResultAndConfigSaysWhereEachValueCameFrom) {
+  Tool alice;
+  Tool bob;
+  bob.setSetting(common::setting::InitialNumber, u"100"_qs);
+  bob.setSetting(common::setting::UseOption, u"1"_qs);
+  const QStringList numIndent{u"numindent"_qs, u"--diff"_qs, u"Calculo.bas"_qs};
+  Workspace work;
+  EXPECT_NE(alice.run(numIndent, work.dir.path()).out, bob.run(numIndent, work.dir.path()).out);
+
+  writeBytes(work.dir.filePath(u".editorconfig"_qs),
+             "root = true\n[*.bas]\nindent_style = space\nindent_size = 4\nquimbel_number_start = 10\n");
+  const Result shared = alice.run(numIndent, work.dir.path());
+  EXPECT_EQ(bob.run(numIndent, work.dir.path()).out, shared.out);
+  EXPECT_TRUE(shared.out.contains(u"+10     If x > 0 Then"_qs)) << shared.out.toStdString();
+
+  const Result config = bob.run({u"config"_qs, u"--interval"_qs, u"7"_qs, u"Calculo.bas"_qs}, work.dir.path());
+  EXPECT_EQ(config.code, 0) << config.err.toStdString();
+  EXPECT_EQ(config.out.simplified(), u"indent_style = space .editorconfig (.editorconfig) "
+                                     "indent_size = 4 .editorconfig (.editorconfig) "
+                                     "quimbel_number_start = 10 .editorconfig (.editorconfig) "
+                                     "quimbel_number_interval = 7 command line "
+                                     "quimbel_numindent = false default"_qs);
+  EXPECT_TRUE(bob.run({u"config"_qs, u"Outro.cls"_qs}, work.dir.path())
+                  .out.contains(u"quimbel_number_start = 100          personal settings ("_qs));
+
+  // The one-command option: numbering indents too.
+  writeBytes(work.dir.filePath(u"Sub/.editorconfig"_qs), "[*]\nquimbel_numindent = true\nindent_size = tab\ntab_width = 2\n");
+  writeBytes(work.dir.filePath(u"Sub/Calculo.bas"_qs), kCalculo);
+  const Result both = alice.run({u"number"_qs, u"--diff"_qs, u"Sub/Calculo.bas"_qs}, work.dir.path());
+  EXPECT_EQ(both.out, alice.run({u"numindent"_qs, u"--diff"_qs, u"Sub/Calculo.bas"_qs}, work.dir.path()).out);
+  EXPECT_TRUE(both.out.contains(u"+10   If x > 0 Then"_qs)) << both.out.toStdString();
+
+  writeBytes(work.dir.filePath(u"Sub/.editorconfig"_qs), "[*.bas]\nquimbel_number_interval = 0\n");
+  const Result bad = alice.run({u"number"_qs, u"Sub/Calculo.bas"_qs}, work.dir.path());
+  EXPECT_EQ(bad.code, 3);
+  EXPECT_TRUE(bad.err.startsWith(u"quimbel: Sub/.editorconfig: quimbel_number_interval = 0 is not"_qs)) << bad.err.toStdString();
+  EXPECT_EQ(readBytes(work.dir.filePath(u"Sub/Calculo.bas"_qs)), kCalculo);
+}
+
+TEST(StandardInput, OneModuleInTheResultOutNothingWritten) {
+  Workspace work;
+  writeBytes(work.dir.filePath(u".editorconfig"_qs), "[*.frm]\nquimbel_number_start = 1\nquimbel_number_interval = 1\n");
+  Tool tool;
+  const QStringList form{u"number"_qs, u"--stdin-filename"_qs, u"Telas/frmA.frm"_qs, u"-"_qs};
+  Result result = tool.run(form, work.dir.path(), kCalculo);
+  EXPECT_EQ(result.code, 0) << result.err.toStdString();
+  EXPECT_TRUE(result.bytes.contains("\r\n1     If x")) << result.bytes.toStdString();
+  EXPECT_EQ(tool.run({u"unnumber"_qs, u"-"_qs}, {}, result.bytes).bytes, kCalculo);
+  EXPECT_EQ(tool.run({u"unnumber"_qs, u"-"_qs}, {}, kCalculo).bytes, kCalculo) << "unchanged, still written";
+  result = tool.run({u"number"_qs, u"--check"_qs, u"-"_qs}, {}, kCalculo);
+  EXPECT_EQ(result.code, 1);
+  EXPECT_EQ(result.out, u"would change stdin.bas\n"_qs);
+  result = tool.run({u"number"_qs, u"--stdin-filename"_qs, u"Mau.bas"_qs, u"-"_qs}, {}, QByteArray("Sub A()\r\n\0", 10));
+  EXPECT_EQ(result.code, 3);
+  EXPECT_TRUE(result.err.startsWith(u"quimbel: Mau.bas, line 2: not a text file"_qs)) << result.err.toStdString();
+  EXPECT_TRUE(result.bytes.isEmpty());
+  EXPECT_EQ(work.bytes(), kCalculo);
+}
+
+TEST(Json, ListAndFindParseBackWithEveryLineNamedForWhatItCounts) {
+  ExampleCopy example;
+  Tool tool;
+  const QJsonDocument list =
+      QJsonDocument::fromJson(tool.run({u"list"_qs, u"--json"_qs, u"Demo.vbg"_qs}, example.path({})).bytes);
+  QStringList rows;
+  for (const QJsonValue project : list[u"projects"_qs].toArray())
+    for (const QJsonValue component : project[u"components"_qs].toArray()) {
+      if (!component[u"members"_qs].isArray()) continue;
+      const QString path = component[u"file"_qs].toString();
+      rows << u"%1\t(declarations)\t0\t0\t0\t%2"_qs.arg(path).arg(component[u"declaration_lines"_qs].toInt());
+      for (const QJsonValue member : component[u"members"_qs].toArray())
+        for (const QJsonValue procedure : member[u"procedures"_qs].toArray()) {
+          const QByteArray line = readBytes(example.path(path)).split('\n').value(procedure[u"body_file_line"_qs].toInt() - 1);
+          EXPECT_TRUE(line.contains(member[u"name"_qs].toString().toLatin1())) << line.toStdString();
+          rows << u"%1\t%2\t%3\t%4"_qs.arg(path, member[u"name"_qs].toString(), procedure[u"kind"_qs].toString())
+                      .arg(procedure[u"start_code_line"_qs].toInt());
+        }
+    }
+  EXPECT_GT(rows.size(), 40);
+  // Every declarations row of --tsv, in the same order.
+  const QStringList tsv = lines(tool.run({u"list"_qs, u"--tsv"_qs, u"Demo.vbg"_qs}, example.path({})).out);
+  EXPECT_EQ(rows.filter(u"(declarations)"_qs), tsv.filter(u"(declarations)"_qs));
+
+  const QStringList search{u"find"_qs, u"cliente"_qs, u"Demo.vbg"_qs};
+  const QJsonArray found = QJsonDocument::fromJson(tool.run(search + QStringList{u"--json"_qs}, example.path({})).bytes).array();
+  QStringList tsvRows;
+  QStringList plainRows;
+  for (const QJsonValue hit : found) {
+    tsvRows << u"%1\t%2\t%3\t%4:%5\t%6"_qs.arg(hit[u"project"_qs].toString(), hit[u"module"_qs].toString(),
+                                               hit[u"procedure"_qs].toString())
+                   .arg(hit[u"code_line"_qs].toInt()).arg(hit[u"column"_qs].toInt()).arg(hit[u"text"_qs].toString());
+    plainRows << u"%1:%2:%3: %4"_qs.arg(hit[u"path"_qs].toString()).arg(hit[u"file_line"_qs].toInt())
+                     .arg(hit[u"column"_qs].toInt()).arg(hit[u"text"_qs].toString());
+  }
+  EXPECT_EQ(tsvRows, lines(tool.run(search + QStringList{u"--tsv"_qs}, example.path({})).out));
+  EXPECT_EQ(plainRows, lines(tool.run(search, example.path({})).out));
+  const Result quiet = tool.run(search + QStringList{u"-q"_qs}, example.path({}));
+  EXPECT_EQ(quiet.code, 0);
+  EXPECT_TRUE(quiet.out.isEmpty() && quiet.err.isEmpty());
+}
+
+TEST(FileLines, EachNewNumberIsTheLineOfTheFileThatHoldsIt) {
+  ExampleCopy copy;
+  QTemporaryDir generated;
+  const QString group =
+      gen::generateProjects(generated.path(), {.codeLines = 8'000, .components = 6, .projects = 2}).groupFile;
+  Tool tool;
+  for (const auto& [file, directory] :
+       {std::pair(copy.groupFile(), copy.path(QString())), std::pair(group, generated.path())}) {
+    SCOPED_TRACE(file.toStdString());
+    ASSERT_EQ(tool.run({u"unnumber"_qs, file}).code, 0);
+    const auto before = host::test::snapshot(directory);
+    for (const QString& command : {u"number"_qs, u"numindent"_qs}) {
+      ASSERT_EQ(tool.run({command, u"--file-lines"_qs, file}).code, 0);
+      int numbered = 0;
+      for (auto it = before.cbegin(); it != before.cend(); ++it) {
+        const QList<QByteArray> old = it.value().split('\n');
+        const QList<QByteArray> now = readBytes(QDir(directory).filePath(it.key())).split('\n');
+        ASSERT_EQ(now.size(), old.size()) << it.key().toStdString();
+        for (qsizetype i = 0; i < now.size(); ++i) {
+          if (now[i] == old[i] || (command != u"number"_qs && !std::isdigit(now[i].front()))) continue;
+          bool isNumber = false;
+          EXPECT_EQ(now[i].left(now[i].indexOf(' ')).toInt(&isNumber), i + 1) << now[i].toStdString();
+          numbered += isNumber;
+        }
+      }
+      EXPECT_GT(numbered, 100);
+      ASSERT_EQ(tool.run({u"unnumber"_qs, file}).code, 0);
+      if (command == u"number"_qs) {
+        EXPECT_EQ(host::test::snapshot(directory), before);
+      }
+    }
+  }
+}
+
+TEST(Inputs, FoldersStandForTheirFilesEachFileIsDoneOnceAndMissingFilesLeaveTheResultVisible) {
+  ExampleCopy copy;
+  Tool tool;
+  const QStringList named{u"."_qs, u"Loja/Loja.vbp"_qs, u"Loja/modPersistencia.bas"_qs,
+                          u"Loja/../Loja/clsPedido.cls"_qs, u"--exclude"_qs, u"Utilitarios"_qs,
+                          u"--exclude"_qs, u"frm*.frm"_qs};
+  const Result check = tool.run(QStringList{u"number"_qs, u"--check"_qs} + named, copy.path({}));
+  EXPECT_EQ(check.code, 1);
+  const QStringList changing = lines(check.out);
+  EXPECT_EQ(changing.size(), QSet<QString>(changing.begin(), changing.end()).size()) << check.out.toStdString();
+  EXPECT_TRUE(changing.contains(u"would change Loja/clsPedido.cls"_qs)) << check.out.toStdString();
+  EXPECT_EQ(changing.filter(u"Utilitarios"_qs).size() + changing.filter(u"/frm"_qs).size(), 0);
+  EXPECT_EQ(tool.run(QStringList{u"number"_qs} + named, copy.path({})).code, 0);
+  EXPECT_EQ(tool.run(QStringList{u"number"_qs, u"--check"_qs} + named, copy.path({})).code, 0);
+
+  QFile::remove(copy.path(u"Loja/clsPedido.cls"_qs));
+  const Result missing = tool.run({u"indent"_qs, u"--spaces"_qs, u"8"_qs, u"--check"_qs, u"Demo.vbg"_qs}, copy.path({}));
+  EXPECT_EQ(missing.code, 5);
+  EXPECT_TRUE(missing.err.endsWith(u"\n%1 files would change, 1 missing\n"_qs.arg(lines(missing.out).size())))
+      << missing.err.toStdString();
+  EXPECT_TRUE(tool.run({u"find"_qs, u"Sub"_qs, u"Demo.vbg"_qs}, copy.path({})).err.contains(QRegularExpression(u"\n\\d+ occurrences found, 1 missing\n$"_qs)));
+}
+
+TEST(Encoding, AUtf8ModuleIsNamedAndUtf8ReadsAndWritesItByteForByte) {
+  const QByteArray utf8 = host::decodeAnsi(kCalculo).toUtf8();
+  Workspace work(utf8);
+  Tool tool;
+  Result result = tool.run({u"find"_qs, u"preços"_qs, u"Calculo.bas"_qs}, work.dir.path());
+  EXPECT_EQ(result.code, 1);
+  EXPECT_TRUE(result.err.startsWith(u"quimbel: Calculo.bas: warning: this module is UTF-8"_qs)) << result.err.toStdString();
+  result = tool.run({u"find"_qs, u"--encoding"_qs, u"utf-8"_qs, u"preços"_qs, u"Calculo.bas"_qs}, work.dir.path());
+  EXPECT_EQ(result.out, u"Calculo.bas:3:14: ' Cálculo de preços\n"_qs);
+  EXPECT_EQ(result.err, u"1 occurrence found\n"_qs);
+  // A byte that is not UTF-8 survives as well.
+  const QByteArray mixed = QByteArray(utf8).replace("acr", "\xFF\xFE");
+  writeBytes(work.file, mixed);
+  for (const QString& command : {u"number"_qs, u"unnumber"_qs})
+    EXPECT_EQ(tool.run({command, u"--encoding"_qs, u"utf-8"_qs, work.file}).err, QString());
+  EXPECT_EQ(work.bytes(), mixed);
 }
 
 }  // namespace

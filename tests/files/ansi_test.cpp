@@ -5,7 +5,10 @@
 
 #include <gtest/gtest.h>
 
+#include <QRandomGenerator>
 #include <QStringDecoder>
+
+#include <algorithm>
 
 namespace host {
 namespace {
@@ -54,6 +57,34 @@ TEST(AnsiTest, AppendKeepsWhatWasThereAndStopsAtTheBadCharacter) {
   EXPECT_FALSE(appendAnsi(out, QString::fromUtf16(u"ab\u4E2D"), &bad));
   EXPECT_EQ(bad, 2);
   EXPECT_TRUE(out.startsWith("head:ok"));
+}
+
+// In UTF-8 mode any bytes come back as they were, valid UTF-8 reads as UTF-8, and only valid UTF-8 with a
+// byte above 0x7F looks like UTF-8.
+TEST(AnsiTest, Utf8ModeKeepsEveryByteAndReadsValidUtf8AsUtf8) {
+  const SourceEncoding before = setSourceEncoding(SourceEncoding::Utf8);
+  QRandomGenerator random(23);
+  for (int round = 0; round < 2000; ++round) {
+    QByteArray bytes(random.bounded(12), '\0');
+    for (char& byte : bytes)  // mostly the bytes of UTF-8 sequences, so that valid ones are common
+      byte = char(random.bounded(4) ? 0x80 + random.bounded(0x78) : random.bounded(256));
+    const QString text = decodeAnsi(bytes);
+    EXPECT_EQ(encodeAnsi(text), std::optional(bytes)) << bytes.toHex().toStdString();
+    QStringDecoder utf8(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless | QStringDecoder::Flag::ConvertInitialBom);
+    const QString strict = utf8.decode(bytes);
+    const bool wide = std::any_of(bytes.begin(), bytes.end(), [](char byte) { return byte & 0x80; });
+    EXPECT_EQ(looksLikeUtf8(bytes), wide && !utf8.hasError()) << bytes.toHex().toStdString();
+    if (!utf8.hasError()) {
+      EXPECT_EQ(text, strict);
+    }
+  }
+  EXPECT_TRUE(looksLikeUtf8("a\xC3\xA7\xF0\x9F\x98\x80"));
+  for (const char* notUtf8 : {"abc", "\xE7", "\xC0\x80", "\xED\xA0\x80", "\xF4\x90\x80\x80", "\xC3"})
+    EXPECT_FALSE(looksLikeUtf8(notUtf8)) << notUtf8;
+  qsizetype bad = -1;
+  EXPECT_FALSE(encodeAnsi(QString(QChar(0xD800)), &bad));
+  EXPECT_EQ(bad, 0);
+  setSourceEncoding(before);
 }
 
 }  // namespace

@@ -17,7 +17,8 @@ cmake --install "$build" --prefix "$prefix" >"$work/install.log" || { cat "$work
 # What a user runs and reads, in the usual places.
 for file in bin/quimbel bin/quimbel-ide share/man/man1/quimbel.1 share/man/man1/quimbel-ide.1 \
   share/applications/quimbel-ide.desktop share/icons/hicolor/scalable/apps/quimbel-ide.svg \
-  share/quimbel/help/index.html; do
+  share/quimbel/help/index.html share/doc/quimbel/SCRIPTING.md share/bash-completion/completions/quimbel \
+  share/zsh/site-functions/_quimbel; do
   [ -f "$prefix/$file" ] || fail "$file is not installed"
 done
 addin=$(find "$prefix" -name libquimbel-addin.so)
@@ -47,6 +48,13 @@ cd "$source"
 "$prefix/bin/quimbel" list examples/demo/Demo.vbg >"$work/installed.txt" || fail "quimbel list failed"
 "$build/bin/quimbel" list examples/demo/Demo.vbg >"$work/built.txt"
 diff -u "$work/built.txt" "$work/installed.txt" || fail "the installed quimbel lists the example group otherwise"
+
+# The installed completion offers the commands and the options of the one typed.
+completions=$(bash -c 'source "$1"; COMP_WORDS=(quimbel nu); COMP_CWORD=1; _quimbel; echo "${COMPREPLY[*]}"
+  COMP_WORDS=(quimbel find --js); COMP_CWORD=2; _quimbel; echo "${COMPREPLY[*]}"' - \
+  "$prefix/share/bash-completion/completions/quimbel")
+[ "$completions" = $'number numindent\n--json' ] || fail "bash completion offered: $completions"
+if command -v zsh >/dev/null; then zsh -n "$prefix/share/zsh/site-functions/_quimbel" || fail "zsh completion"; fi
 
 # The installed IDE loads the installed add-in, which finds its configuration and help pages.
 cat >"$work/session.qis" <<SCRIPT

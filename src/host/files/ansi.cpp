@@ -4,9 +4,92 @@
 #include "host/files/ansi.h"
 
 #include <array>
+#include <atomic>
 
 namespace host {
 namespace {
+
+std::atomic<SourceEncoding> g_encoding{SourceEncoding::Ansi};
+
+/// The length of the valid UTF-8 sequence at `in[i]` (2 to 4), or 0.
+qsizetype utf8SequenceLength(const unsigned char* in, qsizetype i, qsizetype size) {
+  const unsigned char lead = in[i];
+  qsizetype length = 0;
+  unsigned char low = 0x80;
+  unsigned char high = 0xBF;
+  if (lead >= 0xC2 && lead <= 0xDF) {
+    length = 2;
+  } else if (lead >= 0xE0 && lead <= 0xEF) {
+    length = 3;
+    if (lead == 0xE0) low = 0xA0;   // no overlong forms
+    if (lead == 0xED) high = 0x9F;  // no surrogates
+  } else if (lead >= 0xF0 && lead <= 0xF4) {
+    length = 4;
+    if (lead == 0xF0) low = 0x90;
+    if (lead == 0xF4) high = 0x8F;  // nothing past U+10FFFF
+  } else {
+    return 0;
+  }
+  if (i + length > size || in[i + 1] < low || in[i + 1] > high) return 0;
+  for (qsizetype k = 2; k < length; ++k)
+    if ((in[i + k] & 0xC0) != 0x80) return 0;
+  return length;
+}
+
+QString decodeUtf8(QByteArrayView bytes) {
+  QString text;
+  text.reserve(bytes.size());
+  const auto* in = reinterpret_cast<const unsigned char*>(bytes.data());
+  for (qsizetype i = 0, size = bytes.size(); i < size;) {
+    if (in[i] < 0x80) {
+      text += QChar(in[i++]);
+      continue;
+    }
+    const qsizetype length = utf8SequenceLength(in, i, size);
+    if (length == 0) {
+      text += QChar(char16_t(0xDC00 + in[i++]));
+      continue;
+    }
+    char32_t code = in[i] & (0xFF >> (length + 1));
+    for (qsizetype k = 1; k < length; ++k)
+      code = (code << 6) | (in[i + k] & 0x3F);
+    text += QChar::fromUcs4(code);
+    i += length;
+  }
+  return text;
+}
+
+bool appendUtf8(QByteArray& out, QStringView text, qsizetype* firstBad) {
+  for (qsizetype i = 0, size = text.size(); i < size; ++i) {
+    const char16_t c = text[i].unicode();
+    char32_t code = c;
+    if (QChar::isHighSurrogate(c) && i + 1 < size && QChar::isLowSurrogate(text[i + 1].unicode())) {
+      code = QChar::surrogateToUcs4(c, text[++i].unicode());
+    } else if (c >= 0xDC80 && c <= 0xDCFF) {
+      out += char(c - 0xDC00);  // a byte that was not valid UTF-8
+      continue;
+    } else if (QChar::isSurrogate(c)) {
+      if (firstBad) *firstBad = i;
+      return false;
+    }
+    if (code < 0x80) {
+      out += char(code);
+    } else if (code < 0x800) {
+      out += char(0xC0 | (code >> 6));
+      out += char(0x80 | (code & 0x3F));
+    } else if (code < 0x10000) {
+      out += char(0xE0 | (code >> 12));
+      out += char(0x80 | ((code >> 6) & 0x3F));
+      out += char(0x80 | (code & 0x3F));
+    } else {
+      out += char(0xF0 | (code >> 18));
+      out += char(0x80 | ((code >> 12) & 0x3F));
+      out += char(0x80 | ((code >> 6) & 0x3F));
+      out += char(0x80 | (code & 0x3F));
+    }
+  }
+  return true;
+}
 
 // The characters of bytes 0x80..0x9F; every other byte is the character of the same value.
 constexpr std::array<char16_t, 32> kHighControlRange = {
@@ -101,7 +184,32 @@ int encodeSpecial(char16_t character) {
 
 }  // namespace
 
+SourceEncoding setSourceEncoding(SourceEncoding encoding) {
+  return g_encoding.exchange(encoding);
+}
+
+SourceEncoding sourceEncoding() {
+  return g_encoding.load(std::memory_order_relaxed);
+}
+
+bool looksLikeUtf8(QByteArrayView bytes) {
+  const auto* in = reinterpret_cast<const unsigned char*>(bytes.data());
+  bool wide = false;
+  for (qsizetype i = 0, size = bytes.size(); i < size;) {
+    if (in[i] < 0x80) {
+      ++i;
+      continue;
+    }
+    const qsizetype length = utf8SequenceLength(in, i, size);
+    if (length == 0) return false;
+    wide = true;
+    i += length;
+  }
+  return wide;
+}
+
 QString decodeAnsi(QByteArrayView bytes) {
+  if (sourceEncoding() == SourceEncoding::Utf8) return decodeUtf8(bytes);
   QString text(bytes.size(), Qt::Uninitialized);
   char16_t* out = reinterpret_cast<char16_t*>(text.data());
   const auto* in = reinterpret_cast<const unsigned char*>(bytes.data());
@@ -111,6 +219,7 @@ QString decodeAnsi(QByteArrayView bytes) {
 }
 
 bool appendAnsi(QByteArray& out, QStringView text, qsizetype* firstBad) {
+  if (sourceEncoding() == SourceEncoding::Utf8) return appendUtf8(out, text, firstBad);
   const qsizetype start = out.size();
   out.resize(start + text.size());
   char* target = out.data() + start;
