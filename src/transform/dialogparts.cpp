@@ -61,4 +61,34 @@ void ProgressBarSink::setVisible(bool visible) {
   m_bar.repaint();
 }
 
+QString walkFailureText(const QString& message, const WalkFailure& failure) {
+  QString text = message;
+  if (!failure.module.isEmpty()) {
+    text += QStringLiteral("\n\nMódulo %1").arg(failure.module);
+    if (failure.line > 0) text += QStringLiteral(", linha %1").arg(failure.line);
+    text += u'.';
+  }
+  // The IDE's own description is in English: the reasons a user can act on are said here.
+  switch (failure.error.number()) {
+    case ide::err::LineTooLong:
+      text += QStringLiteral(" A linha passaria de 1023 caracteres.");
+      break;
+    default:
+      text += QStringLiteral(" (erro %1)").arg(failure.error.number());
+      break;
+  }
+  return text;
+}
+
+int walkMessageId(PROG_MODE scope, bool indenting) {
+  switch (scope) {
+    case PROG_PROJECT:
+      return indenting ? 5130 : 5121;
+    case PROG_MODULE:
+      return indenting ? 5129 : 5122;
+    default:
+      return indenting ? 5128 : 5123;
+  }
+}
+
 }  // namespace transform
