@@ -10,11 +10,11 @@
 #include "qtplatform.h"
 
 #include <QButtonGroup>
-#include <QScrollBar>
 #include <QComboBox>
-#include <QToolButton>
 #include <QHBoxLayout>
+#include <QScrollBar>
 #include <QSet>
+#include <QToolButton>
 #include <QVBoxLayout>
 
 #include <algorithm>
@@ -86,6 +86,7 @@ CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget*
 
   // The two view buttons stand left of the horizontal scroll bar, which is always there for them.
   auto* views = new QWidget(this);
+  views->setObjectName(QStringLiteral("codeViewButtons"));
   auto* viewsLayout = new QHBoxLayout(views);
   viewsLayout->setContentsMargins(0, 0, 0, 0);
   viewsLayout->setSpacing(0);
@@ -106,8 +107,10 @@ CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget*
     return button;
   };
   m_procedureViewButton = viewButton("procedureView", Glyph::ProcedureView, QStringLiteral("Procedure View"));
-  m_fullModuleViewButton = viewButton("fullModuleView", Glyph::FullModuleView, QStringLiteral("Full Module View"));
+  m_fullModuleViewButton =
+      viewButton("fullModuleView", Glyph::FullModuleView, QStringLiteral("Full Module View"));
   m_fullModuleViewButton->setChecked(true);
+  views->setFixedSize(views->sizeHint());
   m_editor->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOn);
   m_editor->addScrollBarWidget(views, Qt::AlignLeft);
   connect(m_procedureViewButton, &QToolButton::clicked, this, [this] { setProcedureView(true); });

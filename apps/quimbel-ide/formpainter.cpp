@@ -510,9 +510,10 @@ void FormPainter::paintLabel(const Look& l) {
   const bool wrap = !valueOf(l.c, QStringLiteral("AutoSize"), false).toBool() ||
                     valueOf(l.c, QStringLiteral("WordWrap"), false).toBool();
   const bool mnemonic = valueOf(l.c, QStringLiteral("UseMnemonic"), true).toBool();
-  paintText(inner,
-            alignmentOf(l.c) | Qt::AlignTop | (wrap ? Qt::TextWordWrap : 0) | (mnemonic ? Qt::TextShowMnemonic : 0),
-            l.caption, l.fore, l.enabled);
+  paintText(
+      inner,
+      alignmentOf(l.c) | Qt::AlignTop | (wrap ? Qt::TextWordWrap : 0) | (mnemonic ? Qt::TextShowMnemonic : 0),
+      l.caption, l.fore, l.enabled);
 }
 
 void FormPainter::paintTextBox(const Look& l) {
@@ -557,7 +558,7 @@ void FormPainter::paintComboBox(const Look& l) {
   const int boxHeight = style == 1 ? std::min(l.r.height(), l.lineHeight + 6) : l.r.height();
   const QRect box(l.r.topLeft(), QSize(l.r.width(), boxHeight));
   const QRect inner = paintBorder(box, l.flat ? Edge::Flat : Edge::Sunken, window);
-  const QString text = !combo        ? QStringLiteral("c: [ ]")
+  const QString text = !combo       ? QStringLiteral("c: [ ]")
                        : style == 2 ? l.c.name()
                                     : textOf(l.c, QStringLiteral("Text"));
   int textRight = inner.right();
@@ -581,8 +582,8 @@ void FormPainter::paintComboBox(const Look& l) {
 }
 
 void FormPainter::paintListBox(const Look& l) {
-  const QRect inner =
-      paintBorder(l.r, l.flat ? Edge::Flat : Edge::Sunken, colorOf(l.c, QStringLiteral("BackColor"), Qt::white));
+  const QRect inner = paintBorder(l.r, l.flat ? Edge::Flat : Edge::Sunken,
+                                  colorOf(l.c, QStringLiteral("BackColor"), Qt::white));
   QStringList items = valueOf(l.c, QStringLiteral("List")).toStringList();
   // An empty list shows its name at design time.
   if (items.isEmpty() && l.kind == QLatin1StringView("ListBox")) items << l.c.name();
@@ -624,8 +625,8 @@ void FormPainter::paintCheckOrOption(const Look& l) {
       paintRaised(l.r, l.back);
     paintPicture(valueOf(l.c, QStringLiteral("Picture")), l.r.adjusted(3, 3, -3, -3 - l.lineHeight), false,
                  true);
-    paintText(l.r.adjusted(3, 3, -3, -3), Qt::AlignHCenter | Qt::AlignBottom | Qt::TextShowMnemonic, l.caption,
-              l.fore, l.enabled);
+    paintText(l.r.adjusted(3, 3, -3, -3), Qt::AlignHCenter | Qt::AlignBottom | Qt::TextShowMnemonic,
+              l.caption, l.fore, l.enabled);
     return;
   }
   m_painter.fillRect(l.r, l.back);
@@ -637,8 +638,8 @@ void FormPainter::paintCheckOrOption(const Look& l) {
   else
     paintOptionIndicator(box.adjusted(0, 0, -1, -1), value != 0, l.flat);
   const QRect text = right ? l.r.adjusted(0, 0, -kIndicator - 4, 0) : l.r.adjusted(kIndicator + 4, 0, 0, 0);
-  paintText(text, Qt::AlignLeft | Qt::AlignVCenter | Qt::TextShowMnemonic | Qt::TextWordWrap, l.caption, l.fore,
-            l.enabled);
+  paintText(text, Qt::AlignLeft | Qt::AlignVCenter | Qt::TextShowMnemonic | Qt::TextWordWrap, l.caption,
+            l.fore, l.enabled);
 }
 
 void FormPainter::paintPictureBox(const Look& l) {
@@ -737,8 +738,8 @@ void FormPainter::paintUnknown(const Look& l) {
   m_painter.drawRect(l.r.adjusted(0, 0, -1, -1));
   m_painter.setFont(vbFont({}));
   m_compatibleMetrics = false;
-  paintText(l.r.adjusted(3, 2, -2, -2), Qt::AlignLeft | Qt::AlignTop | Qt::TextWordWrap, l.kind + u' ' + l.c.name(),
-            kDarkShadow, true);
+  paintText(l.r.adjusted(3, 2, -2, -2), Qt::AlignLeft | Qt::AlignTop | Qt::TextWordWrap,
+            l.kind + u' ' + l.c.name(), kDarkShadow, true);
 }
 
 int FormPainter::alignmentOf(host::ControlImpl& control) {

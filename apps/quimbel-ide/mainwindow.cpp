@@ -33,15 +33,21 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
     : m_vbe(std::move(vbe)), m_ui(ui) {
   setObjectName(QStringLiteral("mainWindow"));
   setWindowIcon(icon(Glyph::Project));
-  // Bars and their buttons in the IDE's classic face whatever the desktop's theme: flat buttons that rise
-  // under the mouse and sink when pressed or on.
+  // The window's own bars and their buttons in the IDE's classic face whatever the desktop's theme: flat
+  // buttons that rise under the mouse and sink when pressed or on. Dialogs over the window keep their look.
   setStyleSheet(QStringLiteral(
-      "QMenuBar, QToolBar, QStatusBar { background: #d4d0c8; }"
-      "QToolBar { border: none; spacing: 0px; padding: 1px; }"
-      "QToolBar::separator { background: #808080; width: 1px; margin: 3px 3px; }"
-      "QToolButton { background: transparent; border: 1px solid transparent; padding: 2px; }"
-      "QToolButton:hover { border-color: #ffffff #808080 #808080 #ffffff; }"
-      "QToolButton:pressed, QToolButton:checked { border-color: #808080 #ffffff #ffffff #808080; }"));
+      "QMainWindow > QMenuBar, QMainWindow > QToolBar, QMainWindow > QStatusBar, #projectWindowBar"
+      " { background: #d4d0c8; }"
+      "QMainWindow > QToolBar, #projectWindowBar { border: none; spacing: 0px; padding: 1px; }"
+      "QMainWindow > QToolBar::separator { background: #808080; width: 1px; margin: 3px 3px; }"
+      "QMainWindow > QToolBar QToolButton, #projectWindowBar QToolButton, #codeViewButtons QToolButton"
+      " { background: transparent; border: 1px solid transparent; padding: 2px; }"
+      "QMainWindow > QToolBar QToolButton:hover, #projectWindowBar QToolButton:hover,"
+      " #codeViewButtons QToolButton:hover { border-color: #ffffff #808080 #808080 #ffffff; }"
+      "QMainWindow > QToolBar QToolButton:pressed, QMainWindow > QToolBar QToolButton:checked,"
+      " #projectWindowBar QToolButton:pressed, #projectWindowBar QToolButton:checked,"
+      " #codeViewButtons QToolButton:pressed, #codeViewButtons QToolButton:checked"
+      " { border-color: #808080 #ffffff #ffffff #808080; }"));
   if (!options.settingsPath.isEmpty())
     m_settings = std::make_unique<QSettings>(options.settingsPath, QSettings::IniFormat);
   // The code colours the user chose; without settings (a script's session) the IDE's own.
@@ -102,7 +108,8 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
           [this](const std::shared_ptr<host::ControlImpl>& control) {
             DesignerWindow* designer = m_windows->activeDesigner();
             if (!designer) return;
-            const bool root = control == std::static_pointer_cast<host::ControlImpl>(designer->form()->Root());
+            const bool root =
+                control == std::static_pointer_cast<host::ControlImpl>(designer->form()->Root());
             designer->selectControl(root ? nullptr : control);
           });
   connect(qApp, &QApplication::focusChanged, this, [this](QWidget* old, QWidget* now) {

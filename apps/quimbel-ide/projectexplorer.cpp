@@ -111,12 +111,14 @@ void ProjectExplorer::refresh() {
       bold.setBold(true);
       projectItem->setFont(0, bold);
     }
-    const auto addComponent = [&](QTreeWidgetItem* parent, const std::shared_ptr<host::ComponentImpl>& component) {
+    const auto addComponent = [&](QTreeWidgetItem* parent,
+                                  const std::shared_ptr<host::ComponentImpl>& component) {
       auto* item = new QTreeWidgetItem(parent);
       item->setText(0, fileLabel(component->Name(), component->filePath()));
       item->setIcon(0, componentIcon(component->Type()));
       item->setData(0, KindRole, ComponentNode);
-      item->setData(0, PointerRole, QVariant::fromValue<quintptr>(reinterpret_cast<quintptr>(component.get())));
+      item->setData(0, PointerRole,
+                    QVariant::fromValue<quintptr>(reinterpret_cast<quintptr>(component.get())));
       item->setData(0, Qt::UserRole, project->Name() + u'.' + component->Name());
     };
     if (!m_showFolders) {
@@ -256,7 +258,8 @@ void ProjectExplorer::contextMenuEvent(QContextMenuEvent* event) {
 
 // ---------------------------------------------------------------------------------------------------
 
-ProjectWindow::ProjectWindow(ProjectExplorer* explorer, QWidget* parent) : QWidget(parent), m_explorer(explorer) {
+ProjectWindow::ProjectWindow(ProjectExplorer* explorer, QWidget* parent)
+    : QWidget(parent), m_explorer(explorer) {
   setObjectName(QStringLiteral("projectWindow"));
   auto* bar = new QToolBar(this);
   bar->setObjectName(QStringLiteral("projectWindowBar"));

@@ -100,8 +100,8 @@ const PropertyText* propertyText(const QString& name) {
 
 /// "Text1(0) TextBox": how the object box names a control.
 QString objectLabel(host::ControlImpl& control) {
-  const QVariant index = control.hasProperty(QStringLiteral("Index")) ? control.property(QStringLiteral("Index"))
-                                                                        : QVariant();
+  const QVariant index =
+      control.hasProperty(QStringLiteral("Index")) ? control.property(QStringLiteral("Index")) : QVariant();
   QString name = control.name();
   if (index.isValid() && index.toInt() >= 0) name += QStringLiteral("(%1)").arg(index.toInt());
   return name + u' ' + bareClass(control.node() ? control.node()->className() : QString());
@@ -309,7 +309,8 @@ void PropertiesView::fillObjects() {
   });
   controls.insert(controls.begin(), root);
   for (const auto& control : controls) {
-    m_objects->addItem(objectLabel(*control), QVariant::fromValue<quintptr>(reinterpret_cast<quintptr>(control.get())));
+    m_objects->addItem(objectLabel(*control),
+                       QVariant::fromValue<quintptr>(reinterpret_cast<quintptr>(control.get())));
     if (control == m_control) m_objects->setCurrentIndex(m_objects->count() - 1);
   }
 }
@@ -328,7 +329,9 @@ void PropertiesView::rebuild() {
   }
   fillObjects();
   // Alphabetical, with (Name) on top, as the IDE lists them; by category, each category's rows under it.
-  const auto byName = [](const QString& a, const QString& b) { return a.compare(b, Qt::CaseInsensitive) < 0; };
+  const auto byName = [](const QString& a, const QString& b) {
+    return a.compare(b, Qt::CaseInsensitive) < 0;
+  };
   names.removeAll(QStringLiteral("Name"));
   std::sort(names.begin(), names.end(), byName);
   if (m_control || m_component) names.prepend(QStringLiteral("Name"));
@@ -381,7 +384,8 @@ void PropertiesView::rebuild() {
 }
 
 void PropertiesView::describeCurrent() {
-  const QTableWidgetItem* item = m_table->currentRow() >= 0 ? m_table->item(m_table->currentRow(), 1) : nullptr;
+  const QTableWidgetItem* item =
+      m_table->currentRow() >= 0 ? m_table->item(m_table->currentRow(), 1) : nullptr;
   const QString name = item ? item->data(PropertyRole).toString() : QString();
   if (name.isEmpty()) {
     m_description->clear();
@@ -396,7 +400,8 @@ void PropertiesView::describeCurrent() {
 void PropertiesView::refreshValues() {
   if (m_control && m_control->node()) {
     const QString className = m_control->node()->className();
-    if (m_objects->currentIndex() >= 0) m_objects->setItemText(m_objects->currentIndex(), objectLabel(*m_control));
+    if (m_objects->currentIndex() >= 0)
+      m_objects->setItemText(m_objects->currentIndex(), objectLabel(*m_control));
     for (int row = 0; row < m_table->rowCount(); ++row) {
       QTableWidgetItem* item = m_table->item(row, 1);
       const QString name = item->data(PropertyRole).toString();
@@ -464,7 +469,8 @@ bool PropertiesView::applyEdit(const QString& property, const QString& text) {
 QString PropertiesView::shownValue(const QString& property) const {
   for (int row = 0; row < m_table->rowCount(); ++row) {
     const QString name = m_table->item(row, 1)->data(PropertyRole).toString();
-    if (!name.isEmpty() && name.compare(property, Qt::CaseInsensitive) == 0) return m_table->item(row, 1)->text();
+    if (!name.isEmpty() && name.compare(property, Qt::CaseInsensitive) == 0)
+      return m_table->item(row, 1)->text();
   }
   return {};
 }

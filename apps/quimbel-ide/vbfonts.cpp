@@ -97,13 +97,15 @@ qreal fitText(const QPainter& painter, const QRect& area, int flags, const QStri
   if (compatible || text.isEmpty() || area.width() <= 0) return 1.0;
   const QFontMetricsF metrics(painter.font());
   const bool wrapped = flags & Qt::TextWordWrap;
-  // The lines the area holds (at least one): a wrapped caption may use them all.
-  const int lines = std::max(1, static_cast<int>(area.height() / metrics.lineSpacing()));
+  // The lines the area holds (at least one): a wrapped caption may use them all. A face whose leading is
+  // negative has lines closer than their height.
+  const qreal line = std::max(metrics.lineSpacing(), metrics.height());
+  const int lines = std::max(1, static_cast<int>(area.height() / line));
   const auto fits = [&](qreal scale) {
     const QRectF room(0, 0, area.width() / scale, 1e6);
     const QRectF needed = metrics.boundingRect(room, flags & ~Qt::AlignVertical_Mask, text);
     if (!wrapped) return needed.width() <= room.width();
-    return needed.height() <= lines * metrics.lineSpacing() + 0.5 && needed.width() <= room.width();
+    return needed.height() <= lines * line + 0.5 && needed.width() <= room.width();
   };
   if (fits(1.0)) return 1.0;
   constexpr qreal kNarrowest = 0.5;

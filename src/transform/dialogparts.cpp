@@ -61,10 +61,19 @@ void ProgressBarSink::setVisible(bool visible) {
   m_bar.repaint();
 }
 
-QString walkFailureText(const QString& message, const WalkFailure& failure) {
+QString walkFailureText(const QString& message, const WalkFailure& failure, ide::VBE& vbe, PROG_MODE scope) {
+  QString module = failure.module;
+  if (module.isEmpty() && failure.line > 0) {
+    try {
+      if (scope == PROG_PROCEDURE) module = activeCodePane(vbe)->CodeModule()->Name();
+      if (scope == PROG_MODULE) module = selectedComponent(vbe)->Name();
+    } catch (const std::exception&) {
+      // The module left the IDE: the message goes without its name.
+    }
+  }
   QString text = message;
-  if (!failure.module.isEmpty()) {
-    text += QStringLiteral("\n\nMódulo %1").arg(failure.module);
+  if (!module.isEmpty()) {
+    text += QStringLiteral("\n\nMódulo %1").arg(module);
     if (failure.line > 0) text += QStringLiteral(", linha %1").arg(failure.line);
     text += u'.';
   }

@@ -46,9 +46,10 @@ class ProgressBarSink final : public ProgressSink {
   QProgressBar& m_bar;
 };
 
-/// What a dialog says about a failure of its walk: `message` (the walk's fixed text), then the module and
-/// the code-window line it happened at, and why, in the dialog's language.
-QString walkFailureText(const QString& message, const WalkFailure& failure);
+/// What a dialog says about a failure of its walk over `scope`: `message` (the walk's fixed text), then the
+/// module (when the walk did not name it, the one the scope walks) and the code-window line it happened
+/// at, and why, in the dialog's language.
+QString walkFailureText(const QString& message, const WalkFailure& failure, ide::VBE& vbe, PROG_MODE scope);
 
 /// The fixed message of a failed run over `scope`: the indentation's (5130, 5129, 5128) for `indenting`,
 /// else the numbering's (5121, 5122, 5123).

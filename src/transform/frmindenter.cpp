@@ -100,7 +100,8 @@ frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings
 
   m_context.onFailure = [this](const WalkFailure& failure) {
     const int id = failure.messageId ? failure.messageId : walkMessageId(scope(), true);
-    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure), ide::mb::Exclamation, common::title());
+    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope()), ide::mb::Exclamation,
+                                  common::title());
   };
 
   m_txtSpaces->setText(m_settings.value(common::setting::Indentation).trimmed());
@@ -176,7 +177,8 @@ void frmIndenter::walk(PROG_MODE scope, qint32 unit) {
     // The walk's message with the exclamation icon, naming the module and line, as the own walks report.
     m_numIndentError = m_numIndent->Failed.connect([this, scope](const WalkFailure& failure) {
       const int id = failure.messageId ? failure.messageId : walkMessageId(scope, true);
-      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure), ide::mb::Exclamation, common::title());
+      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope), ide::mb::Exclamation,
+                                    common::title());
       m_context.Cancel();
     });
     m_numIndent->DoIt(scope, &m_bar, kOneCommandStart, kOneCommandInterval, spaceMode(), unit, true);

@@ -108,7 +108,8 @@ frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& sett
   // not reported.
   m_context.onFailure = [this](const WalkFailure& failure) {
     const int id = failure.messageId ? failure.messageId : walkMessageId(scope(), false);
-    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure), ide::mb::Exclamation, common::title());
+    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope()), ide::mb::Exclamation,
+                                  common::title());
   };
 
   const NumberingOptions stored = storedNumbering(m_settings);
@@ -193,7 +194,8 @@ void frmLinNumbers::walk(PROG_MODE scope, bool add) {
     m_numIndentError = m_numIndent->Failed.connect([this, scope](const WalkFailure& failure) {
       const int id = failure.messageId ? failure.messageId
                                        : walkMessageId(scope, failure.operation.startsWith(u"Indent"));
-      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure), ide::mb::Exclamation, common::title());
+      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope), ide::mb::Exclamation,
+                                    common::title());
       m_context.Cancel();
     });
     m_numIndent->DoIt(scope, &m_bar, m_startNumber, m_interval, false, 1, add);

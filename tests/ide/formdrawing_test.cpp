@@ -53,9 +53,10 @@ QStringList footer(const QString& name) {
 QStringList control(const QString& kind, const QString& name, QRect twips, const QStringList& values) {
   QStringList lines{u"   Begin %1 %2 "_qs.arg(kind, name)};
   lines << values;
-  lines << u"      Height          =   %1"_qs.arg(twips.height()) << u"      Left            =   %1"_qs.arg(twips.x())
-        << u"      Top             =   %1"_qs.arg(twips.y()) << u"      Width           =   %1"_qs.arg(twips.width())
-        << u"   End"_qs;
+  lines << u"      Height          =   %1"_qs.arg(twips.height())
+        << u"      Left            =   %1"_qs.arg(twips.x())
+        << u"      Top             =   %1"_qs.arg(twips.y())
+        << u"      Width           =   %1"_qs.arg(twips.width()) << u"   End"_qs;
   return lines;
 }
 
@@ -93,9 +94,9 @@ struct Face {
   const char* name;
   bool compatible;  // a stand-in with the font's metrics is installed with the IDE
 };
-const Face kFaces[] = {{"MS Sans Serif", false}, {"Microsoft Sans Serif", false}, {"Segoe UI", false},
-                       {"Tahoma", true},         {"Arial", true},                 {"Times New Roman", true},
-                       {"Courier New", true},    {"Verdana", false}};
+const Face kFaces[] = {
+    {"MS Sans Serif", false}, {"Microsoft Sans Serif", false}, {"Segoe UI", false},   {"Tahoma", true},
+    {"Arial", true},          {"Times New Roman", true},       {"Courier New", true}, {"Verdana", false}};
 const double kSizes[] = {8.25, 12, 18};
 
 TEST_F(FormDrawingTest, EveryFontIsDrawnAtItsSizeInTheRoomItsLabelGives) {

@@ -6,10 +6,10 @@
 #include "codeeditor.h"
 #include "codewindow.h"
 #include "commandbarview.h"
+#include "designerview.h"
 #include "host/model/events.h"
 #include "idecommands.h"
 #include "idefixture.h"
-#include "designerview.h"
 #include "projectexplorer.h"
 #include "propertiesview.h"
 #include "windowmanager.h"
@@ -20,15 +20,16 @@
 #include <QDockWidget>
 #include <QLabel>
 #include <QMdiArea>
+#include <QMdiSubWindow>
+#include <QMenu>
 #include <QPlainTextEdit>
 #include <QStatusBar>
 #include <QTabBar>
 #include <QTableWidget>
-#include <QToolButton>
-#include <QMdiSubWindow>
-#include <QMenu>
 #include <QTemporaryDir>
 #include <QTest>
+#include <QTextBlock>
+#include <QToolButton>
 #include <QTreeWidgetItem>
 
 namespace desktop {
@@ -345,7 +346,8 @@ TEST_F(MainWindowTest, TheProjectWindowIsTitledByTheGroupAndTogglesItsFolders) {
   EXPECT_EQ(m_window->findChild<QDockWidget*>(u"projectDock"_qs)->windowTitle(), u"Project - Demo"_qs);
   EXPECT_EQ(m_window->statusBar()->currentMessage(), QString()) << "opened by the fixture, not the menu";
   ASSERT_TRUE(m_window->commands().open(m_copy.groupFile(), true));
-  EXPECT_EQ(m_window->statusBar()->currentMessage(), u"Opened Demo.vbg"_qs) << "the file name, never its folder";
+  EXPECT_EQ(m_window->statusBar()->currentMessage(), u"Opened Demo.vbg"_qs)
+      << "the file name, never its folder";
   settle();
   auto* window = m_window->findChild<ProjectWindow*>(u"projectWindow"_qs);
   ASSERT_TRUE(window);
@@ -362,11 +364,11 @@ TEST_F(MainWindowTest, TheProjectWindowIsTitledByTheGroupAndTogglesItsFolders) {
   // Without folders the components stand under their project, by name.
   window->toggleFolders()->trigger();
   QTreeWidgetItem* loja = explorer.topLevelItem(0);
-  EXPECT_EQ(loja->child(0)->text(0), u"basQMInf000001 (basQMInf000001.bas)"_qs.left(loja->child(0)->text(0).size()));
+  EXPECT_EQ(loja->child(0)->childCount(), 0) << "no folder";
   for (int i = 1; i < loja->childCount(); ++i)
     EXPECT_LT(loja->child(i - 1)->text(0).compare(loja->child(i)->text(0), Qt::CaseInsensitive), 0);
   window->toggleFolders()->trigger();
-  EXPECT_EQ(loja->child(0)->text(0), u"Forms"_qs) << "the tree was rebuilt";
+  EXPECT_EQ(explorer.topLevelItem(0)->child(0)->text(0), u"Forms"_qs);
   // The first project stays in view while the selected item leaves room for it.
   m_window->show();
   explorer.setCurrentItem(explorer.itemOf(component(u"Loja"_qs, u"ctlPainel"_qs).get()));
@@ -401,7 +403,8 @@ TEST_F(MainWindowTest, ThePropertiesWindowHasItsObjectBoxTabsAndDescription) {
   QStringList categories;
   for (int row = 0; row < grid->rowCount(); ++row)
     if (grid->columnSpan(row, 0) == 2) categories << grid->item(row, 0)->text();
-  EXPECT_TRUE(categories.contains(u"Appearance"_qs) && categories.contains(u"Position"_qs)) << categories.join(u',').toStdString();
+  EXPECT_TRUE(categories.contains(u"Appearance"_qs) && categories.contains(u"Position"_qs))
+      << categories.join(u',').toStdString();
   EXPECT_EQ(properties.shownValue(u"Caption"_qs), caption);
   // The description pane names the current property and says what it is.
   for (int row = 0; row < grid->rowCount(); ++row)

@@ -276,9 +276,9 @@ TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScopeWithItsModuleAndL
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.txtInitial()->setText(u"2147483647"_qs);
   dialog.cmdAdd()->click();
-  EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5123) + u"\n\nMódulo %1, linha 4. (erro 6)"_qs.arg(
-                                                                scene.first->Name()),
-                                                            ide::mb::Exclamation}}));
+  EXPECT_EQ(scene.boxes(),
+            (std::vector<Box>{{text(5123) + u"\n\nMódulo %1, linha 4. (erro 6)"_qs.arg(scene.first->Name()),
+                               ide::mb::Exclamation}}));
   EXPECT_EQ(linesOf(*scene.first)[2], u"2147483647 If x Then"_qs);
   EXPECT_EQ(linesOf(*scene.first)[3], kFirst[3]);
 }
@@ -528,10 +528,11 @@ TEST(IndentationDialog, ALineTheOneCommandRouteWouldGrowTooLongIsNamedInTheWalks
   frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.opIndent(1)->setChecked(true);
   dialog.cmdIndent()->click();
-  EXPECT_EQ(scene.boxes(),
-            (std::vector<Box>{{text(5129) + u"\n\nMódulo %1, linha 3. A linha passaria de 1023 caracteres."_qs.arg(
-                                                module->Name()),
-                               ide::mb::Exclamation}}));
+  EXPECT_EQ(
+      scene.boxes(),
+      (std::vector<Box>{{text(5129) + u"\n\nMódulo %1, linha 3. A linha passaria de 1023 caracteres."_qs.arg(
+                                          module->Name()),
+                         ide::mb::Exclamation}}));
   EXPECT_EQ(linesOf(*module)[2].size(), 1023);
 }
 
