@@ -9,7 +9,7 @@ packages=(
   dpkg-dev file
   qt6-base-dev
   xvfb xauth fonts-dejavu-core
-  fonts-wine fonts-liberation
+  fonts-wine fonts-liberation fonts-crosextra-carlito fonts-crosextra-caladea
   libsqlcipher-dev sqlcipher
   libgsf-1-dev python3-olefile
   libgtest-dev libgmock-dev libbenchmark-dev

@@ -90,7 +90,7 @@ void AddInManagerDialog::showChoice() {
   const QSignalBlocker blockStartup(m_onStartup);
   m_loaded->setChecked(choice.loaded);
   m_onStartup->setChecked(choice.onStartup);
-  m_description->setText(QStringLiteral("%1\n%2").arg(choice.addIn->ProgId(), choice.addIn->libraryPath()));
+  m_description->setText(choice.addIn->details());
 }
 
 void AddInManagerDialog::takeChoice() {

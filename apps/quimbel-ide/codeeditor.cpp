@@ -13,6 +13,8 @@
 #include <QScrollBar>
 #include <QTextBlock>
 
+#include <algorithm>
+
 namespace desktop {
 
 /// The grey bar left of the code, where the IDE shows breakpoints and the current statement.
@@ -150,6 +152,42 @@ void CodeEditor::resizeEvent(QResizeEvent* event) {
   const QRect area = contentsRect();
   m_margin->setGeometry(QRect(area.left(), area.top(), kMarginWidth, area.height()));
   m_highlighter->colourVisible();
+}
+
+void CodeEditor::setSeparators(std::vector<int> lines) {
+  std::sort(lines.begin(), lines.end());
+  if (lines == m_separators) return;
+  m_separators = std::move(lines);
+  viewport()->update();
+}
+
+void CodeEditor::showLines(int first, int last) {
+  if (std::pair(first, last) == m_shown) return;
+  m_shown = {first, last};
+  const bool all = first <= 0 && last <= 0;
+  for (QTextBlock block = document()->firstBlock(); block.isValid(); block = block.next()) {
+    const int line = block.blockNumber() + 1;
+    block.setVisible(all || (line >= first && line <= last));
+  }
+  // The layout learns of the hidden blocks only when their contents are marked changed.
+  document()->markContentsDirty(0, document()->characterCount());
+  viewport()->update();
+  m_margin->update();
+}
+
+void CodeEditor::paintEvent(QPaintEvent* event) {
+  QPlainTextEdit::paintEvent(event);
+  // In the full module view a grey line parts each procedure from what stands above it.
+  if (m_separators.empty() || m_shown != std::pair(0, 0)) return;
+  QPainter painter(viewport());
+  painter.setPen(QColor(0x80, 0x80, 0x80));
+  const QPointF offset = contentOffset();
+  for (QTextBlock block = firstVisibleBlock(); block.isValid(); block = block.next()) {
+    const QRectF box = blockBoundingGeometry(block).translated(offset);
+    if (box.top() > event->rect().bottom()) break;
+    if (std::binary_search(m_separators.begin(), m_separators.end(), block.blockNumber() + 1))
+      painter.drawLine(QPointF(0, box.top()), QPointF(viewport()->width(), box.top()));
+  }
 }
 
 void CodeEditor::paintMargin(QPaintEvent* event) {

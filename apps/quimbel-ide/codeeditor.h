@@ -10,6 +10,8 @@
 #include <QPlainTextEdit>
 
 #include <functional>
+#include <utility>
+#include <vector>
 
 namespace host {
 class WindowSystemImpl;
@@ -34,6 +36,13 @@ class CodeEditor final : public QPlainTextEdit {
   int marginWidth() const { return kMarginWidth; }
   /// Takes the normal and selection colours of the code colour scheme.
   void applyColours();
+  /// The lines (1-based) with a procedure separator above them, as the full module view draws.
+  void setSeparators(std::vector<int> lines);
+  const std::vector<int>& separators() const { return m_separators; }
+  /// Shows only lines `first` to `last` (1-based), as the procedure view does; (0, 0) shows every line.
+  void showLines(int first, int last);
+  /// The lines shown: (0, 0) when every line is.
+  std::pair<int, int> shownLines() const { return m_shown; }
 
  Q_SIGNALS:
   void contextMenuWanted(const QPoint& globalPosition);
@@ -43,6 +52,7 @@ class CodeEditor final : public QPlainTextEdit {
   void keyPressEvent(QKeyEvent* event) override;
   void contextMenuEvent(QContextMenuEvent* event) override;
   void resizeEvent(QResizeEvent* event) override;
+  void paintEvent(QPaintEvent* event) override;
   void inputMethodEvent(QInputMethodEvent* event) override;
   void insertFromMimeData(const QMimeData* source) override;
 
@@ -57,6 +67,8 @@ class CodeEditor final : public QPlainTextEdit {
   host::WindowSystemImpl* m_windows = nullptr;
   std::function<ide::HWnd()> m_window;
   std::function<void()> m_beforeInput;
+  std::vector<int> m_separators;  // sorted
+  std::pair<int, int> m_shown{0, 0};
 };
 
 }  // namespace desktop

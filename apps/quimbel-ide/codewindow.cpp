@@ -6,10 +6,15 @@
 #include "host/files/controlevents.h"
 #include "host/model/designer.h"
 #include "host/model/objects.h"
+#include "icons.h"
+#include "qtplatform.h"
 
+#include <QButtonGroup>
 #include <QComboBox>
 #include <QHBoxLayout>
+#include <QScrollBar>
 #include <QSet>
+#include <QToolButton>
 #include <QVBoxLayout>
 
 #include <algorithm>
@@ -78,6 +83,38 @@ CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget*
   layout->setSpacing(0);
   layout->addLayout(top);
   layout->addWidget(m_editor);
+
+  // The two view buttons stand left of the horizontal scroll bar, which is always there for them.
+  auto* views = new QWidget(this);
+  views->setObjectName(QStringLiteral("codeViewButtons"));
+  auto* viewsLayout = new QHBoxLayout(views);
+  viewsLayout->setContentsMargins(0, 0, 0, 0);
+  viewsLayout->setSpacing(0);
+  auto* group = new QButtonGroup(views);
+  const auto viewButton = [&](const char* name, Glyph glyph, const QString& tip) {
+    auto* button = new QToolButton(views);
+    button->setObjectName(QLatin1StringView(name));
+    button->setIcon(icon(glyph));
+    button->setToolTip(tip);
+    button->setCheckable(true);
+    button->setAutoRaise(true);
+    button->setFocusPolicy(Qt::NoFocus);
+    const int side = m_editor->horizontalScrollBar()->sizeHint().height();
+    button->setFixedSize(side + 2, side);
+    button->setIconSize(QSize(side - 4, side - 4));
+    group->addButton(button);
+    viewsLayout->addWidget(button);
+    return button;
+  };
+  m_procedureViewButton = viewButton("procedureView", Glyph::ProcedureView, QStringLiteral("Procedure View"));
+  m_fullModuleViewButton =
+      viewButton("fullModuleView", Glyph::FullModuleView, QStringLiteral("Full Module View"));
+  m_fullModuleViewButton->setChecked(true);
+  views->setFixedSize(views->sizeHint());
+  m_editor->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOn);
+  m_editor->addScrollBarWidget(views, Qt::AlignLeft);
+  connect(m_procedureViewButton, &QToolButton::clicked, this, [this] { setProcedureView(true); });
+  connect(m_fullModuleViewButton, &QToolButton::clicked, this, [this] { setProcedureView(false); });
 
   auto paneOf = window->pane();
   auto module = std::static_pointer_cast<host::CodeModuleImpl>(paneOf->CodeModule());
@@ -237,6 +274,46 @@ void CodeWindow::showProcedureOfCaret() {
   }
   showItem(m_procedures, item, QVariantList{name, static_cast<int>(kind)});
   m_filling = false;
+  updateView();
+}
+
+void CodeWindow::setProcedureView(bool procedureView) {
+  m_procedureView = procedureView;
+  (procedureView ? m_procedureViewButton : m_fullModuleViewButton)->setChecked(true);
+  m_binding->flush();
+  showProcedureOfCaret();
+}
+
+void CodeWindow::updateView() {
+  auto& text = m_binding->module()->text();
+  try {
+    if (m_separatorsRevision != m_shownRevision) {
+      m_separatorsRevision = m_shownRevision;
+      std::vector<int> lines;
+      for (const host::ProcInfo& procedure : text.procedures()) {
+        const int start = text.procStartLine(procedure.name, procedure.kind);
+        if (start > 1) lines.push_back(start);
+      }
+      m_editor->setSeparators(std::move(lines));
+    }
+    if (!m_procedureView) {
+      m_editor->showLines(0, 0);
+      return;
+    }
+    const int line = std::min(m_binding->pane()->selection().startLine, std::max(1, text.countOfLines()));
+    ide::ProcKind kind = ide::ProcKind::Proc;
+    const QString name = text.procOfLine(line, kind);
+    if (name.isEmpty()) {
+      m_editor->showLines(1, std::max(1, text.countOfDeclarationLines()));
+    } else {
+      const int start = text.procStartLine(name, kind);
+      m_editor->showLines(start, start + text.procCountLines(name, kind) - 1);
+    }
+  } catch (const ide::Error& error) {
+    // A module the index cannot answer for is shown whole.
+    qCDebug(lcIde) << "the code window shows its whole module:" << error.description();
+    m_editor->showLines(0, 0);
+  }
 }
 
 void CodeWindow::chooseObject(const QString& object) {

@@ -5,7 +5,9 @@
 // the procedures that are no object's event procedures; for an object, its events, those that have a
 // procedure in bold. Choosing an event without a procedure writes its empty procedure at the end of the
 // module and puts the caret in it; choosing an object goes to its first event procedure, or writes the
-// procedure of its default event, as the IDE does. Both boxes show where the caret is.
+// procedure of its default event, as the IDE does. Both boxes show where the caret is. The Procedure View
+// and Full Module View buttons left of the horizontal scroll bar show the procedure at the caret alone, or
+// the whole module with a line above each procedure.
 #pragma once
 
 #include "host/model/objects.h"
@@ -17,6 +19,7 @@
 #include <vector>
 
 class QComboBox;
+class QToolButton;
 
 namespace desktop {
 
@@ -44,6 +47,10 @@ class CodeWindow final : public QWidget {
   std::shared_ptr<host::CodePaneImpl> pane() const;
   QComboBox* objectList() const { return m_objects; }
   QComboBox* procedureList() const { return m_procedures; }
+  QToolButton* procedureViewButton() const { return m_procedureViewButton; }
+  QToolButton* fullModuleViewButton() const { return m_fullModuleViewButton; }
+  /// Shows the procedure at the caret alone, or the whole module.
+  void setProcedureView(bool procedureView);
 
   /// The objects of the module, in the Object box's order (without "(General)").
   std::vector<CodeObject> objects() const;
@@ -63,6 +70,8 @@ class CodeWindow final : public QWidget {
   void fillObjects();
   void fillProcedures(const QString& object);
   void showProcedureOfCaret();
+  /// The separators of the module's procedures, and the lines the procedure view shows.
+  void updateView();
   /// The object and event a procedure belongs to; an empty object for a general procedure.
   std::pair<QString, QString> ownerOf(const QString& procedure, const std::vector<CodeObject>& objects) const;
   /// Puts the caret at the start of the body of a procedure (an event procedure written first when missing).
@@ -78,6 +87,10 @@ class CodeWindow final : public QWidget {
   QString m_proceduresOf;  // the object whose procedures the Procedure box holds
   bool m_filling = false;
   int m_shownRevision = -1;
+  int m_separatorsRevision = -1;
+  bool m_procedureView = false;
+  QToolButton* m_procedureViewButton;
+  QToolButton* m_fullModuleViewButton;
 };
 
 }  // namespace desktop

@@ -20,15 +20,6 @@ namespace {
 constexpr int kGrid = 8;  // 120 twips
 constexpr int kHandle = 6;
 
-bool isMenu(const host::FormNode& node) {
-  return bareClass(node.className()) == QLatin1StringView("Menu");
-}
-
-bool isLightweight(const QString& bare) {
-  return bare == QLatin1StringView("Label") || bare == QLatin1StringView("Image") ||
-         bare == QLatin1StringView("Shape") || bare == QLatin1StringView("Line");
-}
-
 /// The eight grab handles: the corners and the middles of the sides, top row first.
 std::array<QPoint, 8> handleCenters(const QRect& r) {
   return {r.topLeft(),
@@ -158,33 +149,7 @@ void FormCanvas::paintEvent(QPaintEvent*) {
   // The grid shows on a form's client area, where controls are placed.
   const QString rootClass = bareClass(m_form->description().root().className());
   formPainter.paintWindow(rootClass == QLatin1StringView("MDIForm") ? 0 : kGrid);
-  const QRect client(m_geometry.clientOrigin(), m_geometry.clientSize());
-
-  // Controls: lightweight ones below windowed ones, as the form draws them; containers before what they
-  // hold, which is clipped to them.
-  std::function<void(host::FormNode*, bool)> paintChildren = [&](host::FormNode* node, bool lightweight) {
-    for (host::FormNode* child : node->children()) {
-      if (isMenu(*child)) continue;
-      const QString bare = bareClass(child->className());
-      auto control = m_form->control(child);
-      if (isLightweight(bare) == lightweight) {
-        painter.save();
-        painter.setClipRect(node->parent() ? rectOf(m_form->control(node)) : client);
-        formPainter.paintControl(control, rectOf(control));
-        painter.restore();
-      }
-      if (!lightweight && m_geometry.isContainer(child)) {
-        painter.save();
-        painter.setClipRect(
-            rectOf(control).intersected(node->parent() ? rectOf(m_form->control(node)) : client));
-        paintChildren(child, true);
-        paintChildren(child, false);
-        painter.restore();
-      }
-    }
-  };
-  paintChildren(&m_form->description().root(), true);
-  paintChildren(&m_form->description().root(), false);
+  formPainter.paintControls();
 
   // Selection: the outline being dragged, and the grab handles.
   auto selected = m_selected.lock();

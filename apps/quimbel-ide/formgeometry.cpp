@@ -36,11 +36,16 @@ std::optional<double> writtenNumber(host::ControlImpl& control, const QString& n
   return ok ? std::optional(value) : std::nullopt;
 }
 
+}  // namespace
+
 bool isMenu(const host::FormNode& node) {
   return bareClass(node.className()) == QLatin1StringView("Menu");
 }
 
-}  // namespace
+bool isLightweight(const QString& bare) {
+  return bare == QLatin1StringView("Label") || bare == QLatin1StringView("Image") ||
+         bare == QLatin1StringView("Shape") || bare == QLatin1StringView("Line");
+}
 
 QString bareClass(const QString& className) {
   const qsizetype dot = className.indexOf(u'.');

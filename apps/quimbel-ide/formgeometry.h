@@ -28,6 +28,10 @@ inline int twipsOf(int pixels) {
 
 /// "TextBox" for "VB.TextBox", "ctlPainel" for "Loja.ctlPainel".
 QString bareClass(const QString& className);
+/// Menus are held by the form but drawn in its menu bar, not as controls.
+bool isMenu(const host::FormNode& node);
+/// Controls without a window of their own (labels, images, shapes, lines): drawn below the others.
+bool isLightweight(const QString& bareClassName);
 /// A property of a control, or `fallback` when the control has none or it cannot be read.
 QVariant valueOf(host::ControlImpl& control, const QString& name, const QVariant& fallback = {});
 double numberOf(host::ControlImpl& control, const QString& name, double fallback);

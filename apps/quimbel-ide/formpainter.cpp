@@ -7,6 +7,8 @@
 #include <QPainter>
 #include <QPainterPath>
 
+#include <functional>
+
 #include <algorithm>
 
 namespace desktop {
@@ -110,15 +112,25 @@ QRect FormPainter::paintBorder(const QRect& r, Edge edge, const QColor& fill) {
 
 void FormPainter::paintText(const QRect& area, int flags, const QString& text, const QColor& color,
                             bool enabled) {
+  // A stand-in wider than the font the form was designed with is narrowed to the room the text had.
+  const qreal scale = fitText(m_painter, area, flags, text, m_compatibleMetrics);
+  QRect room = area;
+  m_painter.save();
+  if (scale < 1.0) {
+    m_painter.translate(area.left(), 0);
+    m_painter.scale(scale, 1.0);
+    room = QRect(0, area.top(), static_cast<int>(area.width() / scale), area.height());
+  }
   if (!enabled) {
     // Disabled text is etched: white, and grey above it.
     m_painter.setPen(kHighlight);
-    m_painter.drawText(area.translated(1, 1), flags, text);
+    m_painter.drawText(room.translated(1, 1), flags, text);
     m_painter.setPen(kShadow);
   } else {
     m_painter.setPen(color);
   }
-  m_painter.drawText(area, flags, text);
+  m_painter.drawText(room, flags, text);
+  m_painter.restore();
 }
 
 void FormPainter::paintPicture(const QVariant& value, const QRect& area, bool stretch, bool centered) {
@@ -348,6 +360,7 @@ void FormPainter::paintWindow(int grid) {
     const QRect menuBar(client.left(), client.top() - frame.menuHeight, client.width(), frame.menuHeight);
     m_painter.fillRect(menuBar, face);
     m_painter.setFont(vbFont({}));
+    m_compatibleMetrics = false;
     int x = menuBar.left() + 6;
     for (host::FormNode* child : m_geometry.form()->description().root().children()) {
       if (bareClass(child->className()) != QLatin1StringView("Menu")) continue;
@@ -374,240 +387,369 @@ void FormPainter::paintWindow(int grid) {
 // ---------------------------------------------------------------------------------------------------
 // Controls
 
-void FormPainter::paintControl(const std::shared_ptr<host::ControlImpl>& control, const QRect& r) {
-  host::ControlImpl& c = *control;
-  const QString kind = bareClass(c.liveNode().className());
-  const QColor face = vbColor(kButtonFace);
-  const QColor back = colorOf(c, QStringLiteral("BackColor"), face);
-  const QColor fore = colorOf(c, QStringLiteral("ForeColor"), Qt::black);
-  const bool enabled = valueOf(c, QStringLiteral("Enabled"), true).toBool();
-  const bool flat = numberOf(c, QStringLiteral("Appearance"), 1) == 0;
-  const QString caption = textOf(c, QStringLiteral("Caption"));
-  m_painter.setFont(vbFont(c.font()));
-  const int lineHeight = m_painter.fontMetrics().height();
-
-  if (kind == QLatin1StringView("CommandButton")) {
-    QRect inner = r;
-    if (valueOf(c, QStringLiteral("Default"), false).toBool()) {
-      m_painter.setPen(Qt::black);
-      m_painter.drawRect(r.adjusted(0, 0, -1, -1));
-      inner = r.adjusted(1, 1, -1, -1);
-    }
-    if (flat) {
-      paintBorder(inner, Edge::Flat, back);
-    } else {
-      paintRaised(inner, back);
-    }
-    const QRect area = inner.adjusted(3, 3, -3, -3);
-    if (numberOf(c, QStringLiteral("Style"), 0) == 1) {
-      const QRect pictureArea = caption.isEmpty() ? area : area.adjusted(0, 0, 0, -lineHeight);
-      paintPicture(valueOf(c, QStringLiteral("Picture")), pictureArea, false, true);
-      paintText(area, Qt::AlignHCenter | Qt::AlignBottom | Qt::TextShowMnemonic | Qt::TextWordWrap, caption,
-                fore, enabled);
-    } else {
-      paintText(area, Qt::AlignCenter | Qt::TextShowMnemonic | Qt::TextWordWrap, caption, fore, enabled);
-    }
-  } else if (kind == QLatin1StringView("Label")) {
-    if (numberOf(c, QStringLiteral("BackStyle"), 1) != 0) m_painter.fillRect(r, back);
-    const Edge edge = edgeOf(c, 0);
-    const QRect inner = edge == Edge::None ? r : paintBorder(r, edge, back);
-    const int alignment = static_cast<int>(numberOf(c, QStringLiteral("Alignment"), 0));
-    const int horizontal = alignment == 1   ? Qt::AlignRight
-                           : alignment == 2 ? Qt::AlignHCenter
-                                            : Qt::AlignLeft;
-    // A label breaks its caption at words unless it sizes itself to one line (AutoSize without WordWrap).
-    const bool wrap = !valueOf(c, QStringLiteral("AutoSize"), false).toBool() ||
-                      valueOf(c, QStringLiteral("WordWrap"), false).toBool();
-    const bool mnemonic = valueOf(c, QStringLiteral("UseMnemonic"), true).toBool();
-    paintText(
-        inner,
-        horizontal | Qt::AlignTop | (wrap ? Qt::TextWordWrap : 0) | (mnemonic ? Qt::TextShowMnemonic : 0),
-        caption, fore, enabled);
-  } else if (kind == QLatin1StringView("TextBox")) {
-    QRect inner = paintBorder(r, edgeOf(c, 1), colorOf(c, QStringLiteral("BackColor"), Qt::white));
-    const bool multiLine = valueOf(c, QStringLiteral("MultiLine"), false).toBool();
-    const int bars = multiLine ? static_cast<int>(numberOf(c, QStringLiteral("ScrollBars"), 0)) : 0;
-    const bool vertical = bars == 2 || bars == 3;
-    const bool horizontal = bars == 1 || bars == 3;
-    if (vertical)
-      paintScrollBar(m_painter,
-                     QRect(inner.right() - kScrollBarWidth + 1, inner.top(), kScrollBarWidth,
-                           inner.height() - (horizontal ? kScrollBarWidth : 0)),
-                     Qt::Vertical);
-    if (horizontal)
-      paintScrollBar(m_painter,
-                     QRect(inner.left(), inner.bottom() - kScrollBarWidth + 1,
-                           inner.width() - (vertical ? kScrollBarWidth : 0), kScrollBarWidth),
-                     Qt::Horizontal);
-    if (vertical && horizontal)
-      m_painter.fillRect(QRect(inner.right() - kScrollBarWidth + 1, inner.bottom() - kScrollBarWidth + 1,
-                               kScrollBarWidth, kScrollBarWidth),
-                         face);
-    inner.adjust(1, 1, -(vertical ? kScrollBarWidth : 0), -(horizontal ? kScrollBarWidth : 0));
-    QString text = textOf(c, QStringLiteral("Text"));
-    const QString password = textOf(c, QStringLiteral("PasswordChar"));
-    if (!password.isEmpty() && !multiLine) text = QString(text.size(), password.front());
-    if (!multiLine) text = text.section(QStringLiteral("\r\n"), 0, 0);
-    text.replace(QStringLiteral("\r\n"), QStringLiteral("\n"));
-    const int alignment = static_cast<int>(numberOf(c, QStringLiteral("Alignment"), 0));
-    const int horizontalFlag = alignment == 1   ? Qt::AlignRight
-                               : alignment == 2 ? Qt::AlignHCenter
-                                                : Qt::AlignLeft;
-    m_painter.save();
-    m_painter.setClipRect(inner, Qt::IntersectClip);
-    // A multi-line box without a horizontal scroll bar breaks its lines at words.
-    paintText(inner.adjusted(1, 0, -1, 0),
-              horizontalFlag | Qt::AlignTop | (multiLine && !horizontal ? Qt::TextWordWrap : 0), text,
-              colorOf(c, QStringLiteral("ForeColor"), Qt::black), enabled);
-    m_painter.restore();
-  } else if (kind == QLatin1StringView("ComboBox") || kind == QLatin1StringView("DriveListBox")) {
-    const int style =
-        kind == QLatin1StringView("ComboBox") ? static_cast<int>(numberOf(c, QStringLiteral("Style"), 0)) : 0;
-    const QColor window = colorOf(c, QStringLiteral("BackColor"), Qt::white);
-    const int boxHeight = style == 1 ? std::min(r.height(), lineHeight + 6) : r.height();
-    const QRect box(r.topLeft(), QSize(r.width(), boxHeight));
-    const QRect inner = paintBorder(box, flat ? Edge::Flat : Edge::Sunken, window);
-    QString text = kind == QLatin1StringView("DriveListBox") ? QStringLiteral("c: [ ]")
-                   : style == 2                              ? c.name()
-                                                             : textOf(c, QStringLiteral("Text"));
-    int textRight = inner.right();
-    if (style != 1) {
-      const QRect button(inner.right() - kScrollBarWidth + 1, inner.top(), kScrollBarWidth, inner.height());
-      paintRaised(button, face);
-      const QPoint m = button.center();
-      m_painter.setPen(Qt::NoPen);
-      m_painter.setBrush(Qt::black);
-      m_painter.drawPolygon(QPolygon({m + QPoint(-3, -1), m + QPoint(3, -1), m + QPoint(0, 2)}));
-      m_painter.setBrush(Qt::NoBrush);
-      textRight = button.left() - 1;
-    }
-    paintText(QRect(inner.left() + 2, inner.top(), textRight - inner.left() - 2, inner.height()),
-              Qt::AlignLeft | Qt::AlignVCenter, text, fore, enabled);
-    if (style == 1 && r.height() > boxHeight) {
-      const QRect list(r.left(), box.bottom() + 1, r.width(), r.height() - boxHeight);
-      paintList(paintBorder(list, flat ? Edge::Flat : Edge::Sunken, window), c,
-                valueOf(c, QStringLiteral("List")).toStringList(), false);
-    }
-  } else if (kind == QLatin1StringView("ListBox") || kind == QLatin1StringView("FileListBox") ||
-             kind == QLatin1StringView("DirListBox")) {
-    const QRect inner =
-        paintBorder(r, flat ? Edge::Flat : Edge::Sunken, colorOf(c, QStringLiteral("BackColor"), Qt::white));
-    QStringList items = valueOf(c, QStringLiteral("List")).toStringList();
-    // An empty list shows its name at design time.
-    if (items.isEmpty() && kind == QLatin1StringView("ListBox")) items << c.name();
-    if (kind == QLatin1StringView("DirListBox")) items = {QStringLiteral("c:\\")};
-    paintList(inner, c, items, numberOf(c, QStringLiteral("Style"), 0) == 1);
-  } else if (kind == QLatin1StringView("Frame")) {
-    m_painter.fillRect(r, back);
-    const int textHeight = lineHeight;
-    if (numberOf(c, QStringLiteral("BorderStyle"), 1) != 0) {
-      const QRect box = r.adjusted(0, textHeight / 2, -1, -1);
-      m_painter.setBrush(Qt::NoBrush);
-      if (flat) {
-        m_painter.setPen(Qt::black);
-        m_painter.drawRect(box);
-      } else {
-        m_painter.setPen(kShadow);
-        m_painter.drawRect(box.adjusted(0, 0, -1, -1));
-        m_painter.setPen(kHighlight);
-        m_painter.drawRect(box.adjusted(1, 1, 0, 0));
+void FormPainter::paintControls(int depth) {
+  const QRect client(m_geometry.clientOrigin(), m_geometry.clientSize());
+  // Lightweight controls below windowed ones, as the form draws them; containers before what they hold,
+  // which is clipped to them.
+  std::function<void(host::FormNode*, bool)> paintChildren = [&](host::FormNode* node, bool lightweight) {
+    const QRect clip = node->parent() ? m_geometry.rectOf(m_geometry.form()->control(node)) : client;
+    for (host::FormNode* child : node->children()) {
+      if (isMenu(*child)) continue;
+      auto control = m_geometry.form()->control(child);
+      const QRect rect = m_geometry.rectOf(control);
+      if (isLightweight(bareClass(child->className())) == lightweight) {
+        m_painter.save();
+        m_painter.setClipRect(clip, Qt::IntersectClip);
+        paintControl(control, rect, depth);
+        m_painter.restore();
+      }
+      if (!lightweight && m_geometry.isContainer(child)) {
+        m_painter.save();
+        m_painter.setClipRect(rect.intersected(clip), Qt::IntersectClip);
+        paintChildren(child, true);
+        paintChildren(child, false);
+        m_painter.restore();
       }
     }
-    if (!caption.isEmpty()) {
-      const int width = m_painter.fontMetrics().horizontalAdvance(withoutMnemonics(caption)) + 4;
-      m_painter.fillRect(QRect(r.left() + 6, r.top(), width, textHeight), back);
-      paintText(QRect(r.left() + 8, r.top(), width, textHeight),
-                Qt::AlignLeft | Qt::AlignVCenter | Qt::TextShowMnemonic, caption, fore, enabled);
-    }
-  } else if (kind == QLatin1StringView("CheckBox") || kind == QLatin1StringView("OptionButton")) {
-    const bool check = kind == QLatin1StringView("CheckBox");
-    const int value = static_cast<int>(check ? numberOf(c, QStringLiteral("Value"), 0)
-                                             : (valueOf(c, QStringLiteral("Value"), false).toBool() ? 1 : 0));
-    if (numberOf(c, QStringLiteral("Style"), 0) == 1) {  // Graphical: a button, pressed when on
-      if (value)
-        paintBorder(r, Edge::Sunken, back);
-      else
-        paintRaised(r, back);
-      paintPicture(valueOf(c, QStringLiteral("Picture")), r.adjusted(3, 3, -3, -3 - lineHeight), false, true);
-      paintText(r.adjusted(3, 3, -3, -3), Qt::AlignHCenter | Qt::AlignBottom | Qt::TextShowMnemonic, caption,
-                fore, enabled);
-    } else {
-      m_painter.fillRect(r, back);
-      const bool right = numberOf(c, QStringLiteral("Alignment"), 0) == 1;
-      const QRect box(right ? r.right() - kIndicator + 1 : r.left(), r.center().y() - kIndicator / 2,
-                      kIndicator, kIndicator);
-      if (check)
-        paintCheckIndicator(box, value, flat);
-      else
-        paintOptionIndicator(box.adjusted(0, 0, -1, -1), value != 0, flat);
-      const QRect text = right ? r.adjusted(0, 0, -kIndicator - 4, 0) : r.adjusted(kIndicator + 4, 0, 0, 0);
-      paintText(text, Qt::AlignLeft | Qt::AlignVCenter | Qt::TextShowMnemonic | Qt::TextWordWrap, caption,
-                fore, enabled);
-    }
-  } else if (kind == QLatin1StringView("PictureBox")) {
-    const QRect inner = paintBorder(r, edgeOf(c, 1), back);
-    paintPicture(valueOf(c, QStringLiteral("Picture")), inner, false);
-  } else if (kind == QLatin1StringView("Image")) {
-    const QVariant picture = valueOf(c, QStringLiteral("Picture"));
-    const Edge edge = edgeOf(c, 0);
-    const QRect inner = edge == Edge::None ? r : paintBorder(r, edge, face);
-    if (picture.typeId() == QMetaType::QByteArray && !m_pictures.image(picture.toByteArray()).isNull()) {
-      paintPicture(picture, inner, valueOf(c, QStringLiteral("Stretch"), false).toBool());
-    } else if (edge == Edge::None) {
-      // An empty image shows its outline at design time.
-      m_painter.setPen(QPen(kDarkShadow, 1, Qt::DashLine));
-      m_painter.setBrush(Qt::NoBrush);
-      m_painter.drawRect(r.adjusted(0, 0, -1, -1));
-    }
-  } else if (kind == QLatin1StringView("Timer")) {
-    paintRaised(r, face);
-    controlIcon(kind).paint(&m_painter, r.adjusted(4, 4, -4, -4));
-  } else if (kind == QLatin1StringView("HScrollBar") || kind == QLatin1StringView("VScrollBar")) {
-    paintScrollBar(m_painter, r, kind == QLatin1StringView("HScrollBar") ? Qt::Horizontal : Qt::Vertical);
-  } else if (kind == QLatin1StringView("Shape")) {
-    m_painter.setPen(QPen(colorOf(c, QStringLiteral("BorderColor"), Qt::black),
-                          numberOf(c, QStringLiteral("BorderWidth"), 1)));
-    m_painter.setBrush(numberOf(c, QStringLiteral("BackStyle"), 0) != 0
-                           ? QBrush(colorOf(c, QStringLiteral("BackColor"), Qt::white))
-                           : QBrush(Qt::NoBrush));
-    const int shape = static_cast<int>(numberOf(c, QStringLiteral("Shape"), 0));
-    QRect box = r.adjusted(0, 0, -1, -1);
-    if (shape == 1 || shape == 3 || shape == 5) {  // the square and circle kinds keep to the smaller side
-      const int side = std::min(box.width(), box.height());
-      box = QRect(box.center() - QPoint(side / 2, side / 2), QSize(side, side));
-    }
-    if (shape == 2 || shape == 3)
-      m_painter.drawEllipse(box);
-    else if (shape == 4 || shape == 5)
-      m_painter.drawRoundedRect(box, 6, 6);
-    else
-      m_painter.drawRect(box);
-    m_painter.setBrush(Qt::NoBrush);
-  } else if (kind == QLatin1StringView("Line")) {
-    const QPoint origin = m_geometry.containerOrigin(c.liveNode().parent());
-    m_painter.setPen(QPen(colorOf(c, QStringLiteral("BorderColor"), Qt::black),
-                          numberOf(c, QStringLiteral("BorderWidth"), 1)));
-    m_painter.drawLine(origin + QPoint(pixelsOf(numberOf(c, QStringLiteral("X1"), 0)),
-                                       pixelsOf(numberOf(c, QStringLiteral("Y1"), 0))),
-                       origin + QPoint(pixelsOf(numberOf(c, QStringLiteral("X2"), 0)),
-                                       pixelsOf(numberOf(c, QStringLiteral("Y2"), 0))));
-  } else if (auto userControl = m_geometry.userControlOf(c.liveNode().className())) {
-    // A user control of an open project: its own back colour and border, a dotted outline while it has
-    // none; what it holds is drawn on top.
-    const Edge edge = edgeOf(*userControl, 0);
-    const QRect inner = paintBorder(r, edge, colorOf(*userControl, QStringLiteral("BackColor"), face));
-    if (edge == Edge::None) {
-      m_painter.setPen(QPen(kShadow, 1, Qt::DotLine));
-      m_painter.drawRect(inner.adjusted(0, 0, -1, -1));
-    }
+  };
+  paintChildren(&m_geometry.form()->description().root(), true);
+  paintChildren(&m_geometry.form()->description().root(), false);
+}
+
+/// What every control's painter starts from.
+struct FormPainter::Look {
+  host::ControlImpl& c;
+  QRect r;
+  QString kind;
+  QColor face, back, fore;
+  bool enabled, flat;
+  QString caption;
+  int lineHeight;
+  int depth;
+};
+
+const QHash<QString, FormPainter::ControlPainterFn>& FormPainter::painters() {
+  static const QHash<QString, ControlPainterFn> table = {
+      {QStringLiteral("CommandButton"), &FormPainter::paintCommandButton},
+      {QStringLiteral("Label"), &FormPainter::paintLabel},
+      {QStringLiteral("TextBox"), &FormPainter::paintTextBox},
+      {QStringLiteral("ComboBox"), &FormPainter::paintComboBox},
+      {QStringLiteral("DriveListBox"), &FormPainter::paintComboBox},
+      {QStringLiteral("ListBox"), &FormPainter::paintListBox},
+      {QStringLiteral("FileListBox"), &FormPainter::paintListBox},
+      {QStringLiteral("DirListBox"), &FormPainter::paintListBox},
+      {QStringLiteral("Frame"), &FormPainter::paintFrame},
+      {QStringLiteral("CheckBox"), &FormPainter::paintCheckOrOption},
+      {QStringLiteral("OptionButton"), &FormPainter::paintCheckOrOption},
+      {QStringLiteral("PictureBox"), &FormPainter::paintPictureBox},
+      {QStringLiteral("Image"), &FormPainter::paintImage},
+      {QStringLiteral("Timer"), &FormPainter::paintTimer},
+      {QStringLiteral("HScrollBar"), &FormPainter::paintScrollBarControl},
+      {QStringLiteral("VScrollBar"), &FormPainter::paintScrollBarControl},
+      {QStringLiteral("Shape"), &FormPainter::paintShape},
+      {QStringLiteral("Line"), &FormPainter::paintLine},
+  };
+  return table;
+}
+
+void FormPainter::paintControl(const std::shared_ptr<host::ControlImpl>& control, const QRect& r, int depth) {
+  host::ControlImpl& c = *control;
+  const QString className = c.liveNode().className();
+  const QColor face = vbColor(kButtonFace);
+  const host::ControlFont font = c.font();
+  m_painter.setFont(vbFont(font));
+  m_compatibleMetrics = hasCompatibleMetrics(font.name);
+  Look look{c,
+            r,
+            bareClass(className),
+            face,
+            colorOf(c, QStringLiteral("BackColor"), face),
+            colorOf(c, QStringLiteral("ForeColor"), Qt::black),
+            valueOf(c, QStringLiteral("Enabled"), true).toBool(),
+            numberOf(c, QStringLiteral("Appearance"), 1) == 0,
+            textOf(c, QStringLiteral("Caption")),
+            m_painter.fontMetrics().height(),
+            depth};
+  // Intrinsic controls are written "VB.Label" (or bare); a user control "Project.ctlName" may share a name.
+  const bool intrinsic = !className.contains(u'.') || className.startsWith(QLatin1StringView("VB."));
+  if (const auto painter = painters().find(look.kind); intrinsic && painter != painters().end())
+    (this->*(*painter))(look);
+  else if (auto userControl = m_geometry.userControlOf(className))
+    paintUserControl(look, userControl);
+  else
+    paintUnknown(look);
+}
+
+void FormPainter::paintCommandButton(const Look& l) {
+  QRect inner = l.r;
+  if (valueOf(l.c, QStringLiteral("Default"), false).toBool()) {
+    m_painter.setPen(Qt::black);
+    m_painter.drawRect(l.r.adjusted(0, 0, -1, -1));
+    inner = l.r.adjusted(1, 1, -1, -1);
+  }
+  if (l.flat)
+    paintBorder(inner, Edge::Flat, l.back);
+  else
+    paintRaised(inner, l.back);
+  const QRect area = inner.adjusted(3, 3, -3, -3);
+  if (numberOf(l.c, QStringLiteral("Style"), 0) == 1) {
+    const QRect pictureArea = l.caption.isEmpty() ? area : area.adjusted(0, 0, 0, -l.lineHeight);
+    paintPicture(valueOf(l.c, QStringLiteral("Picture")), pictureArea, false, true);
+    paintText(area, Qt::AlignHCenter | Qt::AlignBottom | Qt::TextShowMnemonic | Qt::TextWordWrap, l.caption,
+              l.fore, l.enabled);
   } else {
-    // A control the designer cannot draw (an ActiveX control): a box with its class and name.
-    m_painter.fillRect(r, Qt::white);
-    m_painter.setPen(kDarkShadow);
-    m_painter.drawRect(r.adjusted(0, 0, -1, -1));
-    m_painter.setFont(vbFont({}));
-    paintText(r.adjusted(3, 2, -2, -2), Qt::AlignLeft | Qt::AlignTop, kind + u' ' + c.name(), kDarkShadow,
-              true);
+    paintText(area, Qt::AlignCenter | Qt::TextShowMnemonic | Qt::TextWordWrap, l.caption, l.fore, l.enabled);
+  }
+}
+
+void FormPainter::paintLabel(const Look& l) {
+  if (numberOf(l.c, QStringLiteral("BackStyle"), 1) != 0) m_painter.fillRect(l.r, l.back);
+  const Edge edge = edgeOf(l.c, 0);
+  const QRect inner = edge == Edge::None ? l.r : paintBorder(l.r, edge, l.back);
+  // A label breaks its caption at words unless it sizes itself to one line (AutoSize without WordWrap).
+  const bool wrap = !valueOf(l.c, QStringLiteral("AutoSize"), false).toBool() ||
+                    valueOf(l.c, QStringLiteral("WordWrap"), false).toBool();
+  const bool mnemonic = valueOf(l.c, QStringLiteral("UseMnemonic"), true).toBool();
+  paintText(
+      inner,
+      alignmentOf(l.c) | Qt::AlignTop | (wrap ? Qt::TextWordWrap : 0) | (mnemonic ? Qt::TextShowMnemonic : 0),
+      l.caption, l.fore, l.enabled);
+}
+
+void FormPainter::paintTextBox(const Look& l) {
+  QRect inner = paintBorder(l.r, edgeOf(l.c, 1), colorOf(l.c, QStringLiteral("BackColor"), Qt::white));
+  const bool multiLine = valueOf(l.c, QStringLiteral("MultiLine"), false).toBool();
+  const int bars = multiLine ? static_cast<int>(numberOf(l.c, QStringLiteral("ScrollBars"), 0)) : 0;
+  const bool vertical = bars == 2 || bars == 3;
+  const bool horizontal = bars == 1 || bars == 3;
+  if (vertical)
+    paintScrollBar(m_painter,
+                   QRect(inner.right() - kScrollBarWidth + 1, inner.top(), kScrollBarWidth,
+                         inner.height() - (horizontal ? kScrollBarWidth : 0)),
+                   Qt::Vertical);
+  if (horizontal)
+    paintScrollBar(m_painter,
+                   QRect(inner.left(), inner.bottom() - kScrollBarWidth + 1,
+                         inner.width() - (vertical ? kScrollBarWidth : 0), kScrollBarWidth),
+                   Qt::Horizontal);
+  if (vertical && horizontal)
+    m_painter.fillRect(QRect(inner.right() - kScrollBarWidth + 1, inner.bottom() - kScrollBarWidth + 1,
+                             kScrollBarWidth, kScrollBarWidth),
+                       l.face);
+  inner.adjust(1, 1, -(vertical ? kScrollBarWidth : 0), -(horizontal ? kScrollBarWidth : 0));
+  QString text = textOf(l.c, QStringLiteral("Text"));
+  const QString password = textOf(l.c, QStringLiteral("PasswordChar"));
+  if (!password.isEmpty() && !multiLine) text = QString(text.size(), password.front());
+  if (!multiLine) text = text.section(QStringLiteral("\r\n"), 0, 0);
+  text.replace(QStringLiteral("\r\n"), QStringLiteral("\n"));
+  m_painter.save();
+  m_painter.setClipRect(inner, Qt::IntersectClip);
+  // A multi-line box without a horizontal scroll bar breaks its lines at words.
+  paintText(inner.adjusted(1, 0, -1, 0),
+            alignmentOf(l.c) | Qt::AlignTop | (multiLine && !horizontal ? Qt::TextWordWrap : 0), text,
+            colorOf(l.c, QStringLiteral("ForeColor"), Qt::black), l.enabled);
+  m_painter.restore();
+}
+
+void FormPainter::paintComboBox(const Look& l) {
+  const bool combo = l.kind == QLatin1StringView("ComboBox");
+  const int style = combo ? static_cast<int>(numberOf(l.c, QStringLiteral("Style"), 0)) : 0;
+  const QColor window = colorOf(l.c, QStringLiteral("BackColor"), Qt::white);
+  const int boxHeight = style == 1 ? std::min(l.r.height(), l.lineHeight + 6) : l.r.height();
+  const QRect box(l.r.topLeft(), QSize(l.r.width(), boxHeight));
+  const QRect inner = paintBorder(box, l.flat ? Edge::Flat : Edge::Sunken, window);
+  const QString text = !combo       ? QStringLiteral("c: [ ]")
+                       : style == 2 ? l.c.name()
+                                    : textOf(l.c, QStringLiteral("Text"));
+  int textRight = inner.right();
+  if (style != 1) {
+    const QRect button(inner.right() - kScrollBarWidth + 1, inner.top(), kScrollBarWidth, inner.height());
+    paintRaised(button, l.face);
+    const QPoint m = button.center();
+    m_painter.setPen(Qt::NoPen);
+    m_painter.setBrush(Qt::black);
+    m_painter.drawPolygon(QPolygon({m + QPoint(-3, -1), m + QPoint(3, -1), m + QPoint(0, 2)}));
+    m_painter.setBrush(Qt::NoBrush);
+    textRight = button.left() - 1;
+  }
+  paintText(QRect(inner.left() + 2, inner.top(), textRight - inner.left() - 2, inner.height()),
+            Qt::AlignLeft | Qt::AlignVCenter, text, l.fore, l.enabled);
+  if (style == 1 && l.r.height() > boxHeight) {
+    const QRect list(l.r.left(), box.bottom() + 1, l.r.width(), l.r.height() - boxHeight);
+    paintList(paintBorder(list, l.flat ? Edge::Flat : Edge::Sunken, window), l.c,
+              valueOf(l.c, QStringLiteral("List")).toStringList(), false);
+  }
+}
+
+void FormPainter::paintListBox(const Look& l) {
+  const QRect inner = paintBorder(l.r, l.flat ? Edge::Flat : Edge::Sunken,
+                                  colorOf(l.c, QStringLiteral("BackColor"), Qt::white));
+  QStringList items = valueOf(l.c, QStringLiteral("List")).toStringList();
+  // An empty list shows its name at design time.
+  if (items.isEmpty() && l.kind == QLatin1StringView("ListBox")) items << l.c.name();
+  if (l.kind == QLatin1StringView("DirListBox")) items = {QStringLiteral("c:\\")};
+  paintList(inner, l.c, items, numberOf(l.c, QStringLiteral("Style"), 0) == 1);
+}
+
+void FormPainter::paintFrame(const Look& l) {
+  m_painter.fillRect(l.r, l.back);
+  if (numberOf(l.c, QStringLiteral("BorderStyle"), 1) != 0) {
+    const QRect box = l.r.adjusted(0, l.lineHeight / 2, -1, -1);
+    m_painter.setBrush(Qt::NoBrush);
+    if (l.flat) {
+      m_painter.setPen(Qt::black);
+      m_painter.drawRect(box);
+    } else {
+      m_painter.setPen(kShadow);
+      m_painter.drawRect(box.adjusted(0, 0, -1, -1));
+      m_painter.setPen(kHighlight);
+      m_painter.drawRect(box.adjusted(1, 1, 0, 0));
+    }
+  }
+  if (l.caption.isEmpty()) return;
+  const int width =
+      std::min(m_painter.fontMetrics().horizontalAdvance(withoutMnemonics(l.caption)) + 4, l.r.width() - 10);
+  m_painter.fillRect(QRect(l.r.left() + 6, l.r.top(), width, l.lineHeight), l.back);
+  paintText(QRect(l.r.left() + 8, l.r.top(), width, l.lineHeight),
+            Qt::AlignLeft | Qt::AlignVCenter | Qt::TextShowMnemonic, l.caption, l.fore, l.enabled);
+}
+
+void FormPainter::paintCheckOrOption(const Look& l) {
+  const bool check = l.kind == QLatin1StringView("CheckBox");
+  const int value = static_cast<int>(check ? numberOf(l.c, QStringLiteral("Value"), 0)
+                                           : (valueOf(l.c, QStringLiteral("Value"), false).toBool() ? 1 : 0));
+  if (numberOf(l.c, QStringLiteral("Style"), 0) == 1) {  // Graphical: a button, pressed when on
+    if (value)
+      paintBorder(l.r, Edge::Sunken, l.back);
+    else
+      paintRaised(l.r, l.back);
+    paintPicture(valueOf(l.c, QStringLiteral("Picture")), l.r.adjusted(3, 3, -3, -3 - l.lineHeight), false,
+                 true);
+    paintText(l.r.adjusted(3, 3, -3, -3), Qt::AlignHCenter | Qt::AlignBottom | Qt::TextShowMnemonic,
+              l.caption, l.fore, l.enabled);
+    return;
+  }
+  m_painter.fillRect(l.r, l.back);
+  const bool right = numberOf(l.c, QStringLiteral("Alignment"), 0) == 1;
+  const QRect box(right ? l.r.right() - kIndicator + 1 : l.r.left(), l.r.center().y() - kIndicator / 2,
+                  kIndicator, kIndicator);
+  if (check)
+    paintCheckIndicator(box, value, l.flat);
+  else
+    paintOptionIndicator(box.adjusted(0, 0, -1, -1), value != 0, l.flat);
+  const QRect text = right ? l.r.adjusted(0, 0, -kIndicator - 4, 0) : l.r.adjusted(kIndicator + 4, 0, 0, 0);
+  paintText(text, Qt::AlignLeft | Qt::AlignVCenter | Qt::TextShowMnemonic | Qt::TextWordWrap, l.caption,
+            l.fore, l.enabled);
+}
+
+void FormPainter::paintPictureBox(const Look& l) {
+  const QRect inner = paintBorder(l.r, edgeOf(l.c, 1), l.back);
+  paintPicture(valueOf(l.c, QStringLiteral("Picture")), inner, false);
+}
+
+void FormPainter::paintImage(const Look& l) {
+  const QVariant picture = valueOf(l.c, QStringLiteral("Picture"));
+  const Edge edge = edgeOf(l.c, 0);
+  const QRect inner = edge == Edge::None ? l.r : paintBorder(l.r, edge, l.face);
+  if (picture.typeId() == QMetaType::QByteArray && !m_pictures.image(picture.toByteArray()).isNull()) {
+    paintPicture(picture, inner, valueOf(l.c, QStringLiteral("Stretch"), false).toBool());
+  } else if (edge == Edge::None) {
+    // An empty image shows its outline at design time.
+    m_painter.setPen(QPen(kDarkShadow, 1, Qt::DashLine));
+    m_painter.setBrush(Qt::NoBrush);
+    m_painter.drawRect(l.r.adjusted(0, 0, -1, -1));
+  }
+}
+
+void FormPainter::paintTimer(const Look& l) {
+  paintRaised(l.r, l.face);
+  controlIcon(l.kind).paint(&m_painter, l.r.adjusted(4, 4, -4, -4));
+}
+
+void FormPainter::paintScrollBarControl(const Look& l) {
+  paintScrollBar(m_painter, l.r, l.kind == QLatin1StringView("HScrollBar") ? Qt::Horizontal : Qt::Vertical);
+}
+
+void FormPainter::paintShape(const Look& l) {
+  m_painter.setPen(QPen(colorOf(l.c, QStringLiteral("BorderColor"), Qt::black),
+                        numberOf(l.c, QStringLiteral("BorderWidth"), 1)));
+  m_painter.setBrush(numberOf(l.c, QStringLiteral("BackStyle"), 0) != 0
+                         ? QBrush(colorOf(l.c, QStringLiteral("BackColor"), Qt::white))
+                         : QBrush(Qt::NoBrush));
+  const int shape = static_cast<int>(numberOf(l.c, QStringLiteral("Shape"), 0));
+  QRect box = l.r.adjusted(0, 0, -1, -1);
+  if (shape == 1 || shape == 3 || shape == 5) {  // the square and circle kinds keep to the smaller side
+    const int side = std::min(box.width(), box.height());
+    box = QRect(box.center() - QPoint(side / 2, side / 2), QSize(side, side));
+  }
+  if (shape == 2 || shape == 3)
+    m_painter.drawEllipse(box);
+  else if (shape == 4 || shape == 5)
+    m_painter.drawRoundedRect(box, 6, 6);
+  else
+    m_painter.drawRect(box);
+  m_painter.setBrush(Qt::NoBrush);
+}
+
+void FormPainter::paintLine(const Look& l) {
+  const QPoint origin = m_geometry.containerOrigin(l.c.liveNode().parent());
+  m_painter.setPen(QPen(colorOf(l.c, QStringLiteral("BorderColor"), Qt::black),
+                        numberOf(l.c, QStringLiteral("BorderWidth"), 1)));
+  m_painter.drawLine(origin + QPoint(pixelsOf(numberOf(l.c, QStringLiteral("X1"), 0)),
+                                     pixelsOf(numberOf(l.c, QStringLiteral("Y1"), 0))),
+                     origin + QPoint(pixelsOf(numberOf(l.c, QStringLiteral("X2"), 0)),
+                                     pixelsOf(numberOf(l.c, QStringLiteral("Y2"), 0))));
+}
+
+void FormPainter::paintUserControl(const Look& l, const std::shared_ptr<host::ControlImpl>& userControl) {
+  // What the user control's own designer holds, scaled from the size it was designed at to the instance's:
+  // its back colour, border and picture, then its constituent controls.
+  const Edge edge = edgeOf(*userControl, 0);
+  const QRect inner = paintBorder(l.r, edge, colorOf(*userControl, QStringLiteral("BackColor"), l.face));
+  paintPicture(valueOf(*userControl, QStringLiteral("Picture")), inner, false);
+  auto designer = userControl->form();
+  // A user control that holds itself, directly or not, is drawn a few levels deep only.
+  constexpr int kDeepest = 4;
+  if (designer && l.depth < kDeepest && !designer->description().root().children().empty()) {
+    const FormGeometry geometry(designer);
+    const QSize designed = geometry.clientSize();
+    m_painter.save();
+    m_painter.setClipRect(inner, Qt::IntersectClip);
+    m_painter.translate(l.r.topLeft());
+    if (!designed.isEmpty())
+      m_painter.scale(qreal(l.r.width()) / designed.width(), qreal(l.r.height()) / designed.height());
+    m_painter.translate(-geometry.clientOrigin());
+    FormPainter(m_painter, geometry, m_pictures).paintControls(l.depth + 1);
+    m_painter.restore();
+  }
+  if (edge == Edge::None) {
+    // The instance's outline, so that an empty one is still seen at design time.
+    m_painter.setPen(QPen(kShadow, 1, Qt::DotLine));
+    m_painter.setBrush(Qt::NoBrush);
+    m_painter.drawRect(inner.adjusted(0, 0, -1, -1));
+  }
+}
+
+void FormPainter::paintUnknown(const Look& l) {
+  // A control the designer cannot draw (an ActiveX control, a user control whose file is not open): a box
+  // with its class and name.
+  m_painter.fillRect(l.r, Qt::white);
+  m_painter.setPen(kDarkShadow);
+  m_painter.drawRect(l.r.adjusted(0, 0, -1, -1));
+  m_painter.setFont(vbFont({}));
+  m_compatibleMetrics = false;
+  paintText(l.r.adjusted(3, 2, -2, -2), Qt::AlignLeft | Qt::AlignTop | Qt::TextWordWrap,
+            l.kind + u' ' + l.c.name(), kDarkShadow, true);
+}
+
+int FormPainter::alignmentOf(host::ControlImpl& control) {
+  switch (static_cast<int>(numberOf(control, QStringLiteral("Alignment"), 0))) {
+    case 1:
+      return Qt::AlignRight;
+    case 2:
+      return Qt::AlignHCenter;
+    default:
+      return Qt::AlignLeft;
   }
 }
 

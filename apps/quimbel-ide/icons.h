@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
-// The IDE's own pictures, drawn with QPainter on a 16-unit grid and rendered at the sizes toolbars, menus
-// and trees ask for: the built-in commands, the project explorer's nodes and the toolbox's controls.
+// The IDE's own pictures: the built-in commands, the project window's nodes, the toolbox's controls and
+// the code window's view buttons. Each is a pair of PNG files compiled into the program (icons.qrc,
+// apps/quimbel-ide/icons/NAME.png at 16 pixels and NAME@2x.png at 32), found through one table.
 #pragma once
 
 #include "host/model/commandbars.h"
@@ -38,6 +39,9 @@ enum class Glyph {
   ViewCode,
   ViewObject,
   About,
+  // Code window
+  ProcedureView,
+  FullModuleView,
   // Project explorer
   Project,
   Folder,

@@ -232,7 +232,7 @@ bool IdeCommands::open(const QString& path, bool replace) {
   }
   try {
     const auto projects = vbe.open(path);
-    m_window.showStatus(QStringLiteral("Opened %1").arg(QDir::toNativeSeparators(path)), 5000);
+    m_window.showStatus(QStringLiteral("Opened %1").arg(QFileInfo(path).fileName()), 5000);
     // The projects are open without the files they list that are missing: one message names them all.
     QStringList missing;
     const QString opened = QFileInfo(path).absoluteFilePath();
@@ -276,7 +276,7 @@ bool IdeCommands::saveProjectAs(const std::shared_ptr<host::ProjectImpl>& projec
   if (!runSave([&] { project->SaveAs(path); },
                QStringLiteral("Cannot save project %1.").arg(project->Name())))
     return false;
-  m_window.showStatus(QStringLiteral("Saved %1").arg(QDir::toNativeSeparators(path)), 5000);
+  m_window.showStatus(QStringLiteral("Saved %1").arg(QFileInfo(path).fileName()), 5000);
   return true;
 }
 

@@ -12,6 +12,7 @@
 #include "propertiesview.h"
 #include "qtplatform.h"
 #include "toolbox.h"
+#include "vbfonts.h"
 #include "windowmanager.h"
 
 #include <QApplication>
@@ -20,6 +21,7 @@
 #include <QLabel>
 #include <QMdiArea>
 #include <QMenu>
+#include <QPlainTextEdit>
 #include <QScreen>
 #include <QSettings>
 #include <QStatusBar>
@@ -31,6 +33,21 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
     : m_vbe(std::move(vbe)), m_ui(ui) {
   setObjectName(QStringLiteral("mainWindow"));
   setWindowIcon(icon(Glyph::Project));
+  // The window's own bars and their buttons in the IDE's classic face whatever the desktop's theme: flat
+  // buttons that rise under the mouse and sink when pressed or on. Dialogs over the window keep their look.
+  setStyleSheet(QStringLiteral(
+      "QMainWindow > QMenuBar, QMainWindow > QToolBar, QMainWindow > QStatusBar, #projectWindowBar"
+      " { background: #d4d0c8; }"
+      "QMainWindow > QToolBar, #projectWindowBar { border: none; spacing: 0px; padding: 1px; }"
+      "QMainWindow > QToolBar::separator { background: #808080; width: 1px; margin: 3px 3px; }"
+      "QMainWindow > QToolBar QToolButton, #projectWindowBar QToolButton, #codeViewButtons QToolButton"
+      " { background: transparent; border: 1px solid transparent; padding: 2px; }"
+      "QMainWindow > QToolBar QToolButton:hover, #projectWindowBar QToolButton:hover,"
+      " #codeViewButtons QToolButton:hover { border-color: #ffffff #808080 #808080 #ffffff; }"
+      "QMainWindow > QToolBar QToolButton:pressed, QMainWindow > QToolBar QToolButton:checked,"
+      " #projectWindowBar QToolButton:pressed, #projectWindowBar QToolButton:checked,"
+      " #codeViewButtons QToolButton:pressed, #codeViewButtons QToolButton:checked"
+      " { border-color: #808080 #ffffff #ffffff #808080; }"));
   if (!options.settingsPath.isEmpty())
     m_settings = std::make_unique<QSettings>(options.settingsPath, QSettings::IniFormat);
   // The code colours the user chose; without settings (a script's session) the IDE's own.
@@ -87,6 +104,14 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
           });
   connect(m_explorer, &ProjectExplorer::contextMenuWanted, this, &MainWindow::showProjectMenu);
   connect(m_toolbox, &Toolbox::controlWanted, this, &MainWindow::addControl);
+  connect(m_properties, &PropertiesView::objectChosen, this,
+          [this](const std::shared_ptr<host::ControlImpl>& control) {
+            DesignerWindow* designer = m_windows->activeDesigner();
+            if (!designer) return;
+            const bool root =
+                control == std::static_pointer_cast<host::ControlImpl>(designer->form()->Root());
+            designer->selectControl(root ? nullptr : control);
+          });
   connect(qApp, &QApplication::focusChanged, this, [this](QWidget* old, QWidget* now) {
     focusChanged(now);
     if (old && !now) activateUnder(old->window());
@@ -94,6 +119,7 @@ MainWindow::MainWindow(std::shared_ptr<host::VbeImpl> vbe, QtUserInterface& ui, 
 
   auto& events = m_vbe->events();
   auto titleLater = [this](auto&&...) { QTimer::singleShot(0, this, [this] { updateTitle(); }); };
+  m_connections.push_back(events.projects->ItemAdded.connect(titleLater));
   m_connections.push_back(events.projects->ItemActivated.connect(titleLater));
   m_connections.push_back(events.projects->ItemRenamed.connect(titleLater));
   m_connections.push_back(events.projects->ItemRemoved.connect(titleLater));
@@ -133,9 +159,9 @@ void MainWindow::buildDocks() {
   m_explorer = new ProjectExplorer(m_vbe, this);
   m_explorer->setProperty(kWindowHandleProperty,
                           QVariant::fromValue<quintptr>(m_vbe->projectWindow()->hWnd()));
-  m_explorerDock = new QDockWidget(QStringLiteral("Project"), this);
+  m_explorerDock = new QDockWidget(m_explorer->title(), this);
   m_explorerDock->setObjectName(QStringLiteral("projectDock"));
-  m_explorerDock->setWidget(m_explorer);
+  m_explorerDock->setWidget(new ProjectWindow(m_explorer, this));
   addDockWidget(Qt::RightDockWidgetArea, m_explorerDock);
 
   m_properties = new PropertiesView(this);
@@ -157,10 +183,29 @@ void MainWindow::buildDocks() {
   m_toolboxDock->setWidget(m_toolbox);
   addDockWidget(Qt::LeftDockWidgetArea, m_toolboxDock);
   resizeDocks({m_explorerDock, m_toolboxDock}, {300, 64}, Qt::Horizontal);
+
+  // The Immediate window: a place to type and to read what the program printed; Ctrl+G shows it.
+  m_immediate = new QPlainTextEdit(this);
+  m_immediate->setObjectName(QStringLiteral("immediateWindow"));
+  m_immediate->setFont(codeFont());
+  m_immediate->setLineWrapMode(QPlainTextEdit::NoWrap);
+  m_immediateDock = new QDockWidget(QStringLiteral("Immediate"), this);
+  m_immediateDock->setObjectName(QStringLiteral("immediateDock"));
+  m_immediateDock->setWidget(m_immediate);
+  addDockWidget(Qt::BottomDockWidgetArea, m_immediateDock);
+  resizeDocks({m_immediateDock}, {110}, Qt::Vertical);
+  auto* showImmediate = new QAction(this);
+  showImmediate->setShortcut(QKeySequence(Qt::CTRL | Qt::Key_G));
+  addAction(showImmediate);
+  connect(showImmediate, &QAction::triggered, this, [this] {
+    m_immediateDock->show();
+    m_immediate->setFocus();
+  });
 }
 
 void MainWindow::updateTitle() {
   setWindowTitle(m_vbe->MainWindow()->Caption());
+  m_explorerDock->setWindowTitle(m_explorer->title());
   m_mode->setText(QStringLiteral("[%1]").arg(host::modeName(m_vbe->mode())));
 }
 

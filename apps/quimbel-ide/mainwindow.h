@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // The IDE's main window over the model: menu bar and toolbars drawn from the command bars, code and
-// designer windows in an MDI area, the project explorer, the properties window and the toolbox in docks,
+// designer windows in an MDI area, the project window, the properties window, the toolbox and the
+// Immediate window in docks,
 // the caret position and the IDE mode in the status bar. The window follows the model (title, mode, the
 // active window) and reports to it where the keyboard focus is.
 #pragma once
@@ -17,6 +18,7 @@
 class QDockWidget;
 class QLabel;
 class QMdiArea;
+class QPlainTextEdit;
 class QSettings;
 
 namespace desktop {
@@ -51,6 +53,7 @@ class MainWindow final : public QMainWindow {
   ProjectExplorer& explorer() { return *m_explorer; }
   PropertiesView& properties() { return *m_properties; }
   Toolbox& toolbox() { return *m_toolbox; }
+  QPlainTextEdit* immediate() const { return m_immediate; }
   IdeCommands& commands() { return *m_commands; }
   QMdiArea* mdiArea() const { return m_mdi; }
   /// The remembered settings, or null when nothing is remembered.
@@ -94,6 +97,8 @@ class MainWindow final : public QMainWindow {
   QDockWidget* m_explorerDock;
   QDockWidget* m_propertiesDock;
   QDockWidget* m_toolboxDock;
+  QDockWidget* m_immediateDock;
+  QPlainTextEdit* m_immediate;
   QLabel* m_position;
   QLabel* m_mode;
   std::vector<ide::Connection> m_connections;

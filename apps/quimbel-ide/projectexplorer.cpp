@@ -4,10 +4,14 @@
 #include "host/model/events.h"
 #include "icons.h"
 
+#include <QAction>
 #include <QContextMenuEvent>
 #include <QFileInfo>
 #include <QHeaderView>
+#include <QScrollBar>
 #include <QTimer>
+#include <QToolBar>
+#include <QVBoxLayout>
 
 #include <set>
 
@@ -107,7 +111,25 @@ void ProjectExplorer::refresh() {
       bold.setBold(true);
       projectItem->setFont(0, bold);
     }
-    for (const Folder& folder : folders()) {
+    const auto addComponent = [&](QTreeWidgetItem* parent,
+                                  const std::shared_ptr<host::ComponentImpl>& component) {
+      auto* item = new QTreeWidgetItem(parent);
+      item->setText(0, fileLabel(component->Name(), component->filePath()));
+      item->setIcon(0, componentIcon(component->Type()));
+      item->setData(0, KindRole, ComponentNode);
+      item->setData(0, PointerRole,
+                    QVariant::fromValue<quintptr>(reinterpret_cast<quintptr>(component.get())));
+      item->setData(0, Qt::UserRole, project->Name() + u'.' + component->Name());
+    };
+    if (!m_showFolders) {
+      auto components = project->components();
+      std::sort(components.begin(), components.end(), [](const auto& a, const auto& b) {
+        return a->Name().compare(b->Name(), Qt::CaseInsensitive) < 0;
+      });
+      for (const auto& component : components)
+        addComponent(projectItem, component);
+    }
+    for (const Folder& folder : m_showFolders ? folders() : std::vector<Folder>{}) {
       QTreeWidgetItem* folderItem = nullptr;
       for (const auto& component : project->components()) {
         if (std::find(folder.types.begin(), folder.types.end(), component->Type()) == folder.types.end())
@@ -119,13 +141,7 @@ void ProjectExplorer::refresh() {
           folderItem->setData(0, KindRole, FolderNode);
           folderItem->setData(0, Qt::UserRole, project->Name() + u'/' + QString::fromLatin1(folder.title));
         }
-        auto* item = new QTreeWidgetItem(folderItem);
-        item->setText(0, fileLabel(component->Name(), component->filePath()));
-        item->setIcon(0, componentIcon(component->Type()));
-        item->setData(0, KindRole, ComponentNode);
-        item->setData(0, PointerRole,
-                      QVariant::fromValue<quintptr>(reinterpret_cast<quintptr>(component.get())));
-        item->setData(0, Qt::UserRole, project->Name() + u'.' + component->Name());
+        addComponent(folderItem, component);
       }
       if (folderItem) folderItem->setExpanded(!collapsed.count(folderItem->data(0, Qt::UserRole).toString()));
     }
@@ -133,6 +149,37 @@ void ProjectExplorer::refresh() {
   }
   m_syncing = false;
   followSelection();
+  keepRootInView();
+}
+
+void ProjectExplorer::setShowFolders(bool show) {
+  if (show == m_showFolders) return;
+  m_showFolders = show;
+  refresh();
+}
+
+QString ProjectExplorer::title() const {
+  QString name;
+  if (!m_vbe->groupFileName().isEmpty())
+    name = QFileInfo(m_vbe->groupFileName()).completeBaseName();
+  else if (auto active = m_vbe->ActiveVBProject())
+    name = active->Name();
+  return name.isEmpty() ? QStringLiteral("Project") : QStringLiteral("Project - ") + name;
+}
+
+void ProjectExplorer::keepRootInView() {
+  QTreeWidgetItem* item = currentItem();
+  if (!item || topLevelItemCount() == 0) return;
+  // The current item's place below the first row, measured on the rows the tree shows.
+  const int rowHeight = std::max(1, visualItemRect(topLevelItem(0)).height());
+  int rows = 0;
+  for (QTreeWidgetItemIterator it(this, QTreeWidgetItemIterator::NotHidden); *it && *it != item; ++it) {
+    bool shown = true;
+    for (QTreeWidgetItem* parent = (*it)->parent(); parent; parent = parent->parent())
+      shown = shown && parent->isExpanded();
+    rows += shown ? 1 : 0;
+  }
+  if ((rows + 1) * rowHeight <= viewport()->height()) verticalScrollBar()->setValue(0);
 }
 
 std::shared_ptr<host::ComponentImpl> ProjectExplorer::componentOf(const QTreeWidgetItem* item) const {
@@ -174,6 +221,7 @@ void ProjectExplorer::selectComponent(const std::shared_ptr<host::ComponentImpl>
   if (QTreeWidgetItem* item = itemOf(component.get())) {
     setCurrentItem(item);
     scrollToItem(item);
+    keepRootInView();
   }
 }
 
@@ -189,6 +237,7 @@ void ProjectExplorer::followSelection() {
   m_syncing = true;
   setCurrentItem(item);
   m_syncing = false;
+  keepRootInView();
 }
 
 void ProjectExplorer::currentChanged(QTreeWidgetItem* item) {
@@ -205,6 +254,41 @@ void ProjectExplorer::currentChanged(QTreeWidgetItem* item) {
 void ProjectExplorer::contextMenuEvent(QContextMenuEvent* event) {
   if (QTreeWidgetItem* item = itemAt(viewport()->mapFromGlobal(event->globalPos()))) setCurrentItem(item);
   Q_EMIT contextMenuWanted(event->globalPos());
+}
+
+// ---------------------------------------------------------------------------------------------------
+
+ProjectWindow::ProjectWindow(ProjectExplorer* explorer, QWidget* parent)
+    : QWidget(parent), m_explorer(explorer) {
+  setObjectName(QStringLiteral("projectWindow"));
+  auto* bar = new QToolBar(this);
+  bar->setObjectName(QStringLiteral("projectWindowBar"));
+  bar->setIconSize(QSize(16, 16));
+  m_viewCode = bar->addAction(icon(Glyph::ViewCode), QStringLiteral("View Code"));
+  m_viewObject = bar->addAction(icon(Glyph::ViewObject), QStringLiteral("View Object"));
+  m_toggleFolders = bar->addAction(icon(Glyph::Folder), QStringLiteral("Toggle Folders"));
+  m_toggleFolders->setCheckable(true);
+  m_toggleFolders->setChecked(explorer->showFolders());
+  auto* layout = new QVBoxLayout(this);
+  layout->setContentsMargins(0, 0, 0, 0);
+  layout->setSpacing(0);
+  layout->addWidget(bar);
+  layout->addWidget(explorer);
+  const auto open = [this](bool code) {
+    if (auto component = m_explorer->componentOf(m_explorer->currentItem()))
+      Q_EMIT m_explorer->openWanted(component, code || !component->hasDesigner());
+  };
+  connect(m_viewCode, &QAction::triggered, this, [open] { open(true); });
+  connect(m_viewObject, &QAction::triggered, this, [open] { open(false); });
+  connect(m_toggleFolders, &QAction::toggled, explorer, &ProjectExplorer::setShowFolders);
+  connect(explorer, &QTreeWidget::currentItemChanged, this, [this] { updateButtons(); });
+  updateButtons();
+}
+
+void ProjectWindow::updateButtons() {
+  auto component = m_explorer->componentOf(m_explorer->currentItem());
+  m_viewCode->setEnabled(component && component->codeModule());
+  m_viewObject->setEnabled(component && component->hasDesigner());
 }
 
 }  // namespace desktop

@@ -5,7 +5,7 @@
 #include "ide/extensibility.h"
 
 namespace {
-const ide::AddInDescription kAddIn{addin::kProgId, addin::kDescription};
+const ide::AddInDescription kAddIn{addin::kProgId, addin::kDescription, addin::kDetails};
 }  // namespace
 
 extern "C" Q_DECL_EXPORT const ide::AddInDescription* ideAddInDescribe() {

@@ -7,6 +7,10 @@ namespace addin {
 
 inline constexpr char kProgId[] = "Quimbel.Connect";
 inline constexpr char kDescription[] = "Quimbel 2.2 Add-In";
+inline constexpr char kDetails[] =
+    "Navegação pelo código, favoritos, tarefas, macros de teclado, memórias de cópia, numeração e "
+    "indentação de linhas, localização estendida, novo procedimento e assistência ao desenho de "
+    "formulários.";
 inline constexpr char kToolBarName[] = "Quimbel 2.2";
 inline constexpr char16_t kSplashText[] = u"Quimbel 2.2";
 

@@ -32,8 +32,9 @@ class IDTExtensibility {
 
 /// What an add-in library says about itself.
 struct AddInDescription {
-  const char* progId;       // "Quimbel.Connect"
-  const char* description;  // shown by the add-in manager
+  const char* progId;             // "Quimbel.Connect"
+  const char* description;        // the name the add-in manager lists
+  const char* details = nullptr;  // what it does, shown under the list (UTF-8); none: the name again
 };
 
 }  // namespace ide

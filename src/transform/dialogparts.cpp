@@ -61,4 +61,43 @@ void ProgressBarSink::setVisible(bool visible) {
   m_bar.repaint();
 }
 
+QString walkFailureText(const QString& message, const WalkFailure& failure, ide::VBE& vbe, PROG_MODE scope) {
+  QString module = failure.module;
+  if (module.isEmpty() && failure.line > 0) {
+    try {
+      if (scope == PROG_PROCEDURE) module = activeCodePane(vbe)->CodeModule()->Name();
+      if (scope == PROG_MODULE) module = selectedComponent(vbe)->Name();
+    } catch (const std::exception&) {
+      // The module left the IDE: the message goes without its name.
+    }
+  }
+  QString text = message;
+  if (!module.isEmpty()) {
+    text += QStringLiteral("\n\nMódulo %1").arg(module);
+    if (failure.line > 0) text += QStringLiteral(", linha %1").arg(failure.line);
+    text += u'.';
+  }
+  // The IDE's own description is in English: the reasons a user can act on are said here.
+  switch (failure.error.number()) {
+    case ide::err::LineTooLong:
+      text += QStringLiteral(" A linha passaria de 1023 caracteres.");
+      break;
+    default:
+      text += QStringLiteral(" (erro %1)").arg(failure.error.number());
+      break;
+  }
+  return text;
+}
+
+int walkMessageId(PROG_MODE scope, bool indenting) {
+  switch (scope) {
+    case PROG_PROJECT:
+      return indenting ? 5130 : 5121;
+    case PROG_MODULE:
+      return indenting ? 5129 : 5122;
+    default:
+      return indenting ? 5128 : 5123;
+  }
+}
+
 }  // namespace transform

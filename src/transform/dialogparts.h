@@ -4,7 +4,9 @@
 #pragma once
 
 #include "ide/platform.h"
+#include "transform/progmode.h"
 #include "transform/progress.h"
+#include "transform/walk.h"
 
 #include <QLineEdit>
 
@@ -43,6 +45,15 @@ class ProgressBarSink final : public ProgressSink {
  private:
   QProgressBar& m_bar;
 };
+
+/// What a dialog says about a failure of its walk over `scope`: `message` (the walk's fixed text), then the
+/// module (when the walk did not name it, the one the scope walks) and the code-window line it happened
+/// at, and why, in the dialog's language.
+QString walkFailureText(const QString& message, const WalkFailure& failure, ide::VBE& vbe, PROG_MODE scope);
+
+/// The fixed message of a failed run over `scope`: the indentation's (5130, 5129, 5128) for `indenting`,
+/// else the numbering's (5121, 5122, 5123).
+int walkMessageId(PROG_MODE scope, bool indenting);
 
 /// Shows the arrow-and-hourglass cursor while it lives.
 class BusyCursor {

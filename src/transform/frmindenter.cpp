@@ -99,7 +99,9 @@ frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings
   connect(m_cmdCancel, &QPushButton::clicked, this, &frmIndenter::cmdCancel_Click);
 
   m_context.onFailure = [this](const WalkFailure& failure) {
-    m_vbe->Platform().ui().MsgBox(text(failure.messageId), ide::mb::Exclamation, common::title());
+    const int id = failure.messageId ? failure.messageId : walkMessageId(scope(), true);
+    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope()), ide::mb::Exclamation,
+                                  common::title());
   };
 
   m_txtSpaces->setText(m_settings.value(common::setting::Indentation).trimmed());
@@ -172,8 +174,11 @@ void frmIndenter::cmdIndent_Click() {
 void frmIndenter::walk(PROG_MODE scope, qint32 unit) {
   if (m_options.OneCommandNumIndent) {
     m_numIndent = std::make_unique<CNumIndent>(m_vbe);
-    m_numIndentError = m_numIndent->Error.connect([this](const QString& strError) {
-      m_vbe->Platform().ui().MsgBox(strError, ide::mb::OKOnly, common::title());
+    // The walk's message with the exclamation icon, naming the module and line, as the own walks report.
+    m_numIndentError = m_numIndent->Failed.connect([this, scope](const WalkFailure& failure) {
+      const int id = failure.messageId ? failure.messageId : walkMessageId(scope, true);
+      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope), ide::mb::Exclamation,
+                                    common::title());
       m_context.Cancel();
     });
     m_numIndent->DoIt(scope, &m_bar, kOneCommandStart, kOneCommandInterval, spaceMode(), unit, true);

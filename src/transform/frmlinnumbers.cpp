@@ -107,7 +107,9 @@ frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& sett
   // Walks report their failure with the message of the walk that caught it; lines they pass over are
   // not reported.
   m_context.onFailure = [this](const WalkFailure& failure) {
-    m_vbe->Platform().ui().MsgBox(text(failure.messageId), ide::mb::Exclamation, common::title());
+    const int id = failure.messageId ? failure.messageId : walkMessageId(scope(), false);
+    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope()), ide::mb::Exclamation,
+                                  common::title());
   };
 
   const NumberingOptions stored = storedNumbering(m_settings);
@@ -188,8 +190,12 @@ void frmLinNumbers::walk(PROG_MODE scope, bool add) {
   if (m_options.OneCommandNumIndent) {
     if (m_context.cancelled()) return;  // Cancel was clicked before the command existed
     m_numIndent = std::make_unique<CNumIndent>(m_vbe);
-    m_numIndentError = m_numIndent->Error.connect([this](const QString& strError) {
-      m_vbe->Platform().ui().MsgBox(strError, ide::mb::OKOnly, common::title());
+    // The walk's message with the exclamation icon, naming the module and line, as the own walks report.
+    m_numIndentError = m_numIndent->Failed.connect([this, scope](const WalkFailure& failure) {
+      const int id = failure.messageId ? failure.messageId
+                                       : walkMessageId(scope, failure.operation.startsWith(u"Indent"));
+      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope), ide::mb::Exclamation,
+                                    common::title());
       m_context.Cancel();
     });
     m_numIndent->DoIt(scope, &m_bar, m_startNumber, m_interval, false, 1, add);

@@ -112,10 +112,12 @@ void CNumIndent::DoIt(PROG_MODE Unit, ProgressSink* Progbar, qint32 StartNumber,
   WalkContext context(QStringLiteral("CNumIndent"), &m_vbe->Platform().loop(), Progbar);
   context.setYieldInterval(m_yieldInterval);
   context.onFailure = [this](const WalkFailure& failure) {
+    Failed.fire(failure);
     Error.fire(errorText(failure.error, failure.error.source()));
   };
   context.onLineSkipped = [this](const WalkFailure& failure) {
     // Numbering passes over the lines it cannot rewrite without a word; the indenter tells.
+    if (failure.operation.startsWith(u"Indent")) Failed.fire(failure);
     if (failure.operation == u"IndentLine")
       Error.fire(errorText(failure.error, QStringLiteral("IndentLine %1").arg(failure.line)));
     else if (failure.operation == u"IndentDeclarationLine")
@@ -148,6 +150,7 @@ void CNumIndent::DoIt(PROG_MODE Unit, ProgressSink* Progbar, qint32 StartNumber,
   } catch (const std::exception& failure) {
     const ide::Error error =
         common::recordError(failure, QStringLiteral("CNumIndent"), QStringLiteral("DoIt"), 0);
+    Failed.fire(WalkFailure{QStringLiteral("DoIt"), 0, {}, 0, error});
     Error.fire(errorText(error, error.source()));
   }
   if (!m_cancel) Finished.fire();

@@ -65,6 +65,8 @@ class CNumIndent {
   ide::Signal<> Begining;
   /// The error number, a blank, its description, a line feed and where it happened.
   ide::Signal<const QString& /*strError*/> Error;
+  /// The same failure, with the walk, module and line it happened in (raised just before Error).
+  ide::Signal<const WalkFailure&> Failed;
   ide::Signal<> Finished;
 
  private:

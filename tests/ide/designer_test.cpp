@@ -191,7 +191,7 @@ TEST_F(SobreTest, FontsAndAutoSizeLabels) {
   EXPECT_EQ(vbFont(control(u"cmdOk"_qs)->font()).pixelSize(), 11);
   EXPECT_EQ(control(u"cmdOk"_qs)->font().name, u"Tahoma"_qs);
   // Stand-ins of the classic fonts (fonts-wine and fonts-liberation are installed with the IDE).
-  const std::pair<const char*, const char*> families[] = {{"MS Sans Serif", "MS Sans Serif"},
+  const std::pair<const char*, const char*> families[] = {{"MS Sans Serif", "Tahoma"},
                                                           {"Tahoma", "Tahoma"},
                                                           {"Arial", "Liberation Sans"},
                                                           {"Courier New", "Liberation Mono"},

@@ -6,19 +6,30 @@
 #include "codeeditor.h"
 #include "codewindow.h"
 #include "commandbarview.h"
+#include "designerview.h"
 #include "host/model/events.h"
 #include "idecommands.h"
 #include "idefixture.h"
 #include "projectexplorer.h"
+#include "propertiesview.h"
 #include "windowmanager.h"
 
 #include <gtest/gtest.h>
 
+#include <QComboBox>
+#include <QDockWidget>
+#include <QLabel>
 #include <QMdiArea>
 #include <QMdiSubWindow>
 #include <QMenu>
+#include <QPlainTextEdit>
+#include <QStatusBar>
+#include <QTabBar>
+#include <QTableWidget>
 #include <QTemporaryDir>
 #include <QTest>
+#include <QTextBlock>
+#include <QToolButton>
 #include <QTreeWidgetItem>
 
 namespace desktop {
@@ -326,6 +337,112 @@ TEST_F(MainWindowTest, AContextMenuHoldsTheControlsOfItsBar) {
     if (!action->isSeparator()) captions << action->text();
   EXPECT_EQ(captions, (QStringList{u"Cu&t"_qs, u"&Copy"_qs, u"&Paste"_qs, u"Add &Watch..."_qs}));
   EXPECT_FALSE(menu.actions().last()->isEnabled());
+}
+
+// ---------------------------------------------------------------------------------------------------
+// The IDE's windows
+
+TEST_F(MainWindowTest, TheProjectWindowIsTitledByTheGroupAndTogglesItsFolders) {
+  EXPECT_EQ(m_window->findChild<QDockWidget*>(u"projectDock"_qs)->windowTitle(), u"Project - Demo"_qs);
+  EXPECT_EQ(m_window->statusBar()->currentMessage(), QString()) << "opened by the fixture, not the menu";
+  ASSERT_TRUE(m_window->commands().open(m_copy.groupFile(), true));
+  EXPECT_EQ(m_window->statusBar()->currentMessage(), u"Opened Demo.vbg"_qs)
+      << "the file name, never its folder";
+  settle();
+  auto* window = m_window->findChild<ProjectWindow*>(u"projectWindow"_qs);
+  ASSERT_TRUE(window);
+  ProjectExplorer& explorer = m_window->explorer();
+  // The buttons follow the selection: a module has code only, a form both.
+  explorer.setCurrentItem(explorer.itemOf(component(u"Loja"_qs, u"modPrincipal"_qs).get()));
+  EXPECT_TRUE(window->viewCode()->isEnabled());
+  EXPECT_FALSE(window->viewObject()->isEnabled());
+  explorer.setCurrentItem(explorer.itemOf(component(u"Loja"_qs, u"frmSobre"_qs).get()));
+  EXPECT_TRUE(window->viewObject()->isEnabled());
+  window->viewObject()->trigger();
+  settle();
+  ASSERT_TRUE(m_window->windows().activeDesigner());
+  // Without folders the components stand under their project, by name.
+  window->toggleFolders()->trigger();
+  QTreeWidgetItem* loja = explorer.topLevelItem(0);
+  EXPECT_EQ(loja->child(0)->childCount(), 0) << "no folder";
+  for (int i = 1; i < loja->childCount(); ++i)
+    EXPECT_LT(loja->child(i - 1)->text(0).compare(loja->child(i)->text(0), Qt::CaseInsensitive), 0);
+  window->toggleFolders()->trigger();
+  EXPECT_EQ(explorer.topLevelItem(0)->child(0)->text(0), u"Forms"_qs);
+  // The first project stays in view while the selected item leaves room for it.
+  m_window->show();
+  explorer.setCurrentItem(explorer.itemOf(component(u"Loja"_qs, u"ctlPainel"_qs).get()));
+  explorer.refresh();
+  EXPECT_EQ(explorer.visualItemRect(explorer.topLevelItem(0)).isValid(),
+            explorer.visualItemRect(explorer.currentItem()).bottom() < explorer.viewport()->height());
+}
+
+TEST_F(MainWindowTest, ThePropertiesWindowHasItsObjectBoxTabsAndDescription) {
+  auto form = component(u"Loja"_qs, u"frmSobre"_qs);
+  m_ide.vbe->activateWindow(form->designerWindow());
+  settle();
+  PropertiesView& properties = m_window->properties();
+  QComboBox* objects = properties.objectBox();
+  ASSERT_GT(objects->count(), 3);
+  EXPECT_EQ(objects->itemText(0), u"frmSobre Form"_qs);
+  EXPECT_EQ(objects->currentIndex(), 0);
+  for (int i = 2; i < objects->count(); ++i)
+    EXPECT_LT(objects->itemText(i - 1).compare(objects->itemText(i), Qt::CaseInsensitive), 0);
+  // Choosing a control in the box selects it in the designer.
+  const int ok = objects->findText(u"cmdOk CommandButton"_qs);
+  ASSERT_GE(ok, 0);
+  Q_EMIT objects->activated(ok);
+  settle();
+  EXPECT_EQ(m_window->windows().activeDesigner()->selectedControl()->name(), u"cmdOk"_qs);
+  EXPECT_EQ(properties.shownValue(u"Caption"_qs), u"OK"_qs.left(properties.shownValue(u"Caption"_qs).size()));
+
+  // Categorized: each category's title row, then its properties; the values are those of the Alphabetic tab.
+  const QString caption = properties.shownValue(u"Caption"_qs);
+  properties.tabs()->setCurrentIndex(1);
+  QTableWidget* grid = properties.table();
+  QStringList categories;
+  for (int row = 0; row < grid->rowCount(); ++row)
+    if (grid->columnSpan(row, 0) == 2) categories << grid->item(row, 0)->text();
+  EXPECT_TRUE(categories.contains(u"Appearance"_qs) && categories.contains(u"Position"_qs))
+      << categories.join(u',').toStdString();
+  EXPECT_EQ(properties.shownValue(u"Caption"_qs), caption);
+  // The description pane names the current property and says what it is.
+  for (int row = 0; row < grid->rowCount(); ++row)
+    if (grid->item(row, 0)->text() == u"Caption"_qs) grid->setCurrentCell(row, 1);
+  EXPECT_TRUE(properties.description()->text().contains(u"<b>Caption</b>"_qs));
+  EXPECT_GT(properties.description()->text().size(), 30);
+  properties.tabs()->setCurrentIndex(0);
+  EXPECT_EQ(grid->item(0, 0)->text(), u"(Name)"_qs);
+}
+
+TEST_F(MainWindowTest, CodeWindowsPartProceduresAndShowOneInProcedureView) {
+  QMdiSubWindow* sub = openCode(u"Loja"_qs, u"modPrincipal"_qs);
+  ASSERT_TRUE(sub);
+  auto* code = qobject_cast<CodeWindow*>(sub->widget());
+  ASSERT_TRUE(code);
+  auto module = component(u"Loja"_qs, u"modPrincipal"_qs)->codeModule();
+  // A separator above each procedure: at the line where its extent starts.
+  std::vector<int> starts;
+  for (const auto& procedure : module->text().procedures())
+    starts.push_back(module->ProcStartLine(procedure.name, procedure.kind));
+  EXPECT_EQ(code->editor()->separators(), starts);
+  EXPECT_TRUE(code->fullModuleViewButton()->isChecked());
+  // Procedure view shows the lines of the procedure at the caret only.
+  const auto& main = module->text().procedures().front();
+  const int start = module->ProcStartLine(main.name, main.kind);
+  module->pane()->SetSelection(start + 1, 1, start + 1, 1);
+  code->procedureViewButton()->click();
+  settle();
+  EXPECT_EQ(code->editor()->shownLines(),
+            std::pair(start, start + module->ProcCountLines(main.name, main.kind) - 1));
+  QTextDocument* document = code->editor()->document();
+  EXPECT_FALSE(document->findBlockByNumber(start - 2).isVisible());
+  EXPECT_TRUE(document->findBlockByNumber(start).isVisible());
+  code->fullModuleViewButton()->click();
+  EXPECT_TRUE(document->findBlockByNumber(start - 2).isVisible());
+  // The Immediate window is there, empty, in the code font.
+  ASSERT_TRUE(m_window->immediate());
+  EXPECT_TRUE(m_window->immediate()->toPlainText().isEmpty());
 }
 
 }  // namespace

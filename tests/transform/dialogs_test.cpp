@@ -260,26 +260,25 @@ TEST(LineNumberingDialog, WithTheOneCommandOptionNumbersAndIndentsWithTabs) {
                                                 u"\tEnd If"_qs, kFirst[5]}));
 }
 
-TEST(LineNumberingDialog, AnErrorEventOfTheOneCommandRouteIsShownPlainAndEndsTheRun) {
+TEST(LineNumberingDialog, AFailureOfTheOneCommandRouteShowsTheWalksMessageAndEndsTheRun) {
   Scene scene(true);
   scene.first->CodePane()->Window()->Close();  // no code window: no current procedure
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.show();
   dialog.cmdAdd()->click();
-  EXPECT_EQ(scene.boxes(),
-            (std::vector<Box>{{u"91 %1\nem CNumIndent_NumIndentCurrentProcedure, linha: 0"_qs.arg(
-                                   ide::standardDescription(ide::err::ObjectVariableNotSet)),
-                               ide::mb::OKOnly}}));
+  EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5123) + u" (erro 91)"_qs, ide::mb::Exclamation}}));
   EXPECT_TRUE(dialog.cancelled());
   EXPECT_FALSE(dialog.isVisible());  // a cancelled run closes at once
 }
 
-TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScope) {
+TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScopeWithItsModuleAndLine) {
   Scene scene;
   frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
   dialog.txtInitial()->setText(u"2147483647"_qs);
   dialog.cmdAdd()->click();
-  EXPECT_EQ(scene.boxes(), (std::vector<Box>{{text(5123), ide::mb::Exclamation}}));
+  EXPECT_EQ(scene.boxes(),
+            (std::vector<Box>{{text(5123) + u"\n\nMódulo %1, linha 4. (erro 6)"_qs.arg(scene.first->Name()),
+                               ide::mb::Exclamation}}));
   EXPECT_EQ(linesOf(*scene.first)[2], u"2147483647 If x Then"_qs);
   EXPECT_EQ(linesOf(*scene.first)[3], kFirst[3]);
 }
@@ -516,8 +515,25 @@ TEST(IndentationDialog, AModuleWalkFailureShowsTheModuleMessage) {
   dialog.opIndent(1)->setChecked(true);
   dialog.cmdIndent()->click();
   ASSERT_EQ(scene.vbe->headlessUi()->messageBoxes().size(), 1u);
-  EXPECT_EQ(scene.vbe->headlessUi()->messageBoxes()[0].prompt, text(5129));
+  EXPECT_TRUE(scene.vbe->headlessUi()->messageBoxes()[0].prompt.startsWith(text(5129)));
   EXPECT_EQ(scene.vbe->headlessUi()->messageBoxes()[0].style, ide::mb::Exclamation);
+}
+
+TEST(IndentationDialog, ALineTheOneCommandRouteWouldGrowTooLongIsNamedInTheWalksMessage) {
+  Scene scene(true);
+  // 1023 characters: any indentation pushes it past the IDE's limit, and its numbering fails silently.
+  auto module = scene.ide.addModule({u"Sub Longa()"_qs, u"If x Then"_qs,
+                                     u"y = \""_qs + QString(1017, u'a') + u'"', u"End If"_qs, u"End Sub"_qs});
+  scene.select(module);
+  frmIndenter dialog(scene.ide.vbe, scene.settings, scene.options);
+  dialog.opIndent(1)->setChecked(true);
+  dialog.cmdIndent()->click();
+  EXPECT_EQ(
+      scene.boxes(),
+      (std::vector<Box>{{text(5129) + u"\n\nMódulo %1, linha 3. A linha passaria de 1023 caracteres."_qs.arg(
+                                          module->Name()),
+                         ide::mb::Exclamation}}));
+  EXPECT_EQ(linesOf(*module)[2].size(), 1023);
 }
 
 // ---------------------------------------------------------------------------------------------------

@@ -30,11 +30,12 @@ LibraryEntryPoints resolve(QLibrary& library) {
 }  // namespace
 
 AddInImpl::AddInImpl(const std::shared_ptr<VbeImpl>& vbe, QString libraryPath, QString progId,
-                     QString description, bool loadOnStartup)
+                     QString description, bool loadOnStartup, QString details)
     : m_vbe(vbe),
       m_libraryPath(std::move(libraryPath)),
       m_progId(std::move(progId)),
       m_description(std::move(description)),
+      m_details(std::move(details)),
       m_loadOnStartup(loadOnStartup),
       m_library(m_libraryPath) {}
 
@@ -124,12 +125,13 @@ std::shared_ptr<AddInImpl> AddInsImpl::registerLibrary(const QString& path, bool
     ide::raise(kErrorLoadingDll, QStringLiteral("%1 does not describe itself").arg(absolute));
   const QString progId = QString::fromUtf8(description->progId);
   const QString text = QString::fromUtf8(description->description ? description->description : "");
+  const QString details = QString::fromUtf8(description->details ? description->details : "");
   for (const auto& existing : m_addIns) {
     if (existing->ProgId().compare(progId, Qt::CaseInsensitive) != 0) continue;
     existing->setLoadOnStartup(loadOnStartup);
     return existing;
   }
-  auto addIn = std::make_shared<AddInImpl>(m_vbe.lock(), absolute, progId, text, loadOnStartup);
+  auto addIn = std::make_shared<AddInImpl>(m_vbe.lock(), absolute, progId, text, loadOnStartup, details);
   m_addIns.push_back(addIn);
   return addIn;
 }

@@ -20,7 +20,7 @@ class VbeImpl;
 class AddInImpl final : public ide::AddIn, public std::enable_shared_from_this<AddInImpl> {
  public:
   AddInImpl(const std::shared_ptr<VbeImpl>& vbe, QString libraryPath, QString progId, QString description,
-            bool loadOnStartup);
+            bool loadOnStartup, QString details = {});
   ~AddInImpl() override;
 
   QString ProgId() override { return m_progId; }
@@ -32,6 +32,8 @@ class AddInImpl final : public ide::AddIn, public std::enable_shared_from_this<A
   ide::Ref<ide::VBE> VBE() override;
 
   QString libraryPath() const { return m_libraryPath; }
+  /// What the add-in says it does (its description when it says nothing more).
+  QString details() const { return m_details.isEmpty() ? m_description : m_details; }
   bool loadOnStartup() const { return m_loadOnStartup; }
   void setLoadOnStartup(bool load) { m_loadOnStartup = load; }
   /// Loads the library (once) and connects a new connection object.
@@ -48,6 +50,7 @@ class AddInImpl final : public ide::AddIn, public std::enable_shared_from_this<A
   QString m_libraryPath;
   QString m_progId;
   QString m_description;
+  QString m_details;
   bool m_loadOnStartup;
   QLibrary m_library;
   std::unique_ptr<ide::IDTExtensibility> m_connection;
