@@ -94,13 +94,13 @@ int runList(const ListOptions& options) {
         auto& text = module->text();
         printLine(
             QStringLiteral("%1\t(declarations)\t0\t0\t0\t%2").arg(path).arg(text.countOfDeclarationLines()));
-        for (const host::ProcInfo& proc : text.procedures()) {
+        for (const ide::ProcExtent& proc : text.procedureExtents()) {
           printLine(QStringLiteral("%1\t%2\t%3\t%4\t%5\t%6")
                         .arg(path, proc.name)
                         .arg(static_cast<int>(proc.kind))
-                        .arg(text.procStartLine(proc.name, proc.kind))
+                        .arg(proc.startLine)
                         .arg(proc.bodyLine)
-                        .arg(text.procCountLines(proc.name, proc.kind)));
+                        .arg(proc.countLines));
         }
         continue;
       }
@@ -112,19 +112,20 @@ int runList(const ListOptions& options) {
                     .arg(text.countOfLines())
                     .arg(text.countOfDeclarationLines()));
       // The procedures of each member, found by name once: a member does not search the whole module.
-      QHash<QString, std::vector<const host::ProcInfo*>> byMember;
-      for (const host::ProcInfo& proc : text.procedures())
-        byMember[proc.name.toCaseFolded()].push_back(&proc);
+      // Each procedure is listed at its own place, two of one name under #If ... #Else too.
+      const std::vector<ide::ProcExtent> extents = text.procedureExtents();
+      QHash<QString, std::vector<size_t>> byMember;
+      for (size_t i = 0; i < extents.size(); ++i)
+        byMember[extents[i].name.toCaseFolded()].push_back(i);
       for (const host::MemberInfo& member : text.members()) {
         printLine(QStringLiteral("    %1 %2 %3")
                       .arg(scopeName(member.scope), memberTypeName(member.type), member.name));
-        for (const host::ProcInfo* procedure : byMember.value(member.name.toCaseFolded())) {
-          const host::ProcInfo& proc = *procedure;
+        for (const size_t i : byMember.value(member.name.toCaseFolded())) {
           printLine(QStringLiteral("      %1: start %2, body %3, lines %4")
-                        .arg(procedureKeyword(proc))
-                        .arg(text.procStartLine(proc.name, proc.kind))
-                        .arg(proc.bodyLine)
-                        .arg(text.procCountLines(proc.name, proc.kind)));
+                        .arg(procedureKeyword(text.procedures()[i]))
+                        .arg(extents[i].startLine)
+                        .arg(extents[i].bodyLine)
+                        .arg(extents[i].countLines));
         }
       }
     }

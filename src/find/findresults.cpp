@@ -2,7 +2,7 @@
 #include "find/findresults.h"
 
 #include "common/strings.h"
-#include "transform/linetext.h"
+#include "syntax/text.h"
 
 namespace find {
 namespace {
@@ -80,7 +80,7 @@ int FindResults::RemoveItemsOfProject(const QString& name) {
 }
 
 int FindResults::removeWhere(const QString& name, QString FoundRow::*column) {
-  const auto matches = [&](size_t i) { return transform::trimmedView(m_rows[i].row.*column) == name; };
+  const auto matches = [&](size_t i) { return syntax::trimmedView(m_rows[i].row.*column) == name; };
   int removed = 0;
   // The rows of one module lie together: each run of them goes at once.
   for (size_t i = 0; i < m_rows.size();) {

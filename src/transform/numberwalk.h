@@ -31,14 +31,17 @@ class NumberingWalk {
   /// Removes the numbers of the lines between the header line and the End line; the header's
   /// continuation lines and every continuation line of a statement are left alone.
   void UnnumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+  /// The same two for the procedure at its place.
+  void NumberProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
+  void UnnumberProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
 
   /// Numbers (`add`) or unnumbers a procedure's lines in memory, as the two walks above do in the module:
   /// number-and-indent writes each line once, numbered and indented.
   void numberText(ProcedureText& text, bool add) const;
 
   /// One procedure, adding or removing.
-  void numberOrUnnumber(ide::CodeModule& module, const QString& name, ide::ProcKind kind, bool add) {
-    add ? NumberProcedure(module, name, kind) : UnnumberProcedure(module, name, kind);
+  void numberOrUnnumber(ide::CodeModule& module, const ide::ProcExtent& extent, bool add) {
+    add ? NumberProcedure(module, extent) : UnnumberProcedure(module, extent);
   }
 
  private:
@@ -48,6 +51,7 @@ class NumberingWalk {
   WalkContext& m_context;
   qint32 m_startNumber;
   qint32 m_interval;
+  ProcedureCache m_procedures;
 };
 
 }  // namespace transform
