@@ -2,10 +2,11 @@
 #include "vbhighlighter.h"
 
 #include "codecolours.h"
+#include "syntax/keywords.h"
+#include "syntax/line.h"
 
 #include <QPlainTextEdit>
 #include <QScrollBar>
-#include <QSet>
 #include <QTextBlock>
 #include <QTextDocument>
 
@@ -16,49 +17,6 @@ namespace {
 
 /// Lines coloured beyond the visible ones, so that small scrolls find them ready.
 constexpr int kMargin = 60;
-
-const QSet<QString>& keywords() {
-  static const QSet<QString> words = [] {
-    QSet<QString> set;
-    for (const char* word :
-         {"addressof", "alias",      "and",      "any",     "as",      "base",       "binary",
-          "boolean",   "byref",      "byte",     "byval",   "call",    "case",       "cbool",
-          "cbyte",     "ccur",       "cdate",    "cdbl",    "cdec",    "cint",       "clng",
-          "close",     "compare",    "const",    "csng",    "cstr",    "currency",   "cvar",
-          "date",      "debug",      "decimal",  "declare", "defbool", "defbyte",    "defcur",
-          "defdate",   "defdbl",     "defint",   "deflng",  "defobj",  "defsng",     "defstr",
-          "defvar",    "dim",        "do",       "double",  "each",    "else",       "elseif",
-          "empty",     "end",        "enum",     "eqv",     "erase",   "error",      "event",
-          "exit",      "explicit",   "false",    "for",     "friend",  "function",   "get",
-          "global",    "gosub",      "goto",     "if",      "imp",     "implements", "in",
-          "input",     "integer",    "is",       "let",     "lib",     "like",       "line",
-          "lock",      "long",       "loop",     "lset",    "me",      "mod",        "module",
-          "new",       "next",       "not",      "nothing", "null",    "object",     "on",
-          "open",      "option",     "optional", "or",      "output",  "paramarray", "preserve",
-          "print",     "private",    "property", "public",  "put",     "raiseevent", "random",
-          "read",      "redim",      "resume",   "return",  "rset",    "seek",       "select",
-          "set",       "shared",     "single",   "spc",     "static",  "step",       "stop",
-          "string",    "sub",        "tab",      "text",    "then",    "to",         "true",
-          "type",      "typeof",     "unlock",   "until",   "variant", "wend",       "while",
-          "with",      "withevents", "write",    "xor"})
-      set.insert(QString::fromLatin1(word));
-    return set;
-  }();
-  return words;
-}
-
-bool isWordStart(QChar c) {
-  return c.isLetter() || c == u'_';
-}
-bool isWordChar(QChar c) {
-  return c.isLetterOrNumber() || c == u'_';
-}
-
-/// A line (or comment) that ends with " _" goes on on the next line.
-bool continues(QStringView text) {
-  const QStringView trimmed = text.trimmed();
-  return trimmed.endsWith(u'_') && (trimmed.size() == 1 || trimmed.at(trimmed.size() - 2).isSpace());
-}
 
 void addRange(QList<QTextLayout::FormatRange>* formats, qsizetype start, qsizetype length,
               const QTextCharFormat& format) {
@@ -94,7 +52,7 @@ void VbHighlighter::applyColours() {
 }
 
 bool VbHighlighter::isKeyword(QStringView word) {
-  return keywords().contains(word.toString().toLower());
+  return syntax::isColouredKeyword(word);
 }
 
 bool VbHighlighter::nearVisible(int blockNumber) const {
@@ -135,10 +93,10 @@ bool VbHighlighter::startsInComment(const QTextBlock& block) const {
   QTextBlock previous = block.previous();
   if (!previous.isValid()) return false;
   if (previous.userState() != kNotColoured) return previous.userState() == kInComment;
-  if (!continues(previous.text())) return false;
+  if (!syntax::continues(previous.text())) return false;
   // Up to the first line of the logical line (at most 24 continuations), then read forward.
   std::vector<QString> lines;
-  while (previous.isValid() && continues(previous.text()) && lines.size() < 25) {
+  while (previous.isValid() && syntax::continues(previous.text()) && lines.size() < 25) {
     lines.push_back(previous.text());
     previous = previous.previous();
   }
@@ -177,83 +135,34 @@ void VbHighlighter::colourFrom(QTextBlock block) {
 
 bool VbHighlighter::colour(const QString& text, bool inComment,
                            QList<QTextLayout::FormatRange>* formats) const {
-  const qsizetype n = text.size();
-  if (inComment) {
-    addRange(formats, 0, n, m_comment);
-    return continues(text);
-  }
   const qsizetype before = formats ? formats->size() : 0;
-  bool statementStart = true;
-  qsizetype i = 0;
-  while (i < n) {
-    const QChar c = text.at(i);
-    if (c == u'\'') {
-      addRange(formats, i, n - i, m_comment);
-      return continues(text);
-    }
-    if (c == u'"') {
-      qsizetype j = i + 1;
-      while (j < n) {
-        if (text.at(j) == u'"') {
-          if (j + 1 < n && text.at(j + 1) == u'"') {
-            j += 2;
-            continue;
-          }
-          break;
-        }
-        ++j;
-      }
-      if (j >= n) {
+  syntax::Tokenizer tokens(text, inComment);
+  syntax::Token token;
+  while (tokens.next(token)) {
+    switch (token.type) {
+      case syntax::Token::Type::Comment:
+        addRange(formats, token.start, token.length, m_comment);
+        return syntax::continues(text);  // a comment that ends with the mark goes on below
+      case syntax::Token::Type::OpenString:
         // A string left open is a syntax error: the whole line takes the error colour.
         if (formats) {
           formats->resize(before);
-          addRange(formats, 0, n, m_error);
+          addRange(formats, 0, text.size(), m_error);
         }
         return false;
-      }
-      i = j + 1;
-      statementStart = false;
-      continue;
+      case syntax::Token::Type::Directive:
+        addRange(formats, token.start, token.length, m_keyword);
+        break;
+      case syntax::Token::Type::Word:
+        // A member after a dot (obj.Print, rs.Close) is not a keyword.
+        if (!token.afterDot && isKeyword(QStringView(text).sliced(token.start, token.length)))
+          addRange(formats, token.start, token.length, m_keyword);
+        else if (m_identifiers)
+          addRange(formats, token.start, token.length, m_identifier);
+        break;
+      default:
+        break;
     }
-    if (c == u'#' && statementStart) {  // #If, #Else, #Const ...
-      qsizetype j = i + 1;
-      while (j < n && isWordChar(text.at(j)))
-        ++j;
-      addRange(formats, i, j - i, m_keyword);
-      i = j;
-      statementStart = false;
-      continue;
-    }
-    if (isWordStart(c)) {
-      qsizetype j = i + 1;
-      while (j < n && isWordChar(text.at(j)))
-        ++j;
-      const QStringView word = QStringView(text).mid(i, j - i);
-      if (statementStart && word.compare(u"Rem", Qt::CaseInsensitive) == 0 &&
-          (j == n || text.at(j).isSpace())) {
-        addRange(formats, i, n - i, m_comment);
-        return continues(text);
-      }
-      // A member after a dot (obj.Print, rs.Close) is not a keyword.
-      const bool afterDot = i > 0 && text.at(i - 1) == u'.';
-      if (!afterDot && isKeyword(word))
-        addRange(formats, i, j - i, m_keyword);
-      else if (m_identifiers)
-        addRange(formats, i, j - i, m_identifier);
-      i = j;
-      statementStart = false;
-      continue;
-    }
-    if (c.isDigit() && statementStart) {  // a line number or label leaves the statement to come
-      while (i < n && text.at(i).isDigit())
-        ++i;
-      continue;
-    }
-    if (c == u':')
-      statementStart = true;
-    else if (!c.isSpace())
-      statementStart = false;
-    ++i;
   }
   return false;
 }

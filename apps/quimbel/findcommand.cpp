@@ -22,7 +22,7 @@
 #include "host/files/parallel.h"
 #include "host/files/projectfile.h"
 #include "ide/error.h"
-#include "transform/linetext.h"
+#include "syntax/line.h"
 
 #include <QDir>
 #include <QFile>
@@ -309,87 +309,20 @@ struct KeptLines {
   }
 };
 
-bool isAsciiBlank(char c) {
-  return c == ' ' || c == '\t';
-}
-
-/// Reads the words at the start of a line, in lower case; a word too long to be a keyword, or holding
-/// digits or underscores, comes back as "#".
-class WordReader {
- public:
-  WordReader(const char* text, qsizetype length) : m_text(text), m_length(length) {}
-
-  std::string_view next() {
-    while (m_position < m_length && isAsciiBlank(m_text[m_position]))
-      ++m_position;
-    size_t n = 0;
-    for (; m_position < m_length; ++m_position) {
-      const char c = m_text[m_position];
-      const bool letter = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
-      if (!letter && !(c >= '0' && c <= '9') && c != '_') break;
-      if (!letter || n == m_word.size()) return "#";
-      m_word[n++] = char(c | 0x20);
-    }
-    return std::string_view(m_word.data(), n);
-  }
-
- private:
-  const char* m_text;
-  qsizetype m_length;
-  qsizetype m_position = 0;
-  std::array<char, 9> m_word{};
-};
-
-bool isProcedureKeyword(std::string_view word) {
-  return word == "sub" || word == "function" || word == "property";
-}
-
-bool isModifier(std::string_view word) {
-  return word == "public" || word == "private" || word == "friend" || word == "global" || word == "static" ||
-         word == "dim";
-}
-
-/// Whether a statement's first line may open or close a procedure (modifiers, then Sub, Function or
-/// Property; End and one of them), or is a hidden attribute line: the lines that make a module's
-/// structure. Lines that are not are never told apart from blank lines past the declarations section.
+/// Whether a statement's first line may make the module's structure (a procedure header or end, a Type
+/// or Enum block, a directive of conditional compilation) or is a hidden attribute line. Lines that are not
+/// are never told apart from blank lines past the declarations section.
 bool mayBeStructural(const char* text, qsizetype length) {
-  WordReader words(text, length);
-  std::string_view word = words.next();
-  if (word.empty()) return false;
-  switch (word.front()) {
-    case 'a':
-      return word == "attribute";
-    case 'e':
-      return word == "end" && isProcedureKeyword(words.next());
-    case 'd':
-    case 'f':
-    case 'g':
-    case 'p':
-    case 's':
-      while (isModifier(word))
-        word = words.next();
-      return isProcedureKeyword(word);
-    default:
-      return false;
-  }
+  const syntax::Kind kind = syntax::classify(QByteArrayView(text, length)).kind;
+  return syntax::isStructural(kind) || kind == syntax::Kind::Attribute;
 }
 
-/// The line ends with a blank and an underscore (trailing blanks aside): the statement goes on below.
 bool continuesBytes(const char* text, qsizetype length) {
-  while (length > 0 && isAsciiBlank(text[length - 1]))
-    --length;
-  return length > 0 && text[length - 1] == '_' && (length == 1 || isAsciiBlank(text[length - 2]));
+  return syntax::continues(QByteArrayView(text, length));
 }
 
 bool isModuleAttribute(const char* text, qsizetype length) {
-  qsizetype i = 0;
-  while (i < length && isAsciiBlank(text[i]))
-    ++i;
-  if (length - i < 10 || qstrnicmp(text + i, "attribute", 9) != 0 || !isAsciiBlank(text[i + 9])) return false;
-  i += 9;
-  while (i < length && isAsciiBlank(text[i]))
-    ++i;
-  return length - i >= 3 && qstrnicmp(text + i, "vb_", 3) == 0;
+  return syntax::isModuleAttribute(QByteArrayView(text, length));
 }
 
 /// The lines of a module that decide where occurrences are: every line when the search uses wildcards
@@ -451,7 +384,7 @@ KeptLines keptLines(const QByteArray& bytes, const QString& path, const Search& 
   bool anyCandidate = false;
   const auto keep = [&](const LineSpan& line, bool holdsCandidate, bool first) {
     QString text = decode(line);
-    if (first && declarations && host::classifyStatement(text) == host::LineClass::ProcHeader)
+    if (first && declarations && syntax::classify(text).kind == syntax::Kind::ProcHeader)
       declarations = false;
     kept.add(std::move(text), line.end, line.number, holdsCandidate);
   };
@@ -568,7 +501,7 @@ ScannedModule scanModule(const QString& path, const Search& search) {
       const int codeLine = kept.fileLines[k] - int(headerCount) - int(attribute);
       result.occurrences.push_back({codeLine, kept.fileLines[k], int(match->first) + 1,
                                     procedure.isEmpty() ? find::declarationsText() : procedure,
-                                    transform::trimmedView(text).toString()});
+                                    syntax::trimmedView(text).toString()});
       from = match->first + 1;
     }
   }

@@ -72,11 +72,11 @@ QString procedureKeyword(const host::ProcInfo& proc) {
   }
 }
 
-/// The procedures of each member, found by name once: a member does not search the whole module.
-QHash<QString, std::vector<const host::ProcInfo*>> proceduresByMember(host::CodeText& text) {
-  QHash<QString, std::vector<const host::ProcInfo*>> byMember;
-  for (const host::ProcInfo& proc : text.procedures())
-    byMember[proc.name.toCaseFolded()].push_back(&proc);
+/// The procedures of each member, as indices into `extents`, found by name once: a member does not search
+/// the whole module. Each procedure keeps its own place, two of one name under #If ... #Else too.
+QHash<QString, std::vector<size_t>> proceduresByMember(const std::vector<ide::ProcExtent>& extents) {
+  QHash<QString, std::vector<size_t>> byMember;
+  for (size_t i = 0; i < extents.size(); ++i) byMember[extents[i].name.toCaseFolded()].push_back(i);
   return byMember;
 }
 
@@ -96,19 +96,19 @@ QJsonObject componentJson(host::ComponentImpl& component, const QString& path) {
   };
   object.insert(QStringLiteral("code_lines"), text.countOfLines());
   object.insert(QStringLiteral("declaration_lines"), text.countOfDeclarationLines());
-  const auto byMember = proceduresByMember(text);
+  const std::vector<ide::ProcExtent> extents = text.procedureExtents();
+  const auto byMember = proceduresByMember(extents);
   QJsonArray members;
   for (const host::MemberInfo& member : text.members()) {
     QJsonArray procedures;
-    for (const host::ProcInfo* procedure : byMember.value(member.name.toCaseFolded())) {
-      const int start = text.procStartLine(procedure->name, procedure->kind);
-      procedures.append(
-          QJsonObject{{QStringLiteral("kind"), procedureKeyword(*procedure)},
-                      {QStringLiteral("start_code_line"), start},
-                      {QStringLiteral("start_file_line"), fileLine(start)},
-                      {QStringLiteral("body_code_line"), procedure->bodyLine},
-                      {QStringLiteral("body_file_line"), fileLine(procedure->bodyLine)},
-                      {QStringLiteral("line_count"), text.procCountLines(procedure->name, procedure->kind)}});
+    for (const size_t i : byMember.value(member.name.toCaseFolded())) {
+      const ide::ProcExtent& extent = extents[i];
+      procedures.append(QJsonObject{{QStringLiteral("kind"), procedureKeyword(text.procedures()[i])},
+                                    {QStringLiteral("start_code_line"), extent.startLine},
+                                    {QStringLiteral("start_file_line"), fileLine(extent.startLine)},
+                                    {QStringLiteral("body_code_line"), extent.bodyLine},
+                                    {QStringLiteral("body_file_line"), fileLine(extent.bodyLine)},
+                                    {QStringLiteral("line_count"), extent.countLines}});
     }
     members.append(QJsonObject{{QStringLiteral("name"), member.name},
                                {QStringLiteral("type"), memberTypeName(member.type)},
@@ -169,13 +169,13 @@ int runList(const ListOptions& options) {
         auto& text = module->text();
         printLine(
             QStringLiteral("%1\t(declarations)\t0\t0\t0\t%2").arg(path).arg(text.countOfDeclarationLines()));
-        for (const host::ProcInfo& proc : text.procedures()) {
+        for (const ide::ProcExtent& proc : text.procedureExtents()) {
           printLine(QStringLiteral("%1\t%2\t%3\t%4\t%5\t%6")
                         .arg(path, proc.name)
                         .arg(static_cast<int>(proc.kind))
-                        .arg(text.procStartLine(proc.name, proc.kind))
+                        .arg(proc.startLine)
                         .arg(proc.bodyLine)
-                        .arg(text.procCountLines(proc.name, proc.kind)));
+                        .arg(proc.countLines));
         }
         continue;
       }
@@ -186,17 +186,17 @@ int runList(const ListOptions& options) {
       printLine(QStringLiteral("    %1 lines, declarations 1-%2")
                     .arg(text.countOfLines())
                     .arg(text.countOfDeclarationLines()));
-      const auto byMember = proceduresByMember(text);
+      const std::vector<ide::ProcExtent> extents = text.procedureExtents();
+      const auto byMember = proceduresByMember(extents);
       for (const host::MemberInfo& member : text.members()) {
         printLine(QStringLiteral("    %1 %2 %3")
                       .arg(scopeName(member.scope), memberTypeName(member.type), member.name));
-        for (const host::ProcInfo* procedure : byMember.value(member.name.toCaseFolded())) {
-          const host::ProcInfo& proc = *procedure;
+        for (const size_t i : byMember.value(member.name.toCaseFolded())) {
           printLine(QStringLiteral("      %1: start %2, body %3, lines %4")
-                        .arg(procedureKeyword(proc))
-                        .arg(text.procStartLine(proc.name, proc.kind))
-                        .arg(proc.bodyLine)
-                        .arg(text.procCountLines(proc.name, proc.kind)));
+                        .arg(procedureKeyword(text.procedures()[i]))
+                        .arg(extents[i].startLine)
+                        .arg(extents[i].bodyLine)
+                        .arg(extents[i].countLines));
         }
       }
     }

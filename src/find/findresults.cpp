@@ -2,7 +2,7 @@
 #include "find/findresults.h"
 
 #include "common/strings.h"
-#include "transform/linetext.h"
+#include "syntax/text.h"
 
 namespace find {
 namespace {
@@ -73,12 +73,12 @@ const CItemFound* FindResults::item(const QString& key) const {
 
 int FindResults::RemoveItemsOfComponent(const QString& name, const ide::Ref<ide::VBProject>& project) {
   return removeWhere([&](const FoundRow& row) {
-    return row.item.Project == project && transform::trimmedView(row.module) == name;
+    return row.item.Project == project && syntax::trimmedView(row.module) == name;
   });
 }
 
 int FindResults::RemoveItemsOfProject(const QString& name) {
-  return removeWhere([&](const FoundRow& row) { return transform::trimmedView(row.project) == name; });
+  return removeWhere([&](const FoundRow& row) { return syntax::trimmedView(row.project) == name; });
 }
 
 int FindResults::removeWhere(const std::function<bool(const FoundRow&)>& rowMatches) {

@@ -2,7 +2,7 @@
 #include "find/findwalk.h"
 
 #include "common/strings.h"
-#include "transform/linetext.h"
+#include "syntax/text.h"
 
 #include <algorithm>
 
@@ -122,7 +122,7 @@ bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::
     if (procedure.isEmpty()) procedure = declarationsText();
     const QString lineText = module->Lines(startLine, 1);
     m_report.found(FoundRow{projectName, moduleName, std::move(procedure),
-                            transform::trimmedView(lineText).toString(),
+                            syntax::trimmedView(lineText).toString(),
                             CItemFound{project, component, startLine, startColumn, endLine, endColumn}});
     ++m_rows;
     // One character after the start of this occurrence, so that overlapping ones are listed too.

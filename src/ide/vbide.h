@@ -111,6 +111,19 @@ class Members : public Collection<Member> {
   virtual Ref<ide::CodeModule> Parent() = 0;
 };
 
+/// A procedure at its place in a module, with the lines ProcStartLine, ProcBodyLine and ProcCountLines
+/// give for it.
+struct ProcExtent {
+  QString name;
+  ProcKind kind = ProcKind::Proc;
+  int startLine = 0;
+  int bodyLine = 0;
+  /// The header's last line: its continuation lines, and the alternative headers that conditional
+  /// compilation may give one procedure (#If ... #Else ... #End If around its header lines).
+  int headerEnd = 0;
+  int countLines = 0;
+};
+
 /// The code of a component: the text the code window shows, without the file header and the hidden
 /// attributes. Stays the same object while its component is open.
 class CodeModule {
@@ -143,6 +156,11 @@ class CodeModule {
   virtual int ProcCountLines(const QString& procName, ProcKind kind) = 0;
   /// The procedure that owns `line` and its kind; "" and Proc in the declarations section.
   virtual QString ProcOfLine(int line, ProcKind& kind) = 0;
+  /// Every procedure in line order, each with its own extent. The lookups by name above answer with the
+  /// first procedure of a name and kind, as the IDE does; this list holds the others too, such as two
+  /// procedures of one name in alternative branches of conditional compilation. Declare statements are
+  /// not procedures.
+  virtual std::vector<ProcExtent> Procedures() = 0;
 
   /// Searches forward from (startLine, startColumn) to (endLine, endColumn) inclusive; -1 ends mean the
   /// end of the module or line. On success the four positions are set to the match, the end column one

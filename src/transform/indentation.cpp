@@ -4,14 +4,18 @@
 #include "transform/indentation.h"
 
 #include "ide/error.h"
+#include "syntax/line.h"
 
 namespace transform {
 
 namespace {
 
+using syntax::Kind;
+using syntax::NumberPrefix;
+
 // The number prefix of a trimmed line: `head` is written back as found, followed by one space when
 // `space` is set; `code` is the trimmed rest.
-struct NumberPrefix {
+struct SplitPrefix {
   QStringView head;
   bool space = false;
   QStringView code;
@@ -19,47 +23,24 @@ struct NumberPrefix {
   qsizetype length() const { return head.size() + (space ? 1 : 0); }
 };
 
-NumberPrefix splitNumberPrefix(QStringView t) {
-  if (!mayBeginNumber(t)) return {{}, false, t};
-  const qsizetype colon = t.indexOf(u':');
-  if (colon > 0 && isUsableNumber(t.first(colon)))
-    return {t.first(colon + 1), false, trimmedView(t.sliced(colon + 1))};
-  // The blanks between a number and its comment are indentation: keeping them in the prefix would widen
-  // the number column on every run.
-  const qsizetype quote = t.indexOf(u'\'');
-  if (quote > 0 && isUsableNumber(t.first(quote)))
-    return {rightTrimmedView(t.first(quote)), true, t.sliced(quote)};
-  const qsizetype blank = indexOfBlank(t);
-  if (blank > 0 && isUsableNumber(t.first(blank)))
-    return {t.first(blank), true, trimmedView(t.sliced(blank + 1))};
-  return {{}, false, t};
-}
-
-// The statement part of a trimmed line: the text before its comment mark, without trailing blanks. Quotes
-// toggle string literals; a doubled quote inside a literal toggles twice and so stays inside.
-QStringView codePart(QStringView t) {
-  bool inString = false;
-  for (qsizetype i = 0; i < t.size(); ++i) {
-    if (t[i] == u'"') {
-      inString = !inString;
-    } else if (t[i] == u'\'' && !inString) {
-      return rightTrimmedView(t.first(i));
-    }
+SplitPrefix splitNumberPrefix(QStringView t) {
+  const NumberPrefix prefix = syntax::numberPrefix(t);
+  switch (prefix.form) {
+    case NumberPrefix::Form::Colon:
+      return {t.first(prefix.number.size() + 1), false, syntax::trimmedView(prefix.rest)};
+    case NumberPrefix::Form::Blank:
+    case NumberPrefix::Form::Comment:
+      // The blanks between a number and its code or comment are indentation: keeping them in the prefix
+      // would widen the number column on every run.
+      return {prefix.number, true, syntax::trimmedView(prefix.rest)};
+    default:
+      return {{}, false, t};
   }
-  return rightTrimmedView(t);
 }
 
 bool endsWithThen(QStringView code) {
-  if (!code.endsWith(u"Then")) return false;
-  return code.size() == 4 || isBlank(code[code.size() - 5]);
-}
-
-// `keyword` alone, or followed by a blank or a comment: "Next i" and "Loop ' x" but not "Nextx = 1".
-bool isWord(QStringView t, QStringView keyword) {
-  if (!t.startsWith(keyword)) return false;
-  if (t.size() == keyword.size()) return true;
-  const QChar next = t[keyword.size()];
-  return isBlank(next) || next == u'\'';
+  if (code.size() < 4 || !syntax::isKeyword(code.last(4), u"Then")) return false;
+  return code.size() == 4 || syntax::isBlank(code[code.size() - 5]);
 }
 
 // What a line does to the levels.
@@ -76,72 +57,55 @@ enum class Action {
   Close,
 };
 
-Action classifyDirective(QStringView t) {
-  if (t.startsWith(u"#If ")) return Action::If;
-  if (t.startsWith(u"#End If")) return Action::Close;
-  if (t.startsWith(u"#ElseIf ")) return Action::ElseIf;
-  if (isWord(t, u"#Else")) return Action::Else;
-  return Action::Ordinary;
-}
-
-Action classifyBodyLine(QStringView t) {
-  if (t.isEmpty()) return Action::Ordinary;
-  switch (t.front().unicode()) {
-    case u'E':
-      if (isProcedureEnd(t)) return Action::ProcedureEnd;
-      if (t.startsWith(u"End If") || t.startsWith(u"End With")) return Action::Close;
-      if (t.startsWith(u"End Select")) return Action::EndSelect;
-      if (t.startsWith(u"ElseIf ")) return Action::ElseIf;
-      if (isWord(t, u"Else")) return Action::Else;
-      break;
-    case u'I':
-      if (t.startsWith(u"If ")) return Action::If;
-      break;
-    case u'S':
-      if (t.startsWith(u"Select Case ")) return Action::OpenSelect;
-      break;
-    case u'C':
-      if (t.startsWith(u"Case ")) return Action::Case;
-      break;
-    case u'W':
-      if (t.startsWith(u"With ") || t.startsWith(u"While ")) return Action::Open;
-      if (isWord(t, u"Wend")) return Action::Close;
-      break;
-    case u'F':
-      if (t.startsWith(u"For ")) return Action::Open;
-      break;
-    case u'N':
-      if (isWord(t, u"Next")) return Action::Close;
-      break;
-    case u'D':
-      // DoEvents and other names that begin with Do are ordinary calls.
-      if (isWord(t, u"Do")) return Action::Open;
-      break;
-    case u'L':
-      if (isWord(t, u"Loop")) return Action::Close;
-      break;
-    case u'#':
-      return classifyDirective(t);
+Action actionOf(Kind kind) {
+  switch (kind) {
+    case Kind::ProcEnd:
+      return Action::ProcedureEnd;
+    case Kind::If:
+    case Kind::DirectiveIf:
+      return Action::If;
+    case Kind::ElseIf:
+    case Kind::DirectiveElseIf:
+      return Action::ElseIf;
+    case Kind::Else:
+    case Kind::DirectiveElse:
+      return Action::Else;
+    case Kind::With:
+    case Kind::While:
+    case Kind::For:
+    case Kind::Do:
+      return Action::Open;
+    case Kind::SelectCase:
+      return Action::OpenSelect;
+    case Kind::EndSelect:
+      return Action::EndSelect;
+    case Kind::Case:
+      return Action::Case;
+    case Kind::EndIf:
+    case Kind::EndWith:
+    case Kind::Wend:
+    case Kind::Next:
+    case Kind::Loop:
+    case Kind::DirectiveEndIf:
+      return Action::Close;
+    default:
+      return Action::Ordinary;
   }
-  return Action::Ordinary;
 }
 
-// Inside a Type or Enum block every line up to its End is a member, whatever its name ("Type As Byte").
+// In the declarations only Type and Enum blocks and directives change levels. Inside a Type or Enum block
+// every line up to its End is a member, whatever its name ("Type As Byte").
 Action classifyDeclaration(QStringView t, bool& inTypeBlock) {
-  if (t.startsWith(u'#')) return classifyDirective(t);
-  if (t.startsWith(u"End Type") || t.startsWith(u"End Enum")) {
+  const Kind kind = syntax::classify(t).kind;
+  if (syntax::isDirective(kind)) return actionOf(kind);
+  if (kind == Kind::TypeEnd || kind == Kind::EnumEnd) {
     inTypeBlock = false;
     return Action::Close;
   }
   if (inTypeBlock) return Action::Ordinary;
-  static constexpr QStringView kOpeners[] = {
-      u"Type ", u"Enum ", u"Public Type ", u"Public Enum ", u"Private Type ", u"Private Enum ",
-  };
-  for (QStringView opener : kOpeners) {
-    if (t.startsWith(opener)) {
-      inTypeBlock = true;
-      return Action::Open;
-    }
+  if (kind == Kind::TypeBegin || kind == Kind::EnumBegin) {
+    inTypeBlock = true;
+    return Action::Open;
   }
   return Action::Ordinary;
 }
@@ -149,17 +113,17 @@ Action classifyDeclaration(QStringView t, bool& inTypeBlock) {
 }  // namespace
 
 bool IsBlockIf(QStringView trimmed) {
-  return endsWithContinuation(trimmed) || endsWithThen(codePart(trimmed));
+  return syntax::continues(trimmed) || endsWithThen(syntax::codePart(trimmed));
 }
 
 bool IfEndsSingleLine(QStringView trimmed) {
   // A line that is itself continued does not end the header yet.
-  if (endsWithContinuation(trimmed)) return false;
-  return !endsWithThen(codePart(trimmed));
+  if (syntax::continues(trimmed)) return false;
+  return !endsWithThen(syntax::codePart(trimmed));
 }
 
 qsizetype numberPrefixLength(QStringView line) {
-  const QStringView t = trimmedView(line);
+  const QStringView t = syntax::trimmedView(line);
   return t.isEmpty() ? 0 : splitNumberPrefix(t).length();
 }
 
@@ -207,7 +171,7 @@ void Indenter::PopBlock(qint32 mask) {
 }
 
 bool Indenter::indent(QString& line, bool& statementContinued, bool declaration) {
-  const QStringView t = trimmedView(line);
+  const QStringView t = syntax::trimmedView(line);
   if (t.isEmpty()) return false;
 
   Layout layout;
@@ -217,16 +181,16 @@ bool Indenter::indent(QString& line, bool& statementContinued, bool declaration)
     action = classifyDeclaration(t, m_inTypeBlock);
   } else {
     const bool continuationLine = statementContinued || m_lineContinues;
-    const NumberPrefix prefix = continuationLine ? NumberPrefix{{}, false, t} : splitNumberPrefix(t);
+    const SplitPrefix prefix = continuationLine ? SplitPrefix{{}, false, t} : splitNumberPrefix(t);
     const qsizetype column = m_numberColumn.size();
     layout.head = prefix.head;
     layout.code = prefix.code;
     layout.spaces = prefix.head.isEmpty()
                         ? column
                         : (prefix.space ? 1 : 0) + std::max<qsizetype>(0, column - prefix.length());
-    action = classifyBodyLine(prefix.code);
+    action = continuationLine ? Action::Ordinary : actionOf(syntax::classify(prefix.code).kind);
   }
-  const bool continues = endsWithContinuation(t);
+  const bool continues = syntax::continues(t);
   m_lineContinues = continues;
 
   bool changed = false;
@@ -295,7 +259,7 @@ bool Indenter::opener(QString& line, const Layout& layout, bool& statementContin
 }
 
 bool Indenter::ordinary(QString& line, const Layout& layout, bool& statementContinued) {
-  const bool continues = endsWithContinuation(layout.code);
+  const bool continues = syntax::continues(layout.code);
   bool previous = false;
   if (!m_ifContinued && !m_caseContinued) {
     previous = statementContinued;

@@ -4,7 +4,7 @@
 // one declarations section at a time and replace only the lines reported changed.
 #pragma once
 
-#include "transform/linetext.h"
+#include "syntax/line.h"
 
 #include <QString>
 #include <QStringView>
@@ -66,10 +66,10 @@ QString NumberColumnWidth(const Lines& bodyLines) {
   qsizetype width = 0;
   bool continued = false;
   for (const auto& line : bodyLines) {
-    const QStringView trimmed = trimmedView(QStringView(line));
+    const QStringView trimmed = syntax::trimmedView(QStringView(line));
     if (trimmed.isEmpty()) continue;
     if (!continued) width = std::max(width, numberPrefixLength(trimmed));
-    continued = endsWithContinuation(trimmed);
+    continued = syntax::continues(trimmed);
   }
   return QString(width, u' ');
 }

@@ -2,7 +2,7 @@
 // The indentation walks.
 #include "transform/indentwalk.h"
 
-#include "transform/linetext.h"
+#include "syntax/line.h"
 
 #include <span>
 
@@ -40,15 +40,15 @@ void IndentationWalk::IndentMember(const ide::Ref<ide::CodeModule>& module,
                                    const ide::Ref<ide::Member>& member) {
   m_context.guard(u"IndentMember", kProcedureFailed, module.get(), [&] {
     if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
-    forEachProcedure(*module, *member, true,
-                     [&](const QString& name, ide::ProcKind kind) { IndentProcedure(*module, name, kind); });
+    m_procedures.of(*module).forMember(
+        *member, [&](const ide::ProcExtent& extent) { IndentProcedure(*module, extent); });
   });
 }
 
 void IndentationWalk::IndentCurrentProcedure(ide::VBE& vbe) {
   m_context.guard(u"IndentCurrentProcedure", kProcedureFailed, nullptr, [&] {
     const ProcedureRef procedure = currentProcedure(vbe);
-    if (!procedure.name.isEmpty()) IndentProcedure(*procedure.module, procedure.name, procedure.kind);
+    if (procedure.extent) IndentProcedure(*procedure.module, *procedure.extent);
     m_context.AdvanceProgress(1);
   });
 }
@@ -58,19 +58,24 @@ bool IndentationWalk::beginProcedure(const ProcedureText& text) {
   const auto body = std::span<const QString>(text.lines)
                         .subspan(size_t(std::min(text.first, text.stop)), size_t(bodyLines));
   m_indenter.beginProcedure(NumberColumnWidth(body));
-  return isContinued(text.lines.front());
+  return syntax::continues(text.lines[size_t(text.bodyFrom - 1)]);
 }
 
 void IndentationWalk::IndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  ProcedureText text;
+  ide::ProcExtent extent;
   try {
-    text = readProcedure(module, name, kind);
+    extent = extentOf(module, name, kind);
   } catch (const std::exception&) {
     return;  // a kind the property lacks, or a procedure that is gone
   }
+  IndentProcedure(module, extent);
+}
+
+void IndentationWalk::IndentProcedure(ide::CodeModule& module, const ide::ProcExtent& extent) {
+  ProcedureText text = readProcedure(module, extent);
   // Header continuation lines are indented like the body, one unit in.
   bool continued = beginProcedure(text);
-  for (qsizetype i = 1; i < text.stop; ++i) {
+  for (qsizetype i = text.bodyFrom; i < text.stop; ++i) {
     if (m_context.yieldAndCheck()) return;
     const int line = text.moduleLine(i);
     m_context.setLine(line);
@@ -86,7 +91,7 @@ void IndentationWalk::IndentProcedure(ide::CodeModule& module, const QString& na
 
 void IndentationWalk::indentText(ProcedureText& text) {
   bool continued = beginProcedure(text);
-  for (qsizetype i = 1; i < text.stop; ++i)
+  for (qsizetype i = text.bodyFrom; i < text.stop; ++i)
     m_indenter.IndentLine(text.lines[size_t(i)], continued);
 }
 

@@ -29,6 +29,8 @@ class IndentationWalk {
   /// unit in, the body by its blocks, line numbers in a column as wide as the widest. The header and the
   /// End line are left as they are. Quietly does nothing for a procedure the module does not have.
   void IndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+  /// The same for the procedure at its place.
+  void IndentProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
   /// Indents a procedure's lines in memory, as IndentProcedure does in the module.
   void indentText(ProcedureText& text);
 
@@ -41,6 +43,7 @@ class IndentationWalk {
 
   WalkContext& m_context;
   Indenter m_indenter;
+  ProcedureCache m_procedures;
 };
 
 }  // namespace transform

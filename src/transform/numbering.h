@@ -4,13 +4,10 @@
 #pragma once
 
 #include "ide/error.h"
-#include "transform/linetext.h"
+#include "syntax/jumps.h"
 
-#include <QSet>
 #include <QString>
 #include <QStringView>
-
-#include <span>
 
 namespace transform {
 
@@ -25,24 +22,7 @@ class LineNumberOverflow : public ide::Error {
   LineNumberOverflow();
 };
 
-/// The numeric labels that the statements of one procedure jump to: the labels after GoTo, GoSub and
-/// Resume, the lists of On ... GoTo and On ... GoSub, and a number right after Then or Else (a one-line If
-/// jumps there). Jumps inside string literals and comments do not count, and On Error GoTo 0 and Resume 0
-/// name no label. A line that begins with such a label is the target of a jump: numbering or removing
-/// numbers there would leave the jump without its target, so the rules leave the line exactly as it is.
-class JumpTargets {
- public:
-  /// No jumps.
-  JumpTargets() = default;
-  /// The jumps of a procedure's lines, continued statements included.
-  explicit JumpTargets(std::span<const QString> lines);
-
-  /// True when `line` begins (after its leading blanks) with a numeric label that a jump names.
-  bool isTarget(QStringView line) const;
-
- private:
-  QSet<QString> m_labels;  // the label's digits without leading zeros
-};
+using syntax::JumpTargets;
 
 /// Adds a line number to one line of a procedure body (the header, its continuation lines and the End line
 /// are never passed in). `runningNumber` is the number of the previous numbered line: a walker starts each
@@ -62,6 +42,27 @@ class JumpTargets {
 /// line would be numbered past the 32-bit range.
 bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32 interval,
                 const JumpTargets& targets = JumpTargets());
+
+/// NumberLine over the body of one procedure, line after line, with the state the lines pass on: the
+/// running number, the continuation flag, and a Type or Enum block that broken code may hold inside a
+/// procedure (its lines are declarations, which never get a number: numbering its End line would hide
+/// the block's end from every reader of the module).
+class BodyNumbering {
+ public:
+  BodyNumbering(qint32 numberBeforeFirst, qint32 interval, const JumpTargets& targets)
+      : m_number(numberBeforeFirst), m_interval(interval), m_targets(targets) {}
+  /// Numbers the next line; returns whether it changed. Throws LineNumberOverflow as NumberLine.
+  bool number(QString& line);
+  /// The next numbered line gets `numberBefore` + the interval.
+  void continueFrom(qint32 numberBefore) { m_number = numberBefore; }
+
+ private:
+  qint32 m_number;
+  qint32 m_interval;
+  const JumpTargets& m_targets;
+  bool m_continuation = false;
+  bool m_inTypeBlock = false;
+};
 
 /// Removes the line number from one line: a leading usable number followed by ": " loses the number and
 /// those two characters; a leading usable number followed by a blank loses the number and that one blank,

@@ -2,7 +2,7 @@
 // The line-numbering walks.
 #include "transform/numberwalk.h"
 
-#include "transform/linetext.h"
+#include "syntax/line.h"
 #include "transform/numbering.h"
 
 #include <limits>
@@ -43,10 +43,9 @@ void NumberingWalk::NumberMember(const ide::Ref<ide::CodeModule>& module, const 
                                  bool add) {
   m_context.guard(u"NumberMember", kProcedureFailed, module.get(), [&] {
     if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
-    // Adding passes over Declare statements, which are listed as methods; removing cannot harm them.
-    forEachProcedure(*module, *member, add, [&](const QString& name, ide::ProcKind kind) {
-      numberOrUnnumber(*module, name, kind, add);
-    });
+    // Declare statements, which are listed as methods, have no procedure to number.
+    m_procedures.of(*module).forMember(
+        *member, [&](const ide::ProcExtent& extent) { numberOrUnnumber(*module, extent, add); });
     m_context.AdvanceProgress(1);
   });
 }
@@ -54,7 +53,7 @@ void NumberingWalk::NumberMember(const ide::Ref<ide::CodeModule>& module, const 
 void NumberingWalk::NumberCurrentProcedure(ide::VBE& vbe, bool add) {
   m_context.guard(u"NumberCurrentProcedure", kProcedureFailed, nullptr, [&] {
     const ProcedureRef procedure = currentProcedure(vbe);
-    if (!procedure.name.isEmpty()) numberOrUnnumber(*procedure.module, procedure.name, procedure.kind, add);
+    if (procedure.extent) numberOrUnnumber(*procedure.module, *procedure.extent, add);
     m_context.AdvanceProgress(1);
   });
 }
@@ -67,40 +66,45 @@ qint32 NumberingWalk::numberBeforeFirst() const {
 }
 
 void NumberingWalk::NumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  ProcedureText text;
   try {
-    text = readProcedure(module, name, kind);
-  } catch (const std::exception&) {
-    return;  // a kind the property lacks, or a procedure that is gone
+    NumberProcedure(module, extentOf(module, name, kind));
+  } catch (const ide::Error& error) {
+    if (error.number() != ide::err::SubOrFunctionNotDefined) throw;  // a kind the property lacks
   }
+}
+
+void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
+  try {
+    UnnumberProcedure(module, extentOf(module, name, kind));
+  } catch (const ide::Error& error) {
+    if (error.number() != ide::err::SubOrFunctionNotDefined) throw;
+  }
+}
+
+void NumberingWalk::NumberProcedure(ide::CodeModule& module, const ide::ProcExtent& extent) {
+  ProcedureText text = readProcedure(module, extent);
   const JumpTargets targets(text.lines);
-  qint32 number = numberBeforeFirst();
-  bool continuation = false;
+  BodyNumbering numbering(numberBeforeFirst(), m_interval, targets);
   for (qsizetype i = text.first; i < text.stop; ++i) {
     if (m_context.yieldAndCheck()) return;
     const int line = text.moduleLine(i);
     m_context.setLine(line);
     try {
       QString& code = text.lines[size_t(i)];
-      if (m_numberOf) number = m_numberOf(line) - m_interval;
-      if (NumberLine(code, number, continuation, m_interval, targets)) module.ReplaceLine(line, code);
+      if (m_numberOf) numbering.continueFrom(m_numberOf(line) - m_interval);
+      if (numbering.number(code)) module.ReplaceLine(line, code);
     } catch (const std::exception& failure) {
       m_context.lineSkipped(failure, u"NumberLine", module, line);
     }
   }
 }
 
-void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  ProcedureText text;
-  try {
-    text = readProcedure(module, name, kind);
-  } catch (const std::exception&) {
-    return;
-  }
+void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const ide::ProcExtent& extent) {
+  ProcedureText text = readProcedure(module, extent);
   const JumpTargets targets(text.lines);
   // The header's continuation lines hold parameters, never line numbers.
-  bool continuation = isContinued(text.lines.front());
-  for (qsizetype i = 1; i < text.unnumberStop; ++i) {
+  bool continuation = syntax::continues(text.lines[size_t(text.bodyFrom - 1)]);
+  for (qsizetype i = text.bodyFrom; i < text.unnumberStop; ++i) {
     if (m_context.yieldAndCheck()) return;
     const int line = text.moduleLine(i);
     m_context.setLine(line);
@@ -116,17 +120,16 @@ void NumberingWalk::UnnumberProcedure(ide::CodeModule& module, const QString& na
 void NumberingWalk::numberText(ProcedureText& text, bool add) const {
   const JumpTargets targets(text.lines);
   if (add) {
-    qint32 number = numberBeforeFirst();
-    bool continuation = false;
+    BodyNumbering numbering(numberBeforeFirst(), m_interval, targets);
     for (qsizetype i = text.first; i < text.stop; ++i) {
       m_context.setLine(text.moduleLine(i));  // where an overflow is reported
-      if (m_numberOf) number = m_numberOf(text.moduleLine(i)) - m_interval;
-      NumberLine(text.lines[size_t(i)], number, continuation, m_interval, targets);
+      if (m_numberOf) numbering.continueFrom(m_numberOf(text.moduleLine(i)) - m_interval);
+      numbering.number(text.lines[size_t(i)]);
     }
     return;
   }
-  bool continuation = isContinued(text.lines.front());
-  for (qsizetype i = 1; i < text.unnumberStop; ++i)
+  bool continuation = syntax::continues(text.lines[size_t(text.bodyFrom - 1)]);
+  for (qsizetype i = text.bodyFrom; i < text.unnumberStop; ++i)
     UnnumberLine(text.lines[size_t(i)], continuation, targets);
 }
 

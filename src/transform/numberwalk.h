@@ -33,6 +33,9 @@ class NumberingWalk {
   /// Removes the numbers of the lines between the header line and the End line; the header's
   /// continuation lines and every continuation line of a statement are left alone.
   void UnnumberProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+  /// The same two for the procedure at its place.
+  void NumberProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
+  void UnnumberProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
 
   /// Numbers (`add`) or unnumbers a procedure's lines in memory, as the two walks above do in the module:
   /// number-and-indent writes each line once, numbered and indented.
@@ -43,8 +46,8 @@ class NumberingWalk {
   void setLineNumbers(std::function<qint32(int moduleLine)> numberOf) { m_numberOf = std::move(numberOf); }
 
   /// One procedure, adding or removing.
-  void numberOrUnnumber(ide::CodeModule& module, const QString& name, ide::ProcKind kind, bool add) {
-    add ? NumberProcedure(module, name, kind) : UnnumberProcedure(module, name, kind);
+  void numberOrUnnumber(ide::CodeModule& module, const ide::ProcExtent& extent, bool add) {
+    add ? NumberProcedure(module, extent) : UnnumberProcedure(module, extent);
   }
 
  private:
@@ -55,6 +58,7 @@ class NumberingWalk {
   qint32 m_startNumber;
   qint32 m_interval;
   std::function<qint32(int)> m_numberOf;
+  ProcedureCache m_procedures;
 };
 
 }  // namespace transform

@@ -44,27 +44,22 @@ void NumIndentWalk::NumIndentMember(const ide::Ref<ide::CodeModule>& module,
 void NumIndentWalk::NumIndentCurrentProcedure(ide::VBE& vbe, qint32 totalUnits) {
   m_context.guard(u"NumIndentCurrentProcedure", 0, nullptr, [&] {
     const ProcedureRef procedure = currentProcedure(vbe);
-    if (procedure.name.isEmpty()) {
+    if (!procedure.extent) {
       m_context.AdvanceProgress(totalUnits);
       return;
     }
-    numIndentProcedure(*procedure.module, procedure.name, procedure.kind);
+    numIndentProcedure(*procedure.module, *procedure.extent);
   });
 }
 
 void NumIndentWalk::memberProcedures(const ide::Ref<ide::CodeModule>& module,
                                      const ide::Ref<ide::Member>& member) {
-  forEachProcedure(*module, *member, true,
-                   [&](const QString& name, ide::ProcKind kind) { numIndentProcedure(*module, name, kind); });
+  m_procedures.of(*module).forMember(*member,
+                                     [&](const ide::ProcExtent& extent) { numIndentProcedure(*module, extent); });
 }
 
-void NumIndentWalk::numIndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
-  ProcedureText text;
-  try {
-    text = readProcedure(module, name, kind);
-  } catch (const std::exception&) {
-    return;  // a kind the property lacks, or a procedure that is gone
-  }
+void NumIndentWalk::numIndentProcedure(ide::CodeModule& module, const ide::ProcExtent& extent) {
+  ProcedureText text = readProcedure(module, extent);
   // Numbered first, so that the indenter lines the new numbers up in its number column; both in memory,
   // so that each line is written once, and not at all when numbering and indenting give it back as it
   // was (renumbering widens a number's blank, which re-indenting takes away again).

@@ -33,12 +33,13 @@ class NumIndentWalk {
 
  private:
   void memberProcedures(const ide::Ref<ide::CodeModule>& module, const ide::Ref<ide::Member>& member);
-  void numIndentProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+  void numIndentProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
 
   WalkContext& m_context;
   NumberingWalk m_numbering;
   IndentationWalk m_indentation;
   bool m_add;
+  ProcedureCache m_procedures;
 };
 
 /// The number-and-indent command: one run over a scope of the IDE, reporting on the caller's progress

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "transform/options.h"
 
-#include "transform/linetext.h"
+#include "syntax/text.h"
 
 #include <cmath>
 #include <limits>
@@ -9,8 +9,8 @@
 namespace transform {
 
 std::optional<qint32> wholeNumber(QStringView text) {
-  const QStringView trimmed = trimmedView(text);
-  if (!isNumeric(trimmed)) return std::nullopt;
+  const QStringView trimmed = syntax::trimmedView(text);
+  if (!syntax::isNumeric(trimmed)) return std::nullopt;
   bool ok = false;
   const double value = trimmed.toDouble(&ok);
   if (!ok) return std::nullopt;

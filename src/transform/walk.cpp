@@ -3,7 +3,7 @@
 #include "transform/walk.h"
 
 #include "common/errors.h"
-#include "transform/linetext.h"
+#include "syntax/line.h"
 #include "transform/numbering.h"
 
 namespace transform {
@@ -176,6 +176,14 @@ ProcedureRef currentProcedure(ide::VBE& vbe) {
   procedure.module = pane->CodeModule();
   if (!procedure.module) ide::raise(ide::err::ObjectVariableNotSet);
   procedure.name = procedure.module->ProcOfLine(startLine, procedure.kind).trimmed();
+  if (procedure.name.isEmpty()) return procedure;
+  // The procedure at the caret, not the first of its name: another may stand in an #If branch above.
+  for (const ide::ProcExtent& extent : procedure.module->Procedures()) {
+    if (startLine >= extent.startLine && startLine < extent.startLine + extent.countLines) {
+      procedure.extent = extent;
+      break;
+    }
+  }
   return procedure;
 }
 
@@ -211,46 +219,88 @@ bool forEachMember(WalkContext& context, ide::CodeModule& module,
   return true;
 }
 
-void forEachProcedure(ide::CodeModule& module, ide::Member& member, bool skipDeclares,
-                      const std::function<void(const QString& name, ide::ProcKind kind)>& visit) {
+namespace {
+QString procedureKey(QStringView name, ide::ProcKind kind) {
+  return name.toString().toCaseFolded() + QChar(u'0' + int(kind));
+}
+}  // namespace
+
+ModuleProcedures::ModuleProcedures(ide::CodeModule& module)
+    : m_module(&module), m_lines(module.CountOfLines()), m_procedures(module.Procedures()) {
+  for (size_t i = 0; i < m_procedures.size(); ++i)
+    m_byName[procedureKey(m_procedures[i].name, m_procedures[i].kind)].push_back(i);
+}
+
+void ModuleProcedures::forMember(ide::Member& member,
+                                 const std::function<void(const ide::ProcExtent&)>& visit) const {
   const ide::MemberType type = member.Type();
   if (!hasProcedures(type)) return;
   const QString name = member.Name().trimmed();
   if (name.isEmpty()) return;
+  const auto visitKind = [&](ide::ProcKind kind) {
+    const auto found = m_byName.constFind(procedureKey(name, kind));
+    if (found == m_byName.cend()) return;
+    for (const size_t i : *found)
+      visit(m_procedures[i]);
+  };
   if (type == ide::MemberType::Property) {
     for (const ide::ProcKind kind : {ide::ProcKind::Get, ide::ProcKind::Let, ide::ProcKind::Set})
-      visit(name, kind);
+      visitKind(kind);
     return;
   }
-  if (skipDeclares && module.ProcStartLine(name, ide::ProcKind::Proc) <= module.CountOfDeclarationLines())
-    return;
-  visit(name, ide::ProcKind::Proc);
+  visitKind(ide::ProcKind::Proc);
 }
 
-ProcedureText readProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
+std::optional<ide::ProcExtent> ModuleProcedures::find(QStringView name, ide::ProcKind kind) const {
+  const auto found = m_byName.constFind(procedureKey(name.trimmed(), kind));
+  if (found == m_byName.cend()) return std::nullopt;
+  return m_procedures[found->front()];
+}
+
+ide::ProcExtent extentOf(ide::CodeModule& module, const QString& name, ide::ProcKind kind) {
+  ide::ProcExtent extent;
+  extent.name = name;
+  extent.kind = kind;
+  extent.bodyLine = module.ProcBodyLine(name, kind);
+  extent.startLine = module.ProcStartLine(name, kind);
+  extent.countLines = module.ProcCountLines(name, kind);
+  // The header ends where its statement does, or after the alternatives the module knows it has.
+  extent.headerEnd = extent.bodyLine;
+  for (const ide::ProcExtent& known : module.Procedures()) {
+    if (known.bodyLine == extent.bodyLine) return known;
+  }
+  return extent;
+}
+
+ProcedureText readProcedure(ide::CodeModule& module, const ide::ProcExtent& extent) {
   ProcedureText text;
-  text.body = module.ProcBodyLine(name, kind);
-  text.count = module.ProcCountLines(name, kind);
-  const int extentEnd = module.ProcStartLine(name, kind) + text.count - 1;
+  text.body = extent.bodyLine;
+  text.count = extent.countLines;
+  const int extentEnd = extent.startLine + text.count - 1;
   text.lines.reserve(size_t(std::max(1, extentEnd - text.body + 1)));
   for (int i = text.body; i <= std::max(text.body, extentEnd); ++i)
     text.lines.push_back(module.Lines(i, 1));
   const auto size = qsizetype(text.lines.size());
 
   text.first = 1;
-  while (text.first < size && isContinued(text.lines[size_t(text.first - 1)]))
+  while (text.first < size && syntax::continues(text.lines[size_t(text.first - 1)]))
     ++text.first;
+  if (extent.headerEnd - extent.bodyLine + 1 > text.first) {
+    // Alternative headers under #If ... #Else: none of their lines is the body's.
+    text.first = std::min<qsizetype>(size, extent.headerEnd - extent.bodyLine + 1);
+    text.bodyFrom = text.first;
+  }
   qsizetype last = size - 1;
-  while (last > 0 && isBlankLine(text.lines[size_t(last)]))
+  while (last > 0 && syntax::isBlankLine(text.lines[size_t(last)]))
     --last;
   // The End line is the first line that is no continuation and ends the procedure: the last procedure
   // owns the comments after it, which are not its code.
   qsizetype endLine = -1;
-  bool continued = isContinued(text.lines.front());
-  for (qsizetype i = 1; i < size && endLine < 0; ++i) {
-    const QStringView trimmed = trimmedView(text.lines[size_t(i)]);
-    if (!continued && isProcedureEnd(trimmed)) endLine = i;
-    continued = endsWithContinuation(trimmed);
+  bool continued = syntax::continues(text.lines[size_t(text.first - 1)]);
+  for (qsizetype i = text.first; i < size && endLine < 0; ++i) {
+    const QStringView line = text.lines[size_t(i)];
+    if (!continued && syntax::classify(line).kind == syntax::Kind::ProcEnd) endLine = i;
+    continued = syntax::continues(line);
   }
   text.stop = endLine >= 0 ? endLine : last;
   text.unnumberStop = endLine >= 0 ? endLine : size - 1;

@@ -9,6 +9,7 @@
 #include "transform/progmode.h"
 #include "transform/progress.h"
 
+#include <QHash>
 #include <QString>
 #include <QStringView>
 
@@ -141,11 +142,12 @@ ide::Ref<ide::VBProject> activeProject(ide::VBE& vbe);
 ide::Ref<ide::VBComponent> selectedComponent(ide::VBE& vbe);
 ide::Ref<ide::CodePane> activeCodePane(ide::VBE& vbe);
 
-/// A procedure of a code module by name and kind.
+/// A procedure of a code module: its name and kind, and its place when it has one.
 struct ProcedureRef {
   ide::Ref<ide::CodeModule> module;
   QString name;
   ide::ProcKind kind = ide::ProcKind::Proc;
+  std::optional<ide::ProcExtent> extent;
 };
 
 /// The procedure that holds the start of the active code pane's selection; an empty name when the
@@ -171,23 +173,58 @@ bool forEachMember(WalkContext& context, ide::CodeModule& module,
                    const std::function<void(const ide::Ref<ide::Member>&)>& visit,
                    QStringView guardEach = {});
 
-/// Calls `visit` with the name and kind of each procedure a walk visits for `member`: a property's Get,
-/// Let and Set in this order (the procedure walks pass over the kinds it lacks), a method's one procedure.
-/// A method whose first line lies in the declarations is a Declare statement, not a procedure: with
-/// `skipDeclares` it gets none. Other members (variables, constants, events) and members without a name
-/// get none.
-void forEachProcedure(ide::CodeModule& module, ide::Member& member, bool skipDeclares,
-                      const std::function<void(const QString& name, ide::ProcKind kind)>& visit);
+/// The procedures of one module by name and kind, read once for a walk over its members. Two procedures
+/// of one name (alternative branches of conditional compilation) are both here, each at its place.
+class ModuleProcedures {
+ public:
+  explicit ModuleProcedures(ide::CodeModule& module);
+
+  /// Calls `visit` with each procedure a walk visits for `member`: a property's Get, Let and Set in this
+  /// order, a method's procedure; procedures that share a name and kind in line order. Declare
+  /// statements, other members (variables, constants, events) and members without a name get none.
+  void forMember(ide::Member& member, const std::function<void(const ide::ProcExtent&)>& visit) const;
+  /// The first procedure of a name and kind, as the lookups by name find it.
+  std::optional<ide::ProcExtent> find(QStringView name, ide::ProcKind kind) const;
+
+  bool isFor(ide::CodeModule& module) const { return &module == m_module && module.CountOfLines() == m_lines; }
+
+ private:
+  const ide::CodeModule* m_module;
+  int m_lines;
+  std::vector<ide::ProcExtent> m_procedures;
+  QHash<QString, std::vector<size_t>> m_byName;  // folded name and kind -> indexes in line order
+};
+
+/// Reads a module's procedures once for the members of one walk over it; read again for another module or
+/// after lines came or went.
+class ProcedureCache {
+ public:
+  const ModuleProcedures& of(ide::CodeModule& module) {
+    if (!m_procedures || !m_procedures->isFor(module)) m_procedures.emplace(module);
+    return *m_procedures;
+  }
+
+ private:
+  std::optional<ModuleProcedures> m_procedures;
+};
+
+/// The place of a procedure the lookups by name find (the first of its name and kind); error 35 when the
+/// module has none.
+ide::ProcExtent extentOf(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
 
 /// The lines of one procedure, read once: from its header line to the end of its extent (the last
 /// procedure's extent runs to the end of the module, comments after its End line included).
 struct ProcedureText {
   int body = 0;   // the module line of the header, lines[0]
   int count = 0;  // the procedure's line count, for the progress bar
-  /// Indexes into `lines`: the first line after the header and its continuation lines; where numbering
-  /// and indentation stop (the End line, or without one the last line that is not blank); where removal
-  /// of numbers stops (the End line, or without one the extent's last line). Each is never walked.
+  /// Indexes into `lines`: the first line after the header and its continuation lines (and the
+  /// alternative headers that conditional compilation gives it); where indentation and the removal of
+  /// numbers begin (the line after the header line, or `first` after alternative headers, which stay as
+  /// they are); where numbering and indentation stop (the End line, or without one the last line that is
+  /// not blank); where removal of numbers stops (the End line, or without one the extent's last line).
+  /// Each stop is never walked.
   qsizetype first = 0;
+  qsizetype bodyFrom = 1;
   qsizetype stop = 0;
   qsizetype unnumberStop = 0;
   std::vector<QString> lines;
@@ -195,7 +232,7 @@ struct ProcedureText {
   int moduleLine(qsizetype index) const { return body + int(index); }
 };
 
-/// Reads a procedure; throws ide::Error 35 for a procedure the module does not have.
-ProcedureText readProcedure(ide::CodeModule& module, const QString& name, ide::ProcKind kind);
+/// Reads a procedure at its place.
+ProcedureText readProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
 
 }  // namespace transform

@@ -38,33 +38,9 @@ QString nameKey(QStringView name, ide::ProcKind kind) {
   return key;
 }
 
-/// "Attribute Owner.VB_Name = value": the owner and the attribute name (empty when not of that form).
-struct AttributeParts {
-  qsizetype ownerStart = -1;
-  QStringView owner;
-  QStringView attribute;
-  QStringView value;
-};
-
-AttributeParts splitAttribute(QStringView text) {
-  AttributeParts parts;
-  qsizetype i = 0;
-  while (i < text.size() && (text[i] == u' ' || text[i] == u'\t'))
-    ++i;
-  constexpr QLatin1StringView kWord("Attribute");
-  if (!text.sliced(i).startsWith(kWord, Qt::CaseInsensitive)) return parts;
-  i += kWord.size();
-  while (i < text.size() && (text[i] == u' ' || text[i] == u'\t'))
-    ++i;
-  const qsizetype dot = text.indexOf(u'.', i);
-  const qsizetype equals = text.indexOf(u'=', i);
-  if (dot < 0 || (equals >= 0 && equals < dot)) return parts;
-  parts.ownerStart = i;
-  parts.owner = text.sliced(i, dot - i).trimmed();
-  const qsizetype attributeEnd = equals < 0 ? text.size() : equals;
-  parts.attribute = text.sliced(dot + 1, attributeEnd - dot - 1).trimmed();
-  if (equals >= 0) parts.value = text.sliced(equals + 1).trimmed();
-  return parts;
+/// The parts of a hidden attribute line; empty parts for another line.
+syntax::AttributeLine splitAttribute(QStringView text) {
+  return syntax::parseAttribute(text).value_or(syntax::AttributeLine{});
 }
 
 bool sameName(QStringView a, QStringView b) {
@@ -96,8 +72,8 @@ CodeText::Line CodeText::makeLine(QStringView text, bool isContinuation, LineEnd
   Line line;
   line.text = text.toString();
   line.end = end;
-  line.cls = isContinuation ? LineClass::Continuation : classifyStatement(text);
-  line.continues = continuesOnNextLine(text);
+  line.kind = syntax::kindOf(text, isContinuation);
+  line.continues = syntax::continues(text);
   return line;
 }
 
@@ -109,25 +85,29 @@ void CodeText::load(std::vector<SourceLine> code, std::vector<MemberAttributeLin
   m_lines.reserve(code.size() + code.size() / 4 + 16);
   m_markers.clear();
   m_orphanAttributes.clear();
+  m_leadingAttributes.clear();
   bool continuation = false;
   for (SourceLine& source : code) {
     Line line;
-    line.cls = continuation ? LineClass::Continuation : classifyStatement(source.text);
-    line.continues = continuesOnNextLine(source.text);
+    line.kind = syntax::kindOf(source.text, continuation);
+    line.continues = syntax::continues(source.text);
     line.text = std::move(source.text);
     line.end = source.end;
     continuation = line.continues;
-    if (isStructural(line.cls)) m_markers.push_back(static_cast<int>(m_lines.size()) + 1);
+    if (syntax::isStructural(line.kind)) m_markers.push_back(static_cast<int>(m_lines.size()) + 1);
     m_lines.push_back(std::move(line));
   }
   for (MemberAttributeLine& attribute : attributes) {
-    if (attribute.afterCodeLine < 1 || attribute.afterCodeLine > countOfLines()) {
+    // Attribute lines above the first code line stay there: they follow no line that could take them.
+    if (attribute.afterCodeLine < 1) {
+      m_leadingAttributes.push_back(std::move(attribute.line));
+      continue;
+    }
+    if (attribute.afterCodeLine > countOfLines()) {
       m_orphanAttributes.push_back(std::move(attribute.line));
       continue;
     }
-    auto& slot = m_lines[static_cast<size_t>(attribute.afterCodeLine - 1)].attributes;
-    if (!slot) slot = std::make_unique<std::vector<SourceLine>>();
-    slot->push_back(std::move(attribute.line));
+    attach(attribute.afterCodeLine, std::move(attribute.line));
   }
   touch(1, removed, countOfLines(), true);
 }
@@ -141,7 +121,7 @@ void CodeText::store(std::vector<SourceLine>& code, std::vector<MemberAttributeL
   std::vector<std::pair<int, SourceLine>> rehomed;
   QSet<QString> taken;
   for (const SourceLine& orphan : m_orphanAttributes) {
-    const AttributeParts parts = splitAttribute(orphan.text);
+    const syntax::AttributeLine parts = splitAttribute(orphan.text);
     if (parts.owner.isEmpty()) continue;
     Line* attachedTo = nullptr;
     findMemberAttribute(parts.owner, parts.attribute, &attachedTo);
@@ -157,20 +137,14 @@ void CodeText::store(std::vector<SourceLine>& code, std::vector<MemberAttributeL
     const Line& line = m_lines[static_cast<size_t>(n - 1)];
     code.push_back(SourceLine{line.text, line.end});
     if (!line.attributes) continue;
-    // The owner of a header's attributes is the procedure it declares now (it may have been renamed).
-    std::optional<ProcHeader> header;
-    if (line.cls == LineClass::ProcHeader || line.cls == LineClass::Continuation) {
-      int start = n;
-      while (start > 1 && m_lines[static_cast<size_t>(start - 1)].cls == LineClass::Continuation)
-        --start;
-      if (m_lines[static_cast<size_t>(start - 1)].cls == LineClass::ProcHeader)
-        header = parseProcHeader(statementText(start, statementEnd(start)));
-    }
-    for (const SourceLine& attribute : *line.attributes) {
+    // The attributes a header's procedure owned follow it when it is renamed; others stay as written.
+    const QString header = headerNameAt(n);
+    for (const SourceLine& attribute : line.attributes->lines) {
       SourceLine out = attribute;
-      const AttributeParts parts = splitAttribute(attribute.text);
-      if (header && !parts.owner.isEmpty() && !sameName(parts.owner, header->name)) {
-        out.text = attribute.text.left(parts.ownerStart) + header->name +
+      const syntax::AttributeLine parts = splitAttribute(attribute.text);
+      if (!header.isEmpty() && sameName(parts.owner, line.attributes->owner) &&
+          !sameName(parts.owner, header)) {
+        out.text = attribute.text.left(parts.ownerStart) + header +
                    attribute.text.sliced(parts.ownerStart + parts.owner.size());
       }
       attributes.push_back(MemberAttributeLine{n, std::move(out)});
@@ -178,10 +152,40 @@ void CodeText::store(std::vector<SourceLine>& code, std::vector<MemberAttributeL
   }
   for (auto& [anchor, line] : rehomed)
     attributes.push_back(MemberAttributeLine{anchor, std::move(line)});
+  for (const SourceLine& line : m_leadingAttributes)
+    attributes.push_back(MemberAttributeLine{0, line});
   std::stable_sort(attributes.begin(), attributes.end(),
                    [](const MemberAttributeLine& a, const MemberAttributeLine& b) {
                      return a.afterCodeLine < b.afterCodeLine;
                    });
+}
+
+void CodeText::attach(int lineNumber, SourceLine attribute) {
+  auto& slot = m_lines[static_cast<size_t>(lineNumber - 1)].attributes;
+  if (!slot) {
+    slot = std::make_unique<Attributes>();
+    slot->owner = headerNameAt(lineNumber);
+  }
+  slot->lines.push_back(std::move(attribute));
+}
+
+bool CodeText::continuesStructural(int lineNumber) const {
+  if (m_lines[static_cast<size_t>(lineNumber - 1)].kind != syntax::Kind::Continuation) return false;
+  int start = lineNumber;
+  while (start > 1 && m_lines[static_cast<size_t>(start - 1)].kind == syntax::Kind::Continuation)
+    --start;
+  return syntax::isStructural(m_lines[static_cast<size_t>(start - 1)].kind);
+}
+
+QString CodeText::headerNameAt(int lineNumber) const {
+  const syntax::Kind kind = m_lines[static_cast<size_t>(lineNumber - 1)].kind;
+  if (kind != syntax::Kind::ProcHeader && kind != syntax::Kind::Continuation) return {};
+  int start = lineNumber;
+  while (start > 1 && m_lines[static_cast<size_t>(start - 1)].kind == syntax::Kind::Continuation)
+    --start;
+  if (m_lines[static_cast<size_t>(start - 1)].kind != syntax::Kind::ProcHeader) return {};
+  const auto header = syntax::parseProcHeader(statementText(start, statementEnd(start)));
+  return header ? header->name : QString();
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -217,7 +221,7 @@ QString CodeText::statementText(int firstLine, int lastLine) const {
   std::vector<QStringView> parts;
   for (int n = firstLine; n <= lastLine; ++n)
     parts.push_back(line(n));
-  return joinContinuedLines(parts);
+  return syntax::joinContinuedLines(parts);
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -244,26 +248,63 @@ void CodeText::rebuildIndex() {
   std::vector<size_t> nextTypeEnd(m_markers.size() + 1, kNone);
   std::vector<size_t> nextEnumEnd(m_markers.size() + 1, kNone);
   for (size_t k = m_markers.size(); k-- > 0;) {
-    const LineClass cls = m_lines[static_cast<size_t>(m_markers[k] - 1)].cls;
-    nextTypeEnd[k] = cls == LineClass::TypeEnd ? k : nextTypeEnd[k + 1];
-    nextEnumEnd[k] = cls == LineClass::EnumEnd ? k : nextEnumEnd[k + 1];
+    const syntax::Kind lineKind = m_lines[static_cast<size_t>(m_markers[k] - 1)].kind;
+    nextTypeEnd[k] = lineKind == syntax::Kind::TypeEnd ? k : nextTypeEnd[k + 1];
+    nextEnumEnd[k] = lineKind == syntax::Kind::EnumEnd ? k : nextEnumEnd[k + 1];
   }
 
+  // Conditional compilation: a header in another branch of the #If block that holds the header of a
+  // procedure still open is an alternative header of that procedure (one body, one End line), not a
+  // procedure of its own. Blocks are told apart by a number given at their #If.
+  struct Branch {
+    int block = -1;  // -1: outside any #If block
+    int branch = 0;
+  };
+  std::vector<Branch> blocks;
+  int nextBlock = 0;
+  const auto here = [&] { return blocks.empty() ? Branch{} : blocks.back(); };
+
   ProcInfo* open = nullptr;
+  Branch openAt;
   for (size_t k = 0; k < m_markers.size(); ++k) {
     const int marker = m_markers[k];
     const Line& line = m_lines[static_cast<size_t>(marker - 1)];
-    if (line.cls == LineClass::TypeBegin || line.cls == LineClass::EnumBegin) {
-      const size_t end = (line.cls == LineClass::TypeBegin ? nextTypeEnd : nextEnumEnd)[k + 1];
+    switch (line.kind) {
+      case syntax::Kind::DirectiveIf:
+        blocks.push_back({nextBlock++, 0});
+        continue;
+      case syntax::Kind::DirectiveElseIf:
+      case syntax::Kind::DirectiveElse:
+        if (!blocks.empty()) ++blocks.back().branch;
+        continue;
+      case syntax::Kind::DirectiveEndIf:
+        if (blocks.empty()) continue;
+        // The #End If right after the last alternative header closes the header.
+        if (open && open->hasAlternatives && openAt.block == blocks.back().block && marker == open->headerEnd + 1)
+          open->headerEnd = marker;
+        blocks.pop_back();
+        continue;
+      default:
+        break;
+    }
+    if (line.kind == syntax::Kind::TypeBegin || line.kind == syntax::Kind::EnumBegin) {
+      const size_t end = (line.kind == syntax::Kind::TypeBegin ? nextTypeEnd : nextEnumEnd)[k + 1];
       index.blocks.emplace_back(marker, end == kNone ? std::numeric_limits<int>::max() : m_markers[end]);
       if (end != kNone) k = end;
       continue;
     }
-    if (line.cls == LineClass::TypeEnd || line.cls == LineClass::EnumEnd) continue;  // one without a block
-    if (line.cls == LineClass::ProcHeader) {
+    if (line.kind == syntax::Kind::TypeEnd || line.kind == syntax::Kind::EnumEnd) continue;  // one without a block
+    if (line.kind == syntax::Kind::ProcHeader) {
       const int headerEnd = statementEnd(marker);
-      auto header = parseProcHeader(statementText(marker, headerEnd));
+      auto header = syntax::parseProcHeader(statementText(marker, headerEnd));
       if (!header) continue;
+      const Branch branch = here();
+      if (open && openAt.block >= 0 && branch.block == openAt.block && branch.branch != openAt.branch) {
+        open->headerEnd = headerEnd;
+        open->hasAlternatives = true;
+        openAt = branch;
+        continue;
+      }
       if (open) open->endLine = marker - 1;  // a header without its End line runs up to the next header
       ProcInfo& proc = index.procs.emplace_back();
       proc.name = std::move(header->name);
@@ -274,6 +315,7 @@ void CodeText::rebuildIndex() {
       proc.bodyLine = marker;
       proc.headerEnd = headerEnd;
       open = &proc;
+      openAt = branch;
     } else if (open) {  // an End line; one with no header above it closes nothing
       open->endLine = marker;
       open = nullptr;
@@ -292,15 +334,15 @@ void CodeText::rebuildIndex() {
     int n = m_firstHeaderLine - 1;
     while (n > 0) {
       int start = n;
-      while (start > 1 && m_lines[static_cast<size_t>(start - 1)].cls == LineClass::Continuation)
+      while (start > 1 && m_lines[static_cast<size_t>(start - 1)].kind == syntax::Kind::Continuation)
         --start;
-      if (!isBlankOrComment(m_lines[static_cast<size_t>(start - 1)].cls)) break;
+      if (!syntax::isBlankOrComment(m_lines[static_cast<size_t>(start - 1)].kind)) break;
       n = start - 1;
     }
     index.declarationLines = n;
   } else {
     int n = countOfLines();
-    while (n > 0 && m_lines[static_cast<size_t>(n - 1)].cls == LineClass::Blank)
+    while (n > 0 && m_lines[static_cast<size_t>(n - 1)].kind == syntax::Kind::Blank)
       --n;
     index.declarationLines = n;
   }
@@ -338,9 +380,7 @@ int CodeText::procStartLine(QStringView name, ide::ProcKind kind) {
   if (!proc) raiseNotDefined();
   // A Declare statement starts where it stands: it sits in the declarations, not between procedures.
   if (proc->isDeclare) return proc->bodyLine;
-  const Index& idx = *m_index;
-  const size_t i = static_cast<size_t>(proc - idx.procs.data());
-  return i == 0 ? idx.declarationLines + 1 : idx.procs[i - 1].endLine + 1;
+  return startLineOf(static_cast<size_t>(proc - m_index->procs.data()));
 }
 
 int CodeText::procBodyLine(QStringView name, ide::ProcKind kind) {
@@ -353,11 +393,30 @@ int CodeText::procCountLines(QStringView name, ide::ProcKind kind) {
   const ProcInfo* proc = findProc(name, kind);
   if (!proc) raiseNotDefined();
   if (proc->isDeclare) return proc->headerEnd - proc->bodyLine + 1;
+  const size_t i = static_cast<size_t>(proc - m_index->procs.data());
+  return lastLineOf(i) - startLineOf(i) + 1;
+}
+
+int CodeText::startLineOf(size_t i) const {
   const Index& idx = *m_index;
-  const size_t i = static_cast<size_t>(proc - idx.procs.data());
-  const int start = procStartLine(name, kind);
-  const int end = i + 1 == idx.procs.size() ? countOfLines() : proc->endLine;
-  return end - start + 1;
+  return i == 0 ? idx.declarationLines + 1 : idx.procs[i - 1].endLine + 1;
+}
+
+int CodeText::lastLineOf(size_t i) const {
+  const Index& idx = *m_index;
+  return i + 1 == idx.procs.size() ? countOfLines() : idx.procs[i].endLine;
+}
+
+std::vector<ide::ProcExtent> CodeText::procedureExtents() {
+  const Index& idx = index();
+  std::vector<ide::ProcExtent> extents;
+  extents.reserve(idx.procs.size());
+  for (size_t i = 0; i < idx.procs.size(); ++i) {
+    const ProcInfo& proc = idx.procs[i];
+    const int start = startLineOf(i);
+    extents.push_back({proc.name, proc.kind, start, proc.bodyLine, proc.headerEnd, lastLineOf(i) - start + 1});
+  }
+  return extents;
 }
 
 QString CodeText::procOfLine(int line, ide::ProcKind& kind) {
@@ -392,18 +451,18 @@ const std::vector<MemberInfo>& CodeText::members() {
     while (block != idx.blocks.cend() && block->second < n)
       ++block;
     if (block != idx.blocks.cend() && block->first <= n) continue;
-    const LineClass cls = m_lines[static_cast<size_t>(n - 1)].cls;
-    switch (cls) {
-      case LineClass::Variable:
-      case LineClass::Const:
-      case LineClass::Event:
-      case LineClass::Declare: {
+    const syntax::Kind lineKind = m_lines[static_cast<size_t>(n - 1)].kind;
+    switch (lineKind) {
+      case syntax::Kind::Variable:
+      case syntax::Kind::Const:
+      case syntax::Kind::Event:
+      case syntax::Kind::Declare: {
         const int last = statementEnd(n);
-        const auto decl = parseDeclaration(statementText(n, last));
+        const auto decl = syntax::parseDeclaration(statementText(n, last));
         if (!decl) break;
         for (const QString& name : decl->names) {
           add(MemberInfo{name, decl->type, decl->scope, decl->isStatic, n});
-          if (cls == LineClass::Declare) {
+          if (lineKind == syntax::Kind::Declare) {
             ProcInfo declare;
             declare.name = name;
             declare.scope = decl->scope;
@@ -463,7 +522,7 @@ int CodeText::memberAnchorLine(QStringView member) {
 
 SourceLine* CodeText::findMemberAttribute(QStringView member, QStringView attribute, Line** owner) {
   auto matches = [&](const SourceLine& line) {
-    const AttributeParts parts = splitAttribute(line.text);
+    const syntax::AttributeLine parts = splitAttribute(line.text);
     return sameName(parts.owner, member) && sameName(parts.attribute, attribute);
   };
   // A member's attributes follow the lines of its declaration (any accessor of a property).
@@ -471,17 +530,19 @@ SourceLine* CodeText::findMemberAttribute(QStringView member, QStringView attrib
     for (int n = first; n <= last; ++n) {
       Line& line = m_lines[static_cast<size_t>(n - 1)];
       if (!line.attributes) continue;
-      for (SourceLine& attributeLine : *line.attributes) {
+      for (SourceLine& attributeLine : line.attributes->lines) {
         if (!matches(attributeLine)) continue;
         if (owner) *owner = &line;
         return &attributeLine;
       }
     }
   }
-  for (SourceLine& orphan : m_orphanAttributes) {
-    if (!matches(orphan)) continue;
-    if (owner) *owner = nullptr;
-    return &orphan;
+  for (std::vector<SourceLine>* unattached : {&m_orphanAttributes, &m_leadingAttributes}) {
+    for (SourceLine& line : *unattached) {
+      if (!matches(line)) continue;
+      if (owner) *owner = nullptr;
+      return &line;
+    }
   }
   return nullptr;
 }
@@ -497,14 +558,15 @@ void CodeText::setMemberAttribute(QStringView member, QStringView attribute,
   Line* owner = nullptr;
   if (SourceLine* existing = findMemberAttribute(member, attribute, &owner)) {
     if (valueText) {
-      const AttributeParts parts = splitAttribute(existing->text);
+      const syntax::AttributeLine parts = splitAttribute(existing->text);
       const qsizetype valueStart =
           parts.value.isNull() ? existing->text.size() : parts.value.data() - existing->text.constData();
       existing->text = existing->text.left(valueStart) + *valueText;
-    } else if (owner) {
-      std::erase_if(*owner->attributes, [existing](const SourceLine& l) { return &l == existing; });
     } else {
-      std::erase_if(m_orphanAttributes, [existing](const SourceLine& l) { return &l == existing; });
+      const auto isExisting = [existing](const SourceLine& l) { return &l == existing; };
+      if (owner) std::erase_if(owner->attributes->lines, isExisting);
+      std::erase_if(m_orphanAttributes, isExisting);
+      std::erase_if(m_leadingAttributes, isExisting);
     }
     ++m_changeCount;
     return;
@@ -513,10 +575,8 @@ void CodeText::setMemberAttribute(QStringView member, QStringView attribute,
   const int anchor = memberAnchorLine(member);
   if (anchor == 0) ide::raise(ide::err::SubscriptOutOfRange);
   const auto info = this->member(member);
-  auto& slot = m_lines[static_cast<size_t>(anchor - 1)].attributes;
-  if (!slot) slot = std::make_unique<std::vector<SourceLine>>();
-  slot->push_back(SourceLine{QStringLiteral("Attribute %1.%2 = %3").arg(info->name, attribute, *valueText),
-                             newLineEnd()});
+  attach(anchor, SourceLine{QStringLiteral("Attribute %1.%2 = %3").arg(info->name, attribute, *valueText),
+                            newLineEnd()});
   ++m_changeCount;
 }
 
@@ -547,7 +607,7 @@ void CodeText::updateMarker(int lineNumber, bool wasStructural, bool isNowStruct
 
 void CodeText::insertMarkers(int firstLine, int count) {
   for (int n = firstLine; n < firstLine + count; ++n)
-    updateMarker(n, false, isStructural(m_lines[static_cast<size_t>(n - 1)].cls));
+    updateMarker(n, false, syntax::isStructural(m_lines[static_cast<size_t>(n - 1)].kind));
 }
 
 /// Re-reads one line whose predecessor changed: it may have started or stopped being a continuation.
@@ -555,10 +615,10 @@ void CodeText::reclassifyFrom(size_t index) {
   if (index >= m_lines.size()) return;
   Line& line = m_lines[index];
   const bool continuation = index > 0 && m_lines[index - 1].continues;
-  const LineClass cls = continuation ? LineClass::Continuation : classifyStatement(line.text);
-  if (cls == line.cls) return;
-  updateMarker(static_cast<int>(index) + 1, isStructural(line.cls), isStructural(cls));
-  line.cls = cls;
+  const syntax::Kind lineKind = syntax::kindOf(line.text, continuation);
+  if (lineKind == line.kind) return;
+  updateMarker(static_cast<int>(index) + 1, syntax::isStructural(line.kind), syntax::isStructural(lineKind));
+  line.kind = lineKind;
 }
 
 void CodeText::touch(int firstLine, int removed, int inserted, bool structural) {
@@ -598,7 +658,7 @@ bool CodeText::shiftIndex(int firstLine, int removed, int inserted) {
   // A procedure without its End line runs up to the next header, or to the end of the module.
   for (size_t i = 0; i < index.procs.size(); ++i) {
     ProcInfo& proc = index.procs[i];
-    if (m_lines[static_cast<size_t>(proc.endLine - 1)].cls == LineClass::ProcEnd) continue;
+    if (m_lines[static_cast<size_t>(proc.endLine - 1)].kind == syntax::Kind::ProcEnd) continue;
     proc.endLine = i + 1 < index.procs.size() ? index.procs[i + 1].bodyLine - 1 : countOfLines();
   }
   // The Type and Enum blocks stay: they matter only in the declarations, above the edit.
@@ -631,21 +691,17 @@ void CodeText::replaceLine(int line, QStringView text, const QString* shared) {
   const bool continuation = i > 0 && m_lines[i - 1].continues;
 
   if (!severalLines) {
-    const LineClass cls = continuation ? LineClass::Continuation : classifyStatement(text);
-    const bool continues = continuesOnNextLine(text);
-    bool structural = isStructural(cls) || isStructural(target.cls) || continues != target.continues;
-    if (!structural && cls == LineClass::Continuation &&
-        text.trimmed() != QStringView(target.text).trimmed()) {
-      // A header's continuation line carries part of the header (its name, or its own continuation);
-      // re-indenting it changes nothing the header declares.
-      int start = line;
-      while (start > 1 && m_lines[static_cast<size_t>(start - 1)].cls == LineClass::Continuation)
-        --start;
-      structural = m_lines[static_cast<size_t>(start - 1)].cls == LineClass::ProcHeader;
-    }
-    updateMarker(line, isStructural(target.cls), isStructural(cls));
+    const syntax::Kind lineKind = syntax::kindOf(text, continuation);
+    const bool continues = syntax::continues(text);
+    bool structural = syntax::isStructural(lineKind) || syntax::isStructural(target.kind) || continues != target.continues;
+    // A header's continuation line carries part of the header (its name, or its own continuation);
+    // re-indenting it changes nothing the header declares.
+    if (!structural && lineKind == syntax::Kind::Continuation &&
+        text.trimmed() != QStringView(target.text).trimmed())
+      structural = continuesStructural(line);
+    updateMarker(line, syntax::isStructural(target.kind), syntax::isStructural(lineKind));
     target.text = shared ? *shared : text.toString();  // a QString is shared, not copied
-    target.cls = cls;
+    target.kind = lineKind;
     if (continues != target.continues) {
       target.continues = continues;
       reclassifyFrom(i + 1);
@@ -657,12 +713,12 @@ void CodeText::replaceLine(int line, QStringView text, const QString* shared) {
   // Several lines: the first replaces the line (which keeps its hidden attributes), the rest follow it.
   const LineEnd end = target.end == LineEnd::None ? newLineEnd() : target.end;
   const LineEnd lastEnd = target.end;
-  updateMarker(line, isStructural(target.cls), false);
+  updateMarker(line, syntax::isStructural(target.kind), false);
   target.text = parts.front().toString();
-  target.continues = continuesOnNextLine(target.text);
-  target.cls = continuation ? LineClass::Continuation : classifyStatement(target.text);
+  target.continues = syntax::continues(target.text);
+  target.kind = syntax::kindOf(target.text, continuation);
   target.end = end;
-  const bool targetStructural = isStructural(target.cls);
+  const bool targetStructural = syntax::isStructural(target.kind);
   std::vector<Line> added;
   added.reserve(parts.size() - 1);
   bool previousContinues = target.continues;
@@ -709,7 +765,8 @@ void CodeText::insertLines(int line, QStringView text) {
                  std::make_move_iterator(added.end()));
   insertMarkers(line, count);
   reclassifyFrom(at + static_cast<size_t>(count));
-  touch(line, 0, count, m_markerEdits != markerEdits);
+  // Lines that continue a header change what it declares, and where it ends.
+  touch(line, 0, count, m_markerEdits != markerEdits || continuesStructural(line));
 }
 
 void CodeText::addFromString(QStringView text) {
@@ -727,7 +784,7 @@ void CodeText::deleteLines(int startLine, int count) {
   const LineEnd lastEnd = std::prev(last)->end;
   for (auto it = first; it != last; ++it) {
     if (!it->attributes) continue;
-    for (SourceLine& attribute : *it->attributes)
+    for (SourceLine& attribute : it->attributes->lines)
       m_orphanAttributes.push_back(std::move(attribute));
   }
   m_lines.erase(first, last);

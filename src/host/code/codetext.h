@@ -19,10 +19,12 @@
 // Numbers are 1-based; failures throw ide::Error with the IDE's numbers.
 #pragma once
 
-#include "host/code/linesyntax.h"
 #include "host/files/modulefile.h"
 #include "host/files/sourcelines.h"
 #include "ide/types.h"
+#include "ide/vbide.h"
+#include "syntax/declarations.h"
+#include "syntax/line.h"
 
 #include <QString>
 #include <QStringView>
@@ -44,7 +46,8 @@ struct ProcInfo {
   /// declarations and is not one of procedures().
   bool isDeclare = false;
   int bodyLine = 0;   // the header's first line
-  int headerEnd = 0;  // the header's last physical line
+  int headerEnd = 0;  // the header's last physical line (of its last alternative under #If ... #Else)
+  bool hasAlternatives = false;
   int endLine = 0;    // the End line (for an unterminated header: the line above the next header)
 };
 
@@ -98,6 +101,8 @@ class CodeText {
   QString procOfLine(int line, ide::ProcKind& kind);
   /// Every procedure in line order.
   const std::vector<ProcInfo>& procedures();
+  /// Every procedure in line order with its extent, found by its place (not by its name).
+  std::vector<ide::ProcExtent> procedureExtents();
 
   const std::vector<MemberInfo>& members();
   std::optional<MemberInfo> member(QStringView name);
@@ -118,13 +123,19 @@ class CodeText {
   void removeListener(Listener* listener);
 
  private:
+  struct Attributes {
+    std::vector<SourceLine> lines;
+    /// The procedure the line's header declared when they were attached: attributes of that owner are
+    /// renamed with the procedure; those naming another member are written as they stand.
+    QString owner;
+  };
   struct Line {
     QString text;
     LineEnd end = LineEnd::CRLF;
-    LineClass cls = LineClass::Blank;
+    syntax::Kind kind = syntax::Kind::Blank;
     bool continues = false;
     /// Hidden attribute lines written after this line (rare, hence the indirection).
-    std::unique_ptr<std::vector<SourceLine>> attributes;
+    std::unique_ptr<Attributes> attributes;
   };
   struct Index;
 
@@ -138,6 +149,14 @@ class CodeText {
   bool shiftIndex(int firstLine, int removed, int inserted);
   Index& index();
   void rebuildIndex();
+  void attach(int lineNumber, SourceLine attribute);
+  /// Line `lineNumber` continues a statement that makes the module's structure (a header).
+  bool continuesStructural(int lineNumber) const;
+  /// The name a header declares when `lineNumber` is one of its lines, else empty.
+  QString headerNameAt(int lineNumber) const;
+  /// The first and last line of the extent of procedure `i` of the index.
+  int startLineOf(size_t i) const;
+  int lastLineOf(size_t i) const;
   QString statementText(int firstLine, int lastLine) const;
   int statementEnd(int firstLine) const;
   int memberAnchorLine(QStringView member);
@@ -156,6 +175,8 @@ class CodeText {
   int m_firstHeaderLine = 0;
   /// Attribute lines whose line was deleted, kept until a member of their owner's name takes them back.
   std::vector<SourceLine> m_orphanAttributes;
+  /// Attribute lines above the first code line, written back where they were.
+  std::vector<SourceLine> m_leadingAttributes;
   quint64 m_changeCount = 0;
   /// Grows whenever a line becomes or stops being a header or End line.
   quint64 m_markerEdits = 0;

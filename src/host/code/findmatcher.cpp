@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "host/code/findmatcher.h"
 
-#include "host/code/linesyntax.h"
+#include "syntax/text.h"
 #include "ide/error.h"
 
 #include <algorithm>
@@ -144,12 +144,12 @@ bool FindMatcher::tokenMatches(const Token& token, QChar c) const {
 // A side of the match is checked only where the match itself begins or ends with a word character, so
 // that ".Foo" still finds the member in "x.Foo".
 bool FindMatcher::startAllowed(QStringView line, qsizetype start) const {
-  return !m_wholeWord || start == 0 || !isIdentifierChar(line[start]) || !isIdentifierChar(line[start - 1]);
+  return !m_wholeWord || start == 0 || !syntax::isIdentifierChar(line[start]) || !syntax::isIdentifierChar(line[start - 1]);
 }
 
 bool FindMatcher::endAllowed(QStringView line, qsizetype end) const {
-  return !m_wholeWord || end >= line.size() || !isIdentifierChar(line[end - 1]) ||
-         !isIdentifierChar(line[end]);
+  return !m_wholeWord || end >= line.size() || !syntax::isIdentifierChar(line[end - 1]) ||
+         !syntax::isIdentifierChar(line[end]);
 }
 
 // The pattern as a chain of states, state k meaning "the first k tokens are matched"; a "*" state also

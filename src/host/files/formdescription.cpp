@@ -2,7 +2,7 @@
 // Form descriptions: a recursive-descent reader that looks at each line once, and the edits that keep every
 // untouched line as it was read.
 #include "host/files/formdescription.h"
-#include "host/files/blanks.h"
+#include "syntax/text.h"
 
 #include "ide/error.h"
 
@@ -16,20 +16,20 @@ namespace {
 constexpr int kMaxNesting = 200;
 
 qsizetype wordEnd(QStringView text, qsizetype from) {
-  while (from < text.size() && !isBlank(text[from]))
+  while (from < text.size() && !syntax::isBlank(text[from]))
     ++from;
   return from;
 }
 
 bool isBlankFrom(QStringView text, qsizetype from) {
-  return skipBlanks(text, from) == text.size();
+  return syntax::skipBlanks(text, from) == text.size();
 }
 
 /// The `number`-th blank-separated word of `text` (0 = the first), with its start; empty when absent.
 QStringView wordAt(QStringView text, int number, qsizetype* start = nullptr) {
-  qsizetype begin = skipBlanks(text, 0);
+  qsizetype begin = syntax::skipBlanks(text, 0);
   for (int i = 0; i < number && begin < text.size(); ++i)
-    begin = skipBlanks(text, wordEnd(text, begin));
+    begin = syntax::skipBlanks(text, wordEnd(text, begin));
   if (start) *start = begin;
   return text.mid(begin, wordEnd(text, begin) - begin);
 }
@@ -37,7 +37,7 @@ QStringView wordAt(QStringView text, int number, qsizetype* start = nullptr) {
 enum class LineKind { Blank, Begin, End, BeginProperty, EndProperty, Other };
 
 LineKind classifyLine(QStringView text) {
-  const qsizetype start = skipBlanks(text, 0);
+  const qsizetype start = syntax::skipBlanks(text, 0);
   if (start == text.size()) return LineKind::Blank;
   const qsizetype end = wordEnd(text, start);
   const QStringView word = text.mid(start, end - start);
@@ -53,13 +53,13 @@ LineKind classifyLine(QStringView text) {
 bool isWritablePropertyName(QStringView name) {
   if (name.isEmpty()) return false;
   return std::none_of(name.begin(), name.end(), [](QChar character) {
-    return isBlank(character) || character == u'=' || character == u'"' || character == u'\'' ||
+    return syntax::isBlank(character) || character == u'=' || character == u'"' || character == u'\'' ||
            character == u'\r' || character == u'\n';
   });
 }
 
 QString leadingBlanks(const QString& text) {
-  return text.left(skipBlanks(text, 0));
+  return text.left(syntax::skipBlanks(text, 0));
 }
 
 }  // namespace
@@ -87,7 +87,7 @@ QString composePropertyLine(QStringView indent, QStringView name, QStringView va
 QStringView PropertyGroup::PropertyLine::comment() const {
   if (commentStart < 0) return {};
   QStringView rest = QStringView(line.text).mid(commentStart);
-  while (!rest.isEmpty() && isBlank(rest.back()))
+  while (!rest.isEmpty() && syntax::isBlank(rest.back()))
     rest.chop(1);
   return rest;
 }
@@ -99,16 +99,16 @@ PropertyGroup::~PropertyGroup() = default;
 
 std::optional<PropertyGroup::PropertyLine> PropertyGroup::parsePropertyLine(SourceLine line) {
   const QStringView text(line.text);
-  const qsizetype nameStart = skipBlanks(text, 0);
+  const qsizetype nameStart = syntax::skipBlanks(text, 0);
   const qsizetype equals = text.indexOf(u'=', nameStart);
   if (equals < 0) return std::nullopt;
   qsizetype nameEnd = equals;
-  while (nameEnd > nameStart && isBlank(text[nameEnd - 1]))
+  while (nameEnd > nameStart && syntax::isBlank(text[nameEnd - 1]))
     --nameEnd;
   const QStringView name = text.mid(nameStart, nameEnd - nameStart);
   if (!isWritablePropertyName(name)) return std::nullopt;
 
-  const qsizetype valueStart = skipBlanks(text, equals + 1);
+  const qsizetype valueStart = syntax::skipBlanks(text, equals + 1);
   // An apostrophe starts the comment unless it is inside a quoted string ("Don't"); doubled quotes
   // inside a string toggle twice and so need no special case.
   qsizetype commentStart = -1;
@@ -123,7 +123,7 @@ std::optional<PropertyGroup::PropertyLine> PropertyGroup::parsePropertyLine(Sour
     }
   }
   qsizetype valueEnd = commentStart < 0 ? text.size() : commentStart;
-  while (valueEnd > valueStart && isBlank(text[valueEnd - 1]))
+  while (valueEnd > valueStart && syntax::isBlank(text[valueEnd - 1]))
     --valueEnd;
 
   PropertyLine property;

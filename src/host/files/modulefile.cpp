@@ -2,9 +2,9 @@
 // One pass over a module's lines: the header parts in the order the IDE writes them, then the code with its
 // hidden attribute lines moved aside and remembered by the code line they follow.
 #include "host/files/modulefile.h"
-#include "host/files/blanks.h"
 
 #include "ide/error.h"
+#include "syntax/line.h"
 
 #include <algorithm>
 #include <utility>
@@ -15,51 +15,20 @@ namespace {
 /// Whether the line's first word is `word` (case-insensitively), followed by a blank or the line's end;
 /// `after` receives the position after the word.
 bool startsWithWord(QStringView text, QStringView word, qsizetype* after = nullptr) {
-  const qsizetype start = skipBlanks(text, 0);
+  const qsizetype start = syntax::skipBlanks(text, 0);
   if (text.size() - start < word.size()) return false;
   if (text.mid(start, word.size()).compare(word, Qt::CaseInsensitive) != 0) return false;
   const qsizetype end = start + word.size();
-  if (end < text.size() && !isBlank(text[end])) return false;
+  if (end < text.size() && !syntax::isBlank(text[end])) return false;
   if (after) *after = end;
   return true;
 }
 
 bool isObjectLine(QStringView text) {
-  const qsizetype start = skipBlanks(text, 0);
+  const qsizetype start = syntax::skipBlanks(text, 0);
   if (text.mid(start, 6).compare(u"Object", Qt::CaseInsensitive) != 0) return false;
-  const qsizetype next = skipBlanks(text, start + 6);
+  const qsizetype next = syntax::skipBlanks(text, start + 6);
   return next < text.size() && text[next] == u'=';
-}
-
-/// For "Attribute <name> = <value>": the name and the raw value (trimmed); nothing for other lines.
-struct AttributeParts {
-  QStringView name;
-  QStringView value;
-};
-
-std::optional<AttributeParts> splitAttribute(QStringView text) {
-  qsizetype position = 0;
-  if (!startsWithWord(text, u"Attribute", &position)) return std::nullopt;
-  position = skipBlanks(text, position);
-  const qsizetype equals = text.indexOf(u'=', position);
-  if (equals < 0) return std::nullopt;
-  return AttributeParts{text.mid(position, equals - position).trimmed(), text.mid(equals + 1).trimmed()};
-}
-
-bool isModuleAttribute(QStringView text) {
-  qsizetype position = 0;
-  if (!startsWithWord(text, u"Attribute", &position)) return false;
-  position = skipBlanks(text, position);
-  return text.mid(position, 3).compare(u"VB_", Qt::CaseInsensitive) == 0;
-}
-
-/// A line ending in " _" continues on the next physical line (comments included).
-bool continuesOnNextLine(QStringView text) {
-  QStringView trimmed = text;
-  while (!trimmed.isEmpty() && isBlank(trimmed.back()))
-    trimmed.chop(1);
-  if (!trimmed.endsWith(u'_')) return false;
-  return trimmed.size() == 1 || isBlank(trimmed[trimmed.size() - 2]);
 }
 
 [[noreturn]] void failAt(const QString& fileName, std::size_t lineIndex, const QString& problem) {
@@ -80,7 +49,7 @@ ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QStrin
       source.preamble.push_back(lines[position++]);
     qsizetype afterBegin = 0;
     if (position < count && startsWithWord(lines[position].text, u"Begin", &afterBegin)) {
-      if (skipBlanks(lines[position].text, afterBegin) == lines[position].text.size()) {
+      if (syntax::skipBlanks(lines[position].text, afterBegin) == lines[position].text.size()) {
         // A class's BEGIN ... END block of persisted settings: kept raw.
         const std::size_t beginIndex = position;
         std::size_t end = position + 1;
@@ -95,7 +64,7 @@ ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QStrin
       }
     }
   }
-  while (position < count && isModuleAttribute(lines[position].text)) {
+  while (position < count && syntax::isModuleAttribute(lines[position].text)) {
     source.moduleAttributes.push_back(lines[position++]);
   }
 
@@ -103,12 +72,12 @@ ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QStrin
   bool continued = false;
   for (; position < count; ++position) {
     const SourceLine& line = lines[position];
-    if (!continued && startsWithWord(line.text, u"Attribute")) {
+    if (!continued && syntax::classify(line.text).kind == syntax::Kind::Attribute) {
       source.memberAttributes.push_back(MemberAttributeLine{static_cast<int>(source.code.size()), line});
       continue;
     }
     source.code.push_back(line);
-    continued = continuesOnNextLine(line.text);
+    continued = syntax::continues(line.text);
   }
   return source;
 }
@@ -180,7 +149,7 @@ QByteArray writeModule(const ModuleSource& source, const QString& fileName) {
 
 std::optional<QString> moduleAttribute(const ModuleSource& source, QStringView name) {
   for (const SourceLine& line : source.moduleAttributes) {
-    const std::optional<AttributeParts> parts = splitAttribute(line.text);
+    const std::optional<syntax::AttributeLine> parts = syntax::parseAttribute(line.text);
     if (parts && parts->name.compare(name, Qt::CaseInsensitive) == 0) return parts->value.toString();
   }
   return std::nullopt;
@@ -189,7 +158,7 @@ std::optional<QString> moduleAttribute(const ModuleSource& source, QStringView n
 void setModuleAttribute(ModuleSource& source, const QString& name, const QString& rawValue) {
   const QString text = QStringLiteral("Attribute %1 = %2").arg(name, rawValue);
   for (SourceLine& line : source.moduleAttributes) {
-    const std::optional<AttributeParts> parts = splitAttribute(line.text);
+    const std::optional<syntax::AttributeLine> parts = syntax::parseAttribute(line.text);
     if (parts && parts->name.compare(name, Qt::CaseInsensitive) == 0) {
       if (parts->value != rawValue) line.text = text;
       return;

@@ -163,6 +163,7 @@ class CodeModuleImpl final : public ide::CodeModule,
   int ProcBodyLine(const QString& procName, ide::ProcKind kind) override;
   int ProcCountLines(const QString& procName, ide::ProcKind kind) override;
   QString ProcOfLine(int line, ide::ProcKind& kind) override { return m_text.procOfLine(line, kind); }
+  std::vector<ide::ProcExtent> Procedures() override { return m_text.procedureExtents(); }
   bool Find(const QString& target, int& startLine, int& startColumn, int& endLine, int& endColumn,
             bool wholeWord, bool matchCase, bool patternSearch) override;
 
