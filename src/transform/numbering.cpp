@@ -164,8 +164,7 @@ bool UnnumberLine(QString& line) {
     if (syntax::isBlankLine(rest)) return false;  // the number alone, with trailing blanks
     // A one-word line was numbered with two blanks: the second goes too.
     const QStringView word = syntax::trimmedView(rest);
-    if (!rest.isEmpty() && syntax::isBlank(rest.front()) && syntax::indexOfBlank(word) < 0)
-      rest = rest.sliced(1);
+    if (rest.startsWith(u' ') && syntax::indexOfBlank(word) < 0) rest = rest.sliced(1);
   }
 
   QString result;

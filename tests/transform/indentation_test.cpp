@@ -97,6 +97,7 @@ class IndenterStack : public ::testing::Test {
   // Opens a For level and a continued statement inside it: body at 3, For body at 6, continuation at 9.
   void openForAndContinuation() {
     indenter.beginProcedure();
+    continued = false;
     QString forLine = u"For i = 1 To 2"_qs;
     QString continuedLine = u"x = 1 + _"_qs;
     indenter.IndentLine(forLine, continued);

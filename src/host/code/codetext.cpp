@@ -280,7 +280,8 @@ void CodeText::rebuildIndex() {
       case syntax::Kind::DirectiveEndIf:
         if (blocks.empty()) continue;
         // The #End If right after the last alternative header closes the header.
-        if (open && open->hasAlternatives && openAt.block == blocks.back().block && marker == open->headerEnd + 1)
+        if (open && open->hasAlternatives && openAt.block == blocks.back().block &&
+            marker == open->headerEnd + 1)
           open->headerEnd = marker;
         blocks.pop_back();
         continue;
@@ -293,7 +294,8 @@ void CodeText::rebuildIndex() {
       if (end != kNone) k = end;
       continue;
     }
-    if (line.kind == syntax::Kind::TypeEnd || line.kind == syntax::Kind::EnumEnd) continue;  // one without a block
+    if (line.kind == syntax::Kind::TypeEnd || line.kind == syntax::Kind::EnumEnd)
+      continue;  // one without a block
     if (line.kind == syntax::Kind::ProcHeader) {
       const int headerEnd = statementEnd(marker);
       auto header = syntax::parseProcHeader(statementText(marker, headerEnd));
@@ -414,7 +416,8 @@ std::vector<ide::ProcExtent> CodeText::procedureExtents() {
   for (size_t i = 0; i < idx.procs.size(); ++i) {
     const ProcInfo& proc = idx.procs[i];
     const int start = startLineOf(i);
-    extents.push_back({proc.name, proc.kind, start, proc.bodyLine, proc.headerEnd, lastLineOf(i) - start + 1});
+    extents.push_back(
+        {proc.name, proc.kind, start, proc.bodyLine, proc.headerEnd, lastLineOf(i) - start + 1});
   }
   return extents;
 }
@@ -693,7 +696,8 @@ void CodeText::replaceLine(int line, QStringView text, const QString* shared) {
   if (!severalLines) {
     const syntax::Kind lineKind = syntax::kindOf(text, continuation);
     const bool continues = syntax::continues(text);
-    bool structural = syntax::isStructural(lineKind) || syntax::isStructural(target.kind) || continues != target.continues;
+    bool structural =
+        syntax::isStructural(lineKind) || syntax::isStructural(target.kind) || continues != target.continues;
     // A header's continuation line carries part of the header (its name, or its own continuation);
     // re-indenting it changes nothing the header declares.
     if (!structural && lineKind == syntax::Kind::Continuation &&
