@@ -29,13 +29,6 @@ SplitPrefix splitNumberPrefix(QStringView t) {
     case NumberPrefix::Form::Colon:
       return {t.first(prefix.number.size() + 1), false, syntax::trimmedView(prefix.rest)};
     case NumberPrefix::Form::Blank:
-      if (const QStringView rest = prefix.rest.sliced(syntax::leadingBlanks(prefix.rest).size());
-          rest.startsWith(u':')) {
-        // "10 : x": the colon still ends the number's label
-        const QStringView label = t.first(t.size() - rest.size() + 1);
-        return {label, false, syntax::trimmedView(rest.sliced(1))};
-      }
-      [[fallthrough]];
     case NumberPrefix::Form::Comment:
       // The blanks between a number and its code or comment are indentation: keeping them in the prefix
       // would widen the number column on every run.

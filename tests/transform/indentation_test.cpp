@@ -299,7 +299,7 @@ TEST(IndentProcedureBlocks, TabModeWritesOneTabPerLevelWhateverTheSpaceCount) {
 TEST(NumberColumn, PrefixFormsAreMeasuredAsTheyAreWritten) {
   const std::pair<const char16_t*, qsizetype> cases[] = {
       {u"10: x", 3},
-      {u"10 : x", 4},
+      {u"10 : x", 3},  // the colon begins the code: an empty statement
       {u"10 ' nota", 3},
       {u"10' nota", 3},
       {u"    10 x", 3},
