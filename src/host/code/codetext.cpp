@@ -56,6 +56,7 @@ struct CodeText::Index {
 
   bool membersValid = false;
   std::vector<MemberInfo> members;
+  QHash<QString, size_t> memberByName;  // folded name -> members index
   /// Declare statements: listed as methods and answered by the procedure queries.
   std::vector<ProcInfo> declares;
   /// Type and Enum blocks in line order: first and End line (INT_MAX for a block without one).
@@ -440,7 +441,8 @@ const std::vector<MemberInfo>& CodeText::members() {
   if (idx.membersValid) return idx.members;
   idx.members.clear();
   idx.declares.clear();
-  QHash<QString, size_t> seen;  // folded name -> members index
+  QHash<QString, size_t>& seen = idx.memberByName;
+  seen.clear();
   auto add = [&](MemberInfo info) {
     const QString key = info.name.toCaseFolded();
     if (seen.contains(key)) return;
@@ -494,9 +496,10 @@ const std::vector<MemberInfo>& CodeText::members() {
 }
 
 std::optional<MemberInfo> CodeText::member(QStringView name) {
-  for (const MemberInfo& info : members())
-    if (sameName(info.name, name)) return info;
-  return std::nullopt;
+  const std::vector<MemberInfo>& all = members();
+  const auto found = m_index->memberByName.constFind(name.toString().toCaseFolded());
+  if (found == m_index->memberByName.cend()) return std::nullopt;
+  return all[*found];
 }
 
 // ---------------------------------------------------------------------------------------------------
