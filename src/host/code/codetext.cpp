@@ -631,8 +631,14 @@ void CodeText::touch(int firstLine, int removed, int inserted, bool structural) 
   ++m_changeCount;
   if (m_indexValid) {
     const bool inDeclarations = m_firstHeaderLine == 0 || firstLine <= m_firstHeaderLine;
-    if (structural || inDeclarations || (removed != inserted && !shiftIndex(firstLine, removed, inserted)))
+    if (structural) {
       m_indexValid = false;
+    } else if (removed == inserted) {
+      // The lines kept their places and kinds: the procedures stand; a declaration may name another member.
+      if (inDeclarations) m_index->membersValid = false;
+    } else if (inDeclarations || !shiftIndex(firstLine, removed, inserted)) {
+      m_indexValid = false;
+    }
   }
   for (Listener* listener : std::vector<Listener*>(m_listeners))
     listener->linesChanged(firstLine, removed, inserted);
@@ -699,8 +705,15 @@ void CodeText::replaceLine(int line, QStringView text, const QString* shared) {
   if (!severalLines) {
     const syntax::Kind lineKind = syntax::kindOf(text, continuation);
     const bool continues = syntax::continues(text);
-    bool structural =
-        syntax::isStructural(lineKind) || syntax::isStructural(target.kind) || continues != target.continues;
+    // Re-indenting a directive, an End or a Type line keeps the structure: only a changed kind, a header
+    // that says something else or a changed continuation moves it.
+    const bool sameShape = lineKind == target.kind && continues == target.continues &&
+                           (lineKind != syntax::Kind::ProcHeader ||
+                            syntax::trimmedView(text) == syntax::trimmedView(target.text));
+    bool structural = !sameShape && (syntax::isStructural(lineKind) || syntax::isStructural(target.kind) ||
+                                     continues != target.continues);
+    // Above the first header a line's kind decides where the declarations end.
+    if (lineKind != target.kind && (m_firstHeaderLine == 0 || line <= m_firstHeaderLine)) structural = true;
     // A header's continuation line carries part of the header (its name, or its own continuation);
     // re-indenting it changes nothing the header declares.
     if (!structural && lineKind == syntax::Kind::Continuation &&
