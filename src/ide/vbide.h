@@ -122,6 +122,8 @@ struct ProcExtent {
   /// compilation may give one procedure (#If ... #Else ... #End If around its header lines).
   int headerEnd = 0;
   int countLines = 0;
+
+  bool operator==(const ProcExtent&) const = default;
 };
 
 /// The code of a component: the text the code window shows, without the file header and the hidden
