@@ -246,9 +246,11 @@ std::optional<qsizetype> FrxFile::recordLength(const FrxReference& reference, Fr
 
 std::vector<FrxProperty> frxProperties(FormNode& root) {
   std::vector<FrxProperty> found;
+  std::map<std::pair<const PropertyGroup*, QString>, int> seen;
   root.forEachProperty([&](PropertyGroup& group, FormNode& owner, QStringView name, QStringView value) {
+    const int occurrence = seen[{&group, name.toString().toLower()}]++;
     if (auto reference = parseFrxReference(value))
-      found.push_back({&group, &owner, name.toString(), std::move(*reference)});
+      found.push_back({&group, &owner, name.toString(), std::move(*reference), occurrence});
   });
   return found;
 }
@@ -263,12 +265,13 @@ std::map<quint32, qsizetype> frxRecordEnds(FormNode& root, const FrxFile& file) 
     const quint32 offset = property.reference.offset;
     if (offset >= file.bytes().size()) continue;
     const auto next = starts.upper_bound(offset);
-    qsizetype end =
-        next == starts.end() ? file.bytes().size() : std::min<qsizetype>(*next, file.bytes().size());
+    // A record whose header gives its length ends there, even where another record starts inside it (a
+    // damaged file): cut at that start, it would read back as another value.
     const FrxRecordKind kind =
         frxRecordKind(property.owner->className(), property.name, property.reference.longText);
-    if (const auto length = file.recordLength(property.reference, kind))
-      end = std::min(end, offset + *length);
+    qsizetype end =
+        next == starts.end() ? file.bytes().size() : std::min<qsizetype>(*next, file.bytes().size());
+    if (const auto length = file.recordLength(property.reference, kind)) end = offset + *length;
     auto [slot, added] = ends.emplace(offset, end);
     if (!added) slot->second = std::max(slot->second, end);
   }
@@ -301,7 +304,7 @@ QByteArray rebuildFrx(FormNode& root, const FrxFile& old, const std::map<quint32
     values.push_back(formatFrxReference({fileName, offset, property.reference.longText}));
   }
   for (size_t i = 0; i < properties.size(); ++i)
-    properties[i].group->setProperty(properties[i].name, values[i]);
+    properties[i].group->setPropertyAt(properties[i].name, properties[i].occurrence, values[i]);
   return bytes;
 }
 

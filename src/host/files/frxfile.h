@@ -94,6 +94,8 @@ struct FrxProperty {
   FormNode* owner;       // the control it belongs to
   QString name;
   FrxReference reference;
+  /// How many lines of the same name stand above it in its group (a damaged file may repeat one).
+  int occurrence = 0;
 };
 
 /// Every property line of the description that refers to a binary file, in file order.
