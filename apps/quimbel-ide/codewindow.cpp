@@ -134,7 +134,7 @@ CodeWindow::CodeWindow(const std::shared_ptr<host::WindowImpl>& window, QWidget*
   connect(m_objects, &QComboBox::activated, this,
           [this](int index) { chooseObject(m_objects->itemText(index)); });
   connect(m_procedures, &QComboBox::activated, this,
-          [this](int index) { chooseProcedure(m_procedures->itemText(index)); });
+          [this](int index) { chooseProcedure(m_procedures->itemText(index), index); });
   m_caretTimer.setSingleShot(true);
   m_caretTimer.setInterval(150);
   connect(&m_caretTimer, &QTimer::timeout, this, &CodeWindow::showProcedureOfCaret);
@@ -216,16 +216,18 @@ void CodeWindow::fillProcedures(const QString& object) {
   const std::vector<CodeObject> all = objects();
   if (object.isEmpty() || object == kGeneral) {
     m_procedures->addItem(kDeclarations, QVariantList{QString(), 0});
-    std::vector<const host::ProcInfo*> general;
-    for (const host::ProcInfo& proc : text.procedures())
-      if (ownerOf(proc.name, all).first.isEmpty()) general.push_back(&proc);
-    std::stable_sort(general.begin(), general.end(), [](const host::ProcInfo* a, const host::ProcInfo* b) {
+    // Each declaration at its own place: two of one name in #If ... #Else branches are two entries.
+    const std::vector<ide::ProcExtent> extents = text.procedureExtents();
+    std::vector<const ide::ProcExtent*> general;
+    for (const ide::ProcExtent& extent : extents)
+      if (ownerOf(extent.name, all).first.isEmpty()) general.push_back(&extent);
+    std::stable_sort(general.begin(), general.end(), [](const ide::ProcExtent* a, const ide::ProcExtent* b) {
       return lessCaseInsensitive(a->name, b->name);
     });
-    for (const host::ProcInfo* proc : general) {
-      const int kind = static_cast<int>(proc->kind);
-      m_procedures->addItem(proc->name + QLatin1StringView(kKindSuffix[kind]),
-                            QVariantList{proc->name, kind});
+    for (const ide::ProcExtent* extent : general) {
+      const int kind = static_cast<int>(extent->kind);
+      m_procedures->addItem(extent->name + QLatin1StringView(kKindSuffix[kind]),
+                            QVariantList{extent->name, kind, extent->bodyLine});
     }
   } else if (const auto found =
                  std::find_if(all.begin(), all.end(), [&](const CodeObject& o) { return o.name == object; });
@@ -290,10 +292,8 @@ void CodeWindow::updateView() {
     if (m_separatorsRevision != m_shownRevision) {
       m_separatorsRevision = m_shownRevision;
       std::vector<int> lines;
-      for (const host::ProcInfo& procedure : text.procedures()) {
-        const int start = text.procStartLine(procedure.name, procedure.kind);
-        if (start > 1) lines.push_back(start);
-      }
+      for (const ide::ProcExtent& extent : text.procedureExtents())
+        if (extent.startLine > 1) lines.push_back(extent.startLine);
       m_editor->setSeparators(std::move(lines));
     }
     if (!m_procedureView) {
@@ -301,14 +301,14 @@ void CodeWindow::updateView() {
       return;
     }
     const int line = std::min(m_binding->pane()->selection().startLine, std::max(1, text.countOfLines()));
-    ide::ProcKind kind = ide::ProcKind::Proc;
-    const QString name = text.procOfLine(line, kind);
-    if (name.isEmpty()) {
+    const std::vector<ide::ProcExtent> extents = text.procedureExtents();
+    const auto around = std::find_if(extents.begin(), extents.end(), [line](const ide::ProcExtent& extent) {
+      return line >= extent.startLine && line < extent.startLine + extent.countLines;
+    });
+    if (around == extents.end())
       m_editor->showLines(1, std::max(1, text.countOfDeclarationLines()));
-    } else {
-      const int start = text.procStartLine(name, kind);
-      m_editor->showLines(start, start + text.procCountLines(name, kind) - 1);
-    }
+    else
+      m_editor->showLines(around->startLine, around->startLine + around->countLines - 1);
   } catch (const ide::Error& error) {
     // A module the index cannot answer for is shown whole.
     qCDebug(lcIde) << "the code window shows its whole module:" << error.description();
@@ -344,13 +344,14 @@ void CodeWindow::chooseObject(const QString& object) {
   showProcedureOfCaret();
 }
 
-void CodeWindow::chooseProcedure(const QString& item) {
+void CodeWindow::chooseProcedure(const QString& item, int index) {
   if (m_filling) return;
   const QString object = m_objects->currentText();
   if (m_proceduresOf != object) fillProcedures(object);
-  const int index = m_procedures->findText(item, Qt::MatchFixedString | Qt::MatchCaseSensitive);
+  if (index < 0 || index >= m_procedures->count() || m_procedures->itemText(index) != item)
+    index = m_procedures->findText(item, Qt::MatchFixedString | Qt::MatchCaseSensitive);
   const QVariantList data = index >= 0 ? m_procedures->itemData(index).toList() : QVariantList();
-  if (data.size() != 2) return;
+  if (data.size() < 2) return;
   const QString name = data.at(0).toString();
   if (name.isEmpty()) {
     pane()->SetSelection(1, 1, 1, 1);
@@ -366,6 +367,10 @@ void CodeWindow::chooseProcedure(const QString& item) {
   if (!exists && found != all.end()) {
     writeEventProcedure(*found, item);
     fillProcedures(object);
+  } else if (data.size() > 2 && data.at(2).toInt() <= m_binding->module()->CountOfLines()) {
+    const int line = data.at(2).toInt();  // that declaration, not the first of its name
+    pane()->SetSelection(line, 1, line, 1);
+    m_editor->setFocus();
   } else {
     goToProcedure(name, static_cast<ide::ProcKind>(data.at(1).toInt()));
   }

@@ -59,7 +59,7 @@ class CodeWindow final : public QWidget {
   void fillLists();
   /// What choosing an item of each box does.
   void chooseObject(const QString& object);
-  void chooseProcedure(const QString& item);
+  void chooseProcedure(const QString& item, int index = -1);
 
  Q_SIGNALS:
   void caretMoved(int line, int column);

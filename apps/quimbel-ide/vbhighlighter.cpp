@@ -141,6 +141,8 @@ bool VbHighlighter::colour(const QString& text, bool inComment,
   while (tokens.next(token)) {
     switch (token.type) {
       case syntax::Token::Type::Comment:
+        // A comment's continuation line is comment from its first column, blanks included.
+        if (inComment) token.length += token.start, token.start = 0;
         addRange(formats, token.start, token.length, m_comment);
         return syntax::continues(text);  // a comment that ends with the mark goes on below
       case syntax::Token::Type::OpenString:

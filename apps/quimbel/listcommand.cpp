@@ -76,7 +76,8 @@ QString procedureKeyword(const host::ProcInfo& proc) {
 /// the whole module. Each procedure keeps its own place, two of one name under #If ... #Else too.
 QHash<QString, std::vector<size_t>> proceduresByMember(const std::vector<ide::ProcExtent>& extents) {
   QHash<QString, std::vector<size_t>> byMember;
-  for (size_t i = 0; i < extents.size(); ++i) byMember[extents[i].name.toCaseFolded()].push_back(i);
+  for (size_t i = 0; i < extents.size(); ++i)
+    byMember[extents[i].name.toCaseFolded()].push_back(i);
   return byMember;
 }
 

@@ -365,8 +365,8 @@ static int runTool(int argc, char** argv) {
       "be written, is read-only or was changed by another program since it was read (what was on disk is\n"
       "kept) or standard output failed, 5 files that a group or project lists are missing (each is named;\n"
       "the rest was done, and a line on standard error tells its result), 6 a save failed half way and\n"
-      "could not be undone (the message names the files), 7 tasks or favorites: the project has"
-      " no info file, 8 the task named does not exist.",
+      "could not be undone (the message names the files), 7 tasks or favorites: the project has no info\n"
+      "file, 8 the task named does not exist.",
       "quimbel"};
   parser.require_subcommand(1);
   parser.set_version_flag("--version", "quimbel " QUIMBEL_VERSION, "Print the version and exit");

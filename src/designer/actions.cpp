@@ -4,6 +4,8 @@
 #include "common/errors.h"
 #include "common/uiutils.h"
 #include "designer/values.h"
+#include "syntax/line.h"
+#include "syntax/text.h"
 
 #include <QStringList>
 
@@ -16,17 +18,33 @@ namespace {
 
 const QString kModule = QStringLiteral("basGlobals");
 
-bool isIdentifierChar(QChar c) {
-  return c.isLetterOrNumber() || c == u'_';
+/// Appends `word`, the control's new name in place of its old one (also in its event procedures' names:
+/// Text1_Change).
+void appendRenamed(QString& out, QStringView word, QStringView oldName, QStringView newName) {
+  if (word == oldName) {
+    out += newName;
+  } else if (word.size() > oldName.size() + 1 && word.startsWith(oldName) && word[oldName.size()] == u'_') {
+    out += newName;
+    out += word.sliced(oldName.size());
+  } else {
+    out += word;
+  }
 }
 
-/// A statement may begin after nothing, a colon or a line number.
-bool atStatementStart(QStringView before) {
-  before = before.trimmed();
-  if (before.isEmpty() || before.endsWith(u':')) return true;
-  for (const QChar c : before)
-    if (!c.isDigit()) return false;
-  return true;
+/// Appends a comment with the control renamed in its words too.
+void appendRenamedComment(QString& out, QStringView comment, QStringView oldName, QStringView newName) {
+  qsizetype i = 0;
+  while (i < comment.size()) {
+    qsizetype end = i;
+    while (end < comment.size() && syntax::isIdentifierChar(comment[end]))
+      ++end;
+    if (end == i) {
+      out += comment[i++];
+      continue;
+    }
+    appendRenamed(out, comment.sliced(i, end - i), oldName, newName);
+    i = end;
+  }
 }
 
 /// The control the writers write for: its form's code module, its name and whether it is an element of
@@ -96,42 +114,21 @@ QString renameControlInLine(QStringView line, QStringView oldName, QStringView n
   if (oldName.isEmpty()) return line.toString();
   QString out;
   out.reserve(line.size() + 16);
-  bool inString = false;
-  bool inComment = false;
-  qsizetype i = 0;
-  while (i < line.size()) {
-    const QChar c = line[i];
-    if (!inComment) {
-      if (inString || c == u'"') {
-        // A doubled quote inside a string closes and opens it again: the same as staying inside.
-        if (c == u'"') inString = !inString;
-        out += c;
-        ++i;
-        continue;
-      }
-      if (c == u'\'') inComment = true;
-    }
-    if (!c.isLetter() || (i > 0 && isIdentifierChar(line[i - 1]))) {
-      out += c;
-      ++i;
-      continue;
-    }
-    qsizetype end = i;
-    while (end < line.size() && isIdentifierChar(line[end]))
-      ++end;
-    const QStringView word = line.sliced(i, end - i);
-    if (!inComment && word.compare(u"Rem", Qt::CaseInsensitive) == 0 && atStatementStart(out))
-      inComment = true;
-    if (word == oldName) {
-      out += newName;
-    } else if (word.size() > oldName.size() + 1 && word.startsWith(oldName) && word[oldName.size()] == u'_') {
-      out += newName;  // an event procedure of the control: Text1_Change
-      out += word.sliced(oldName.size());
-    } else {
-      out += word;
-    }
-    i = end;
+  syntax::Tokenizer tokens(line);
+  syntax::Token token;
+  qsizetype done = 0;
+  while (tokens.next(token)) {
+    out += line.sliced(done, token.start - done);
+    const QStringView text = line.sliced(token.start, token.length);
+    if (token.type == syntax::Token::Type::Word)
+      appendRenamed(out, text, oldName, newName);
+    else if (token.type == syntax::Token::Type::Comment)
+      appendRenamedComment(out, text, oldName, newName);
+    else
+      out += text;  // strings keep what they say
+    done = token.start + token.length;
   }
+  out += line.sliced(done);
   return out;
 }
 

@@ -24,6 +24,10 @@ class JumpTargets {
   /// True when `line` begins (after its leading blanks) with a numeric label that a jump names.
   bool isTarget(QStringView line) const;
   bool empty() const { return m_labels.isEmpty(); }
+  /// True when a jump names the line number `number`.
+  bool names(qint32 number) const {
+    return !m_labels.isEmpty() && m_labels.contains(QString::number(number));
+  }
 
  private:
   QSet<QString> m_labels;  // the label's digits without leading zeros

@@ -178,8 +178,9 @@ int compareFolded(QStringView a, QStringView b) noexcept {
 
 unsigned char flagsOf(QStringView word) noexcept {
   if (word.size() < 2 || word.size() > 10) return 0;
-  const auto found = std::lower_bound(std::begin(kKeywords), std::end(kKeywords), word,
-                                      [](const Keyword& k, QStringView w) { return compareFolded(k.word, w) < 0; });
+  const auto found =
+      std::lower_bound(std::begin(kKeywords), std::end(kKeywords), word,
+                       [](const Keyword& k, QStringView w) { return compareFolded(k.word, w) < 0; });
   return found != std::end(kKeywords) && compareFolded(found->word, word) == 0 ? found->flags : 0;
 }
 

@@ -202,7 +202,7 @@ struct Token {
     Directive,   // "#" and the word after it, at the start of a statement
     Colon,       // the statement separator (":" not followed by "=")
     Comma,
-    Other,       // any other character
+    Other,  // any other character
   };
   Type type = Type::Other;
   qsizetype start = 0;

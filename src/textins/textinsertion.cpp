@@ -4,6 +4,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "host/files/ansi.h"
+#include "syntax/declarations.h"
 
 #include <QLoggingCategory>
 
@@ -81,13 +82,11 @@ QString longTimeFormat(const QLocale& locale) {
   return result.remove(QStringLiteral("()")).trimmed();
 }
 
-/// "Sub" or "Function" when the statement declares one, by the keyword after a blank or at its start.
+/// "Sub" or "Function" when the statement declares one.
 QString declaredKind(const QString& statement) {
-  for (const QLatin1StringView keyword : {QLatin1StringView("Sub"), QLatin1StringView("Function")}) {
-    const QString word = keyword + u' ';
-    if (statement.startsWith(word) || statement.contains(u' ' + word)) return keyword;
-  }
-  return {};
+  const auto header = syntax::parseProcHeader(statement);
+  if (!header || header->kind != ide::ProcKind::Proc) return {};
+  return header->isFunction ? QStringLiteral("Function") : QStringLiteral("Sub");
 }
 
 QString projectName(const ide::Ref<ide::VBComponent>& component) {
@@ -105,11 +104,9 @@ std::optional<QString> controlName(const ide::Ref<ide::VBComponent>& component, 
   ignoringFailure([&] {
     const auto designer = component->Designer();
     if (!designer) return;
-    const QString statement = component->CodeModule()->Lines(info.BodyLine, 1);
-    const qsizetype keyword = statement.indexOf(QLatin1StringView(" Sub "));
-    const qsizetype nameStart = keyword < 0 ? 4 : keyword + 5;
-    const qsizetype underscore = statement.indexOf(u'_', nameStart);
-    const QString candidate = underscore < 0 ? QString() : statement.mid(nameStart, underscore - nameStart);
+    const auto header = syntax::parseProcHeader(component->CodeModule()->Lines(info.BodyLine, 1));
+    const qsizetype underscore = header ? header->name.indexOf(u'_') : -1;
+    const QString candidate = underscore < 0 ? QString() : header->name.first(underscore);
     for (const auto& control : designer->VBControls()->items()) {
       const QString name = control->name();
       if (name.compare(candidate, Qt::CaseInsensitive) == 0) {

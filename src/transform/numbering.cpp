@@ -46,6 +46,14 @@ qint32 nextNumber(qint32 runningNumber, qint32 interval) {
   return qint32(next);
 }
 
+// A number a kept label already has would label two lines: it is passed over.
+qint32 nextFreeNumber(qint32 runningNumber, qint32 interval, const JumpTargets& targets) {
+  qint32 number = nextNumber(runningNumber, interval);
+  while (targets.names(number))
+    number = nextNumber(number, interval);
+  return number;
+}
+
 void appendNumber(QString& out, qint32 number) {
   char digits[16];
   const auto end = std::to_chars(digits, digits + sizeof digits, number).ptr;
@@ -121,12 +129,12 @@ bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32
   } else if (prefix) {
     // An old number or numeric label: the new number takes its place and its separator (the colon and a
     // blank after it, or one blank) and keeps what followed, so that numbering again changes nothing.
-    number = nextNumber(runningNumber, interval);
+    number = nextFreeNumber(runningNumber, interval, targets);
     const QStringView after = rest.sliced(1);
     result = numbered(number, u" ", indent,
                       prefix.form == NumberPrefix::Form::Colon ? withoutOneBlank(after) : after);
   } else {
-    number = nextNumber(runningNumber, interval);
+    number = nextFreeNumber(runningNumber, interval, targets);
     // One word (Else, Loop): two spaces keep it clear of the number.
     result = numbered(number, syntax::indexOfBlank(t) < 0 ? u"  " : u" ", {}, whole);
   }
@@ -166,8 +174,7 @@ bool UnnumberLine(QString& line) {
     if (syntax::isBlankLine(rest)) return false;  // the number alone, with trailing blanks
     // A one-word line was numbered with two blanks: the second goes too.
     const QStringView word = syntax::trimmedView(rest);
-    if (!rest.isEmpty() && syntax::isBlank(rest.front()) && syntax::indexOfBlank(word) < 0)
-      rest = rest.sliced(1);
+    if (rest.startsWith(u' ') && syntax::indexOfBlank(word) < 0) rest = rest.sliced(1);
   }
 
   QString result;

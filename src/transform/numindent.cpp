@@ -54,8 +54,8 @@ void NumIndentWalk::NumIndentCurrentProcedure(ide::VBE& vbe, qint32 totalUnits) 
 
 void NumIndentWalk::memberProcedures(const ide::Ref<ide::CodeModule>& module,
                                      const ide::Ref<ide::Member>& member) {
-  m_procedures.of(*module).forMember(*member,
-                                     [&](const ide::ProcExtent& extent) { numIndentProcedure(*module, extent); });
+  m_procedures.of(*module).forMember(
+      *member, [&](const ide::ProcExtent& extent) { numIndentProcedure(*module, extent); });
 }
 
 void NumIndentWalk::numIndentProcedure(ide::CodeModule& module, const ide::ProcExtent& extent) {

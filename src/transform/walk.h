@@ -186,7 +186,9 @@ class ModuleProcedures {
   /// The first procedure of a name and kind, as the lookups by name find it.
   std::optional<ide::ProcExtent> find(QStringView name, ide::ProcKind kind) const;
 
-  bool isFor(ide::CodeModule& module) const { return &module == m_module && module.CountOfLines() == m_lines; }
+  bool isFor(ide::CodeModule& module) const {
+    return &module == m_module && module.CountOfLines() == m_lines;
+  }
 
  private:
   const ide::CodeModule* m_module;

@@ -53,7 +53,8 @@ class Tool {
     environment.insert(u"QUIMBEL_CONFIG_DIR"_qs, m_home.filePath(u"config"_qs));
     environment.insert(u"QUIMBEL_DATA_DIR"_qs, m_home.filePath(u"data"_qs));
     environment.insert(u"LC_ALL"_qs, u"C.UTF-8"_qs);
-    environment.insert(u"PATH"_qs, QFileInfo(QUIMBEL_BINARY).absolutePath() + u':' + environment.value(u"PATH"_qs));
+    environment.insert(u"PATH"_qs,
+                       QFileInfo(QUIMBEL_BINARY).absolutePath() + u':' + environment.value(u"PATH"_qs));
     process.setProcessEnvironment(environment);
     if (!directory.isEmpty()) process.setWorkingDirectory(directory);
     process.start(program, arguments);
@@ -170,7 +171,8 @@ TEST(CommandLine, MessagesNameWhatIsWrongOnceAndUsageNamesTheTool) {
   const std::tuple<QStringList, int, QString> runs[] = {
       {{u"frobnicate"_qs}, 2, u"quimbel: unknown command 'frobnicate'\n"_qs},
       {{u"list"_qs, u"Nada.bas"_qs}, 3, u"quimbel: Nada.bas: File not found\n"_qs},
-      {{u"tasks"_qs, u"Calculo.bas"_qs}, 2,
+      {{u"tasks"_qs, u"Calculo.bas"_qs},
+       2,
        u"quimbel: Calculo.bas: tasks and favorites belong to a project; give its project file (.vbp)\n"_qs},
       {{u"number"_qs, u"--file-lines"_qs, u"--start"_qs, u"5"_qs, u"Calculo.bas"_qs}, 2, {}},
       {{u"number"_qs, u"-"_qs, u"--stdin-filename"_qs, u"Leiame.txt"_qs}, 3, {}}};
@@ -596,7 +598,8 @@ TEST(FindCommand, ListsWhatTheAddInListsInTheSameOrder) {
       const QStringList expected = modelRows(file, search);
       EXPECT_EQ(lines(result.out), expected) << arguments.join(u' ').toStdString();
       EXPECT_EQ(result.code, expected.isEmpty() ? 1 : 0);
-      EXPECT_EQ(result.err, u"%1 occurrence%2 found\n"_qs.arg(expected.size()).arg(expected.size() == 1 ? "" : "s"));
+      EXPECT_EQ(result.err,
+                u"%1 occurrence%2 found\n"_qs.arg(expected.size()).arg(expected.size() == 1 ? "" : "s"));
     }
   }
 }
@@ -671,9 +674,10 @@ struct Repository {
 
   explicit Repository(Tool& user, const QByteArray& editorConfig = {}) : tool(user) {
     if (!editorConfig.isEmpty()) writeBytes(copy.path(u".editorconfig"_qs), editorConfig);
-    for (const QStringList& arguments :
-         {QStringList{u"init"_qs, u"-q"_qs}, {u"config"_qs, u"user.name"_qs, u"Teste"_qs},
-          {u"config"_qs, u"user.email"_qs, u"teste@example.invalid"_qs}, {u"config"_qs, u"core.autocrlf"_qs, u"false"_qs}})
+    for (const QStringList& arguments : {QStringList{u"init"_qs, u"-q"_qs},
+                                         {u"config"_qs, u"user.name"_qs, u"Teste"_qs},
+                                         {u"config"_qs, u"user.email"_qs, u"teste@example.invalid"_qs},
+                                         {u"config"_qs, u"core.autocrlf"_qs, u"false"_qs}})
       git(arguments);
   }
   Result git(const QStringList& arguments, const QByteArray& input = {}) {
@@ -692,9 +696,9 @@ TEST(Git, DiffsApplyWithGitAndPatch) {
   Repository repository(tool);
   repository.commitAll();
   QTemporaryDir patches;
-  for (const QStringList& command :
-       {QStringList{u"number"_qs, u"--start"_qs, u"10"_qs}, {u"indent"_qs, u"--spaces"_qs, u"2"_qs},
-        {u"numindent"_qs, u"--file-lines"_qs}}) {
+  for (const QStringList& command : {QStringList{u"number"_qs, u"--start"_qs, u"10"_qs},
+                                     {u"indent"_qs, u"--spaces"_qs, u"2"_qs},
+                                     {u"numindent"_qs, u"--file-lines"_qs}}) {
     const QString patch = patches.filePath(command.front());
     const Result diff = tool.run(command + QStringList{u"--diff"_qs, u"Demo.vbg"_qs}, repository.root);
     ASSERT_EQ(diff.code, 0) << diff.err.toStdString();
@@ -703,7 +707,8 @@ TEST(Git, DiffsApplyWithGitAndPatch) {
     repository.git({u"apply"_qs, u"--check"_qs, patch});
   }
   // Applied with patch, the diff gives what the command writes.
-  const Result applied = tool.runProgram(u"patch"_qs, {u"-s"_qs, u"-p1"_qs, u"-i"_qs, patches.filePath(u"number"_qs)}, repository.root);
+  const Result applied = tool.runProgram(
+      u"patch"_qs, {u"-s"_qs, u"-p1"_qs, u"-i"_qs, patches.filePath(u"number"_qs)}, repository.root);
   ASSERT_EQ(applied.code, 0) << applied.out.toStdString();
   const auto patched = repository.copy.snapshot();
   repository.git({u"checkout"_qs, u"-q"_qs, u"--"_qs, u"."_qs});
@@ -762,7 +767,8 @@ TEST(Git, ThePreCommitHooksCheckFixAndUnnumberTheFilesGiven) {
   const QString file = u"Loja/modPersistencia.bas"_qs;
   repository.commitAll();
   const auto run = [&](const QString& hook, const QStringList& arguments) {
-    return tool.runProgram(u"/bin/sh"_qs, QStringList{u"-c"_qs, hooks[hook].first + u" \"$@\""_qs, u"hook"_qs} + arguments,
+    return tool.runProgram(u"/bin/sh"_qs,
+                           QStringList{u"-c"_qs, hooks[hook].first + u" \"$@\""_qs, u"hook"_qs} + arguments,
                            repository.root);
   };
   const QByteArray before = readBytes(repository.copy.path(file));
@@ -771,7 +777,9 @@ TEST(Git, ThePreCommitHooksCheckFixAndUnnumberTheFilesGiven) {
   EXPECT_EQ(run(u"quimbel-indent"_qs, {file}).code, 0);
   EXPECT_EQ(run(u"quimbel-indent"_qs, {u"--check"_qs, file}).code, 0);
   EXPECT_EQ(run(u"quimbel-unnumber"_qs, {file}).code, 0);
-  EXPECT_FALSE(QRegularExpression(u"\\n\\s*\\d+ "_qs).match(QString::fromLatin1(readBytes(repository.copy.path(file)))).hasMatch());
+  EXPECT_FALSE(QRegularExpression(u"\\n\\s*\\d+ "_qs)
+                   .match(QString::fromLatin1(readBytes(repository.copy.path(file))))
+                   .hasMatch());
   EXPECT_NE(repository.git({u"status"_qs, u"--porcelain"_qs}).out, QString());
 }
 
@@ -790,18 +798,21 @@ TEST(Style, AnEditorConfigGivesEveryoneTheSameResultAndConfigSaysWhereEachValueC
   EXPECT_EQ(bob.run(numIndent, work.dir.path()).out, shared.out);
   EXPECT_TRUE(shared.out.contains(u"+10     If x > 0 Then"_qs)) << shared.out.toStdString();
 
-  const Result config = bob.run({u"config"_qs, u"--interval"_qs, u"7"_qs, u"Calculo.bas"_qs}, work.dir.path());
+  const Result config =
+      bob.run({u"config"_qs, u"--interval"_qs, u"7"_qs, u"Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(config.code, 0) << config.err.toStdString();
-  EXPECT_EQ(config.out.simplified(), u"indent_style = space .editorconfig (.editorconfig) "
-                                     "indent_size = 4 .editorconfig (.editorconfig) "
-                                     "quimbel_number_start = 10 .editorconfig (.editorconfig) "
-                                     "quimbel_number_interval = 7 command line "
-                                     "quimbel_numindent = false default"_qs);
+  EXPECT_EQ(config.out.simplified(),
+            u"indent_style = space .editorconfig (.editorconfig) "
+            "indent_size = 4 .editorconfig (.editorconfig) "
+            "quimbel_number_start = 10 .editorconfig (.editorconfig) "
+            "quimbel_number_interval = 7 command line "
+            "quimbel_numindent = false default"_qs);
   EXPECT_TRUE(bob.run({u"config"_qs, u"Outro.cls"_qs}, work.dir.path())
                   .out.contains(u"quimbel_number_start = 100          personal settings ("_qs));
 
   // The one-command option: numbering indents too.
-  writeBytes(work.dir.filePath(u"Sub/.editorconfig"_qs), "[*]\nquimbel_numindent = true\nindent_size = tab\ntab_width = 2\n");
+  writeBytes(work.dir.filePath(u"Sub/.editorconfig"_qs),
+             "[*]\nquimbel_numindent = true\nindent_size = tab\ntab_width = 2\n");
   writeBytes(work.dir.filePath(u"Sub/Calculo.bas"_qs), kCalculo);
   const Result both = alice.run({u"number"_qs, u"--diff"_qs, u"Sub/Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(both.out, alice.run({u"numindent"_qs, u"--diff"_qs, u"Sub/Calculo.bas"_qs}, work.dir.path()).out);
@@ -810,13 +821,15 @@ TEST(Style, AnEditorConfigGivesEveryoneTheSameResultAndConfigSaysWhereEachValueC
   writeBytes(work.dir.filePath(u"Sub/.editorconfig"_qs), "[*.bas]\nquimbel_number_interval = 0\n");
   const Result bad = alice.run({u"number"_qs, u"Sub/Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(bad.code, 3);
-  EXPECT_TRUE(bad.err.startsWith(u"quimbel: Sub/.editorconfig: quimbel_number_interval = 0 is not"_qs)) << bad.err.toStdString();
+  EXPECT_TRUE(bad.err.startsWith(u"quimbel: Sub/.editorconfig: quimbel_number_interval = 0 is not"_qs))
+      << bad.err.toStdString();
   EXPECT_EQ(readBytes(work.dir.filePath(u"Sub/Calculo.bas"_qs)), kCalculo);
 }
 
 TEST(StandardInput, OneModuleInTheResultOutNothingWritten) {
   Workspace work;
-  writeBytes(work.dir.filePath(u".editorconfig"_qs), "[*.frm]\nquimbel_number_start = 1\nquimbel_number_interval = 1\n");
+  writeBytes(work.dir.filePath(u".editorconfig"_qs),
+             "[*.frm]\nquimbel_number_start = 1\nquimbel_number_interval = 1\n");
   Tool tool;
   const QStringList form{u"number"_qs, u"--stdin-filename"_qs, u"Telas/frmA.frm"_qs, u"-"_qs};
   Result result = tool.run(form, work.dir.path(), kCalculo);
@@ -827,9 +840,11 @@ TEST(StandardInput, OneModuleInTheResultOutNothingWritten) {
   result = tool.run({u"number"_qs, u"--check"_qs, u"-"_qs}, {}, kCalculo);
   EXPECT_EQ(result.code, 1);
   EXPECT_EQ(result.out, u"would change stdin.bas\n"_qs);
-  result = tool.run({u"number"_qs, u"--stdin-filename"_qs, u"Mau.bas"_qs, u"-"_qs}, {}, QByteArray("Sub A()\r\n\0", 10));
+  result = tool.run({u"number"_qs, u"--stdin-filename"_qs, u"Mau.bas"_qs, u"-"_qs}, {},
+                    QByteArray("Sub A()\r\n\0", 10));
   EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.startsWith(u"quimbel: Mau.bas, line 2: not a text file"_qs)) << result.err.toStdString();
+  EXPECT_TRUE(result.err.startsWith(u"quimbel: Mau.bas, line 2: not a text file"_qs))
+      << result.err.toStdString();
   EXPECT_TRUE(result.bytes.isEmpty());
   EXPECT_EQ(work.bytes(), kCalculo);
 }
@@ -847,9 +862,11 @@ TEST(Json, ListAndFindParseBackWithEveryLineNamedForWhatItCounts) {
       rows << u"%1\t(declarations)\t0\t0\t0\t%2"_qs.arg(path).arg(component[u"declaration_lines"_qs].toInt());
       for (const QJsonValue member : component[u"members"_qs].toArray())
         for (const QJsonValue procedure : member[u"procedures"_qs].toArray()) {
-          const QByteArray line = readBytes(example.path(path)).split('\n').value(procedure[u"body_file_line"_qs].toInt() - 1);
+          const QByteArray line =
+              readBytes(example.path(path)).split('\n').value(procedure[u"body_file_line"_qs].toInt() - 1);
           EXPECT_TRUE(line.contains(member[u"name"_qs].toString().toLatin1())) << line.toStdString();
-          rows << u"%1\t%2\t%3\t%4"_qs.arg(path, member[u"name"_qs].toString(), procedure[u"kind"_qs].toString())
+          rows << u"%1\t%2\t%3\t%4"_qs
+                      .arg(path, member[u"name"_qs].toString(), procedure[u"kind"_qs].toString())
                       .arg(procedure[u"start_code_line"_qs].toInt());
         }
     }
@@ -859,15 +876,21 @@ TEST(Json, ListAndFindParseBackWithEveryLineNamedForWhatItCounts) {
   EXPECT_EQ(rows.filter(u"(declarations)"_qs), tsv.filter(u"(declarations)"_qs));
 
   const QStringList search{u"find"_qs, u"cliente"_qs, u"Demo.vbg"_qs};
-  const QJsonArray found = QJsonDocument::fromJson(tool.run(search + QStringList{u"--json"_qs}, example.path({})).bytes).array();
+  const QJsonArray found =
+      QJsonDocument::fromJson(tool.run(search + QStringList{u"--json"_qs}, example.path({})).bytes).array();
   QStringList tsvRows;
   QStringList plainRows;
   for (const QJsonValue hit : found) {
-    tsvRows << u"%1\t%2\t%3\t%4:%5\t%6"_qs.arg(hit[u"project"_qs].toString(), hit[u"module"_qs].toString(),
-                                               hit[u"procedure"_qs].toString())
-                   .arg(hit[u"code_line"_qs].toInt()).arg(hit[u"column"_qs].toInt()).arg(hit[u"text"_qs].toString());
-    plainRows << u"%1:%2:%3: %4"_qs.arg(hit[u"path"_qs].toString()).arg(hit[u"file_line"_qs].toInt())
-                     .arg(hit[u"column"_qs].toInt()).arg(hit[u"text"_qs].toString());
+    tsvRows << u"%1\t%2\t%3\t%4:%5\t%6"_qs
+                   .arg(hit[u"project"_qs].toString(), hit[u"module"_qs].toString(),
+                        hit[u"procedure"_qs].toString())
+                   .arg(hit[u"code_line"_qs].toInt())
+                   .arg(hit[u"column"_qs].toInt())
+                   .arg(hit[u"text"_qs].toString());
+    plainRows << u"%1:%2:%3: %4"_qs.arg(hit[u"path"_qs].toString())
+                     .arg(hit[u"file_line"_qs].toInt())
+                     .arg(hit[u"column"_qs].toInt())
+                     .arg(hit[u"text"_qs].toString());
   }
   EXPECT_EQ(tsvRows, lines(tool.run(search + QStringList{u"--tsv"_qs}, example.path({})).out));
   EXPECT_EQ(plainRows, lines(tool.run(search, example.path({})).out));
@@ -913,24 +936,32 @@ TEST(FileLines, EachNewNumberIsTheLineOfTheFileThatHoldsIt) {
 TEST(Inputs, FoldersStandForTheirFilesEachFileIsDoneOnceAndMissingFilesLeaveTheResultVisible) {
   ExampleCopy copy;
   Tool tool;
-  const QStringList named{u"."_qs, u"Loja/Loja.vbp"_qs, u"Loja/modPersistencia.bas"_qs,
-                          u"Loja/../Loja/clsPedido.cls"_qs, u"--exclude"_qs, u"Utilitarios"_qs,
-                          u"--exclude"_qs, u"frm*.frm"_qs};
+  const QStringList named{u"."_qs,
+                          u"Loja/Loja.vbp"_qs,
+                          u"Loja/modPersistencia.bas"_qs,
+                          u"Loja/../Loja/clsPedido.cls"_qs,
+                          u"--exclude"_qs,
+                          u"Utilitarios"_qs,
+                          u"--exclude"_qs,
+                          u"frm*.frm"_qs};
   const Result check = tool.run(QStringList{u"number"_qs, u"--check"_qs} + named, copy.path({}));
   EXPECT_EQ(check.code, 1);
   const QStringList changing = lines(check.out);
-  EXPECT_EQ(changing.size(), QSet<QString>(changing.begin(), changing.end()).size()) << check.out.toStdString();
+  EXPECT_EQ(changing.size(), QSet<QString>(changing.begin(), changing.end()).size())
+      << check.out.toStdString();
   EXPECT_TRUE(changing.contains(u"would change Loja/clsPedido.cls"_qs)) << check.out.toStdString();
   EXPECT_EQ(changing.filter(u"Utilitarios"_qs).size() + changing.filter(u"/frm"_qs).size(), 0);
   EXPECT_EQ(tool.run(QStringList{u"number"_qs} + named, copy.path({})).code, 0);
   EXPECT_EQ(tool.run(QStringList{u"number"_qs, u"--check"_qs} + named, copy.path({})).code, 0);
 
   QFile::remove(copy.path(u"Loja/clsPedido.cls"_qs));
-  const Result missing = tool.run({u"indent"_qs, u"--spaces"_qs, u"8"_qs, u"--check"_qs, u"Demo.vbg"_qs}, copy.path({}));
+  const Result missing =
+      tool.run({u"indent"_qs, u"--spaces"_qs, u"8"_qs, u"--check"_qs, u"Demo.vbg"_qs}, copy.path({}));
   EXPECT_EQ(missing.code, 5);
   EXPECT_TRUE(missing.err.endsWith(u"\n%1 files would change, 1 missing\n"_qs.arg(lines(missing.out).size())))
       << missing.err.toStdString();
-  EXPECT_TRUE(tool.run({u"find"_qs, u"Sub"_qs, u"Demo.vbg"_qs}, copy.path({})).err.contains(QRegularExpression(u"\n\\d+ occurrences found, 1 missing\n$"_qs)));
+  EXPECT_TRUE(tool.run({u"find"_qs, u"Sub"_qs, u"Demo.vbg"_qs}, copy.path({}))
+                  .err.contains(QRegularExpression(u"\n\\d+ occurrences found, 1 missing\n$"_qs)));
 }
 
 TEST(Encoding, AUtf8ModuleIsNamedAndUtf8ReadsAndWritesItByteForByte) {
@@ -939,8 +970,10 @@ TEST(Encoding, AUtf8ModuleIsNamedAndUtf8ReadsAndWritesItByteForByte) {
   Tool tool;
   Result result = tool.run({u"find"_qs, u"preços"_qs, u"Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(result.code, 1);
-  EXPECT_TRUE(result.err.startsWith(u"quimbel: Calculo.bas: warning: this module is UTF-8"_qs)) << result.err.toStdString();
-  result = tool.run({u"find"_qs, u"--encoding"_qs, u"utf-8"_qs, u"preços"_qs, u"Calculo.bas"_qs}, work.dir.path());
+  EXPECT_TRUE(result.err.startsWith(u"quimbel: Calculo.bas: warning: this module is UTF-8"_qs))
+      << result.err.toStdString();
+  result =
+      tool.run({u"find"_qs, u"--encoding"_qs, u"utf-8"_qs, u"preços"_qs, u"Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(result.out, u"Calculo.bas:3:14: ' Cálculo de preços\n"_qs);
   EXPECT_EQ(result.err, u"1 occurrence found\n"_qs);
   // A byte that is not UTF-8 survives as well.

@@ -70,7 +70,8 @@ TEST(AnsiTest, Utf8ModeKeepsEveryByteAndReadsValidUtf8AsUtf8) {
       byte = char(random.bounded(4) ? 0x80 + random.bounded(0x78) : random.bounded(256));
     const QString text = decodeAnsi(bytes);
     EXPECT_EQ(encodeAnsi(text), std::optional(bytes)) << bytes.toHex().toStdString();
-    QStringDecoder utf8(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless | QStringDecoder::Flag::ConvertInitialBom);
+    QStringDecoder utf8(QStringDecoder::Utf8,
+                        QStringDecoder::Flag::Stateless | QStringDecoder::Flag::ConvertInitialBom);
     const QString strict = utf8.decode(bytes);
     const bool wide = std::any_of(bytes.begin(), bytes.end(), [](char byte) { return byte & 0x80; });
     EXPECT_EQ(looksLikeUtf8(bytes), wide && !utf8.hasError()) << bytes.toHex().toStdString();

@@ -471,9 +471,8 @@ TEST(Editing, TheIndexFollowsLinesAddedAndRemovedInsideProcedures) {
     } else {
       const int first = low + static_cast<int>(random() % static_cast<unsigned>(count - low + 1));
       const QString line = text.line(first);
-      const LineClass cls = classifyStatement(line);
-      if (isStructural(cls) || continuesOnNextLine(line) ||
-          (first > 1 && continuesOnNextLine(text.line(first - 1))))
+      if (syntax::isStructural(syntax::classify(line).kind) || syntax::continues(line) ||
+          (first > 1 && syntax::continues(text.line(first - 1))))
         continue;  // keep the structure: this test is about lines that come and go around it
       text.deleteLines(first, 1);
     }

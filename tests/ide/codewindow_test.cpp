@@ -85,5 +85,21 @@ TEST_F(CodeWindowTest, ChoosingAnEventWithoutAProcedureWritesItAndPutsTheCaretIn
                      "X As Single, Y As Single)"));
 }
 
+TEST_F(CodeWindowTest, TwoProceduresOfOneNameInConditionalBranchesAreTwoEntries) {
+  CodeWindow* window = open("modPrincipal");
+  ASSERT_NE(window, nullptr);
+  auto module = window->binding()->module();
+  module->InsertLines(module->CountOfLines() + 1,
+                      u"#If DEBUG Then\r\nSub Conecta()\r\n    x = 1\r\nEnd Sub\r\n#Else\r\nSub Conecta()\r\n"
+                      "    x = 2\r\nEnd Sub\r\n#End If"_qs);
+  window->fillLists();
+  const QStringList items = itemsOf(window->procedureList());
+  ASSERT_EQ(items.count(u"Conecta"_qs), 2) << items.join(u',').toStdString();
+  window->chooseProcedure(u"Conecta"_qs, int(items.lastIndexOf(u"Conecta"_qs)));
+  EXPECT_EQ(line(window, window->pane()->selection().startLine + 1), u"    x = 2"_qs);
+  window->chooseProcedure(u"Conecta"_qs, int(items.indexOf(u"Conecta"_qs)));
+  EXPECT_EQ(line(window, window->pane()->selection().startLine + 1), u"    x = 1"_qs);
+}
+
 }  // namespace
 }  // namespace desktop

@@ -53,10 +53,13 @@ TEST(Tool, TasksAreListedAndChangedInTheFileTheAddInUses) {
   const QStringList listed = quimbel({u"tasks"_qs, vbp}).out;
   EXPECT_EQ(listed.mid(1), (QStringList{u"    1  [ ]  Revisar (frete)"_qs, u"           Tabela"_qs,
                                         u"           nova"_qs, u"    2  [x]  Conferir ação"_qs}));
-  const QJsonDocument json = QJsonDocument::fromJson(quimbel({u"tasks"_qs, u"--json"_qs, vbp}).out.join(u'\n').toUtf8());
+  const QJsonDocument json =
+      QJsonDocument::fromJson(quimbel({u"tasks"_qs, u"--json"_qs, vbp}).out.join(u'\n').toUtf8());
   EXPECT_EQ(json[u"project"_qs], u"Loja"_qs);
-  EXPECT_EQ(json[u"tasks"_qs][1].toObject(),
-            (QJsonObject{{u"id"_qs, 2}, {u"done"_qs, true}, {u"name"_qs, u"Conferir ação"_qs}, {u"text"_qs, QString()}}));
+  EXPECT_EQ(
+      json[u"tasks"_qs][1].toObject(),
+      (QJsonObject{
+          {u"id"_qs, 2}, {u"done"_qs, true}, {u"name"_qs, u"Conferir ação"_qs}, {u"text"_qs, QString()}}));
 
   // The add-in reads what the tool wrote; while it holds the file the tool may list but not change it.
   auto project = scene.open(vbp);
@@ -83,10 +86,15 @@ TEST(Tool, FavoritesAreListedWithModuleProcedureAndLine) {
   EXPECT_EQ(run.out[1].simplified(), u"1 modA Um line 4"_qs);
   EXPECT_EQ(run.out[2].simplified(), u"2 modA General Declarations line 1"_qs);
   const QJsonArray json =
-      QJsonDocument::fromJson(quimbel({u"favorites"_qs, u"--json"_qs, vbp}).out.join(u'\n').toUtf8())[u"favorites"_qs].toArray();
+      QJsonDocument::fromJson(
+          quimbel({u"favorites"_qs, u"--json"_qs, vbp}).out.join(u'\n').toUtf8())[u"favorites"_qs]
+          .toArray();
   ASSERT_EQ(json.size(), 2);
-  EXPECT_EQ(json[0].toObject(), (QJsonObject{{u"id"_qs, 1}, {u"module"_qs, u"modA"_qs}, {u"procedure"_qs, u"Um"_qs},
-                                             {u"kind"_qs, u"Procedure"_qs}, {u"code_line"_qs, 4}}));
+  EXPECT_EQ(json[0].toObject(), (QJsonObject{{u"id"_qs, 1},
+                                             {u"module"_qs, u"modA"_qs},
+                                             {u"procedure"_qs, u"Um"_qs},
+                                             {u"kind"_qs, u"Procedure"_qs},
+                                             {u"code_line"_qs, 4}}));
   EXPECT_EQ(json[1][u"kind"_qs], u"Declarations"_qs);
 }
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 // What a line is: one table of line shapes, each rule once, read as text and as Windows-1252 bytes.
-#include "syntax/keywords.h"
 #include "syntax/line.h"
+#include "syntax/keywords.h"
 
 #include "printers.h"
 
@@ -134,9 +134,7 @@ TEST(LineShapes, ALineAfterAContinuedCommentIsComment) {
   const std::pair<const char16_t*, Carry> lines[] = {
       {u"x = 1 ' a _", {true, true}},  // the comment goes on
       {u"  b \"c _", {true, true}},    // comment text: its quote opens no string
-      {u"  d", {false, false}},
-      {u"y = a + _", {true, false}},
-      {u"  b ' e", {false, false}},
+      {u"  d", {false, false}},       {u"y = a + _", {true, false}}, {u"  b ' e", {false, false}},
   };
   for (const auto& [line, expected] : lines) {
     SCOPED_TRACE(QString::fromUtf16(line).toStdString());
@@ -160,10 +158,10 @@ TEST(LineShapes, TokensTellWordsStringsAndComments) {
   }
   using T = Token::Type;
   const std::vector<std::pair<Token::Type, QString>> expected = {
-      {T::Number, u"10"_qs}, {T::Word, u"If"_qs},    {T::Word, u"a"_qs},      {T::Other, u"."_qs},
-      {T::Word, u"Print"_qs}, {T::Word, u"Then"_qs}, {T::Word, u"s"_qs},      {T::Other, u"="_qs},
-      {T::String, u"\"x'y\""_qs}, {T::Word, u"Else"_qs}, {T::Word, u"n"_qs}, {T::Other, u"="_qs},
-      {T::Number, u"1.5"_qs}, {T::Colon, u":"_qs},   {T::Comment, u"Rem z"_qs}};
+      {T::Number, u"10"_qs},      {T::Word, u"If"_qs},   {T::Word, u"a"_qs},       {T::Other, u"."_qs},
+      {T::Word, u"Print"_qs},     {T::Word, u"Then"_qs}, {T::Word, u"s"_qs},       {T::Other, u"="_qs},
+      {T::String, u"\"x'y\""_qs}, {T::Word, u"Else"_qs}, {T::Word, u"n"_qs},       {T::Other, u"="_qs},
+      {T::Number, u"1.5"_qs},     {T::Colon, u":"_qs},   {T::Comment, u"Rem z"_qs}};
   EXPECT_EQ(tokens, expected);
   // The line number leaves the statement to the If; the Rem after the colon starts one.
   EXPECT_TRUE(starts[0] && starts[1] && !starts[2] && starts.back());

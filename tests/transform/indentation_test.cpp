@@ -97,6 +97,7 @@ class IndenterStack : public ::testing::Test {
   // Opens a For level and a continued statement inside it: body at 3, For body at 6, continuation at 9.
   void openForAndContinuation() {
     indenter.beginProcedure();
+    continued = false;
     QString forLine = u"For i = 1 To 2"_qs;
     QString continuedLine = u"x = 1 + _"_qs;
     indenter.IndentLine(forLine, continued);
@@ -298,7 +299,7 @@ TEST(IndentProcedureBlocks, TabModeWritesOneTabPerLevelWhateverTheSpaceCount) {
 TEST(NumberColumn, PrefixFormsAreMeasuredAsTheyAreWritten) {
   const std::pair<const char16_t*, qsizetype> cases[] = {
       {u"10: x", 3},
-      {u"10 : x", 4},
+      {u"10 : x", 3},  // the colon begins the code: an empty statement
       {u"10 ' nota", 3},
       {u"10' nota", 3},
       {u"    10 x", 3},

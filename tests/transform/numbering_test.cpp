@@ -318,8 +318,8 @@ TEST(NumberProcedureWalk, RenumberingReplacesOldNumbersAndRestartsPerProcedure) 
 
 TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
   // Each row: a line and what numbering makes of it. The targets of GoTo, GoSub, Resume, On ... GoTo lists
-  // (also continued), and a number after Then or Else stay as they are and take no number; jumps inside
-  // strings, comments and Rem, On Error GoTo 0 and Resume 0 protect nothing.
+  // (also continued), and a number after Then or Else stay as they are and take no number (nor does a Rem
+  // line, a comment); jumps inside strings, comments and Rem, On Error GoTo 0 and Resume 0 protect nothing.
   const std::pair<const char16_t*, const char16_t*> rows[] = {
       {u"Private Sub Ordena(v() As Long)", nullptr},
       {u"    Dim i As Long, u As Long", u"10000     Dim i As Long, u As Long"},
@@ -329,17 +329,17 @@ TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
       {u"        If v(i) < u Then goto 1", u"10020         If v(i) < u Then goto 1"},
       {u"        If v(i) = 0 Then 20 Else 30", u"10025         If v(i) = 0 Then 20 Else 30"},
       {u"        Debug.Print \"GoTo 50\": Resume 40 ' GoTo 60", nullptr},
-      {u"        Rem Resume 70", u"10035         Rem Resume 70"},
-      {u"        On Error GoTo 0: Resume 0", u"10040         On Error GoTo 0: Resume 0"},
-      {u"        On k GoTo 1, _", u"10045         On k GoTo 1, _"},
+      {u"        Rem Resume 70", nullptr},
+      {u"        On Error GoTo 0: Resume 0", u"10035         On Error GoTo 0: Resume 0"},
+      {u"        On k GoTo 1, _", u"10040         On k GoTo 1, _"},
       {u"            110", nullptr},
       {u"1       Next i", nullptr},
       {u"10      s = \"índice\"", nullptr},
       {u"20: x = 2", nullptr},
       {u"30  ' fim", nullptr},
       {u"40", nullptr},
-      {u"50      y = 3", u"10050      y = 3"},
-      {u"0       Exit Sub", u"10055       Exit Sub"},
+      {u"50      y = 3", u"10045      y = 3"},
+      {u"0       Exit Sub", u"10050       Exit Sub"},
       {u"110", nullptr},
       {u"100     Resume Next", nullptr},
       {u"End Sub", nullptr},

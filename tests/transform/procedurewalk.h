@@ -27,9 +27,9 @@ inline QStringList linesOf(const char* utf8) {
 inline ProcedureBounds procedureBounds(const QStringList& lines) {
   ProcedureBounds bounds;
   bounds.last = lines.size() - 1;
-  while (bounds.last > 0 && isBlankLine(lines[bounds.last]))
+  while (bounds.last > 0 && syntax::isBlankLine(lines[bounds.last]))
     --bounds.last;
-  while (bounds.first < bounds.last && isContinued(lines[bounds.first]))
+  while (bounds.first < bounds.last && syntax::continues(lines[bounds.first]))
     ++bounds.first;
   ++bounds.first;
   return bounds;
@@ -38,17 +38,16 @@ inline ProcedureBounds procedureBounds(const QStringList& lines) {
 inline QStringList numberProcedure(QStringList lines, qint32 start = 10000, qint32 interval = 5) {
   const ProcedureBounds bounds = procedureBounds(lines);
   const JumpTargets targets(lines);
-  qint32 number = start - interval;
-  bool continuation = false;
+  BodyNumbering numbering(start - interval, interval, targets);
   for (qsizetype i = bounds.first; i < bounds.last; ++i)
-    NumberLine(lines[i], number, continuation, interval, targets);
+    numbering.number(lines[i]);
   return lines;
 }
 
 // Removal has no header skipping: it runs from the line after the header line to the line before the End.
 inline QStringList unnumberProcedure(QStringList lines) {
   const JumpTargets targets(lines);
-  bool continuation = isContinued(lines.front());
+  bool continuation = syntax::continues(lines.front());
   for (qsizetype i = 1; i + 1 < lines.size(); ++i)
     UnnumberLine(lines[i], continuation, targets);
   return lines;
@@ -59,7 +58,7 @@ inline int indentProcedure(QStringList& lines, Indenter& indenter) {
   const ProcedureBounds bounds = procedureBounds(lines);
   indenter.beginProcedure(NumberColumnWidth(
       std::span<const QString>(lines.constData() + bounds.first, bounds.last - bounds.first)));
-  bool continued = isContinued(lines.front());
+  bool continued = syntax::continues(lines.front());
   int changed = 0;
   for (qsizetype i = 1; i < bounds.last; ++i)
     changed += indenter.IndentLine(lines[i], continued) ? 1 : 0;

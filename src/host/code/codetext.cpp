@@ -56,6 +56,7 @@ struct CodeText::Index {
 
   bool membersValid = false;
   std::vector<MemberInfo> members;
+  QHash<QString, size_t> memberByName;  // folded name -> members index
   /// Declare statements: listed as methods and answered by the procedure queries.
   std::vector<ProcInfo> declares;
   /// Type and Enum blocks in line order: first and End line (INT_MAX for a block without one).
@@ -280,7 +281,8 @@ void CodeText::rebuildIndex() {
       case syntax::Kind::DirectiveEndIf:
         if (blocks.empty()) continue;
         // The #End If right after the last alternative header closes the header.
-        if (open && open->hasAlternatives && openAt.block == blocks.back().block && marker == open->headerEnd + 1)
+        if (open && open->hasAlternatives && openAt.block == blocks.back().block &&
+            marker == open->headerEnd + 1)
           open->headerEnd = marker;
         blocks.pop_back();
         continue;
@@ -293,7 +295,8 @@ void CodeText::rebuildIndex() {
       if (end != kNone) k = end;
       continue;
     }
-    if (line.kind == syntax::Kind::TypeEnd || line.kind == syntax::Kind::EnumEnd) continue;  // one without a block
+    if (line.kind == syntax::Kind::TypeEnd || line.kind == syntax::Kind::EnumEnd)
+      continue;  // one without a block
     if (line.kind == syntax::Kind::ProcHeader) {
       const int headerEnd = statementEnd(marker);
       auto header = syntax::parseProcHeader(statementText(marker, headerEnd));
@@ -414,7 +417,8 @@ std::vector<ide::ProcExtent> CodeText::procedureExtents() {
   for (size_t i = 0; i < idx.procs.size(); ++i) {
     const ProcInfo& proc = idx.procs[i];
     const int start = startLineOf(i);
-    extents.push_back({proc.name, proc.kind, start, proc.bodyLine, proc.headerEnd, lastLineOf(i) - start + 1});
+    extents.push_back(
+        {proc.name, proc.kind, start, proc.bodyLine, proc.headerEnd, lastLineOf(i) - start + 1});
   }
   return extents;
 }
@@ -437,7 +441,8 @@ const std::vector<MemberInfo>& CodeText::members() {
   if (idx.membersValid) return idx.members;
   idx.members.clear();
   idx.declares.clear();
-  QHash<QString, size_t> seen;  // folded name -> members index
+  QHash<QString, size_t>& seen = idx.memberByName;
+  seen.clear();
   auto add = [&](MemberInfo info) {
     const QString key = info.name.toCaseFolded();
     if (seen.contains(key)) return;
@@ -491,9 +496,10 @@ const std::vector<MemberInfo>& CodeText::members() {
 }
 
 std::optional<MemberInfo> CodeText::member(QStringView name) {
-  for (const MemberInfo& info : members())
-    if (sameName(info.name, name)) return info;
-  return std::nullopt;
+  const std::vector<MemberInfo>& all = members();
+  const auto found = m_index->memberByName.constFind(name.toString().toCaseFolded());
+  if (found == m_index->memberByName.cend()) return std::nullopt;
+  return all[*found];
 }
 
 // ---------------------------------------------------------------------------------------------------
@@ -693,7 +699,8 @@ void CodeText::replaceLine(int line, QStringView text, const QString* shared) {
   if (!severalLines) {
     const syntax::Kind lineKind = syntax::kindOf(text, continuation);
     const bool continues = syntax::continues(text);
-    bool structural = syntax::isStructural(lineKind) || syntax::isStructural(target.kind) || continues != target.continues;
+    bool structural =
+        syntax::isStructural(lineKind) || syntax::isStructural(target.kind) || continues != target.continues;
     // A header's continuation line carries part of the header (its name, or its own continuation);
     // re-indenting it changes nothing the header declares.
     if (!structural && lineKind == syntax::Kind::Continuation &&

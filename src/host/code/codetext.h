@@ -48,7 +48,7 @@ struct ProcInfo {
   int bodyLine = 0;   // the header's first line
   int headerEnd = 0;  // the header's last physical line (of its last alternative under #If ... #Else)
   bool hasAlternatives = false;
-  int endLine = 0;    // the End line (for an unterminated header: the line above the next header)
+  int endLine = 0;  // the End line (for an unterminated header: the line above the next header)
 };
 
 /// A member of the module (one per property name, whatever accessors it has).

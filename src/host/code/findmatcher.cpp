@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "host/code/findmatcher.h"
 
-#include "syntax/text.h"
 #include "ide/error.h"
+#include "syntax/text.h"
 
 #include <algorithm>
 
@@ -144,7 +144,8 @@ bool FindMatcher::tokenMatches(const Token& token, QChar c) const {
 // A side of the match is checked only where the match itself begins or ends with a word character, so
 // that ".Foo" still finds the member in "x.Foo".
 bool FindMatcher::startAllowed(QStringView line, qsizetype start) const {
-  return !m_wholeWord || start == 0 || !syntax::isIdentifierChar(line[start]) || !syntax::isIdentifierChar(line[start - 1]);
+  return !m_wholeWord || start == 0 || !syntax::isIdentifierChar(line[start]) ||
+         !syntax::isIdentifierChar(line[start - 1]);
 }
 
 bool FindMatcher::endAllowed(QStringView line, qsizetype end) const {

@@ -1,0 +1,323 @@
+// SPDX-License-Identifier: MIT
+// Properties of the code index and the four walks on generated modules written the way real VB6 code is:
+// conditional compilation around whole procedures and around headers, continuations after a blank or a
+// tab, continued comments, one-line procedures, labels, numeric labels and their jumps, Type and Enum
+// blocks, nested blocks, member names like keywords, letters of the ANSI code page.
+#include "modelfixture.h"
+#include "syntax/line.h"
+#include "transform/indentwalk.h"
+#include "transform/numberwalk.h"
+#include "transform/numindent.h"
+
+#include <gtest/gtest.h>
+
+#include <random>
+
+namespace transform {
+namespace {
+
+using test::Ide;
+using test::linesOf;
+
+/// A random module, and how many procedures it declares (alternative headers of one procedure count once).
+class MessyModule {
+ public:
+  explicit MessyModule(quint32 seed) : m_random(seed) {
+    declarations();
+    const int count = 1 + below(5);
+    for (int i = 0; i < count; ++i)
+      procedureShape();
+    if (chance(30)) add(u"' fim do módulo"_qs);
+  }
+
+  QStringList lines;
+  int procedures = 0;
+
+ private:
+  bool chance(int percent) { return int(m_random() % 100) < percent; }
+  int below(int n) { return int(m_random() % unsigned(n)); }
+  template <size_t N>
+  QString pick(const char16_t* const (&texts)[N]) {
+    return QString::fromUtf16(texts[below(int(N))]);
+  }
+  void add(const QString& line) { lines << line; }
+  QString indent() { return pick({u"", u"    ", u"\t", u"  \t", u"        "}); }
+  QString mark() { return pick({u" _", u"\t_", u"  _", u" \t_"}); }
+  QString name() {
+    return pick({u"Calcula", u"ModificadorDaño", u"Conecta", u"Render", u"Ação", u"Get_Value"}) +
+           QString::number(++m_names);
+  }
+
+  void declarations() {
+    if (chance(70)) add(u"Option Explicit"_qs);
+    const int count = below(6);
+    for (int i = 0; i < count; ++i) {
+      switch (below(7)) {
+        case 0:
+          add(u"Private m_Valor As Long"_qs);
+          break;
+        case 1:
+          add(u"Public Const TAXA = 1 ' taxa _"_qs), add(u"   continua o comentário"_qs);
+          break;
+        case 2:
+          add(u"Private Type TPonto"_qs), add(u"    X As Long"_qs), add(u"End Type"_qs);
+          break;
+        case 3:
+          add(u"Public Enum ECor"_qs), add(u"    corAzul = 1"_qs), add(u"End Enum"_qs);
+          break;
+        case 4:
+          add(u"#Const DEPURA = 1"_qs);
+          break;
+        case 5:
+          add(u"Private Declare Function GetTickCount Lib \"kernel32\" () As Long"_qs);
+          break;
+        default:
+          add(u"Dim sCaminho As String,"_qs + mark()), add(u"\tsNome As String"_qs);
+          break;
+      }
+    }
+  }
+
+  void procedureShape() {
+    add(QString());
+    if (chance(20)) add(u"' procedimento"_qs);
+    const QString procName = name();
+    const bool function = chance(40);
+    switch (below(6)) {
+      case 0:  // one line, as interface classes are written
+        add(u"Public Sub "_qs + procName + u"(ByVal d As Long): End Sub"_qs);
+        ++procedures;
+        return;
+      case 1:  // the same procedure in two branches, one of them compiled
+        add(u"#If DEPURA Then"_qs);
+        procedure(procName, function);
+        add(u"#Else"_qs);
+        procedure(procName, function);
+        add(u"#End If"_qs);
+        return;
+      case 2: {  // one body under alternative headers
+        add(u"#If Win64 Then"_qs);
+        headerLines(procName, function);
+        add(u"#Else"_qs);
+        headerLines(procName, function);
+        add(u"#End If"_qs);
+        body(procName, function);
+        ++procedures;
+        return;
+      }
+      default:
+        procedure(procName, function);
+        return;
+    }
+  }
+
+  void headerLines(const QString& procName, bool function) {
+    const QString scope = pick({u"", u"Public ", u"Private "});
+    const QString kind = function ? u"Function "_qs : u"Sub "_qs;
+    if (chance(30)) {
+      add(scope + kind + procName + u"(ByVal a As Long,"_qs + mark());
+      add(u"        ByVal b As String)"_qs + (function ? u" As Long"_qs : QString()));
+    } else {
+      add(scope + kind + procName + u"(ByVal a As Long)"_qs + (function ? u" As Long"_qs : QString()));
+    }
+  }
+
+  void procedure(const QString& procName, bool function) {
+    headerLines(procName, function);
+    body(procName, function);
+    ++procedures;
+  }
+
+  void body(const QString& procName, bool function) {
+    m_label = 0;
+    if (chance(40)) {
+      m_label = 100 * (1 + below(9));
+      add(indent() + u"On Error GoTo "_qs + QString::number(m_label));
+    }
+    block(procName, 0);
+    if (m_label) {
+      add(indent() + u"Exit "_qs + (function ? u"Function"_qs : u"Sub"_qs));
+      add(chance(50) ? QString::number(m_label) + u":"_qs : QString::number(m_label) + u" Resume Next"_qs);
+    }
+    if (chance(20)) add(QString());
+    add(function ? u"End Function"_qs : u"End Sub"_qs);
+  }
+
+  void block(const QString& procName, int depth) {
+    const int count = 1 + below(5);
+    for (int i = 0; i < count; ++i)
+      (depth < 3 && chance(30)) ? nested(procName, depth + 1) : statement(procName);
+  }
+
+  void nested(const QString& procName, int depth) {
+    switch (below(6)) {
+      case 0:
+        add(indent() + u"If a > 1 Then"_qs);
+        block(procName, depth);
+        if (chance(50)) add(indent() + u"ElseIf a = 0 Then"_qs), block(procName, depth);
+        if (chance(50)) add(indent() + u"Else"_qs), block(procName, depth);
+        add(indent() + u"End If"_qs);
+        break;
+      case 1:
+        add(indent() + u"For i = 1 To a"_qs), block(procName, depth), add(indent() + u"Next i"_qs);
+        break;
+      case 2:
+        add(indent() + u"Do While a > 0"_qs), block(procName, depth), add(indent() + u"Loop"_qs);
+        break;
+      case 3:
+        add(indent() + u"Select Case a"_qs);
+        add(indent() + u"Case 1, 2"_qs), block(procName, depth);
+        add(indent() + u"Case Else"_qs), block(procName, depth);
+        add(indent() + u"End Select"_qs);
+        break;
+      case 4:
+        add(indent() + u"With oPedido"_qs), add(indent() + u".Print \"a\""_qs), block(procName, depth);
+        add(indent() + u"End With"_qs);
+        break;
+      default:
+        add(indent() + u"#If DEPURA Then"_qs), block(procName, depth), add(indent() + u"#End If"_qs);
+        break;
+    }
+  }
+
+  void statement(const QString& procName) {
+    switch (below(12)) {
+      case 0:
+        add(indent() + u"x = a + 1"_qs);
+        break;
+      case 1:
+        add(indent() + u"x = a +"_qs + mark()), add(indent() + u"2"_qs);
+        break;
+      case 2:
+        add(indent() + u"y = Soma(1,"_qs + mark()), add(u"20 + a, 3)"_qs);
+        break;
+      case 3:
+        add(indent() + u"' nota _"_qs), add(u"   segue a nota"_qs);
+        break;
+      case 4:
+        add(indent() + u"Rem GoTo 10"_qs);
+        break;
+      case 5:
+        add(u"Saida:"_qs);
+        break;
+      case 6:
+        add(indent() + u"MsgBox \"a: b ' c _\" & s ' fim"_qs);
+        break;
+      case 7:
+        add(indent() + u"If a Then x = 1 Else x = 2"_qs);
+        break;
+      case 8:
+        add(indent() + u"oPedido.Name = ModificadorDaño: rs.Close"_qs);
+        break;
+      case 9:
+        add(indent() + procName + u" = x"_qs);
+        break;
+      case 10:
+        add(indent() + u": x = 1"_qs);
+        break;
+      default:
+        add(indent() + u"Debug.Print Err.Number"_qs);
+        break;
+    }
+  }
+
+  std::mt19937 m_random;
+  int m_names = 0;
+  int m_label = 0;
+};
+
+/// Each line without its line number and leading blanks; a continuation line keeps a leading number.
+QStringList withoutNumbers(const QStringList& lines) {
+  QStringList code;
+  bool continuation = false;
+  for (const QString& line : lines) {
+    QStringView text = QStringView(line).sliced(syntax::leadingBlanks(line).size());
+    if (!continuation) {
+      if (const syntax::NumberPrefix prefix = syntax::numberPrefix(text);
+          prefix && prefix.form != syntax::NumberPrefix::Form::Alone)
+        text = prefix.rest.sliced(syntax::leadingBlanks(prefix.rest).size());
+    }
+    continuation = syntax::continues(line);
+    code << text.toString();
+  }
+  return code;
+}
+
+/// The first line where two texts differ, or nothing.
+std::string firstDifference(const QStringList& got, const QStringList& expected) {
+  for (qsizetype i = 0; i < std::max(got.size(), expected.size()); ++i) {
+    const QString a = got.value(i, u"<none>"_qs), b = expected.value(i, u"<none>"_qs);
+    if (a != b) return QStringLiteral("line %1: \"%2\" instead of \"%3\"").arg(i + 1).arg(a, b).toStdString();
+  }
+  return {};
+}
+
+struct Transforms {
+  Ide ide;
+  WalkContext context{u"frmLinNumbers"_qs, nullptr, nullptr};
+  int failures = 0;
+  Transforms() {
+    context.onFailure = [this](const WalkFailure&) { ++failures; };
+    context.onLineSkipped = [this](const WalkFailure&) { ++failures; };
+  }
+  template <typename Walk>
+  QStringList apply(const QStringList& lines, Walk walk) {
+    auto module = ide.addModule(lines);
+    walk(module);
+    return linesOf(*module);
+  }
+  QStringList number(const QStringList& l) {
+    return apply(l, [&](auto& m) { NumberingWalk(context, 10, 10).NumberModule(m, true); });
+  }
+  QStringList unnumber(const QStringList& l) {
+    return apply(l, [&](auto& m) { NumberingWalk(context, 10, 10).NumberModule(m, false); });
+  }
+  QStringList indent(const QStringList& l) {
+    return apply(l, [&](auto& m) { IndentationWalk(context, IndentMode::Spaces, 4).IndentModule(m); });
+  }
+  QStringList numIndent(const QStringList& l) {
+    return apply(
+        l, [&](auto& m) { NumIndentWalk(context, 10000, 5, IndentMode::Tabs, 4, true).NumIndentModule(m); });
+  }
+};
+
+TEST(MessyModules, TheIndexAndTheWalksKeepTheirInvariants) {
+  // QUIMBEL_SEED replays one module; a failure names the seed that made it.
+  const quint32 first =
+      qEnvironmentVariableIsSet("QUIMBEL_SEED") ? qEnvironmentVariableIntValue("QUIMBEL_SEED") : 1;
+  const quint32 count = qEnvironmentVariableIsSet("QUIMBEL_SEED") ? 1 : 3000;
+  for (quint32 seed = first; seed < first + count; ++seed) {
+    const MessyModule generated(seed);
+    SCOPED_TRACE(testing::Message() << "QUIMBEL_SEED=" << seed << "\n"
+                                    << generated.lines.join(u'\n').toStdString());
+    Transforms t;
+    // The procedures cover the module below the declarations, each at its own place.
+    auto module = t.ide.addModule(generated.lines);
+    ASSERT_EQ(linesOf(*module), generated.lines);
+    const std::vector<ide::ProcExtent> extents = module->Procedures();
+    ASSERT_EQ(int(extents.size()), generated.procedures);
+    int next = module->CountOfDeclarationLines() + 1;
+    for (const ide::ProcExtent& extent : extents) {
+      ASSERT_EQ(extent.startLine, next) << extent.name.toStdString();
+      ASSERT_GT(extent.countLines, 0);
+      next += extent.countLines;
+    }
+    ASSERT_EQ(next, module->CountOfLines() + 1);
+
+    const QStringList numbered = t.number(generated.lines);
+    ASSERT_EQ(firstDifference(t.number(numbered), numbered), "") << "numbering twice";
+    ASSERT_EQ(firstDifference(t.unnumber(numbered), generated.lines), "") << "numbers taken off again";
+    const QStringList indented = t.indent(generated.lines);
+    ASSERT_EQ(firstDifference(t.indent(indented), indented), "") << "indenting twice";
+    const QStringList both = t.numIndent(generated.lines);
+    ASSERT_EQ(firstDifference(t.numIndent(both), both), "") << "number-and-indent twice";
+    // Nothing but numbers and leading blanks changes.
+    const QStringList code = withoutNumbers(generated.lines);
+    for (const QStringList* changed : {&numbered, &indented, &both})
+      ASSERT_EQ(firstDifference(withoutNumbers(*changed), code), "");
+    ASSERT_EQ(t.failures, 0);
+  }
+}
+
+}  // namespace
+}  // namespace transform
