@@ -172,7 +172,22 @@ void Indenter::PopBlock(qint32 mask) {
 
 bool Indenter::indent(QString& line, bool& statementContinued, bool declaration) {
   const QStringView t = syntax::trimmedView(line);
-  if (t.isEmpty()) return false;
+  if (t.isEmpty()) {
+    // A blank line is the last line of a statement continued onto it: the next line starts a new one (and
+    // may carry a line number), as numbering and the code index read it.
+    if (statementContinued || m_lineContinues) {
+      m_lineContinues = false;
+      if (m_ifContinued) {
+        m_ifContinued = false;  // "If x Then _" and nothing more: a block If, whose level stays
+      } else if (m_caseContinued) {
+        m_caseContinued = false;
+      } else if (statementContinued) {
+        statementContinued = false;
+        PopBlock(IT_RELATIVE);
+      }
+    }
+    return false;
+  }
 
   Layout layout;
   Action action;

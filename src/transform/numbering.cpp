@@ -106,7 +106,9 @@ bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32
     return false;
   }
   const NumberPrefix prefix = syntax::numberPrefix(t);
-  if (prefix.form == NumberPrefix::Form::Alone) {
+  // A number alone ("10", "10:") labels nothing that a new number could label.
+  if (prefix.form == NumberPrefix::Form::Alone ||
+      (prefix.form == NumberPrefix::Form::Colon && syntax::isBlankLine(prefix.rest))) {
     line.clear();
     return true;
   }

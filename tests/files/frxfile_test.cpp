@@ -155,5 +155,36 @@ TEST(FrxRebuild, ARecordChangesAndTheOthersKeepTheirBytesInDescriptionOrder) {
       << error.description().toStdString();
 }
 
+// Damaged files: a record that another one starts inside, a property written twice. Rebuilt with nothing
+// edited, every line keeps its value and every record reads back as before.
+TEST(FrxRebuild, DamagedRecordsAndRepeatedLinesKeepTheirValues) {
+  const char* form = R"(Begin VB.Form F
+   Begin VB.ListBox L
+      ItemData        =   "x
+      ItemData        =   "F.frx":0000
+      List            =   "F.frx":0002 'kept
+   End
+End
+)";
+  const FrxFile old(le(1, 2) + le(0, 2) + le(0xDDCCBBAA, 4));  // the list starts inside the item data
+  const std::vector<SourceLine> lines = readSourceLines(windowsFile(form), u"F.frm"_qs);
+  std::size_t position = 0;
+  FormDescription description = FormDescription::parse(lines, position, u"F.frm"_qs);
+  FormNode& list = *description.root().findNode(u"L");
+  const QByteArray rebuilt = rebuildFrx(description.root(), old, frxRecordEnds(description.root(), old),
+                                        u"F.frx"_qs, nullptr, {}, {}, u"F.frx"_qs);
+
+  EXPECT_EQ(rebuilt, old.bytes());  // the list inside the item data stays there
+  EXPECT_EQ(FrxFile(rebuilt).itemData(0), QList<qint32>{qint32(0xDDCCBBAA)});
+  EXPECT_EQ(FrxFile(rebuilt).list(2), QStringList{});
+  EXPECT_EQ(FrxFile(rebuilt).listSecondField(2), 0xBBAA);
+  std::vector<SourceLine> written;
+  description.appendLines(written);
+  EXPECT_EQ(written[2].text, u"      ItemData        =   \"x"_qs);
+  EXPECT_EQ(written[3].text, u"      ItemData        =   \"F.frx\":0000"_qs);
+  EXPECT_EQ(list.property(u"List"), u"\"F.frx\":0002"_qs);
+  EXPECT_EQ(list.propertyComment(u"List"), u"'kept"_qs);
+}
+
 }  // namespace
 }  // namespace host

@@ -198,11 +198,26 @@ void PropertyGroup::setProperty(const QString& name, const QString& valueText, c
   QString fullComment = comment;
   if (!fullComment.isEmpty() && !fullComment.startsWith(u'\'')) fullComment.prepend(u'\'');
 
-  auto found = std::find_if(m_items.begin(), m_items.end(), [&](const Item& item) {
-    const auto* property = std::get_if<PropertyLine>(&item);
-    return property && property->name().compare(name, Qt::CaseInsensitive) == 0;
-  });
-  PropertyLine* existing = found == m_items.end() ? nullptr : std::get_if<PropertyLine>(&*found);
+  writeProperty(findProperty(name, 0), name, valueText, fullComment);
+}
+
+void PropertyGroup::setPropertyAt(const QString& name, int occurrence, const QString& valueText) {
+  PropertyLine* existing = findProperty(name, occurrence);
+  if (!existing) return setProperty(name, valueText);
+  writeProperty(existing, name, valueText, existing->comment().toString());
+}
+
+PropertyGroup::PropertyLine* PropertyGroup::findProperty(QStringView name, int occurrence) {
+  for (Item& item : m_items) {
+    auto* property = std::get_if<PropertyLine>(&item);
+    if (property && property->name().compare(name, Qt::CaseInsensitive) == 0 && occurrence-- == 0)
+      return property;
+  }
+  return nullptr;
+}
+
+void PropertyGroup::writeProperty(PropertyLine* existing, const QString& name, const QString& valueText,
+                                  const QString& fullComment) {
   if (existing && existing->value() == valueText && existing->comment() == fullComment) return;
 
   SourceLine line;

@@ -52,6 +52,11 @@ class PropertyGroup {
   /// apostrophe. Throws ide::Error 5 for a name that cannot be written (empty, blanks, "=").
   void setProperty(const QString& name, const QString& valueText, const QString& comment = {});
 
+  /// Rewrites the value of the `occurrence`-th line named `name` (0: the one property() reads), keeping its
+  /// comment; without such a line, as setProperty. A damaged file may hold a property twice: each line
+  /// keeps its own value.
+  void setPropertyAt(const QString& name, int occurrence, const QString& valueText);
+
   /// Removes the property's line; false when there is none.
   bool removeProperty(QStringView name);
 
@@ -102,6 +107,9 @@ class PropertyGroup {
   LineEnd generatedLineEnd() const { return m_beginLine.end; }
 
   const PropertyLine* findProperty(QStringView name) const;
+  PropertyLine* findProperty(QStringView name, int occurrence);
+  void writeProperty(PropertyLine* existing, const QString& name, const QString& valueText,
+                     const QString& fullComment);
   /// Where a property or block named `name` goes: before the first property or block whose name sorts
   /// after it, else after the last one (so before any child control).
   std::size_t insertionPosition(QStringView name) const;

@@ -206,6 +206,22 @@ std::optional<QByteArray> FrxFile::picture(quint32 offset) const {
 }
 
 std::optional<qsizetype> FrxFile::recordLength(const FrxReference& reference, FrxRecordKind kind) const {
+  auto length = headerLength(reference, kind);
+  const qsizetype at = reference.offset;
+  if (length && at + *length > m_bytes.size()) {
+    if (at + *length - 1 != m_bytes.size()) return std::nullopt;
+    *length -= 1;
+  }
+  return length;
+}
+
+bool FrxFile::readsPastEnd(const FrxReference& reference, FrxRecordKind kind) const {
+  if (kind == FrxRecordKind::Other) return false;
+  const auto length = headerLength(reference, kind);
+  return !length || qsizetype(reference.offset) + *length > m_bytes.size();
+}
+
+std::optional<qsizetype> FrxFile::headerLength(const FrxReference& reference, FrxRecordKind kind) const {
   const quint32 offset = reference.offset;
   const qsizetype at = offset;
   std::optional<qsizetype> length;
@@ -235,10 +251,6 @@ std::optional<qsizetype> FrxFile::recordLength(const FrxReference& reference, Fr
     case FrxRecordKind::Other:
       break;
   }
-  if (length && at + *length > m_bytes.size()) {
-    if (at + *length - 1 != m_bytes.size()) return std::nullopt;
-    *length -= 1;
-  }
   return length;
 }
 
@@ -246,9 +258,11 @@ std::optional<qsizetype> FrxFile::recordLength(const FrxReference& reference, Fr
 
 std::vector<FrxProperty> frxProperties(FormNode& root) {
   std::vector<FrxProperty> found;
+  std::map<std::pair<const PropertyGroup*, QString>, int> seen;
   root.forEachProperty([&](PropertyGroup& group, FormNode& owner, QStringView name, QStringView value) {
+    const int occurrence = seen[{&group, name.toString().toLower()}]++;
     if (auto reference = parseFrxReference(value))
-      found.push_back({&group, &owner, name.toString(), std::move(*reference)});
+      found.push_back({&group, &owner, name.toString(), std::move(*reference), occurrence});
   });
   return found;
 }
@@ -263,12 +277,16 @@ std::map<quint32, qsizetype> frxRecordEnds(FormNode& root, const FrxFile& file) 
     const quint32 offset = property.reference.offset;
     if (offset >= file.bytes().size()) continue;
     const auto next = starts.upper_bound(offset);
-    qsizetype end =
-        next == starts.end() ? file.bytes().size() : std::min<qsizetype>(*next, file.bytes().size());
+    // A record whose header gives its length ends there, even where another record starts inside it (a
+    // damaged file): cut at that start, it would read back as another value.
     const FrxRecordKind kind =
         frxRecordKind(property.owner->className(), property.name, property.reference.longText);
-    if (const auto length = file.recordLength(property.reference, kind))
-      end = std::min(end, offset + *length);
+    qsizetype end =
+        next == starts.end() ? file.bytes().size() : std::min<qsizetype>(*next, file.bytes().size());
+    if (file.readsPastEnd(property.reference, kind))
+      end = file.bytes().size();  // it reads what follows it, up to the end of the file
+    else if (const auto length = file.recordLength(property.reference, kind))
+      end = offset + *length;
     auto [slot, added] = ends.emplace(offset, end);
     if (!added) slot->second = std::max(slot->second, end);
   }
@@ -279,29 +297,93 @@ QByteArray rebuildFrx(FormNode& root, const FrxFile& old, const std::map<quint32
                       const QString& fileName, const PropertyGroup* changedGroup, QStringView changedName,
                       const QByteArray& changedRecord, const QString& displayName) {
   std::vector<FrxProperty> properties = frxProperties(root);
-  QByteArray bytes;
-  std::vector<QString> values;
-  values.reserve(properties.size());
-  for (const FrxProperty& property : properties) {
-    const bool changed =
-        property.group == changedGroup && property.name.compare(changedName, Qt::CaseInsensitive) == 0;
-    const quint32 offset = static_cast<quint32>(bytes.size());
-    if (changed) {
-      bytes.append(changedRecord);
-    } else {
-      const auto end = ends.find(property.reference.offset);
-      if (end == ends.end()) {
-        throw ide::Error(ide::err::InvalidFileFormat,
-                         QStringLiteral("%1: the value of %2.%3 at offset %4 is not in the file")
-                             .arg(displayName, property.owner->name(), property.name)
-                             .arg(property.reference.offset, 4, 16, QLatin1Char('0')));
-      }
-      bytes.append(old.bytes().mid(end->first, end->second - end->first));
+  // The old bytes each unchanged record reads. Records that share bytes (damaged files: one starting inside
+  // another, two lines referring to one offset) are copied together, once, so that each reads back what
+  // it read before; those that read up to the end of the file go last, so that they still end there.
+  struct Group {
+    qsizetype from = 0;
+    qsizetype to = 0;
+    bool atEnd = false;
+    std::size_t first = 0;  // the description index of its first record
+  };
+  std::vector<Group> groups;
+  std::vector<std::ptrdiff_t> groupOf(properties.size(), -1);  // -1: the changed record
+  std::vector<std::size_t> byStart;
+  for (std::size_t i = 0; i < properties.size(); ++i) {
+    const FrxProperty& property = properties[i];
+    if (property.group == changedGroup && property.name.compare(changedName, Qt::CaseInsensitive) == 0)
+      continue;
+    if (!ends.contains(property.reference.offset)) {
+      throw ide::Error(ide::err::InvalidFileFormat,
+                       QStringLiteral("%1: the value of %2.%3 at offset %4 is not in the file")
+                           .arg(displayName, property.owner->name(), property.name)
+                           .arg(property.reference.offset, 4, 16, QLatin1Char('0')));
     }
-    values.push_back(formatFrxReference({fileName, offset, property.reference.longText}));
+    byStart.push_back(i);
   }
-  for (size_t i = 0; i < properties.size(); ++i)
-    properties[i].group->setProperty(properties[i].name, values[i]);
+  std::stable_sort(byStart.begin(), byStart.end(), [&](std::size_t a, std::size_t b) {
+    return properties[a].reference.offset < properties[b].reference.offset;
+  });
+  for (const std::size_t i : byStart) {
+    const FrxReference& reference = properties[i].reference;
+    const qsizetype from = reference.offset;
+    const qsizetype to = ends.at(reference.offset);
+    const bool atEnd = old.readsPastEnd(
+        reference, frxRecordKind(properties[i].owner->className(), properties[i].name, reference.longText));
+    if (groups.empty() || from >= groups.back().to) {
+      groups.push_back({from, to, atEnd, i});
+    } else {
+      Group& group = groups.back();
+      group.to = std::max(group.to, to);
+      group.atEnd = group.atEnd || atEnd;
+      group.first = std::min(group.first, i);
+    }
+    groupOf[i] = std::ptrdiff_t(groups.size() - 1);
+  }
+  std::vector<std::size_t> order(groups.size());
+  for (std::size_t g = 0; g < groups.size(); ++g)
+    order[g] = g;
+  std::stable_sort(order.begin(), order.end(), [&](std::size_t a, std::size_t b) {
+    if (groups[a].atEnd != groups[b].atEnd) return groups[b].atEnd;
+    return groups[a].first < groups[b].first;
+  });
+
+  // In description order: each group where its first record is described, the changed record at its line.
+  QByteArray bytes;
+  std::vector<qsizetype> groupStart(groups.size(), -1);
+  std::vector<qsizetype> changedAt(properties.size(), -1);
+  std::size_t nextGroup = 0;
+  const auto placeGroupsUpTo = [&](std::size_t index) {
+    while (nextGroup < order.size() && !groups[order[nextGroup]].atEnd &&
+           groups[order[nextGroup]].first <= index) {
+      const Group& group = groups[order[nextGroup]];
+      groupStart[order[nextGroup]] = bytes.size();
+      bytes.append(old.bytes().mid(group.from, group.to - group.from));
+      ++nextGroup;
+    }
+  };
+  for (std::size_t i = 0; i < properties.size(); ++i) {
+    placeGroupsUpTo(i);
+    if (groupOf[i] < 0) {
+      changedAt[i] = bytes.size();
+      bytes.append(changedRecord);
+    }
+  }
+  for (; nextGroup < order.size(); ++nextGroup) {
+    const Group& group = groups[order[nextGroup]];
+    groupStart[order[nextGroup]] = bytes.size();
+    bytes.append(old.bytes().mid(group.from, group.to - group.from));
+  }
+
+  for (std::size_t i = 0; i < properties.size(); ++i) {
+    FrxProperty& property = properties[i];
+    const qsizetype offset = groupOf[i] < 0 ? changedAt[i]
+                                            : groupStart[size_t(groupOf[i])] + property.reference.offset -
+                                                  groups[size_t(groupOf[i])].from;
+    property.group->setPropertyAt(
+        property.name, property.occurrence,
+        formatFrxReference({fileName, static_cast<quint32>(offset), property.reference.longText}));
+  }
   return bytes;
 }
 

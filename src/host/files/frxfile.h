@@ -77,10 +77,14 @@ class FrxFile {
 
   /// The record's length as its own header gives it; nothing for Other records or when it does not fit.
   std::optional<qsizetype> recordLength(const FrxReference& reference, FrxRecordKind kind) const;
+  /// The length its header gives runs past the end of the file (a record cut short, the IDE's one byte
+  /// short, a header that does not fit): the record reads as it does only where the file ends.
+  bool readsPastEnd(const FrxReference& reference, FrxRecordKind kind) const;
 
  private:
   /// Where a text's bytes start and how many there are, as its length field says.
   std::optional<std::pair<qsizetype, qsizetype>> textBounds(const FrxReference& reference) const;
+  std::optional<qsizetype> headerLength(const FrxReference& reference, FrxRecordKind kind) const;
   std::optional<quint32> number(qsizetype at, int size) const;
   /// `length` bytes at `at`, or one fewer when exactly one is missing at the end of the file.
   std::optional<QByteArrayView> span(qsizetype at, qsizetype length) const;
@@ -94,17 +98,22 @@ struct FrxProperty {
   FormNode* owner;       // the control it belongs to
   QString name;
   FrxReference reference;
+  /// How many lines of the same name stand above it in its group (a damaged file may repeat one).
+  int occurrence = 0;
 };
 
 /// Every property line of the description that refers to a binary file, in file order.
 std::vector<FrxProperty> frxProperties(FormNode& root);
 
 /// Where each record of `file` that the description refers to ends, by its offset: at the end its own header
-/// gives, or (for records whose layout is not known) at the next record or the end of the file.
+/// gives, at the end of the file for one that reads past it, or (for records whose layout is not known) at
+/// the next record or the end of the file.
 std::map<quint32, qsizetype> frxRecordEnds(FormNode& root, const FrxFile& file);
 
 /// The binary file as the IDE writes it after a value in it changed: the records the description refers to,
 /// in its order, back to back from offset 0, and each reference rewritten to `fileName` and its new offset.
+/// Records that share bytes in a damaged file are written together once, and those that read up to the end
+/// of the file last, so that every record reads back as it did.
 /// The line of `changedName` in `changedGroup` gets `changedRecord`; every other record keeps its bytes
 /// (`ends` tells where they end, as frxRecordEnds gave it before the change). Throws ide::Error 321 naming
 /// `displayName` when a record the description refers to is not in the file.

@@ -378,7 +378,7 @@ void ComponentImpl::SaveAs(const QString& fileName) {
       FrxReference reference = property.reference;
       reference.fileName = name;
       const QString before = formatFrxReference(property.reference);
-      property.group->setProperty(property.name, formatFrxReference(reference));
+      property.group->setPropertyAt(property.name, property.occurrence, formatFrxReference(reference));
       renamed.emplace_back(std::move(property), before);
     }
   }
@@ -400,7 +400,7 @@ void ComponentImpl::SaveAs(const QString& fileName) {
   } catch (...) {
     m_filePath = oldPath;
     for (const auto& [property, before] : renamed)
-      property.group->setProperty(property.name, before);
+      property.group->setPropertyAt(property.name, property.occurrence, before);
     if (!renamed.empty() && !wasChanged) m_form->binarySaved();
     throw;
   }

@@ -1,0 +1,2 @@
+Function a1:
+y
