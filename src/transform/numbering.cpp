@@ -74,10 +74,9 @@ QStringView withoutOneBlank(QStringView text) {
   return !text.isEmpty() && syntax::isBlank(text.front()) ? text.sliced(1) : text;
 }
 
-}  // namespace
-
-bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32 interval,
-                const JumpTargets& targets) {
+/// NumberLine, with the line's statement already classified when `known` is given.
+bool numberLine(QString& line, qint32& runningNumber, bool& continuation, qint32 interval,
+                const JumpTargets& targets, const syntax::Statement* known) {
   const QStringView whole(line);
   const QStringView indent = syntax::leadingBlanks(whole);
   const QStringView code = whole.sliced(indent.size());  // trailing blanks kept: they are the line's own
@@ -93,7 +92,7 @@ bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32
     continuation = continues;
     return false;
   }
-  const syntax::Statement statement = syntax::classify(t);
+  const syntax::Statement statement = known ? *known : syntax::classify(t);
   // A comment ends a continued statement, but one that ends with the mark goes on over the next line as
   // comment text, which takes no number. A line holding only the mark has no code to number either.
   if (statement.kind == Kind::Comment || t == u"_") {
@@ -146,6 +145,13 @@ bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32
   return true;
 }
 
+}  // namespace
+
+bool NumberLine(QString& line, qint32& runningNumber, bool& continuation, qint32 interval,
+                const JumpTargets& targets) {
+  return numberLine(line, runningNumber, continuation, interval, targets, nullptr);
+}
+
 bool BodyNumbering::number(QString& line) {
   if (m_inTypeBlock) {
     const Kind kind = syntax::classify(line).kind;
@@ -153,11 +159,10 @@ bool BodyNumbering::number(QString& line) {
     m_continuation = false;
     return false;
   }
-  if (!m_continuation) {
-    const Kind kind = syntax::classify(line).kind;
-    m_inTypeBlock = kind == Kind::TypeBegin || kind == Kind::EnumBegin;
-  }
-  return NumberLine(line, m_number, m_continuation, m_interval, m_targets);
+  if (m_continuation) return numberLine(line, m_number, m_continuation, m_interval, m_targets, nullptr);
+  const syntax::Statement statement = syntax::classify(line);
+  m_inTypeBlock = statement.kind == Kind::TypeBegin || statement.kind == Kind::EnumBegin;
+  return numberLine(line, m_number, m_continuation, m_interval, m_targets, &statement);
 }
 
 bool UnnumberLine(QString& line) {
