@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "find/findwalk.h"
 
+#include "common/errors.h"
 #include "common/strings.h"
 #include "syntax/text.h"
 
@@ -64,7 +65,9 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
         const auto component = m_vbe.SelectedVBComponent();
         if (component && component->Type() != ide::ComponentType::RelatedDocument)
           module = component->CodeModule();
-      } catch (const std::exception&) {
+      } catch (const std::exception& failure) {
+        // Nothing to search: the selected component went meanwhile.
+        common::logFailure(failure, QStringLiteral("FindWalk"), QStringLiteral("Search"), __LINE__);
       }
       if (module && stillOpen(project, module->Parent())) searchModule(project, module, options);
       m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "find/navigate.h"
 
+#include "common/errors.h"
 #include "common/strings.h"
 
 namespace find {
@@ -36,13 +37,17 @@ void ShowItemFound(ide::VBE& vbe, const CItemFound& item, const std::function<vo
   try {
     if (item.Component)
       if (auto module = item.Component->CodeModule()) pane = module->CodePane();
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("navigate"), QStringLiteral("ShowItemFound"),
+                       __LINE__);  // told below
   }
   if (!pane) {
     QString name;
     try {
       if (item.Component) name = item.Component->Name();
-    } catch (const std::exception&) {
+    } catch (const std::exception& failure) {
+      common::logFailure(failure, QStringLiteral("navigate"), QStringLiteral("ShowItemFound"),
+                         __LINE__);  // told without it
     }
     ui.MsgBox(common::LoadResString(kNoCodeWindow) + QStringLiteral(" \"") + name + QStringLiteral("\" ") +
                   common::LoadResString(kInActiveProject),

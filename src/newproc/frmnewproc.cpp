@@ -256,7 +256,9 @@ void frmNewProc::Form_Load() {
     // the active code pane's, not the component selected in the Project window.
     const auto target = pane->CodeModule()->Parent();
     m_opScope[2]->setEnabled(!target || target->Type() != ide::ComponentType::StdModule);
-  } catch (const ide::Error&) {
+  } catch (const ide::Error& failure) {
+    // Friend stays offered; writing the procedure reports a module that went.
+    common::logFailure(failure, QStringLiteral("frmNewProc"), QStringLiteral("Form_Load"), __LINE__);
   }
   m_cboDataType->setEditText(QStringLiteral("String"));
   enable({m_frPropProcs, m_ckPropGet, m_ckPropLet, m_ckIsObject}, false);

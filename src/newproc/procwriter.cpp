@@ -72,7 +72,8 @@ QStringList controlNames(ide::CodeModule& module) {
     if (const auto designer = module.Parent()->Designer())
       for (const auto& control : designer->VBControls()->items())
         names << control->name();
-  } catch (const ide::Error&) {
+  } catch (const ide::Error& failure) {
+    common::logFailure(failure, QStringLiteral("ProcWriter"), QStringLiteral("controlNames"), __LINE__);
   }
   return names;
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "projinfo/tasklist.h"
 
+#include "common/errors.h"
 #include "projinfo/records.h"
 
 namespace projinfo {
@@ -27,7 +28,9 @@ void CTaskList::InitializeFromFile() {
       task->owner = this;
       task->setSerialization(m_projInfo->GetTaskListItem(element.Name()));
       Tasks.Add(QLatin1StringView(kTaskPrefix) + QString::number(task->ItemId), task);
-    } catch (const std::exception&) {
+    } catch (const std::exception& failure) {
+      common::logFailure(failure, QStringLiteral("CTaskList"), QStringLiteral("InitializeFromFile"),
+                         __LINE__);
     }
   }
 }
