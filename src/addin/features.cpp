@@ -137,8 +137,6 @@ class AddInFeatures final : public Features {
   }
 
  private:
-  static constexpr int kAddFavoriteFailed = 5084;
-
   static projinfo::ProjInfoServices projInfoServices(const FeatureServices& services) {
     projinfo::ProjInfoServices result;
     result.vbe = services.vbe.get();

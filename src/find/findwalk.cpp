@@ -3,22 +3,12 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "find/texts.h"
 #include "syntax/text.h"
 
 #include <algorithm>
 
 namespace find {
-namespace {
-
-// "Pesquisando ...", "Resultados da pesquisa em".
-constexpr int kSearching = 5131;
-constexpr int kResultsIn = 5132;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
-
-}  // namespace
 
 QString declarationsText() {
   return QStringLiteral("(Declarations)");
@@ -45,14 +35,14 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
       for (const auto& project : m_vbe.VBProjects()->items()) {
         if (m_context.cancelled()) return;
         if (!stillOpen(project)) continue;  // removed while an earlier one was searched
-        m_report.status(text(kSearching));
-        m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+        m_report.status(common::LoadResString(kSearching));
+        m_report.resultsLabel(common::LoadResString(kResultsIn) + u' ' + project->Name());
         searchProject(project, options);
       }
       return;
     case SearchScope::ActiveProject: {
       const auto project = transform::activeProject(m_vbe);
-      m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+      m_report.resultsLabel(common::LoadResString(kResultsIn) + u' ' + project->Name());
       searchProject(project, options);
       return;
     }
@@ -70,7 +60,7 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
         common::logFailure(failure, QStringLiteral("FindWalk"), QStringLiteral("Search"), __LINE__);
       }
       if (module && stillOpen(project, module->Parent())) searchModule(project, module, options);
-      m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+      m_report.resultsLabel(common::LoadResString(kResultsIn) + u' ' + project->Name());
       return;
     }
   }
@@ -97,7 +87,7 @@ bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::
   const auto component = module->Parent();
   const QString projectName = project->Name();
   const QString moduleName = component->Name();
-  m_report.status(text(kSearching) + u' ' + moduleName);
+  m_report.status(common::LoadResString(kSearching) + u' ' + moduleName);
   int line = 1;
   int column = 1;
   for (;;) {

@@ -3,15 +3,10 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "find/texts.h"
 
 namespace find {
 namespace {
-
-// "O item seleciondado pertence a um projeto não localizado."; "Não foi possível abrir a janela de código
-// de" ... "no projeto ativo."
-constexpr int kProjectGone = 5111;
-constexpr int kNoCodeWindow = 5112;
-constexpr int kInActiveProject = 5113;
 
 bool isOpen(ide::VBE& vbe, const ide::Ref<ide::VBProject>& project) {
   if (!project) return false;

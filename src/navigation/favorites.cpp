@@ -3,13 +3,11 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "navigation/texts.h"
 #include "projinfo/records.h"
 
 namespace navigation {
 namespace {
-
-constexpr int kAddFailed = 5084;
-constexpr int kRecordFailed = 5116;
 
 QString declarations() {
   return QString::fromLatin1(kGeneralDeclarations);

@@ -4,6 +4,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "common/uiutils.h"
+#include "newproc/texts.h"
 #include "textins/textinsertion.h"
 
 #include <QStringList>
@@ -13,9 +14,6 @@
 
 namespace newproc {
 namespace {
-
-constexpr int kNameInUse = 5117;
-constexpr int kMemberVariableInUse = 5118;
 
 bool sameName(const QString& a, const QString& b) {
   return a.compare(b, Qt::CaseInsensitive) == 0;
