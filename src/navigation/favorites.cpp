@@ -47,7 +47,7 @@ void CFavorites::InitializeFromFile() {
   Project = owner->Project();
   bool failed = false;
   try {
-    const projinfo::StorageElements elements = owner->m_Favorites->Elements();
+    const projinfo::StorageElements elements = owner->favoritesStorage()->Elements();
     for (int i = 1; i <= elements.Count(); ++i) {
       try {
         auto item = std::make_shared<CFavoritesItem>();

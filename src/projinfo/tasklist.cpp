@@ -20,8 +20,8 @@ void CTaskItem::setSerialization(const QString& text) {
 
 void CTaskList::InitializeFromFile() {
   Project = m_projInfo->Project();
-  if (!m_projInfo->m_TaskList) return;
-  for (const VBSTATSTG& element : m_projInfo->m_TaskList->Elements()) {
+  if (!m_projInfo->taskListStorage()) return;
+  for (const VBSTATSTG& element : m_projInfo->taskListStorage()->Elements()) {
     // A record that cannot be read is left out, and left in the file as it is.
     try {
       auto task = std::make_shared<CTaskItem>();
