@@ -12,7 +12,6 @@
 // IDE's ProcOfLine gives it, and the matcher behind Find decides every occurrence. Wildcard searches, and
 // files whose header this quick reading does not recognise, are read whole.
 #include "cli.h"
-#include "find/findwalk.h"
 #include "host/code/codetext.h"
 #include "host/code/findmatcher.h"
 #include "host/files/ansi.h"
@@ -23,6 +22,7 @@
 #include "host/files/projectfile.h"
 #include "ide/error.h"
 #include "syntax/line.h"
+#include "walk/walk.h"
 
 #include <QDir>
 #include <QFile>
@@ -503,7 +503,7 @@ ScannedModule scanModule(const QString& path, const Search& search) {
       // Every file line above this one is a header line, a hidden attribute line or a code line.
       const int codeLine = kept.fileLines[k] - int(headerCount) - int(attribute);
       result.occurrences.push_back({codeLine, kept.fileLines[k], int(match->first) + 1,
-                                    procedure.isEmpty() ? find::declarationsText() : procedure,
+                                    procedure.isEmpty() ? walk::declarationsText() : procedure,
                                     syntax::trimmedView(text).toString()});
       from = match->first + 1;
     }

@@ -10,10 +10,6 @@
 
 namespace find {
 
-QString declarationsText() {
-  return QStringLiteral("(Declarations)");
-}
-
 bool FindWalk::stillOpen(const ide::Ref<ide::VBProject>& project,
                          const ide::Ref<ide::VBComponent>& component) {
   try {
@@ -41,13 +37,13 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
       }
       return;
     case SearchScope::ActiveProject: {
-      const auto project = transform::activeProject(m_vbe);
+      const auto project = walk::activeProject(m_vbe);
       m_report.resultsLabel(common::LoadResString(kResultsIn) + u' ' + project->Name());
       searchProject(project, options);
       return;
     }
     case SearchScope::ActiveModule: {
-      const auto project = transform::activeProject(m_vbe);
+      const auto project = walk::activeProject(m_vbe);
       if (m_context.yieldAndCheck()) return;
       ide::Ref<ide::CodeModule> module;
       try {
@@ -112,7 +108,7 @@ bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::
     if (!stillOpen(project, component)) return true;
     ide::ProcKind kind = ide::ProcKind::Proc;
     QString procedure = module->ProcOfLine(startLine, kind);
-    if (procedure.isEmpty()) procedure = declarationsText();
+    if (procedure.isEmpty()) procedure = walk::declarationsText();
     const QString lineText = module->Lines(startLine, 1);
     m_report.found(FoundRow{projectName, moduleName, std::move(procedure),
                             syntax::trimmedView(lineText).toString(),

@@ -30,7 +30,7 @@ struct frmFind::Run {
     // The IDE's loop decides how often it runs: every yield is offered to it.
     context.setYieldInterval({});
   }
-  transform::WalkContext context;
+  walk::WalkContext context;
   /// The window was destroyed: the search must not touch it again.
   bool windowGone = false;
   /// "&Fechar" was pressed during the search: the window was emptied and hidden.
