@@ -12,13 +12,13 @@
 // IDE's ProcOfLine gives it, and the matcher behind Find decides every occurrence. Wildcard searches, and
 // files whose header this quick reading does not recognise, are read whole.
 #include "cli.h"
+#include "fileio/fileio.h"
+#include "fileio/parallel.h"
 #include "host/code/codetext.h"
 #include "host/code/findmatcher.h"
 #include "host/files/ansi.h"
-#include "host/files/fileio.h"
 #include "host/files/groupfile.h"
 #include "host/files/modulefile.h"
-#include "host/files/parallel.h"
 #include "host/files/projectfile.h"
 #include "ide/error.h"
 #include "syntax/line.h"
@@ -64,7 +64,7 @@ struct Inputs {
     const QString absolute = QFileInfo(file).absoluteFilePath();
     const QString suffix = QFileInfo(file).suffix().toLower();
     if (suffix == QLatin1StringView("vbg")) {
-      const host::GroupFile group = host::GroupFile::parse(host::readFileBytes(absolute), file);
+      const host::GroupFile group = host::GroupFile::parse(fileio::readFileBytes(absolute), file);
       const QString directory = QFileInfo(absolute).absolutePath();
       const std::vector<host::GroupProject> projects = group.projects();
       for (size_t i = 0; i < projects.size(); ++i) {
@@ -97,7 +97,8 @@ struct Inputs {
 
  private:
   void addProject(const QString& projectFile) {
-    const host::ProjectFile project = host::ProjectFile::parse(host::readFileBytes(projectFile), projectFile);
+    const host::ProjectFile project =
+        host::ProjectFile::parse(fileio::readFileBytes(projectFile), projectFile);
     QString name = project.name();
     if (name.isEmpty()) name = QFileInfo(projectFile).completeBaseName();
     projectNames << name;
@@ -463,7 +464,7 @@ const QByteArray& readInto(QByteArray& buffer, const QString& path) {
     buffer.resize(size);
     if (file.read(buffer.data(), size) == size) return buffer;
   }
-  buffer = host::readFileBytes(path);  // which says what failed
+  buffer = fileio::readFileBytes(path);  // which says what failed
   return buffer;
 }
 
@@ -575,7 +576,7 @@ int runFind(const FindCommandOptions& options) {
   const std::vector<ModuleEntry>& modules = inputs.modules;
   std::vector<ScannedModule> scanned(modules.size());
   std::vector<std::exception_ptr> failures;
-  host::parallelFor(
+  fileio::parallelFor(
       modules.size(),
       [&](size_t i) {
         scanned[i] = scanModule(modules[i].path, *search);

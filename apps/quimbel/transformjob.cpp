@@ -4,9 +4,9 @@
 // changed files, printing a diff or checking.
 #include "cli.h"
 #include "diff.h"
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
+#include "fileio/parallel.h"
 #include "host/files/modulefile.h"
-#include "host/files/parallel.h"
 #include "host/files/sourcelines.h"
 #include "host/model/vbe.h"
 #include "terminalprogress.h"
