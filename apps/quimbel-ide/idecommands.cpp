@@ -300,7 +300,7 @@ bool IdeCommands::runSave(const std::function<void()>& save, const QString& fail
     try {
       save();
       return true;
-    } catch (const host::FilesChangedOnDisk& error) {
+    } catch (const fileio::FilesChangedOnDisk& error) {
       QStringList files;
       for (const QString& path : error.changed)
         files << QDir::toNativeSeparators(path);
@@ -313,7 +313,7 @@ bool IdeCommands::runSave(const std::function<void()>& save, const QString& fail
           ide::mb::YesNo | ide::mb::Exclamation, kTitle);
       if (answer != ide::mb::Yes) return false;
       m_window.vbe()->acceptFilesOnDisk(error.changed + error.deleted);
-    } catch (const host::SaveHalfDone& error) {
+    } catch (const fileio::SaveHalfDone& error) {
       // Some files hold the new text: the description says which.
       m_window.reportError(failure + QStringLiteral("\n\n") + error.description());
       return false;

@@ -42,14 +42,10 @@
 
 #include <cstdio>
 #include <span>
+#include <utility>
 
 namespace desktop {
 namespace {
-
-/// A step that cannot run yet (its dialog or widget has not appeared): it is tried again on the next tick.
-struct NotReady {
-  QString what;
-};
 
 struct StepError {
   QString message;
@@ -348,7 +344,7 @@ struct ScriptRunner::Commands {
 
   static void set(ScriptRunner& runner, const QStringList& args) {
     QWidget* widget = runner.findWidget(args[0]);
-    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[0])};
+    if (!widget) return runner.notYet(QStringLiteral("no widget named \"%1\" is open").arg(args[0]));
     const QString& value = args[1];
     if (auto* line = qobject_cast<QLineEdit*>(widget)) {
       line->selectAll();
@@ -399,7 +395,7 @@ struct ScriptRunner::Commands {
 
   static void doubleClick(ScriptRunner& runner, const QStringList& args) {
     QWidget* widget = runner.findWidget(args[0]);
-    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[0])};
+    if (!widget) return runner.notYet(QStringLiteral("no widget named \"%1\" is open").arg(args[0]));
     auto* view = qobject_cast<QAbstractItemView*>(widget);
     if (!view) fail(QStringLiteral("\"%1\" is not a list").arg(args[0]));
     QAbstractItemModel* model = view->model();
@@ -432,7 +428,7 @@ struct ScriptRunner::Commands {
       }
       if (found) break;
     }
-    if (!found) throw NotReady{QStringLiteral("no button \"%1\" is open").arg(args[0])};
+    if (!found) return runner.notYet(QStringLiteral("no button \"%1\" is open").arg(args[0]));
     if (!found->isEnabled()) fail(QStringLiteral("the button \"%1\" is disabled").arg(args[0]));
     found->click();
   }
@@ -465,7 +461,7 @@ struct ScriptRunner::Commands {
       target = &runner.m_window;
     } else if (which == QLatin1StringView("dialog")) {
       const auto open = runner.dialogs();
-      if (open.empty()) throw NotReady{QStringLiteral("no dialog is open")};
+      if (open.empty()) return runner.notYet(QStringLiteral("no dialog is open"));
       target = open.front();
     } else if (!which.isEmpty()) {
       fail(QStringLiteral("screenshot takes main or dialog, not \"%1\"").arg(args[0]));
@@ -486,10 +482,10 @@ struct ScriptRunner::Commands {
     // A time has put the next step off already (tick()); a condition holds the script until it is met.
     const QString what = args[0].toLower();
     if (what == QLatin1StringView("dialog")) {
-      if (runner.dialogs().empty()) throw NotReady{QStringLiteral("no dialog opened")};
+      if (runner.dialogs().empty()) return runner.notYet(QStringLiteral("no dialog opened"));
     } else if (what == QLatin1StringView("closed")) {
       if (QWidget* open = QApplication::activeModalWidget())
-        throw NotReady{QStringLiteral("the dialog \"%1\" stayed open").arg(open->windowTitle())};
+        return runner.notYet(QStringLiteral("the dialog \"%1\" stayed open").arg(open->windowTitle()));
     } else {
       toNumber(args[0], "the time");
     }
@@ -574,7 +570,7 @@ struct ScriptRunner::Commands {
 
   static void expectValue(ScriptRunner& runner, const QStringList& args) {
     QWidget* widget = runner.findWidget(args[1]);
-    if (!widget) throw NotReady{QStringLiteral("no widget named \"%1\" is open").arg(args[1])};
+    if (!widget) return runner.notYet(QStringLiteral("no widget named \"%1\" is open").arg(args[1]));
     QString actual;
     if (auto* line = qobject_cast<QLineEdit*>(widget))
       actual = line->text();
@@ -762,15 +758,15 @@ void ScriptRunner::tick() {
     bool timed = false;
     const int waitMs = step.command == QLatin1StringView("wait") ? step.arguments[0].toInt(&timed) : 0;
     schedule(timed ? std::max(0, waitMs) : 10);
-    execute(step);
-    m_waitingSince = -1;
-  } catch (const NotReady& notReady) {
-    const qint64 now = QDateTime::currentMSecsSinceEpoch();
-    if (m_waitingSince < 0) m_waitingSince = now;
-    if (now - m_waitingSince > m_patienceMs) {
-      return finish(1, QStringLiteral("%1:%2: %3").arg(m_name).arg(step.line).arg(notReady.what));
+    if (const std::optional<QString> notReady = execute(step)) {
+      const qint64 now = QDateTime::currentMSecsSinceEpoch();
+      if (m_waitingSince < 0) m_waitingSince = now;
+      if (now - m_waitingSince > m_patienceMs)
+        return finish(1, QStringLiteral("%1:%2: %3").arg(m_name).arg(step.line).arg(*notReady));
+      m_next = index;  // again on the next tick
+      return;
     }
-    m_next = index;  // again on the next tick
+    m_waitingSince = -1;
   } catch (const StepError& error) {
     return finish(1, QStringLiteral("%1:%2: %3").arg(m_name).arg(step.line).arg(error.message));
   } catch (const ide::Error& error) {
@@ -866,13 +862,15 @@ QWidget* ScriptRunner::findWidget(const QString& name) const {
   return nullptr;
 }
 
-void ScriptRunner::execute(const ScriptStep& step) {
+std::optional<QString> ScriptRunner::execute(const ScriptStep& step) {
   const Commands::Entry* command = Commands::find(step.command);
   if (!command) fail(QStringLiteral("unknown command \"%1\"").arg(step.command));
   if (auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
       box && !command->whileABoxIsOpen)
-    throw NotReady{QStringLiteral("a message box is open: \"%1\"").arg(box->text())};
+    return QStringLiteral("a message box is open: \"%1\"").arg(box->text());
+  m_notReady.reset();
   command->run(*this, step.arguments);
+  return std::exchange(m_notReady, std::nullopt);
 }
 
 }  // namespace desktop

@@ -11,6 +11,7 @@
 #include <QTimer>
 
 #include <functional>
+#include <optional>
 #include <vector>
 
 class QWidget;
@@ -60,7 +61,11 @@ class ScriptRunner final : public QObject {
  private:
   void schedule(int delayMs);
   void tick();
-  void execute(const ScriptStep& step);
+  /// Runs a step; what keeps it from running yet (its dialog or widget has not appeared) comes back, to be
+  /// tried again on the next tick.
+  std::optional<QString> execute(const ScriptStep& step);
+  /// Said by a step's handler that cannot run yet, and why.
+  void notYet(QString why) { m_notReady = std::move(why); }
   void finish(int exitCode, const QString& error = {});
   void noteMessage(const QString& title, const QString& text);
   bool answerOpenMessageBox();
@@ -79,6 +84,7 @@ class ScriptRunner final : public QObject {
   bool m_starting = false;
   int m_patienceMs = 10000;
   qint64 m_waitingSince = -1;
+  std::optional<QString> m_notReady;
   QString m_lastMessage;
   QString m_error;
   std::function<void(const QString&, const QString&)> m_previousObserver;

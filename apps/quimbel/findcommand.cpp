@@ -12,17 +12,17 @@
 // IDE's ProcOfLine gives it, and the matcher behind Find decides every occurrence. Wildcard searches, and
 // files whose header this quick reading does not recognise, are read whole.
 #include "cli.h"
-#include "find/findwalk.h"
+#include "fileio/fileio.h"
+#include "fileio/parallel.h"
 #include "host/code/codetext.h"
 #include "host/code/findmatcher.h"
 #include "host/files/ansi.h"
-#include "host/files/fileio.h"
 #include "host/files/groupfile.h"
 #include "host/files/modulefile.h"
-#include "host/files/parallel.h"
 #include "host/files/projectfile.h"
 #include "ide/error.h"
 #include "syntax/line.h"
+#include "walk/walk.h"
 
 #include <QDir>
 #include <QFile>
@@ -64,7 +64,7 @@ struct Inputs {
     const QString absolute = QFileInfo(file).absoluteFilePath();
     const QString suffix = QFileInfo(file).suffix().toLower();
     if (suffix == QLatin1StringView("vbg")) {
-      const host::GroupFile group = host::GroupFile::parse(host::readFileBytes(absolute), file);
+      const host::GroupFile group = host::GroupFile::parse(fileio::readFileBytes(absolute), file);
       const QString directory = QFileInfo(absolute).absolutePath();
       const std::vector<host::GroupProject> projects = group.projects();
       for (size_t i = 0; i < projects.size(); ++i) {
@@ -97,7 +97,8 @@ struct Inputs {
 
  private:
   void addProject(const QString& projectFile) {
-    const host::ProjectFile project = host::ProjectFile::parse(host::readFileBytes(projectFile), projectFile);
+    const host::ProjectFile project =
+        host::ProjectFile::parse(fileio::readFileBytes(projectFile), projectFile);
     QString name = project.name();
     if (name.isEmpty()) name = QFileInfo(projectFile).completeBaseName();
     projectNames << name;
@@ -230,13 +231,10 @@ struct LineSpan {
   int number = 0;
 };
 
-/// A quick split met a file it must read exactly (a line end that is a lone carriage return, or a
-/// problem to report with its line number).
-struct SplitExactly {};
-
 /// Splits a file into lines as the file layer does, refusing what it refuses: a NUL byte (not a text file)
 /// and a line longer than the IDE allows. The quick way looks for line feeds only and leaves lone carriage
-/// returns to the exact way (see crlfCount()); it throws SplitExactly instead of reporting a problem.
+/// returns to the exact way (see crlfCount()); met with a problem, it stops and says so (gaveUp()) for the
+/// exact way to report it with its line number.
 class LineSplitter {
  public:
   LineSplitter(const QByteArray& bytes, const QString& path, bool exact)
@@ -245,7 +243,7 @@ class LineSplitter {
   }
 
   bool next(LineSpan& span) {
-    if (m_position >= m_size) return false;
+    if (m_position >= m_size || m_gaveUp) return false;
     const char* begin = m_data + m_position;
     const char* newline = static_cast<const char*>(std::memchr(begin, '\n', size_t(m_size - m_position)));
     const char* stop = newline ? newline : m_data + m_size;
@@ -257,9 +255,9 @@ class LineSplitter {
       ++m_crlf;
     }
     span = LineSpan{m_position, (cr ? cr : stop) - begin, host::LineEnd::None, ++m_line};
-    if (m_nul && m_nul < begin + span.length) fail(QStringLiteral("not a text file"));
+    if (m_nul && m_nul < begin + span.length) return fail(QStringLiteral("not a text file"));
     if (span.length > host::kMaxLineLength)
-      fail(QStringLiteral("line longer than %1 characters").arg(host::kMaxLineLength));
+      return fail(QStringLiteral("line longer than %1 characters").arg(host::kMaxLineLength));
     if (cr) {
       const bool crlf = cr + 1 < m_data + m_size && cr[1] == '\n';
       span.end = crlf ? host::LineEnd::CRLF : host::LineEnd::CR;
@@ -276,11 +274,14 @@ class LineSplitter {
   /// Carriage returns the quick way took as part of a CR LF: when the file holds others, it splits
   /// differently and must be read exactly.
   qsizetype crlfCount() const { return m_crlf; }
+  /// The quick way met a problem: the file must be read exactly for it to be reported.
+  bool gaveUp() const { return m_gaveUp; }
   bool exact() const { return m_exact; }
 
  private:
-  [[noreturn]] void fail(const QString& problem) const {
-    if (!m_exact) throw SplitExactly{};
+  bool fail(const QString& problem) {
+    m_gaveUp = true;
+    if (!m_exact) return false;
     throw ide::Error(ide::err::InvalidFileFormat,
                      QStringLiteral("%1, line %2: %3").arg(m_path).arg(m_line).arg(problem));
   }
@@ -293,6 +294,7 @@ class LineSplitter {
   qsizetype m_position = 0;
   qsizetype m_crlf = 0;
   int m_line = 0;
+  bool m_gaveUp = false;
 };
 
 /// The lines of a module file that reach the parser, with their line numbers in the file.
@@ -302,6 +304,8 @@ struct KeptLines {
   std::vector<bool> candidates;
   /// The carriage returns the split took as parts of CR LF line ends.
   qsizetype crlfCount = 0;
+  /// The quick split stopped at a problem; the lines are incomplete.
+  bool splitGaveUp = false;
   void add(QString text, host::LineEnd end, int fileLine, bool candidate) {
     lines.push_back({std::move(text), end});
     fileLines.push_back(fileLine);
@@ -340,6 +344,7 @@ KeptLines keptLines(const QByteArray& bytes, const QString& path, const Search& 
     while (splitter.next(span))
       kept.add(decode(span), span.end, span.number, true);
     kept.crlfCount = splitter.crlfCount();
+    kept.splitGaveUp = splitter.gaveUp();
     return kept;
   }
 
@@ -372,6 +377,7 @@ KeptLines keptLines(const QByteArray& bytes, const QString& path, const Search& 
     while (again.next(span))
       whole.add(decode(span), span.end, span.number, true);
     whole.crlfCount = again.crlfCount();
+    whole.splitGaveUp = again.gaveUp();
     return whole;
   }
 
@@ -421,6 +427,7 @@ KeptLines keptLines(const QByteArray& bytes, const QString& path, const Search& 
   for (size_t i = 0; i < statement.size(); ++i)
     kept.add(decode(statement[i]), statement[i].end, statement[i].number, true);
   kept.crlfCount = splitter.crlfCount();
+  kept.splitGaveUp = splitter.gaveUp();
   return kept;
 }
 
@@ -444,11 +451,8 @@ qsizetype countByte(QByteArrayView bytes, char value) {
 }
 
 KeptLines keptLines(const QByteArray& bytes, const QString& path, const Search& search) {
-  try {
-    KeptLines kept = keptLines(bytes, path, search, false);
-    if (countByte(bytes, '\r') == kept.crlfCount) return kept;
-  } catch (const SplitExactly&) {
-  }
+  KeptLines kept = keptLines(bytes, path, search, false);
+  if (!kept.splitGaveUp && countByte(bytes, '\r') == kept.crlfCount) return kept;
   return keptLines(bytes, path, search, true);
 }
 
@@ -460,7 +464,7 @@ const QByteArray& readInto(QByteArray& buffer, const QString& path) {
     buffer.resize(size);
     if (file.read(buffer.data(), size) == size) return buffer;
   }
-  buffer = host::readFileBytes(path);  // which says what failed
+  buffer = fileio::readFileBytes(path);  // which says what failed
   return buffer;
 }
 
@@ -500,7 +504,7 @@ ScannedModule scanModule(const QString& path, const Search& search) {
       // Every file line above this one is a header line, a hidden attribute line or a code line.
       const int codeLine = kept.fileLines[k] - int(headerCount) - int(attribute);
       result.occurrences.push_back({codeLine, kept.fileLines[k], int(match->first) + 1,
-                                    procedure.isEmpty() ? find::declarationsText() : procedure,
+                                    procedure.isEmpty() ? walk::declarationsText() : procedure,
                                     syntax::trimmedView(text).toString()});
       from = match->first + 1;
     }
@@ -572,7 +576,7 @@ int runFind(const FindCommandOptions& options) {
   const std::vector<ModuleEntry>& modules = inputs.modules;
   std::vector<ScannedModule> scanned(modules.size());
   std::vector<std::exception_ptr> failures;
-  host::parallelFor(
+  fileio::parallelFor(
       modules.size(),
       [&](size_t i) {
         scanned[i] = scanModule(modules[i].path, *search);

@@ -3,13 +3,13 @@
 // enough for the user to wonder.
 #pragma once
 
-#include "transform/progress.h"
+#include "walk/progress.h"
 
 #include <chrono>
 
 namespace cli {
 
-class TerminalProgress final : public transform::ProgressSink {
+class TerminalProgress final : public walk::ProgressSink {
  public:
   TerminalProgress();
   /// Clears the bar from the terminal.

@@ -4,9 +4,9 @@
 // changed files, printing a diff or checking.
 #include "cli.h"
 #include "diff.h"
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
+#include "fileio/parallel.h"
 #include "host/files/modulefile.h"
-#include "host/files/parallel.h"
 #include "host/files/sourcelines.h"
 #include "host/model/vbe.h"
 #include "terminalprogress.h"
@@ -282,9 +282,7 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
     return kInputError;
   }
 
-  // Deliberately never freed: the process ends right after the run, and taking a million lines apart one
-  // by one would only delay its exit.
-  std::vector<Input>& inputs = *new std::vector<Input>(size_t(files.size()));
+  std::vector<Input> inputs(size_t(files.size()));
   int missing = 0;
   for (qsizetype i = 0; i < files.size(); ++i) {
     Input& input = inputs[size_t(i)];

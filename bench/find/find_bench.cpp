@@ -34,7 +34,7 @@ struct ToList final : find::FindReport {
 void searchAllProjects(benchmark::State& state, const find::FindOptions& options, double targetMs) {
   auto vbe = host::VbeImpl::create();
   vbe->open(corpus().group().groupFile);
-  transform::WalkContext context(QStringLiteral("bench"), &vbe->Platform().loop(), nullptr);
+  walk::WalkContext context(QStringLiteral("bench"), &vbe->Platform().loop(), nullptr);
   int rows = 0;
   double worstMs = 0;
   for (auto _ : state) {

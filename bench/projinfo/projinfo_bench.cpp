@@ -4,7 +4,7 @@
 // identifier, reading the file, loading every task and favourite) < 100 ms; adding a task to it, the
 // commit included (the whole file written, flushed and renamed into place) < 20 ms. The last two
 // benchmarks split a commit: laying out the file in memory, and writing and flushing that many bytes.
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
 #include "host/model/vbe.h"
 #include "navigation/favorites.h"
 #include "projinfo/projinfos.h"
@@ -111,7 +111,7 @@ BENCHMARK(BM_AddTaskWithItsCommit)->Unit(benchmark::kMillisecond);
 
 void BM_LayOutTheFile(benchmark::State& state) {
   Fixture fixture;
-  const QByteArray bytes = host::readFileBytes(fixture.dir.filePath(QStringLiteral("qm000900.qmi")));
+  const QByteArray bytes = fileio::readFileBytes(fixture.dir.filePath(QStringLiteral("qm000900.qmi")));
   const auto root = readCompoundFile(bytes);
   for (auto _ : state)
     benchmark::DoNotOptimize(writeCompoundFile(*root));
@@ -122,9 +122,9 @@ BENCHMARK(BM_LayOutTheFile)->Unit(benchmark::kMillisecond);
 void BM_WriteAndFlushThatMuch(benchmark::State& state) {
   Fixture fixture;
   const QString path = fixture.dir.filePath(QStringLiteral("qm000900.qmi"));
-  const QByteArray bytes = host::readFileBytes(path);
+  const QByteArray bytes = fileio::readFileBytes(path);
   for (auto _ : state)
-    host::writeFileAtomically(path, bytes);
+    fileio::writeFileAtomically(path, bytes);
 }
 BENCHMARK(BM_WriteAndFlushThatMuch)->Unit(benchmark::kMillisecond);
 

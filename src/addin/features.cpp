@@ -77,7 +77,9 @@ class AddInFeatures final : public Features {
     ide::Ref<ide::VBProject> project = place.project;
     try {
       if (place.component) project = place.component->Collection()->Parent();
-    } catch (const std::exception&) {
+    } catch (const std::exception& failure) {
+      // The place's own project, as given, is used instead.
+      common::logFailure(failure, QStringLiteral("AddInFeatures"), QStringLiteral("addFavorite"), __LINE__);
     }
     projinfo::CProjInfo* info = project ? m_projInfos.item(project) : nullptr;
     if (info && !info->isOpen()) return tell(info->unavailable());
@@ -135,8 +137,6 @@ class AddInFeatures final : public Features {
   }
 
  private:
-  static constexpr int kAddFavoriteFailed = 5084;
-
   static projinfo::ProjInfoServices projInfoServices(const FeatureServices& services) {
     projinfo::ProjInfoServices result;
     result.vbe = services.vbe.get();
@@ -180,7 +180,10 @@ void AddInFeatures::showExtendedFind() {
   QString selected;
   try {
     selected = CEnvUtils(*m_vbe).GetSelectedText();
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    // The window opens without a text to look for.
+    common::logFailure(failure, QStringLiteral("AddInFeatures"), QStringLiteral("showExtendedFind"),
+                       __LINE__);
   }
   m_findForm->Show(selected);
 }

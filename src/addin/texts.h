@@ -25,4 +25,8 @@ inline constexpr char16_t kNoConfigurationAccess[] = u"Sem acesso de leitura à 
 /// The window message posted to run work once the IDE is idle.
 inline constexpr char kIdleMessageName[] = "QM_ONIDLE_MSG";
 
+/// Numbers in the string table.
+inline constexpr int kNoAddInsMenuText = 201;
+inline constexpr int kAddFavoriteFailed = 5084;
+
 }  // namespace addin

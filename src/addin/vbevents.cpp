@@ -50,7 +50,7 @@ void CVBEvents::ConnectMenus(bool connect) {
   try {
     m_vbe.CommandBars()->Item(QStringLiteral("Add-Ins"));
   } catch (const ide::Error&) {
-    throw common::recordError(ide::Error(kNoAddInsMenuError, common::LoadResString(201)),
+    throw common::recordError(ide::Error(kNoAddInsMenuError, common::LoadResString(kNoAddInsMenuText)),
                               QString::fromLatin1(kModule), QStringLiteral("ConnectMenus"), __LINE__);
   }
   AddInControls& controls = m_globals.controls();

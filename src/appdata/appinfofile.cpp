@@ -233,9 +233,8 @@ auto appDataOperation(const QString& file, const char* procedure, int line, Work
     return work();
   } catch (const std::exception& failure) {
     common::recordErrorNumber(failure);
-    throw ide::Error(
-        kAppDataError, file + QStringLiteral(": ") + describe(failure),
-        common::locationText(QStringLiteral("CAppInfoFile"), QLatin1StringView(procedure), line));
+    throw common::LocatedError(kAppDataError, file + QStringLiteral(": ") + describe(failure),
+                               {QStringLiteral("CAppInfoFile"), QString::fromLatin1(procedure), line});
   }
 }
 

@@ -17,9 +17,13 @@ LastError& lastError() {
   return record;
 }
 
-QString locationText(const QString& module, const QString& procedure, int line) {
+QString Place::text() const {
+  if (module.isEmpty() && procedure.isEmpty()) return {};  // no place recorded
   return QStringLiteral("em %1_%2, linha: %3").arg(module, procedure).arg(line);
 }
+
+LocatedError::LocatedError(long number, QString description, Place place)
+    : ide::Error(number, std::move(description), place.text()), m_place(std::move(place)) {}
 
 namespace {
 long numberOf(const std::exception& failure) {
@@ -27,12 +31,12 @@ long numberOf(const std::exception& failure) {
   return error ? error->number() : ide::err::InvalidProcedureCall;  // not the IDE's: an invalid call
 }
 
-/// The record of a failure caught at module_procedure, line: the innermost location wins.
-LastError describe(const std::exception& failure, const QString& module, const QString& procedure, int line) {
+/// The record of a failure caught at module_procedure, line: the innermost place wins.
+LastError describe(const std::exception& failure, const Place& here) {
   const auto* error = dynamic_cast<const ide::Error*>(&failure);
-  const QString source = error ? error->source() : QString();
+  const auto* located = dynamic_cast<const LocatedError*>(&failure);
   return {numberOf(failure), error ? error->description() : QString::fromLocal8Bit(failure.what()),
-          source.startsWith(QLatin1StringView("em ")) ? source : locationText(module, procedure, line)};
+          located ? located->place() : here};
 }
 }  // namespace
 
@@ -40,11 +44,11 @@ void recordErrorNumber(const std::exception& failure) {
   lastError().number = numberOf(failure);
 }
 
-ide::Error recordError(const std::exception& failure, const QString& module, const QString& procedure,
-                       int line) {
+LocatedError recordError(const std::exception& failure, const QString& module, const QString& procedure,
+                         int line) {
   LastError& record = lastError();
-  record = describe(failure, module, procedure, line);
-  return ide::Error(record.number, record.description, record.location);
+  record = describe(failure, Place{module, procedure, line});
+  return LocatedError(record.number, record.description, record.place);
 }
 
 QString errorLogPath() {
@@ -65,7 +69,7 @@ void appendToLog(const LastError& record) {
   log.write(QStringLiteral("%1\t%2\t%3\t%4\n")
                 .arg(QDateTime::currentDateTime().toString(Qt::ISODate))
                 .arg(record.number)
-                .arg(record.description, record.location)
+                .arg(record.description, record.place.text())
                 .toUtf8());
 }
 }  // namespace
@@ -75,10 +79,10 @@ void logLastError() {
 }
 
 void logFailure(const std::exception& failure, const QString& module, const QString& procedure, int line) {
-  LastError record = describe(failure, module, procedure, line);
+  LastError record = describe(failure, Place{module, procedure, line});
   thread_local LastError previous;
   if (record.number == previous.number && record.description == previous.description &&
-      record.location == previous.location)
+      record.place == previous.place)
     return;
   appendToLog(record);
   previous = std::move(record);

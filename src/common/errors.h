@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 // The add-in's error convention. A procedure that fails records the error in the process-wide last-error
-// record with a location text "em <module>_<procedure>, linha: <n>" (kept when the error already carries
-// one from a nested procedure) and raises it again with that location as its source; the outermost
+// record with its place, shown as "em <module>_<procedure>, linha: <n>" (kept when the error already
+// carries one from a nested procedure), and raises it again as a LocatedError; the outermost
 // handler shows it with ShowErrorReport. Every reported location is also appended to a log file in the
 // user's data directory, for bug reports.
 #pragma once
@@ -19,22 +19,40 @@ namespace common {
 inline constexpr long kCancelled = 9999;
 inline constexpr long kCommonDialogCancelled = 32755;
 
+/// Where a failure was caught: the add-in's module, procedure and line.
+struct Place {
+  QString module;
+  QString procedure;
+  int line = 0;
+  /// "em " + module + "_" + procedure + ", linha: " + line, as reports and the log show it.
+  QString text() const;
+  bool operator==(const Place&) const = default;
+};
+
+/// A failure that has passed a handler of the convention: it carries the place where it was first
+/// caught, kept by every handler it passes afterwards. The source is the place's text.
+class LocatedError : public ide::Error {
+ public:
+  LocatedError(long number, QString description, Place place);
+  const Place& place() const noexcept { return m_place; }
+
+ private:
+  Place m_place;
+};
+
 struct LastError {
   long number = 0;
   QString description;
-  QString location;
+  Place place;
 };
 
 /// The process-wide last-error record.
 LastError& lastError();
 
-/// "em " + module + "_" + procedure + ", linha: " + line.
-QString locationText(const QString& module, const QString& procedure, int line);
-
 /// Records a failure caught in module_procedure at `line` and returns the error to raise again: same
-/// number and description, the innermost location as source.
-ide::Error recordError(const std::exception& failure, const QString& module, const QString& procedure,
-                       int line);
+/// number and description, the innermost place.
+LocatedError recordError(const std::exception& failure, const QString& module, const QString& procedure,
+                         int line);
 
 /// Records only the number of a failure that is swallowed (the timer's), keeping the rest of the record.
 void recordErrorNumber(const std::exception& failure);

@@ -460,7 +460,9 @@ void frmProps::writeProperty(const QString& name, const QVariant& value) {
   // A value the control holds already is not written again: the form would record a default it leaves out.
   try {
     if (const QVariant current = property->Value(); current.isValid() && sameValue(current, value)) return;
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    // A value that cannot be read is written all the same.
+    common::logFailure(failure, kModule, QStringLiteral("writeProperty"), __LINE__);
   }
   property->setValue(value);
 }

@@ -2,15 +2,10 @@
 #include "find/findresults.h"
 
 #include "common/strings.h"
+#include "find/texts.h"
 #include "syntax/text.h"
 
 namespace find {
-namespace {
-
-// Column captions: "Projeto", "Módulo", "Procedimento", "Texto Localizado".
-constexpr int kFirstCaption = 5064;
-
-}  // namespace
 
 int FindResults::rowCount(const QModelIndex& parent) const {
   return parent.isValid() ? 0 : static_cast<int>(m_rows.size());

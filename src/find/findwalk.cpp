@@ -1,27 +1,14 @@
 // SPDX-License-Identifier: MIT
 #include "find/findwalk.h"
 
+#include "common/errors.h"
 #include "common/strings.h"
+#include "find/texts.h"
 #include "syntax/text.h"
 
 #include <algorithm>
 
 namespace find {
-namespace {
-
-// "Pesquisando ...", "Resultados da pesquisa em".
-constexpr int kSearching = 5131;
-constexpr int kResultsIn = 5132;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
-
-}  // namespace
-
-QString declarationsText() {
-  return QStringLiteral("(Declarations)");
-}
 
 bool FindWalk::stillOpen(const ide::Ref<ide::VBProject>& project,
                          const ide::Ref<ide::VBComponent>& component) {
@@ -44,19 +31,19 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
       for (const auto& project : m_vbe.VBProjects()->items()) {
         if (m_context.cancelled()) return;
         if (!stillOpen(project)) continue;  // removed while an earlier one was searched
-        m_report.status(text(kSearching));
-        m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+        m_report.status(common::LoadResString(kSearching));
+        m_report.resultsLabel(common::LoadResString(kResultsIn) + u' ' + project->Name());
         searchProject(project, options);
       }
       return;
     case SearchScope::ActiveProject: {
-      const auto project = transform::activeProject(m_vbe);
-      m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+      const auto project = walk::activeProject(m_vbe);
+      m_report.resultsLabel(common::LoadResString(kResultsIn) + u' ' + project->Name());
       searchProject(project, options);
       return;
     }
     case SearchScope::ActiveModule: {
-      const auto project = transform::activeProject(m_vbe);
+      const auto project = walk::activeProject(m_vbe);
       if (m_context.yieldAndCheck()) return;
       ide::Ref<ide::CodeModule> module;
       try {
@@ -64,10 +51,12 @@ void FindWalk::Search(SearchScope scope, const FindOptions& options) {
         const auto component = m_vbe.SelectedVBComponent();
         if (component && component->Type() != ide::ComponentType::RelatedDocument)
           module = component->CodeModule();
-      } catch (const std::exception&) {
+      } catch (const std::exception& failure) {
+        // Nothing to search: the selected component went meanwhile.
+        common::logFailure(failure, QStringLiteral("FindWalk"), QStringLiteral("Search"), __LINE__);
       }
       if (module && stillOpen(project, module->Parent())) searchModule(project, module, options);
-      m_report.resultsLabel(text(kResultsIn) + u' ' + project->Name());
+      m_report.resultsLabel(common::LoadResString(kResultsIn) + u' ' + project->Name());
       return;
     }
   }
@@ -94,7 +83,7 @@ bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::
   const auto component = module->Parent();
   const QString projectName = project->Name();
   const QString moduleName = component->Name();
-  m_report.status(text(kSearching) + u' ' + moduleName);
+  m_report.status(common::LoadResString(kSearching) + u' ' + moduleName);
   int line = 1;
   int column = 1;
   for (;;) {
@@ -119,7 +108,7 @@ bool FindWalk::searchModule(const ide::Ref<ide::VBProject>& project, const ide::
     if (!stillOpen(project, component)) return true;
     ide::ProcKind kind = ide::ProcKind::Proc;
     QString procedure = module->ProcOfLine(startLine, kind);
-    if (procedure.isEmpty()) procedure = declarationsText();
+    if (procedure.isEmpty()) procedure = walk::declarationsText();
     const QString lineText = module->Lines(startLine, 1);
     m_report.found(FoundRow{projectName, moduleName, std::move(procedure),
                             syntax::trimmedView(lineText).toString(),

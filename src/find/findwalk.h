@@ -6,7 +6,7 @@
 #pragma once
 
 #include "find/itemfound.h"
-#include "transform/walk.h"
+#include "walk/walk.h"
 
 #include <QString>
 
@@ -44,16 +44,13 @@ class FindReport {
   virtual void found(FoundRow row) = 0;
 };
 
-/// The procedure column of a line outside any procedure.
-QString declarationsText();
-
 class FindWalk {
  public:
   /// The lines one Find call covers at most: a module without occurrences is still searched in stretches
   /// short enough for the IDE to stay responsive between them.
   static constexpr int kStretchLines = 4096;
 
-  FindWalk(transform::WalkContext& context, ide::VBE& vbe, FindReport& report)
+  FindWalk(walk::WalkContext& context, ide::VBE& vbe, FindReport& report)
       : m_context(context), m_vbe(vbe), m_report(report) {}
 
   /// Searches the scope. A failure (no active project, a pattern Find refuses, a module that fails
@@ -71,7 +68,7 @@ class FindWalk {
   bool searchModule(const ide::Ref<ide::VBProject>& project, const ide::Ref<ide::CodeModule>& module,
                     const FindOptions& options);
 
-  transform::WalkContext& m_context;
+  walk::WalkContext& m_context;
   ide::VBE& m_vbe;
   FindReport& m_report;
   int m_rows = 0;

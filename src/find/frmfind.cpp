@@ -4,6 +4,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "find/navigate.h"
+#include "find/texts.h"
 
 #include <QApplication>
 #include <QCheckBox>
@@ -23,26 +24,13 @@
 #include <QVBoxLayout>
 
 namespace find {
-namespace {
-
-constexpr int kSearching = 5131;
-constexpr int kCompleted = 5133;
-constexpr int kLinesFound = 5134;
-constexpr int kResults = 5015;
-constexpr int kSearchFailed = 5110;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
-
-}  // namespace
 
 struct frmFind::Run {
   explicit Run(ide::EventLoop& loop) : context(QStringLiteral("frmFind"), &loop, nullptr) {
     // The IDE's loop decides how often it runs: every yield is offered to it.
     context.setYieldInterval({});
   }
-  transform::WalkContext context;
+  walk::WalkContext context;
   /// The window was destroyed: the search must not touch it again.
   bool windowGone = false;
   /// "&Fechar" was pressed during the search: the window was emptied and hidden.
@@ -60,20 +48,20 @@ frmFind::frmFind(ide::Ref<ide::VBE> vbe, QWidget* parent)
     : QWidget(parent, Qt::Window),
       m_vbe(std::move(vbe)),
       m_txtSearch(new QLineEdit(this)),
-      m_ckWholeWd(new QCheckBox(text(5009), this)),
-      m_ckMatchCase(new QCheckBox(text(5010), this)),
-      m_ckPattern(new QCheckBox(text(5011), this)),
-      m_cmdCancel(new QPushButton(text(5012), this)),
-      m_cmdFind(new QPushButton(text(5013), this)),
-      m_cmdClose(new QPushButton(text(5014), this)),
-      m_lblResults(new QLabel(text(kResults), this)),
+      m_ckWholeWd(new QCheckBox(common::LoadResString(kWholeWords), this)),
+      m_ckMatchCase(new QCheckBox(common::LoadResString(kMatchCase), this)),
+      m_ckPattern(new QCheckBox(common::LoadResString(kUsePattern), this)),
+      m_cmdCancel(new QPushButton(common::LoadResString(kStopSearch), this)),
+      m_cmdFind(new QPushButton(common::LoadResString(kFindButton), this)),
+      m_cmdClose(new QPushButton(common::LoadResString(kFindClose), this)),
+      m_lblResults(new QLabel(common::LoadResString(kResults), this)),
       m_lvList(new QTreeView(this)),
       m_sbStatus(new QStatusBar(this)),
       m_statusPanel(new QLabel(m_sbStatus)),
       m_results(new FindResults(this)),
       m_run(std::make_shared<Run>(m_vbe->Platform().loop())) {
   setObjectName(QStringLiteral("frmFind"));
-  setWindowTitle(common::title() + QStringLiteral(" - ") + text(5003));
+  setWindowTitle(common::title() + QStringLiteral(" - ") + common::LoadResString(kFindCaption));
   m_txtSearch->setObjectName(QStringLiteral("txtSearch"));
   m_ckWholeWd->setObjectName(QStringLiteral("ckWholeWd"));
   m_ckMatchCase->setObjectName(QStringLiteral("ckMatchCase"));
@@ -85,15 +73,15 @@ frmFind::frmFind(ide::Ref<ide::VBE> vbe, QWidget* parent)
   m_lvList->setObjectName(QStringLiteral("lvList"));
   m_sbStatus->setObjectName(QStringLiteral("sbStatus"));
 
-  auto* where = new QGroupBox(text(5004), this);
+  auto* where = new QGroupBox(common::LoadResString(kFindWhereFrame), this);
   auto* options = new QVBoxLayout(where);
   for (int i = 0; i < 3; ++i) {
-    m_opSearch[size_t(i)] = new QRadioButton(text(5006 + i), where);
+    m_opSearch[size_t(i)] = new QRadioButton(common::LoadResString(kFindScopeFirst + i), where);
     m_opSearch[size_t(i)]->setObjectName(QStringLiteral("OpSearch%1").arg(i + 1));
     options->addWidget(m_opSearch[size_t(i)]);
   }
   m_opSearch[0]->setChecked(true);
-  auto* searchLabel = new QLabel(text(5005), this);
+  auto* searchLabel = new QLabel(common::LoadResString(kFindTextLabel), this);
   searchLabel->setBuddy(m_txtSearch);
 
   auto* left = new QVBoxLayout;
@@ -194,7 +182,7 @@ void frmFind::cmdFind_Click() {
   m_results->clear();
   m_cmdCancel->setEnabled(true);
   m_cmdFind->setEnabled(false);
-  status(text(kSearching));
+  status(common::LoadResString(kSearching));
   vbe->Platform().loop().DoEvents();
   if (run->windowGone) return;
   run->context.reset();
@@ -208,15 +196,16 @@ void frmFind::cmdFind_Click() {
         common::recordError(failure, QStringLiteral("frmFind"), QStringLiteral("cmdFind_Click"), 0);
     common::logLastError();
     // The fixed message, and below it what failed (an invalid pattern ...), so that the user can act on it.
-    vbe->Platform().ui().MsgBox(
-        text(kSearchFailed) + u'\n' + QString::number(error.number()) + u' ' + error.description(),
-        ide::mb::Exclamation, common::title());
+    vbe->Platform().ui().MsgBox(common::LoadResString(kSearchFailed) + u'\n' +
+                                    QString::number(error.number()) + u' ' + error.description(),
+                                ide::mb::Exclamation, common::title());
   }
   if (run->windowGone) return;
   m_cmdCancel->setEnabled(false);
   m_cmdFind->setEnabled(true);
   if (!run->closed)
-    status(text(kCompleted) + u' ' + QString::number(m_results->rowCount()) + u' ' + text(kLinesFound));
+    status(common::LoadResString(kCompleted) + u' ' + QString::number(m_results->rowCount()) + u' ' +
+           common::LoadResString(kLinesFound));
   m_searching = false;
 }
 
@@ -232,7 +221,7 @@ void frmFind::cmdClose_Click() {
   if (!self) return;
   m_txtSearch->clear();
   m_results->clear();
-  m_lblResults->setText(text(kResults));
+  m_lblResults->setText(common::LoadResString(kResults));
   status(QString());
   m_cmdFind->setEnabled(true);
   m_cmdCancel->setEnabled(false);

@@ -1,16 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "find/navigate.h"
 
+#include "common/errors.h"
 #include "common/strings.h"
+#include "find/texts.h"
 
 namespace find {
 namespace {
-
-// "O item seleciondado pertence a um projeto não localizado."; "Não foi possível abrir a janela de código
-// de" ... "no projeto ativo."
-constexpr int kProjectGone = 5111;
-constexpr int kNoCodeWindow = 5112;
-constexpr int kInActiveProject = 5113;
 
 bool isOpen(ide::VBE& vbe, const ide::Ref<ide::VBProject>& project) {
   if (!project) return false;
@@ -36,13 +32,17 @@ void ShowItemFound(ide::VBE& vbe, const CItemFound& item, const std::function<vo
   try {
     if (item.Component)
       if (auto module = item.Component->CodeModule()) pane = module->CodePane();
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    common::logFailure(failure, QStringLiteral("navigate"), QStringLiteral("ShowItemFound"),
+                       __LINE__);  // told below
   }
   if (!pane) {
     QString name;
     try {
       if (item.Component) name = item.Component->Name();
-    } catch (const std::exception&) {
+    } catch (const std::exception& failure) {
+      common::logFailure(failure, QStringLiteral("navigate"), QStringLiteral("ShowItemFound"),
+                         __LINE__);  // told without it
     }
     ui.MsgBox(common::LoadResString(kNoCodeWindow) + QStringLiteral(" \"") + name + QStringLiteral("\" ") +
                   common::LoadResString(kInActiveProject),

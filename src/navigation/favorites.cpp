@@ -3,13 +3,11 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "navigation/texts.h"
 #include "projinfo/records.h"
 
 namespace navigation {
 namespace {
-
-constexpr int kAddFailed = 5084;
-constexpr int kRecordFailed = 5116;
 
 QString declarations() {
   return QString::fromLatin1(kGeneralDeclarations);
@@ -49,7 +47,7 @@ void CFavorites::InitializeFromFile() {
   Project = owner->Project();
   bool failed = false;
   try {
-    const projinfo::StorageElements elements = owner->m_Favorites->Elements();
+    const projinfo::StorageElements elements = owner->favoritesStorage()->Elements();
     for (int i = 1; i <= elements.Count(); ++i) {
       try {
         auto item = std::make_shared<CFavoritesItem>();

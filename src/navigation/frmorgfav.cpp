@@ -3,6 +3,7 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "navigation/texts.h"
 
 #include <QHeaderView>
 #include <QKeyEvent>
@@ -14,12 +15,6 @@ namespace {
 
 constexpr int kKeyRole = Qt::UserRole;
 constexpr int kTagRole = Qt::UserRole + 1;
-constexpr int kCannotShow = 5114;
-constexpr int kMayBeGone = 5115;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
 
 ide::UserInterface& uiOf(const CFavorites& favorites) {
   return favorites.owner->services().vbe->Platform().ui();
@@ -33,9 +28,11 @@ frmOrgFav::frmOrgFav(CFavorites& favorites, QWidget* parent)
   m_lvFavorites->setObjectName(QStringLiteral("lvFavorites"));
   auto active = favorites.owner->services().vbe->ActiveVBProject();
   const QString project = active ? active->Name() : QString();
-  setWindowTitle(common::title() + QStringLiteral(": ") + project + QStringLiteral(" - ") + text(5061));
+  setWindowTitle(common::title() + QStringLiteral(": ") + project + QStringLiteral(" - ") +
+                 common::LoadResString(kFavoritesCaption));
   m_lvFavorites->setColumnCount(3);
-  m_lvFavorites->setHeaderLabels({text(5062), text(5063), text(5162)});
+  m_lvFavorites->setHeaderLabels({common::LoadResString(kProcedureColumn), common::LoadResString(kLineColumn),
+                                  common::LoadResString(kModuleColumn)});
   m_lvFavorites->setRootIsDecorated(false);
   m_lvFavorites->setSelectionMode(QAbstractItemView::ExtendedSelection);
   m_lvFavorites->viewport()->installEventFilter(this);
@@ -85,8 +82,9 @@ void frmOrgFav::openRow(QTreeWidgetItem* row) {
   } catch (const std::exception& failure) {
     common::recordErrorNumber(failure);
     uiOf(*m_favorites)
-        .MsgBox(text(kCannotShow) + QStringLiteral(" \n") + text(kMayBeGone), ide::mb::Information,
-                common::title());
+        .MsgBox(
+            common::LoadResString(kCannotShow) + QStringLiteral(" \n") + common::LoadResString(kMayBeGone),
+            ide::mb::Information, common::title());
     if (!hidden) return;
   }
   accept();

@@ -6,6 +6,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "newproc/procwriter.h"
+#include "newproc/texts.h"
 
 #include <QCheckBox>
 #include <QComboBox>
@@ -28,8 +29,6 @@
 namespace newproc {
 
 namespace {
-
-constexpr int kCreationFailed = 5100;
 const QColor kReminderColor(255, 0, 0);
 
 // The data types the list offers.
@@ -38,10 +37,6 @@ constexpr const char* kDataTypes[] = {"Boolean", "Byte",   "Currency", "Date",  
 // Typed or chosen, these types are never objects.
 constexpr QStringView kPlainTypes[] = {u"integer", u"long", u"single", u"double", u"currency",
                                        u"string",  u"date", u"byte",   u"boolean"};
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
 
 // A template box's text with CR LF between its lines, whatever breaks the stored text had.
 QString templateText(const QPlainTextEdit* box) {
@@ -77,7 +72,7 @@ void showNewProcedureDialog(const NewProcServices& services, QWidget* parent) {
     common::recordError(ide::Error(ide::err::CannotEdit, ide::standardDescription(ide::err::CannotEdit)),
                         QStringLiteral("frmNewProc"), QStringLiteral("Form_Load"), __LINE__);
     common::logLastError();
-    ui.MsgBox(text(kCreationFailed), ide::mb::Exclamation, common::title());
+    ui.MsgBox(common::LoadResString(kCreationFailed), ide::mb::Exclamation, common::title());
     return;
   }
   if (!services.appInfo) {
@@ -219,22 +214,22 @@ void frmNewProc::buildControls() {
 }
 
 void frmNewProc::loadTexts() {
-  setWindowTitle(common::title() + QStringLiteral(" - ") + text(5136));
+  setWindowTitle(common::title() + QStringLiteral(" - ") + common::LoadResString(kNewProcCaption));
   for (int i = 0; i < 3; ++i)
-    m_tabNewProc->setTabText(i, text(5041 + i));
-  m_lblName->setText(text(5044));
-  m_frProcType->setTitle(text(5045));
-  m_frScope->setTitle(text(5046));
-  m_frPropProcs->setTitle(text(5047));
-  m_lblMemberVar->setText(text(5048));
-  m_lblType->setText(text(5049));
-  m_ckIsObject->setText(text(5050));
-  m_ckErrHandler->setText(text(5051));
-  m_ckDocHeader->setText(text(5052));
-  m_cmdCancel->setText(text(5053));
-  m_cmdHelp->setText(text(5054));
-  m_lblEnterEH->setText(text(5055));
-  m_lblEnterDocH->setText(text(5056));
+    m_tabNewProc->setTabText(i, common::LoadResString(kNewProcTabFirst + i));
+  m_lblName->setText(common::LoadResString(kNameLabel));
+  m_frProcType->setTitle(common::LoadResString(kProcTypeFrame));
+  m_frScope->setTitle(common::LoadResString(kScopeFrame));
+  m_frPropProcs->setTitle(common::LoadResString(kPropertyProcsFrame));
+  m_lblMemberVar->setText(common::LoadResString(kMemberVariableLabel));
+  m_lblType->setText(common::LoadResString(kDataTypeLabel));
+  m_ckIsObject->setText(common::LoadResString(kIsObject));
+  m_ckErrHandler->setText(common::LoadResString(kErrorHandler));
+  m_ckDocHeader->setText(common::LoadResString(kDocHeader));
+  m_cmdCancel->setText(common::LoadResString(kNewProcCancel));
+  m_cmdHelp->setText(common::LoadResString(kNewProcHelp));
+  m_lblEnterEH->setText(common::LoadResString(kEnterErrorHandler));
+  m_lblEnterDocH->setText(common::LoadResString(kEnterDocHeader));
 }
 
 void frmNewProc::Form_Load() {
@@ -256,7 +251,9 @@ void frmNewProc::Form_Load() {
     // the active code pane's, not the component selected in the Project window.
     const auto target = pane->CodeModule()->Parent();
     m_opScope[2]->setEnabled(!target || target->Type() != ide::ComponentType::StdModule);
-  } catch (const ide::Error&) {
+  } catch (const ide::Error& failure) {
+    // Friend stays offered; writing the procedure reports a module that went.
+    common::logFailure(failure, QStringLiteral("frmNewProc"), QStringLiteral("Form_Load"), __LINE__);
   }
   m_cboDataType->setEditText(QStringLiteral("String"));
   enable({m_frPropProcs, m_ckPropGet, m_ckPropLet, m_ckIsObject}, false);
@@ -330,11 +327,11 @@ void frmNewProc::opType_Click(int index) {
       m_ckIsObject->setEnabled(false);
       break;
     case ProcType::Function:
-      m_lblType->setText(text(5137));
+      m_lblType->setText(common::LoadResString(kReturnTypeLabel));
       functionTypeRule();
       break;
     case ProcType::Property:
-      m_lblType->setText(text(5049));
+      m_lblType->setText(common::LoadResString(kDataTypeLabel));
       if (m_txtVariable->text().trimmed().isEmpty())
         m_txtVariable->setText(QStringLiteral("m_") + m_txtName->text().trimmed());
       propertyTypeRule();
@@ -536,10 +533,10 @@ void frmNewProc::cmdOk_Click() {
   } catch (const std::exception& failure) {
     common::recordError(failure, QStringLiteral("frmNewProc"), QStringLiteral("cmdOk_Click"), __LINE__);
     common::logLastError();
-    ui.MsgBox(text(kCreationFailed), ide::mb::Exclamation, common::title());
+    ui.MsgBox(common::LoadResString(kCreationFailed), ide::mb::Exclamation, common::title());
     return;
   }
-  const QString another = text(5098) + u'\n' + text(5099);
+  const QString another = common::LoadResString(kCreated) + u'\n' + common::LoadResString(kCreateAnother);
   if (ui.MsgBox(another, ide::mb::YesNo | ide::mb::Question, common::title()) == ide::mb::Yes)
     readyForNext();
   else

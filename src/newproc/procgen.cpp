@@ -3,6 +3,7 @@
 
 #include "common/strings.h"
 #include "ide/platform.h"
+#include "newproc/texts.h"
 
 #include <QStringList>
 
@@ -67,13 +68,9 @@ bool hasIdentifierShape(QStringView name) {
                      [](QChar c) { return isCodePageLetter(c) || (c >= u'0' && c <= u'9') || c == u'_'; });
 }
 
-QString text(int id) {
-  return common::LoadResString(id);
-}
-
 // A double quote, the caption of the option, a double quote, a blank and the rest of the message.
 QString quotedOption(int optionId, int restId) {
-  return u'"' + text(optionId) + QStringLiteral("\" ") + text(restId);
+  return u'"' + common::LoadResString(optionId) + QStringLiteral("\" ") + common::LoadResString(restId);
 }
 
 bool isObjectType(const NewProcChoices& choices) {
@@ -211,23 +208,24 @@ std::optional<Refusal> Validate(const NewProcChoices& choices, const QString& er
   const QString name = choices.name.trimmed();
   // A Function keeps its result in the local "ret", which its own name would clash with.
   if (!IsVbIdentifier(name) || (choices.type == ProcType::Function && sameWord(name, u"ret")))
-    return Refusal{text(5105), ide::mb::Exclamation, Field::Name};
+    return Refusal{common::LoadResString(kInvalidName), ide::mb::Exclamation, Field::Name};
 
   // The type is checked where it is written: a Function without one returns a Variant; a Sub has none.
   const QString type = choices.dataType.trimmed();
   const bool typeNeeded = choices.type == ProcType::Property;
   if (choices.type != ProcType::Sub && (typeNeeded || !type.isEmpty()) && !IsVbTypeName(type))
-    return Refusal{text(5106), ide::mb::Exclamation, Field::DataType};
+    return Refusal{common::LoadResString(kInvalidDataType), ide::mb::Exclamation, Field::DataType};
 
   if (choices.type != ProcType::Property) return std::nullopt;
   // The member variable may be neither the property itself nor the parameter its Let and Set assign.
   const QString member = choices.memberVariable.trimmed();
   if (!IsVbIdentifier(member) || sameWord(member, name) || sameWord(member, u"NewValue"))
-    return Refusal{text(5107), ide::mb::Exclamation, Field::MemberVariable};
+    return Refusal{common::LoadResString(kInvalidMemberVariable), ide::mb::Exclamation,
+                   Field::MemberVariable};
   if (!choices.get && !choices.let && !choices.set)
-    return Refusal{text(5108), ide::mb::Information, Field::PropertyProcs};
+    return Refusal{common::LoadResString(kNoPropertyProcs), ide::mb::Information, Field::PropertyProcs};
   if (choices.isObject && sameWord(type, u"variant") && choices.let != choices.set)
-    return Refusal{text(5109), ide::mb::Information, Field::PropertyProcs};
+    return Refusal{common::LoadResString(kVariantNeedsLetAndSet), ide::mb::Information, Field::PropertyProcs};
   return std::nullopt;
 }
 

@@ -4,6 +4,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "common/uiutils.h"
+#include "newproc/texts.h"
 #include "textins/textinsertion.h"
 
 #include <QStringList>
@@ -13,9 +14,6 @@
 
 namespace newproc {
 namespace {
-
-constexpr int kNameInUse = 5117;
-constexpr int kMemberVariableInUse = 5118;
 
 bool sameName(const QString& a, const QString& b) {
   return a.compare(b, Qt::CaseInsensitive) == 0;
@@ -72,7 +70,8 @@ QStringList controlNames(ide::CodeModule& module) {
     if (const auto designer = module.Parent()->Designer())
       for (const auto& control : designer->VBControls()->items())
         names << control->name();
-  } catch (const ide::Error&) {
+  } catch (const ide::Error& failure) {
+    common::logFailure(failure, QStringLiteral("ProcWriter"), QStringLiteral("controlNames"), __LINE__);
   }
   return names;
 }

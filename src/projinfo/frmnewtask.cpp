@@ -4,6 +4,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "projinfo/frmtasks.h"
+#include "projinfo/texts.h"
 
 #include <QCloseEvent>
 #include <QGridLayout>
@@ -16,16 +17,6 @@
 #include <QVBoxLayout>
 
 namespace projinfo {
-namespace {
-
-constexpr int kEmptyName = 5088;
-constexpr int kSaveChanges = 5087;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
-
-}  // namespace
 
 frmNewTask::frmNewTask(CTaskList& list, frmTasks* tasks, Mode mode, std::shared_ptr<CTaskItem> task,
                        QWidget* parent)
@@ -36,10 +27,10 @@ frmNewTask::frmNewTask(CTaskList& list, frmTasks* tasks, Mode mode, std::shared_
       m_task(std::move(task)),
       m_txtName(new QLineEdit(this)),
       m_txtDescription(new QPlainTextEdit(this)),
-      m_lblTaskName(new QLabel(text(5057), this)),
-      m_lblDescription(new QLabel(text(5058), this)),
+      m_lblTaskName(new QLabel(common::LoadResString(kTaskNameLabel), this)),
+      m_lblDescription(new QLabel(common::LoadResString(kTaskDescriptionLabel), this)),
       m_cmdOK(new QPushButton(QStringLiteral("OK"), this)),
-      m_cmdCancel(new QPushButton(text(5059), this)) {
+      m_cmdCancel(new QPushButton(common::LoadResString(kTaskCancel), this)) {
   setObjectName(QStringLiteral("frmNewTask"));
   m_txtName->setObjectName(QStringLiteral("txtName"));
   m_txtDescription->setObjectName(QStringLiteral("txtDescription"));
@@ -81,7 +72,8 @@ ide::UserInterface& frmNewTask::ui() const {
 void frmNewTask::Initialize() {
   const QString project = m_list->Project ? m_list->Project->Name() : QString();
   const int caption = m_mode == NewTask ? 5060 : 5154;
-  setWindowTitle(common::title() + QStringLiteral(": ") + project + QStringLiteral(" - ") + text(caption));
+  setWindowTitle(common::title() + QStringLiteral(": ") + project + QStringLiteral(" - ") +
+                 common::LoadResString(caption));
   if (m_mode == EditTask && m_task) {
     m_txtName->setText(m_task->Name);
     m_txtDescription->setPlainText(m_task->Text);
@@ -99,7 +91,7 @@ bool frmNewTask::eventFilter(QObject* watched, QEvent* event) {
 
 bool frmNewTask::validate() {
   if (!m_txtName->text().trimmed().isEmpty()) return true;
-  ui().MsgBox(text(kEmptyName), ide::mb::Exclamation, common::title());
+  ui().MsgBox(common::LoadResString(kEmptyName), ide::mb::Exclamation, common::title());
   m_txtName->setFocus();
   return false;
 }
@@ -145,7 +137,8 @@ void frmNewTask::reject() {
 
 void frmNewTask::closeEvent(QCloseEvent* event) {
   if (!m_closing && m_changed && !m_cancelled) {
-    const int answer = ui().MsgBox(text(kSaveChanges), ide::mb::YesNo | ide::mb::Question, common::title());
+    const int answer =
+        ui().MsgBox(common::LoadResString(kSaveChanges), ide::mb::YesNo | ide::mb::Question, common::title());
     if (answer == ide::mb::Yes && !(validate() && save())) {
       event->ignore();
       return;

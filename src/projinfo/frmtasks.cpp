@@ -4,6 +4,7 @@
 #include "common/errors.h"
 #include "common/strings.h"
 #include "projinfo/frmnewtask.h"
+#include "projinfo/texts.h"
 
 #include <QHBoxLayout>
 #include <QHeaderView>
@@ -17,11 +18,6 @@ namespace {
 
 constexpr int kKeyRole = Qt::UserRole;
 constexpr int kTagRole = Qt::UserRole + 1;
-constexpr int kRemoveFailed = 5089;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
 
 }  // namespace
 
@@ -29,13 +25,14 @@ frmTasks::frmTasks(CTaskList& list, QWidget* parent)
     : QDialog(parent),
       m_list(&list),
       m_lvTasks(new QTreeWidget(this)),
-      m_cmdAdd(new QPushButton(text(5080), this)),
-      m_cmdRemove(new QPushButton(text(5081), this)),
-      m_cmdEdit(new QPushButton(text(5082), this)),
-      m_cmdClose(new QPushButton(text(5083), this)) {
+      m_cmdAdd(new QPushButton(common::LoadResString(kAddTask), this)),
+      m_cmdRemove(new QPushButton(common::LoadResString(kRemoveTask), this)),
+      m_cmdEdit(new QPushButton(common::LoadResString(kEditTask), this)),
+      m_cmdClose(new QPushButton(common::LoadResString(kCloseTasks), this)) {
   setObjectName(QStringLiteral("frmTasks"));
   const QString project = list.Project ? list.Project->Name() : QString();
-  setWindowTitle(common::title() + QStringLiteral(": ") + project + QStringLiteral(" - ") + text(5151));
+  setWindowTitle(common::title() + QStringLiteral(": ") + project + QStringLiteral(" - ") +
+                 common::LoadResString(kTasksCaption));
   m_lvTasks->setObjectName(QStringLiteral("lvTasks"));
   m_cmdAdd->setObjectName(QStringLiteral("cmdAdd"));
   m_cmdRemove->setObjectName(QStringLiteral("cmdRemove"));
@@ -43,7 +40,7 @@ frmTasks::frmTasks(CTaskList& list, QWidget* parent)
   m_cmdClose->setObjectName(QStringLiteral("cmdClose"));
 
   m_lvTasks->setColumnCount(1);
-  m_lvTasks->setHeaderLabels({text(5079)});
+  m_lvTasks->setHeaderLabels({common::LoadResString(kTasksHeader)});
   m_lvTasks->header()->setStretchLastSection(true);
   m_lvTasks->setRootIsDecorated(false);
   m_lvTasks->setSelectionMode(QAbstractItemView::ExtendedSelection);
@@ -151,7 +148,7 @@ void frmTasks::cmdRemove_Click() {
       m_list->DeleteTask(row->data(0, kTagRole).toInt());
     } catch (const std::exception& failure) {
       common::recordErrorNumber(failure);
-      ui().MsgBox(text(kRemoveFailed), ide::mb::Information, common::title());
+      ui().MsgBox(common::LoadResString(kRemoveFailed), ide::mb::Information, common::title());
     }
     delete row;  // the next row moves up to this index
   }

@@ -139,7 +139,9 @@ bool CProjInfo::Initialize() {
       basProjInfo = module;
       try {
         if (auto pane = module->CodeModule()->CodePane()) pane->Window()->Close();
-      } catch (const std::exception&) {
+      } catch (const std::exception& failure) {
+        // The identity module stays; only its window is left open.
+        common::logFailure(failure, QString::fromLatin1(kModule), QStringLiteral("Initialize"), __LINE__);
       }
     }
     m_moduleName = basProjInfo->Name();

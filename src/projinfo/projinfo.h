@@ -107,18 +107,18 @@ class CProjInfo {
   CProjInfo(const CProjInfo&) = delete;
   CProjInfo& operator=(const CProjInfo&) = delete;
 
-  std::shared_ptr<Storage> m_FileInfo;
-  std::shared_ptr<Storage> m_Favorites;
-  std::shared_ptr<Storage> m_TaskList;
-  std::unique_ptr<CTaskList> m_oTaskList;
-  std::unique_ptr<InfoRecordList> m_oFavorites;
+  /// The info file, its favourites and task-list storages (null while the file is not open).
+  Storage* fileInfo() const { return m_FileInfo.get(); }
+  Storage* favoritesStorage() const { return m_Favorites.get(); }
+  Storage* taskListStorage() const { return m_TaskList.get(); }
   /// The directory of the info file.
-  QString FilePath;
+  const QString& filePath() const { return FilePath; }
   /// The project has a file name and the info file lies beside it.
-  bool Saved = false;
+  bool isSaved() const { return Saved; }
   /// The info file's name.
-  QString FileTitle;
-  ide::Ref<ide::VBComponent> basProjInfo;
+  const QString& fileTitle() const { return FileTitle; }
+  /// The module that ties the project to its file.
+  const ide::Ref<ide::VBComponent>& identityModule() const { return basProjInfo; }
 
   /// Finds the project's identifier module (inserting one, with a new identifier, into a project that has
   /// none) and opens the info file. True when the file is open. A file that cannot be opened is reported
@@ -165,6 +165,16 @@ class CProjInfo {
   const ProjInfoServices& services() const { return m_services; }
 
  private:
+  std::shared_ptr<Storage> m_FileInfo;
+  std::shared_ptr<Storage> m_Favorites;
+  std::shared_ptr<Storage> m_TaskList;
+  std::unique_ptr<CTaskList> m_oTaskList;
+  std::unique_ptr<InfoRecordList> m_oFavorites;
+  QString FilePath;
+  bool Saved = false;
+  QString FileTitle;
+  ide::Ref<ide::VBComponent> basProjInfo;
+
   qint32 NextTaskId();
   qint32 NextFavoriteId();
   qint32 nextId(const char* streamName, qint32& highest);

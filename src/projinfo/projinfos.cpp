@@ -57,7 +57,7 @@ void ProjInfos::projectFileMoved(const ide::Ref<ide::VBProject>& project, const 
 
 bool ProjInfos::isIdentityModule(const ide::Ref<ide::VBComponent>& component) const {
   for (const auto& info : m_items)
-    if (info->basProjInfo == component) return true;
+    if (info->identityModule() == component) return true;
   return false;
 }
 
@@ -68,7 +68,7 @@ void ProjInfos::componentAdded(const ide::Ref<ide::VBComponent>& component) {
 void ProjInfos::componentRemoved(const ide::Ref<ide::VBComponent>& component) {
   CProjInfo* info = owner(component);
   if (!info) return;
-  if (info->basProjInfo == component) return info->TieLost();
+  if (info->identityModule() == component) return info->TieLost();
   if (InfoRecordList* favorites = info->Favorites()) favorites->componentRemoved(component);
 }
 
@@ -76,7 +76,7 @@ void ProjInfos::componentRenamed(const ide::Ref<ide::VBComponent>& component) {
   CProjInfo* info = owner(component);
   if (!info) return;
   if (info->Retie(component)) return;
-  if (info->basProjInfo == component) {
+  if (info->identityModule() == component) {
     if (info->tieLost()) return;
     if (IdentityOf(component))
       info->moduleRenamed();

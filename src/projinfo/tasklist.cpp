@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "projinfo/tasklist.h"
 
+#include "common/errors.h"
 #include "projinfo/records.h"
 
 namespace projinfo {
@@ -19,15 +20,17 @@ void CTaskItem::setSerialization(const QString& text) {
 
 void CTaskList::InitializeFromFile() {
   Project = m_projInfo->Project();
-  if (!m_projInfo->m_TaskList) return;
-  for (const VBSTATSTG& element : m_projInfo->m_TaskList->Elements()) {
+  if (!m_projInfo->taskListStorage()) return;
+  for (const VBSTATSTG& element : m_projInfo->taskListStorage()->Elements()) {
     // A record that cannot be read is left out, and left in the file as it is.
     try {
       auto task = std::make_shared<CTaskItem>();
       task->owner = this;
       task->setSerialization(m_projInfo->GetTaskListItem(element.Name()));
       Tasks.Add(QLatin1StringView(kTaskPrefix) + QString::number(task->ItemId), task);
-    } catch (const std::exception&) {
+    } catch (const std::exception& failure) {
+      common::logFailure(failure, QStringLiteral("CTaskList"), QStringLiteral("InitializeFromFile"),
+                         __LINE__);
     }
   }
 }

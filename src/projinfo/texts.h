@@ -39,4 +39,20 @@ inline constexpr char16_t kNoAccess[] = u"sem permissão de acesso ao arquivo ou
 inline constexpr char16_t kExists[] = u"já existe um arquivo com esse nome lá";
 inline constexpr char16_t kOtherFailure[] = u"%1";
 
+// The numbers in the string table of the task list's texts, named.
+// frmTasks
+inline constexpr int kTasksCaption = 5151;
+inline constexpr int kTasksHeader = 5079;
+inline constexpr int kAddTask = 5080;
+inline constexpr int kRemoveTask = 5081;
+inline constexpr int kEditTask = 5082;
+inline constexpr int kCloseTasks = 5083;
+inline constexpr int kRemoveFailed = 5089;
+// frmNewTask
+inline constexpr int kTaskNameLabel = 5057;
+inline constexpr int kTaskDescriptionLabel = 5058;
+inline constexpr int kTaskCancel = 5059;
+inline constexpr int kEmptyName = 5088;
+inline constexpr int kSaveChanges = 5087;
+
 }  // namespace projinfo

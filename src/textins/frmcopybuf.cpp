@@ -3,14 +3,9 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "textins/texts.h"
 
 namespace textins {
-namespace {
-
-constexpr int kUndeterminedError = 5091;
-constexpr int kLoadFailed = 5163;
-
-}  // namespace
 
 frmCopyBuf::frmCopyBuf(CCopyBuffers& owner, ide::UserInterface& ui, HelpOpener help, QWidget* parent)
     : TextsWindow(ui, std::move(help),
@@ -35,7 +30,7 @@ void frmCopyBuf::reportFailure() {
 }
 
 void showCopyBuffersWindow(CCopyBuffers& buffers, ide::UserInterface& ui, const HelpOpener& help) {
-  execTextsWindow(ui, kLoadFailed, [&](QWidget* parent) {
+  execTextsWindow(ui, kCopyBuffersLoadFailed, [&](QWidget* parent) {
     auto window = std::make_unique<frmCopyBuf>(buffers, ui, help, parent);
     window->InitWindow();
     return window;

@@ -3,6 +3,7 @@
 
 #include "common/errors.h"
 #include "common/strings.h"
+#include "textins/texts.h"
 
 #include <QMenu>
 #include <QPlainTextEdit>
@@ -11,8 +12,6 @@
 
 namespace textins {
 namespace {
-
-constexpr int kLoadFailed = 5152;
 constexpr int kReservedWordsHelp = 16;
 
 struct ReservedWord {
@@ -53,7 +52,7 @@ frmMacros::frmMacros(CMacros& owner, ide::UserInterface& ui, HelpOpener help, QW
   setObjectName(QStringLiteral("frmMacros"));
   QToolBar* tb2 = addToolBarBeside("tb2");
   m_resWords->setObjectName(QStringLiteral("ResWords"));
-  m_resWords->setText(common::LoadResString(5038));
+  m_resWords->setText(common::LoadResString(kReservedWordsButton));
   m_resWords->setPopupMode(QToolButton::InstantPopup);
   m_resWords->setToolButtonStyle(Qt::ToolButtonTextOnly);
   // A click must leave the focus (and so the caret) in the text box.
@@ -94,7 +93,7 @@ void frmMacros::textBoxFocusChanged(bool focused) {
 }
 
 void showMacrosWindow(CMacros& macros, ide::UserInterface& ui, const HelpOpener& help) {
-  execTextsWindow(ui, kLoadFailed, [&](QWidget* parent) {
+  execTextsWindow(ui, kMacrosLoadFailed, [&](QWidget* parent) {
     auto window = std::make_unique<frmMacros>(macros, ui, help, parent);
     window->InitWindow();
     return window;

@@ -5,6 +5,7 @@
 #include "common/strings.h"
 #include "host/files/ansi.h"
 #include "syntax/declarations.h"
+#include "textins/texts.h"
 
 #include <QLoggingCategory>
 
@@ -18,7 +19,6 @@ namespace {
 // IDE failures that insertion does without; QT_LOGGING_RULES="quimbel.textins.debug=true" shows them.
 Q_LOGGING_CATEGORY(lcInsertion, "quimbel.textins", QtInfoMsg)
 
-constexpr int kInsertionFailedText = 5096;
 /// %1 the character (empty when it has no picture of its own), %2 its code.
 constexpr char16_t kNotAnsi[] =
     u"O caractere \u201C%1\u201D (U+%2) não existe na página de código do Windows (1252) em que o VB grava "
@@ -345,7 +345,7 @@ void TextInsertion::InsertText(const QString& Text) {
     // Code the IDE could not save is not put in: a text stored elsewhere, or a name it expanded to.
     if (const std::optional<char32_t> character = firstNonAnsi(text)) {
       m_vbe.Platform().ui().MsgBox(
-          common::LoadResString(kInsertionFailedText) + QStringLiteral("\n\n") + nonAnsiMessage(*character),
+          common::LoadResString(kInsertionFailed) + QStringLiteral("\n\n") + nonAnsiMessage(*character),
           ide::mb::Exclamation, common::title());
       return;
     }
@@ -374,7 +374,7 @@ void TextInsertion::InsertText(const QString& Text) {
   } catch (const std::exception& failure) {
     common::recordError(failure, QStringLiteral("basTextInsertion"), QStringLiteral("InsertText"), __LINE__);
     common::logLastError();
-    m_vbe.Platform().ui().MsgBox(common::LoadResString(kInsertionFailedText), ide::mb::Exclamation,
+    m_vbe.Platform().ui().MsgBox(common::LoadResString(kInsertionFailed), ide::mb::Exclamation,
                                  common::title());
   }
 }

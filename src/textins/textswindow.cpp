@@ -5,6 +5,7 @@
 #include "common/strings.h"
 #include "textins/hotkey.h"
 #include "textins/textinsertion.h"
+#include "textins/texts.h"
 
 #include <QAction>
 #include <QClipboard>
@@ -24,8 +25,6 @@
 
 namespace textins {
 namespace {
-
-constexpr int kHelpNotFound = 5158;
 
 struct ButtonSpec {
   const char* key;

@@ -4,15 +4,18 @@
 #pragma once
 
 #include "ide/platform.h"
-#include "transform/progmode.h"
-#include "transform/progress.h"
-#include "transform/walk.h"
+#include "walk/progmode.h"
+#include "walk/progress.h"
+#include "walk/walk.h"
 
 #include <QLineEdit>
 
 class QProgressBar;
 
 namespace transform {
+
+// The transforms are walks: the walk framework's names read as their own.
+using namespace walk;
 
 /// An edit box that takes digits only: letters can be neither typed nor pasted (Ctrl+V, Shift+Insert,
 /// a context menu or a drop). Getting the focus selects the whole text, so a new value replaces the old.

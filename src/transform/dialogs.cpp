@@ -5,6 +5,7 @@
 #include "common/strings.h"
 #include "transform/frmindenter.h"
 #include "transform/frmlinnumbers.h"
+#include "transform/texts.h"
 
 #include <optional>
 
@@ -32,7 +33,8 @@ void showIndentationDialog(const ide::Ref<ide::VBE>& vbe, common::SettingsStore&
     dialog.emplace(vbe, settings, options, ownerOf(*vbe, parent));
   } catch (const std::exception& failure) {
     common::logFailure(failure, QStringLiteral("frmIndenter"), QStringLiteral("Form_Load"), __LINE__);
-    vbe->Platform().ui().MsgBox(common::LoadResString(5127), ide::mb::Exclamation, common::title());
+    vbe->Platform().ui().MsgBox(common::LoadResString(kIndenterLoadFailed), ide::mb::Exclamation,
+                                common::title());
     return;
   }
   dialog->exec();

@@ -6,6 +6,7 @@
 #include "common/strings.h"
 #include "transform/indentwalk.h"
 #include "transform/options.h"
+#include "transform/texts.h"
 
 #include <QGroupBox>
 #include <QHBoxLayout>
@@ -18,18 +19,9 @@ namespace transform {
 
 namespace {
 
-// Message numbers of the dialog.
-constexpr int kInvalidSpaces = 5124;
-constexpr int kNoSpaces = 5125;
-constexpr int kRunFailed = 5126;
-
 // The numbering that number-and-indent applies when the indenter hands it the run.
 constexpr qint32 kOneCommandStart = 10000;
 constexpr qint32 kOneCommandInterval = 5;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
 
 }  // namespace
 
@@ -47,7 +39,7 @@ frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings
       m_frUse(new QGroupBox(this)),
       m_bar(*m_progBar),
       m_context(QStringLiteral("frmIndenter"), &m_vbe->Platform().loop(), &m_bar) {
-  setWindowTitle(common::title() + QStringLiteral(" - ") + text(5135));
+  setWindowTitle(common::title() + QStringLiteral(" - ") + common::LoadResString(kIndenterCaption));
   m_txtSpaces->setObjectName(QStringLiteral("txtSpaces"));
   m_cmdIndent->setObjectName(QStringLiteral("cmdIndent"));
   m_cmdCancel->setObjectName(QStringLiteral("cmdCancel"));
@@ -55,19 +47,19 @@ frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings
   m_frIndent->setObjectName(QStringLiteral("frIndent"));
   m_frUse->setObjectName(QStringLiteral("frUse"));
 
-  m_cmdCancel->setText(text(5025));
-  m_cmdIndent->setText(text(5026));
-  m_frIndent->setTitle(text(5016));
-  m_frUse->setTitle(text(5017));
+  m_cmdCancel->setText(common::LoadResString(kIndenterClose));
+  m_cmdIndent->setText(common::LoadResString(kIndentButton));
+  m_frIndent->setTitle(common::LoadResString(kIndentFrame));
+  m_frUse->setTitle(common::LoadResString(kUseFrame));
   auto* scopes = new QVBoxLayout(m_frIndent);
   for (int i = 0; i < 3; ++i) {
-    m_opIndent[size_t(i)] = new QRadioButton(text(5018 + i), m_frIndent);
+    m_opIndent[size_t(i)] = new QRadioButton(common::LoadResString(kIndentScopeFirst + i), m_frIndent);
     m_opIndent[size_t(i)]->setObjectName(QStringLiteral("opIndent%1").arg(i));
     scopes->addWidget(m_opIndent[size_t(i)]);
   }
   auto* use = new QVBoxLayout(m_frUse);
   for (int i = 0; i < 2; ++i) {
-    m_opSpaces[size_t(i)] = new QRadioButton(text(5021 + i), m_frUse);
+    m_opSpaces[size_t(i)] = new QRadioButton(common::LoadResString(kIndentCharsFirst + i), m_frUse);
     m_opSpaces[size_t(i)]->setObjectName(QStringLiteral("opSpaces%1").arg(i));
     connect(m_opSpaces[size_t(i)], &QRadioButton::clicked, this, [this, i] { opSpaces_Click(i); });
   }
@@ -100,8 +92,8 @@ frmIndenter::frmIndenter(ide::Ref<ide::VBE> vbe, common::SettingsStore& settings
 
   m_context.onFailure = [this](const WalkFailure& failure) {
     const int id = failure.messageId ? failure.messageId : walkMessageId(scope(), true);
-    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope()), ide::mb::Exclamation,
-                                  common::title());
+    m_vbe->Platform().ui().MsgBox(walkFailureText(common::LoadResString(id), failure, *m_vbe, scope()),
+                                  ide::mb::Exclamation, common::title());
   };
 
   m_txtSpaces->setText(m_settings.value(common::setting::Indentation).trimmed());
@@ -135,7 +127,8 @@ void frmIndenter::cmdIndent_Click() {
     const QString spaces = m_txtSpaces->text().trimmed();
     const auto value = wholeNumber(spaces);
     if (spaces.isEmpty() || !value || *value <= 0) {
-      ui.MsgBox(text(spaces.isEmpty() ? kNoSpaces : kInvalidSpaces), ide::mb::Information, common::title());
+      ui.MsgBox(common::LoadResString(spaces.isEmpty() ? kNoSpaces : kInvalidSpaces), ide::mb::Information,
+                common::title());
       m_txtSpaces->setFocus();
       return;
     }
@@ -145,7 +138,7 @@ void frmIndenter::cmdIndent_Click() {
   BusyCursor cursor(ui);
   m_context.reset();
   m_cmdIndent->setEnabled(false);
-  m_cmdCancel->setText(text(5024));
+  m_cmdCancel->setText(common::LoadResString(kIndenterCancel));
   m_cmdCancel->repaint();
   m_running = true;
   m_closeAfterRun = false;
@@ -156,7 +149,7 @@ void frmIndenter::cmdIndent_Click() {
     completed = true;
   } catch (const std::exception& failure) {
     common::logFailure(failure, QStringLiteral("frmIndenter"), QStringLiteral("cmdIndent_Click"), __LINE__);
-    ui.MsgBox(text(kRunFailed), ide::mb::Information, common::title());
+    ui.MsgBox(common::LoadResString(kIndentRunFailed), ide::mb::Information, common::title());
   }
   m_running = false;
   m_numIndentError.disconnect();
@@ -168,7 +161,7 @@ void frmIndenter::cmdIndent_Click() {
   // A run that failed as a whole leaves the dialog open, so that another scope can be chosen.
   m_progBar->hide();
   m_cmdIndent->setEnabled(true);
-  m_cmdCancel->setText(text(5025));
+  m_cmdCancel->setText(common::LoadResString(kIndenterClose));
 }
 
 void frmIndenter::walk(PROG_MODE scope, qint32 unit) {
@@ -177,8 +170,8 @@ void frmIndenter::walk(PROG_MODE scope, qint32 unit) {
     // The walk's message with the exclamation icon, naming the module and line, as the own walks report.
     m_numIndentError = m_numIndent->Failed.connect([this, scope](const WalkFailure& failure) {
       const int id = failure.messageId ? failure.messageId : walkMessageId(scope, true);
-      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope), ide::mb::Exclamation,
-                                    common::title());
+      m_vbe->Platform().ui().MsgBox(walkFailureText(common::LoadResString(id), failure, *m_vbe, scope),
+                                    ide::mb::Exclamation, common::title());
       m_context.Cancel();
     });
     m_numIndent->DoIt(scope, &m_bar, kOneCommandStart, kOneCommandInterval, spaceMode(), unit, true);
@@ -212,7 +205,7 @@ void frmIndenter::cancelRun() {
   if (m_numIndent) m_numIndent->Cancel();
   m_context.Cancel();
   m_closeAfterRun = true;
-  m_cmdCancel->setText(text(5025));
+  m_cmdCancel->setText(common::LoadResString(kIndenterClose));
 }
 
 void frmIndenter::done(int result) {

@@ -10,7 +10,7 @@
 #include "ide/vbide.h"
 #include "transform/dialogparts.h"
 #include "transform/numindent.h"
-#include "transform/walk.h"
+#include "walk/walk.h"
 
 #include <QDialog>
 
@@ -24,6 +24,9 @@ class QPushButton;
 class QRadioButton;
 
 namespace transform {
+
+// The transforms are walks: the walk framework's names read as their own.
+using namespace walk;
 
 /// Idle → Running (Indent disabled, "&Cancelar") → the dialog closes itself at the end of the run.
 /// Cancel during a run ends the walk at its next yield. The unit and the choice of tabs or spaces are

@@ -6,6 +6,7 @@
 #include "common/strings.h"
 #include "transform/numberwalk.h"
 #include "transform/options.h"
+#include "transform/texts.h"
 
 #include <QGridLayout>
 #include <QGroupBox>
@@ -22,14 +23,6 @@ namespace {
 
 // How long the finished run stays on screen before the dialog closes itself.
 constexpr int kCloseDelayMs = 1000;
-
-// Message numbers of the dialog.
-constexpr int kStartNotNumeric = 5119;
-constexpr int kIntervalNotNumeric = 5120;
-
-QString text(int id) {
-  return common::LoadResString(id);
-}
 
 }  // namespace
 
@@ -50,7 +43,7 @@ frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& sett
       m_lblInterval(new QLabel(this)),
       m_bar(*m_progBar),
       m_context(QStringLiteral("frmLinNumbers"), &m_vbe->Platform().loop(), &m_bar) {
-  setWindowTitle(common::title() + QStringLiteral(" - ") + text(5036));
+  setWindowTitle(common::title() + QStringLiteral(" - ") + common::LoadResString(kNumbersCaption));
   m_txtInitial->setObjectName(QStringLiteral("txtInitial"));
   m_txtInterval->setObjectName(QStringLiteral("txtInterval"));
   m_cmdAdd->setObjectName(QStringLiteral("cmdAdd"));
@@ -61,17 +54,17 @@ frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& sett
   m_lblStartNum->setObjectName(QStringLiteral("lblStartNum"));
   m_lblInterval->setObjectName(QStringLiteral("lblInterval"));
 
-  m_cmdAdd->setText(text(5033));
-  m_cmdCancel->setText(text(5161));
-  m_cmdRemove->setText(text(5034));
-  m_frOptions->setTitle(text(5027));
-  m_lblInterval->setText(text(5032));
-  m_lblStartNum->setText(text(5031));
+  m_cmdAdd->setText(common::LoadResString(kAddNumbersButton));
+  m_cmdCancel->setText(common::LoadResString(kNumbersClose));
+  m_cmdRemove->setText(common::LoadResString(kRemoveNumbersButton));
+  m_frOptions->setTitle(common::LoadResString(kNumbersFrame));
+  m_lblInterval->setText(common::LoadResString(kIntervalLabel));
+  m_lblStartNum->setText(common::LoadResString(kStartNumberLabel));
   m_lblStartNum->setBuddy(m_txtInitial);
   m_lblInterval->setBuddy(m_txtInterval);
   auto* scopes = new QVBoxLayout(m_frOptions);
   for (int i = 0; i < 3; ++i) {
-    m_opNumbers[size_t(i)] = new QRadioButton(text(5028 + i), m_frOptions);
+    m_opNumbers[size_t(i)] = new QRadioButton(common::LoadResString(kNumberScopeFirst + i), m_frOptions);
     m_opNumbers[size_t(i)]->setObjectName(QStringLiteral("opNumbers%1").arg(i));
     scopes->addWidget(m_opNumbers[size_t(i)]);
   }
@@ -108,8 +101,8 @@ frmLinNumbers::frmLinNumbers(ide::Ref<ide::VBE> vbe, common::SettingsStore& sett
   // not reported.
   m_context.onFailure = [this](const WalkFailure& failure) {
     const int id = failure.messageId ? failure.messageId : walkMessageId(scope(), false);
-    m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope()), ide::mb::Exclamation,
-                                  common::title());
+    m_vbe->Platform().ui().MsgBox(walkFailureText(common::LoadResString(id), failure, *m_vbe, scope()),
+                                  ide::mb::Exclamation, common::title());
   };
 
   const NumberingOptions stored = storedNumbering(m_settings);
@@ -134,7 +127,7 @@ bool frmLinNumbers::readBox(QLineEdit* box, qint32& field, int messageId) {
   if (box->text().trimmed().isEmpty()) return true;  // an empty box keeps the value last used
   const auto value = wholeNumber(box->text());
   if (!value) {
-    m_vbe->Platform().ui().MsgBox(text(messageId), ide::mb::Exclamation, common::title());
+    m_vbe->Platform().ui().MsgBox(common::LoadResString(messageId), ide::mb::Exclamation, common::title());
     box->setFocus();
     return false;
   }
@@ -151,7 +144,7 @@ void frmLinNumbers::run(bool add) {
   m_cursor.emplace(platform.ui());
   m_cmdAdd->setEnabled(false);
   m_cmdRemove->setEnabled(false);
-  m_cmdCancel->setText(text(5035));
+  m_cmdCancel->setText(common::LoadResString(kNumbersCancel));
   m_cmdCancel->repaint();
   m_running = true;
   m_closeAfterRun = false;
@@ -194,8 +187,8 @@ void frmLinNumbers::walk(PROG_MODE scope, bool add) {
     m_numIndentError = m_numIndent->Failed.connect([this, scope](const WalkFailure& failure) {
       const int id = failure.messageId ? failure.messageId
                                        : walkMessageId(scope, failure.operation.startsWith(u"Indent"));
-      m_vbe->Platform().ui().MsgBox(walkFailureText(text(id), failure, *m_vbe, scope), ide::mb::Exclamation,
-                                    common::title());
+      m_vbe->Platform().ui().MsgBox(walkFailureText(common::LoadResString(id), failure, *m_vbe, scope),
+                                    ide::mb::Exclamation, common::title());
       m_context.Cancel();
     });
     m_numIndent->DoIt(scope, &m_bar, m_startNumber, m_interval, false, 1, add);
@@ -245,7 +238,7 @@ void frmLinNumbers::backToIdle() {
   m_progBar->hide();
   m_cmdRemove->setEnabled(true);
   m_cmdAdd->setEnabled(true);
-  m_cmdCancel->setText(text(5161));
+  m_cmdCancel->setText(common::LoadResString(kNumbersClose));
   m_cmdCancel->repaint();
   m_cursor.reset();
 }

@@ -10,7 +10,7 @@
 #include "ide/vbide.h"
 #include "transform/dialogparts.h"
 #include "transform/numindent.h"
-#include "transform/walk.h"
+#include "walk/walk.h"
 
 #include <QDialog>
 
@@ -25,6 +25,9 @@ class QPushButton;
 class QRadioButton;
 
 namespace transform {
+
+// The transforms are walks: the walk framework's names read as their own.
+using namespace walk;
 
 /// Idle (bar hidden, Add and Remove enabled, "&Fechar") → Running (bar shown, both disabled,
 /// "&Cancelar") → a second after the run the dialog closes itself. Cancel during a run ends the walk at

@@ -3,23 +3,17 @@
 #include "transform/indentwalk.h"
 
 #include "syntax/line.h"
+#include "transform/texts.h"
 
 #include <span>
 
 namespace transform {
 
-namespace {
-// Message numbers of the walks' failures.
-constexpr int kProjectFailed = 5130;
-constexpr int kModuleFailed = 5129;
-constexpr int kProcedureFailed = 5128;
-}  // namespace
-
 IndentationWalk::IndentationWalk(WalkContext& context, IndentMode mode, qint32 spaces)
     : m_context(context), m_indenter(mode, spaces) {}
 
 void IndentationWalk::IndentProject(const ide::Ref<ide::VBProject>& project) {
-  m_context.guard(u"IndentProject", kProjectFailed, nullptr, [&] {
+  m_context.guard(u"IndentProject", kIndentProjectFailed, nullptr, [&] {
     if (!project) ide::raise(ide::err::ObjectVariableNotSet);
     forEachCodeModule(m_context, *project,
                       [&](const ide::Ref<ide::CodeModule>& module) { IndentModule(module); });
@@ -27,7 +21,7 @@ void IndentationWalk::IndentProject(const ide::Ref<ide::VBProject>& project) {
 }
 
 void IndentationWalk::IndentModule(const ide::Ref<ide::CodeModule>& module) {
-  m_context.guard(u"IndentModule", kModuleFailed, module.get(), [&] {
+  m_context.guard(u"IndentModule", kIndentModuleFailed, module.get(), [&] {
     if (!module) ide::raise(ide::err::ObjectVariableNotSet);
     const bool walked = forEachMember(m_context, *module, [&](const ide::Ref<ide::Member>& member) {
       if (hasProcedures(member->Type())) IndentMember(module, member);
@@ -38,7 +32,7 @@ void IndentationWalk::IndentModule(const ide::Ref<ide::CodeModule>& module) {
 
 void IndentationWalk::IndentMember(const ide::Ref<ide::CodeModule>& module,
                                    const ide::Ref<ide::Member>& member) {
-  m_context.guard(u"IndentMember", kProcedureFailed, module.get(), [&] {
+  m_context.guard(u"IndentMember", kIndentProcedureFailed, module.get(), [&] {
     if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
     m_procedures.of(*module).forMember(
         *member, [&](const ide::ProcExtent& extent) { IndentProcedure(*module, extent); });
@@ -46,7 +40,7 @@ void IndentationWalk::IndentMember(const ide::Ref<ide::CodeModule>& module,
 }
 
 void IndentationWalk::IndentCurrentProcedure(ide::VBE& vbe) {
-  m_context.guard(u"IndentCurrentProcedure", kProcedureFailed, nullptr, [&] {
+  m_context.guard(u"IndentCurrentProcedure", kIndentProcedureFailed, nullptr, [&] {
     const ProcedureRef procedure = currentProcedure(vbe);
     if (procedure.extent) IndentProcedure(*procedure.module, *procedure.extent);
     m_context.AdvanceProgress(1);

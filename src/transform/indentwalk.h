@@ -4,9 +4,12 @@
 #pragma once
 
 #include "transform/indentation.h"
-#include "transform/walk.h"
+#include "walk/walk.h"
 
 namespace transform {
+
+// The transforms are walks: the walk framework's names read as their own.
+using namespace walk;
 
 /// Re-indents code. Walks report their failures through the context with their fixed messages (5130 for
 /// a project, 5129 for a module, 5128 for a member or the current procedure) and end; a line that cannot

@@ -11,7 +11,7 @@
 
 namespace transform {
 
-LineNumberOverflow::LineNumberOverflow() : ide::Error(kOverflowError, QStringLiteral("Overflow")) {}
+LineNumberOverflow::LineNumberOverflow() : walk::RunStopped(kOverflowError, QStringLiteral("Overflow")) {}
 
 namespace {
 

@@ -5,6 +5,7 @@
 
 #include "ide/error.h"
 #include "syntax/jumps.h"
+#include "walk/runstopped.h"
 
 #include <QString>
 #include <QStringView>
@@ -17,7 +18,7 @@ inline constexpr long kOverflowError = 6;
 /// Thrown by NumberLine when the next line number would leave the 32-bit range. A wrapped number would
 /// write negative or duplicate labels into the module, so the run must stop; walkers catch it as any
 /// ide::Error and report the failure of their scope.
-class LineNumberOverflow : public ide::Error {
+class LineNumberOverflow : public walk::RunStopped {
  public:
   LineNumberOverflow();
 };

@@ -4,23 +4,17 @@
 
 #include "syntax/line.h"
 #include "transform/numbering.h"
+#include "transform/texts.h"
 
 #include <limits>
 
 namespace transform {
 
-namespace {
-// Message numbers of the walks' failures.
-constexpr int kProjectFailed = 5121;
-constexpr int kModuleFailed = 5122;
-constexpr int kProcedureFailed = 5123;
-}  // namespace
-
 NumberingWalk::NumberingWalk(WalkContext& context, qint32 startNumber, qint32 interval)
     : m_context(context), m_startNumber(startNumber), m_interval(interval) {}
 
 void NumberingWalk::NumberProject(const ide::Ref<ide::VBProject>& project, bool add) {
-  m_context.guard(u"NumberProject", kProjectFailed, nullptr, [&] {
+  m_context.guard(u"NumberProject", kNumberProjectFailed, nullptr, [&] {
     if (!project) ide::raise(ide::err::ObjectVariableNotSet);
     forEachCodeModule(m_context, *project,
                       [&](const ide::Ref<ide::CodeModule>& module) { NumberModule(module, add); });
@@ -28,7 +22,7 @@ void NumberingWalk::NumberProject(const ide::Ref<ide::VBProject>& project, bool 
 }
 
 void NumberingWalk::NumberModule(const ide::Ref<ide::CodeModule>& module, bool add) {
-  m_context.guard(u"NumberModule", kModuleFailed, module.get(), [&] {
+  m_context.guard(u"NumberModule", kNumberModuleFailed, module.get(), [&] {
     if (!module) ide::raise(ide::err::ObjectVariableNotSet);
     forEachMember(m_context, *module, [&](const ide::Ref<ide::Member>& member) {
       if (hasProcedures(member->Type()))
@@ -41,7 +35,7 @@ void NumberingWalk::NumberModule(const ide::Ref<ide::CodeModule>& module, bool a
 
 void NumberingWalk::NumberMember(const ide::Ref<ide::CodeModule>& module, const ide::Ref<ide::Member>& member,
                                  bool add) {
-  m_context.guard(u"NumberMember", kProcedureFailed, module.get(), [&] {
+  m_context.guard(u"NumberMember", kNumberProcedureFailed, module.get(), [&] {
     if (!module || !member) ide::raise(ide::err::ObjectVariableNotSet);
     // Declare statements, which are listed as methods, have no procedure to number.
     m_procedures.of(*module).forMember(
@@ -51,7 +45,7 @@ void NumberingWalk::NumberMember(const ide::Ref<ide::CodeModule>& module, const 
 }
 
 void NumberingWalk::NumberCurrentProcedure(ide::VBE& vbe, bool add) {
-  m_context.guard(u"NumberCurrentProcedure", kProcedureFailed, nullptr, [&] {
+  m_context.guard(u"NumberCurrentProcedure", kNumberProcedureFailed, nullptr, [&] {
     const ProcedureRef procedure = currentProcedure(vbe);
     if (procedure.extent) numberOrUnnumber(*procedure.module, *procedure.extent, add);
     m_context.AdvanceProgress(1);

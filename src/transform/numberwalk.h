@@ -3,11 +3,14 @@
 // caret, each procedure numbered from the start number, line by line through the code module.
 #pragma once
 
-#include "transform/walk.h"
+#include "walk/walk.h"
 
 #include <functional>
 
 namespace transform {
+
+// The transforms are walks: the walk framework's names read as their own.
+using namespace walk;
 
 /// Adds or removes line numbers. Walks report their failures through the context with their fixed
 /// messages (5121 for a project, 5122 for a module, 5123 for a member or the current procedure) and end;

@@ -117,7 +117,7 @@ TEST(ErrorConvention, AFailureThreeCallsDeepIsShownOnceWithTheInnermostLocation)
   ASSERT_EQ(ui.messageBoxes().size(), 1u);
   EXPECT_EQ(ui.messageBoxes().front().prompt, u"9 "_qs + ide::standardDescription(9));
   EXPECT_EQ(ui.messageBoxes().front().style, ide::mb::OKOnly);
-  EXPECT_EQ(common::lastError().location, u"em basUm_Innermost, linha: 30"_qs);
+  EXPECT_EQ(common::lastError().place.text(), u"em basUm_Innermost, linha: 30"_qs);
   const QStringList log = environment.errorLog();
   ASSERT_EQ(log.size(), 1);
   EXPECT_TRUE(log.front().endsWith(u"\tem basUm_Innermost, linha: 30"_qs));

@@ -562,7 +562,7 @@ QStringList modelRows(const QString& file, const find::FindOptions& options) {
   } report;
   auto vbe = host::VbeImpl::create();
   vbe->open(file);
-  transform::WalkContext context(u"test"_qs, nullptr, nullptr);
+  walk::WalkContext context(u"test"_qs, nullptr, nullptr);
   find::FindWalk(context, *vbe, report).Search(find::SearchScope::AllProjects, options);
   return report.rows;
 }

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Tests of whole-file reads and atomic writes in a temporary directory: the error numbers and descriptions
 // of each failure, and that a failed write leaves the old file as it was.
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
 
 #include "testtext.h"
 
@@ -20,10 +20,10 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-namespace host {
+namespace fileio {
 namespace {
 
-using testing::expectError;
+using host::testing::expectError;
 
 void writePlainFile(const QString& path, const QByteArray& bytes) {
   QFile file(path);
@@ -370,4 +370,4 @@ TEST(FileWriteBatchTest, ASignalWhileWritingLeavesNothingBehindAndAKilledSaveIsS
 }
 
 }  // namespace
-}  // namespace host
+}  // namespace fileio

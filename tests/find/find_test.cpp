@@ -80,7 +80,7 @@ struct Recorder final : FindReport {
 QStringList search(Scene& scene, SearchScope scope, const FindOptions& options,
                    QStringList* labels = nullptr) {
   Recorder recorder;
-  transform::WalkContext context(u"test"_qs, &scene.loop(), nullptr);
+  walk::WalkContext context(u"test"_qs, &scene.loop(), nullptr);
   FindWalk(context, *scene.ide.vbe, recorder).Search(scope, options);
   if (labels) *labels = recorder.labels;
   return recorder.rows;

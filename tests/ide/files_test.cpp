@@ -6,7 +6,7 @@
 #include "codebinding.h"
 #include "codeeditor.h"
 #include "codewindow.h"
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
 #include "host/model/addins.h"
 #include "host/model/events.h"
 #include "idecommands.h"
@@ -219,13 +219,13 @@ TEST_F(FilesTest, ASaveThatCannotBeUndoneSaysWhichFileHoldsTheNewText) {
   auto api = component(u"Utilitarios"_qs, u"modApi"_qs);
   principal->codeModule()->InsertLines(1, u"' mudado"_qs);
   api->codeModule()->InsertLines(1, u"' mudado"_qs);
-  host::setFileFaultHook([&](host::FileStep step, const QString& path) {
-    const bool replace = step == host::FileStep::Replace && path == api->filePath();
-    return replace || (step == host::FileStep::Restore && path == principal->filePath()) ? EIO : 0;
+  fileio::setFileFaultHook([&](fileio::FileStep step, const QString& path) {
+    const bool replace = step == fileio::FileStep::Replace && path == api->filePath();
+    return replace || (step == fileio::FileStep::Restore && path == principal->filePath()) ? EIO : 0;
   });
   m_ide.ui->queueAnswer(ide::mb::OK);
   EXPECT_FALSE(commands().saveAll());
-  host::setFileFaultHook({});
+  fileio::setFileFaultHook({});
   ASSERT_FALSE(m_messages.isEmpty());
   EXPECT_FALSE(m_messages.last().contains(u"unchanged"_qs)) << m_messages.last().toStdString();
   EXPECT_TRUE(m_messages.last().contains(principal->filePath() + u" holds the new text"_qs));

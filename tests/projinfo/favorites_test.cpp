@@ -116,7 +116,7 @@ TEST(Favorites, TheRecordsFollowRenamedComponentsAndGoWithRemovedOnes) {
 TEST(Favorites, RecordsThatCannotBeReadAreToldOnceAndStayInTheFile) {
   Project p;
   p.favorites().AddPlace(p.modA, u"Um"_qs, ide::ProcKind::Proc, 6);
-  Storage& storage = *p.scene.info(p.project).m_Favorites;
+  Storage& storage = *p.scene.info(p.project).favoritesStorage();
   storage.CreateStream(u"Favorite8"_qs, kElementMode)
       ->WriteData(FavoriteRecord{u"modSumido"_qs, u"Main"_qs, 0, 8, 1}.toText());
   storage.CreateStream(u"Favorite9"_qs, kElementMode)->WriteData(u"[ComponentName](modA)[Line](x)"_qs);

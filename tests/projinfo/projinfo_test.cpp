@@ -62,7 +62,7 @@ TEST(LifeCycle, ANewProjectGetsAModuleAndAFileThatFollowItsSaves) {
   EXPECT_EQ(module->CodeModule()->Lines(1, 1), u"'PROJID=000001"_qs);
   const QString temporary = scene.path(u"tmp/qm000001.qmi"_qs);
   EXPECT_TRUE(QFile::exists(temporary));
-  EXPECT_FALSE(scene.info(project).Saved);
+  EXPECT_FALSE(scene.info(project).isSaved());
   scene.addTask(project, u"Primeira"_qs);
 
   // Saved elsewhere: the file goes along, and later sessions find module and file again.
@@ -73,13 +73,13 @@ TEST(LifeCycle, ANewProjectGetsAModuleAndAFileThatFollowItsSaves) {
   EXPECT_FALSE(QFile::exists(temporary));
   const QString moved = scene.path(u"Trabalho/qm000001.qmi"_qs);
   EXPECT_TRUE(QFile::exists(moved));
-  EXPECT_TRUE(scene.info(project).Saved);
+  EXPECT_TRUE(scene.info(project).isSaved());
   scene.addTask(project, u"Segunda"_qs);
   scene.close(project);
   EXPECT_EQ(streamsOf(moved, u"TaskList"_qs), (QStringList{u"Task1"_qs, u"Task2"_qs}));
 
   auto again = scene.open(vbp);
-  EXPECT_EQ(scene.info(again).basProjInfo->Name(), u"basQMInf000001"_qs);
+  EXPECT_EQ(scene.info(again).identityModule()->Name(), u"basQMInf000001"_qs);
   EXPECT_EQ(again->components().size(), 1u) << "no second module";
   EXPECT_EQ(scene.tasks(again).Tasks.Count(), 2);
 
@@ -97,7 +97,7 @@ TEST(LifeCycle, ANewProjectGetsAModuleAndAFileThatFollowItsSaves) {
   // The module removed or renamed: the tie is lost (the message names the module it had), the file
   // closed and kept; the module back, added again or renamed back, brings the tasks back.
   CProjInfo& info = scene.info(again);
-  auto identity = info.basProjInfo;
+  auto identity = info.identityModule();
   scene.infos->componentRemoved(identity);
   again->Remove(identity);
   EXPECT_FALSE(info.isOpen());
@@ -119,7 +119,7 @@ TEST(LifeCycle, ANewProjectGetsAModuleAndAFileThatFollowItsSaves) {
   EXPECT_TRUE(QFile::exists(moved));
   // Never saved, the project takes its file along even when its module went first.
   auto fresh = scene.newProject();
-  scene.infos->componentRemoved(scene.info(fresh).basProjInfo);
+  scene.infos->componentRemoved(scene.info(fresh).identityModule());
   scene.close(fresh);
   EXPECT_TRUE(QDir(scene.path(u"tmp"_qs)).isEmpty());
 }
@@ -176,7 +176,7 @@ TEST(Identifiers, TasksAreNumberedFromOneAndNoRecordIsEverOverwritten) {
   scene.tasks(project).DeleteTask(1);
   EXPECT_EQ(scene.addTask(project, u"Dois"_qs)->ItemId, 2);
   // A counter behind the records (written by hand, or damaged) does not hand out a used number.
-  auto counter = scene.info(project).m_FileInfo->CreateStream(u"LastTaskId"_qs, kElementMode);
+  auto counter = scene.info(project).fileInfo()->CreateStream(u"LastTaskId"_qs, kElementMode);
   counter->WriteData(qint32(0));
   EXPECT_EQ(scene.addTask(project, u"Três"_qs)->ItemId, 3);
   counter->SSeek(0);

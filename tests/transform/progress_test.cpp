@@ -6,7 +6,7 @@
 
 #include <limits>
 
-namespace transform {
+namespace walk {
 namespace {
 
 class ProgressScaleTest : public ::testing::Test {
@@ -16,7 +16,7 @@ class ProgressScaleTest : public ::testing::Test {
     bar.setMinimum(5);
     bar.setValue(7);
   }
-  test::RecordingBar bar;
+  transform::test::RecordingBar bar;
   ProgressScale progress{bar};
 };
 
@@ -93,4 +93,4 @@ TEST_F(ProgressScaleTest, NewRangeStartsAnEmptyBarAndLeavesVisibilityToTheCaller
 }
 
 }  // namespace
-}  // namespace transform
+}  // namespace walk

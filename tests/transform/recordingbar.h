@@ -2,7 +2,7 @@
 // A progress bar for tests: it remembers its state and every value it was given.
 #pragma once
 
-#include "transform/progress.h"
+#include "walk/progress.h"
 
 #include <functional>
 #include <vector>
@@ -10,7 +10,7 @@
 namespace transform::test {
 
 /// A progress bar that remembers its state and every value it was given.
-class RecordingBar final : public ProgressSink {
+class RecordingBar final : public walk::ProgressSink {
  public:
   int minimum() const override { return m_minimum; }
   void setMinimum(int minimum) override { m_minimum = minimum; }

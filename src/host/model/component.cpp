@@ -2,10 +2,10 @@
 // Components: their files, names, code modules, designers and windows.
 #include <QElapsedTimer>
 #include <cstdio>
+#include "fileio/fileio.h"
+#include "fileio/parallel.h"
 #include "host/files/ansi.h"
-#include "host/files/fileio.h"
 #include "host/files/frxfile.h"
-#include "host/files/parallel.h"
 #include "host/model/designer.h"
 #include "host/model/events.h"
 #include "host/model/objects.h"

@@ -6,8 +6,8 @@
 // error 91.
 #pragma once
 
+#include "fileio/fileio.h"
 #include "host/code/codetext.h"
-#include "host/files/fileio.h"
 #include "host/files/modulefile.h"
 #include "host/files/projectfile.h"
 #include "ide/vbide.h"
@@ -20,6 +20,9 @@
 #include <vector>
 
 namespace host {
+
+// The model reads and writes its files through the file layer's base; its names read as the model's own.
+using namespace fileio;
 
 class VbeImpl;
 class ProjectImpl;

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 // Projects: their project file, their components and what they write back.
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
+#include "fileio/parallel.h"
 #include "host/files/modulefile.h"
-#include "host/files/parallel.h"
 #include "host/model/objects.h"
 #include "host/model/vbe.h"
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "host/model/vbe.h"
 
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
 #include "host/files/groupfile.h"
 #include "host/files/projectfile.h"
 #include "host/files/sourcelines.h"

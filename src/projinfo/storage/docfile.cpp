@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "projinfo/storage/docfile.h"
 
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
 #include "ide/error.h"
 
 #include <QFile>
@@ -65,7 +65,7 @@ std::shared_ptr<DocFile> DocFile::open(const QString& path, Access access) {
   if (!QFileInfo::exists(file->m_path)) fail(stg::FileNotFound, file->m_path, QStringLiteral("no such file"));
   if (access == Access::ReadWrite) file->lock();
   try {
-    file->m_committed = host::readFileBytes(file->m_path);
+    file->m_committed = fileio::readFileBytes(file->m_path);
   } catch (const ide::Error& error) {
     throw ide::Error(stg::AccessDenied, error.description());
   }
@@ -98,7 +98,7 @@ void DocFile::commit() {
     fail(stg::AccessDenied, m_path, QStringLiteral("the file is read-only"));
   const QByteArray bytes = writeCompoundFile(*m_root);
   try {
-    host::writeFileAtomically(m_path, bytes);
+    fileio::writeFileAtomically(m_path, bytes);
   } catch (const ide::Error& error) {
     throw ide::Error(QFileInfo(info.absolutePath()).isWritable() ? stg::WriteFault : stg::AccessDenied,
                      error.description());

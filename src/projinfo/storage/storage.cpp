@@ -137,7 +137,9 @@ std::shared_ptr<Storage> Storage::unbound(const ide::Error& failure) {
 Storage::~Storage() {
   try {
     if (m_handle.file && !m_handle.element->gone) m_handle.file->commit();
-  } catch (const std::exception&) {
+  } catch (const std::exception& failure) {
+    // A destructor must not throw; the owner's explicit commits report the same failure.
+    common::logFailure(failure, QStringLiteral("Storage"), QStringLiteral("~Storage"), __LINE__);
   }
 }
 

@@ -11,7 +11,7 @@
 #include <thread>
 #include <vector>
 
-namespace host {
+namespace fileio {
 
 /// How many threads `count` pieces of work get: one per core (or at most `limit`), never more than there
 /// are pieces, at least one.
@@ -66,4 +66,4 @@ void parallelFor(std::size_t count, Work&& work, std::vector<std::exception_ptr>
   });
 }
 
-}  // namespace host
+}  // namespace fileio

@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: MIT
-// The scope of a numbering or indentation run, shared by the dialogs, the number-and-indent command and
-// the command-line tool.
+// The scope of a walk: the active project, the selected module, the procedure at the caret.
 #pragma once
 
 #include <QtGlobal>
 
-namespace transform {
+namespace walk {
 
 enum PROG_MODE : qint32 {
   PROG_PROJECT = 1,    // every module of the active project
@@ -13,4 +12,4 @@ enum PROG_MODE : qint32 {
   PROG_PROCEDURE = 3,  // the procedure at the caret
 };
 
-}  // namespace transform
+}  // namespace walk

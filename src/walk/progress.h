@@ -6,7 +6,7 @@
 
 #include <QtGlobal>
 
-namespace transform {
+namespace walk {
 
 /// A progress bar as the walks see it.
 class ProgressSink {
@@ -52,4 +52,4 @@ class ProgressScale {
   qint32 m_totalUnits = 0;
 };
 
-}  // namespace transform
+}  // namespace walk

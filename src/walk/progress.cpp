@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: MIT
 // Progress scaling for long walks.
-#include "transform/progress.h"
+#include "walk/progress.h"
 
 #include <algorithm>
 #include <cmath>
 
-namespace transform {
+namespace walk {
 
 void ProgressScale::SetProgressRange(qint32 units) {
   m_totalUnits = units;
@@ -29,4 +29,4 @@ void ProgressScale::AdvanceProgress(qint32 units) {
   m_sink.setValue(int(std::clamp<qint64>(value + step, m_sink.minimum(), maximum)));
 }
 
-}  // namespace transform
+}  // namespace walk

@@ -1,13 +1,16 @@
 // SPDX-License-Identifier: MIT
-// What the numbering and indentation walks over the object model share: yielding to the IDE's loop, the
-// cancel flag, the progress bar and the handing of caught failures to whoever runs the walk. The dialogs,
-// the number-and-indent command and the command-line tool run the same walks, each with its own context.
+// What the walks over the object model share (numbering, indentation, the extended find): yielding to the
+// IDE's loop, the cancel flag, the progress bar, the handing of caught failures to whoever runs the walk,
+// and the helpers that find the active project, module and procedure and read a procedure's lines. The
+// dialogs, the number-and-indent command, the find window and the command-line tool run their walks each
+// with its own context.
 #pragma once
 
 #include "ide/error.h"
 #include "ide/vbide.h"
-#include "transform/progmode.h"
-#include "transform/progress.h"
+#include "walk/progmode.h"
+#include "walk/progress.h"
+#include "walk/runstopped.h"
 
 #include <QHash>
 #include <QString>
@@ -18,7 +21,7 @@
 #include <optional>
 #include <vector>
 
-namespace transform {
+namespace walk {
 
 /// A failure that a walk caught. The walk that caught a failure ends (its caller goes on with the next
 /// unit); a line that cannot be rewritten is passed over and the walk goes on with the next line.
@@ -33,7 +36,7 @@ struct WalkFailure {
   int line = 0;
   /// The failure as the error convention recorded it: its location text is the error's source.
   ide::Error error;
-  /// The walk stops here: the next line number would leave the 32-bit range.
+  /// The walk stops here: the failure was a RunStopped.
   bool stopsRun = false;
 };
 
@@ -80,7 +83,7 @@ class WalkContext {
   std::function<void(const WalkFailure&)> onLineSkipped;
 
   /// Runs `body` as the walk `operation` on `module` (may be null). A failure ends the body; it is
-  /// recorded under `operation` and reported with `messageId`. A line number overflow is not the failure
+  /// recorded under `operation` and reported with `messageId`. A RunStopped is not the failure
   /// of one unit: it passes through the guards of nested walks to the outermost one, which reports it and
   /// stops the run.
   template <class Body>
@@ -89,12 +92,12 @@ class WalkContext {
     try {
       body();
     } catch (const std::exception& failure) {
-      if (isOverflow(failure) && m_depth > 1) throw;
+      if (endsRun(failure) && m_depth > 1) throw;
       failed(failure, operation, messageId, module);
     }
   }
 
-  /// Reports a line that could not be rewritten (rethrows a line number overflow, which is never passed
+  /// Reports a line that could not be rewritten (rethrows a RunStopped, which is never passed
   /// over).
   void lineSkipped(const std::exception& failure, QStringView operation, ide::CodeModule& module, int line);
 
@@ -108,7 +111,7 @@ class WalkContext {
     int& m_depth;
   };
 
-  static bool isOverflow(const std::exception& failure);
+  static bool endsRun(const std::exception& failure);
   void failed(const std::exception& failure, QStringView operation, int messageId, ide::CodeModule* module);
   WalkFailure record(const std::exception& failure, QStringView operation, int messageId,
                      ide::CodeModule* module, int line);
@@ -237,4 +240,7 @@ struct ProcedureText {
 /// Reads a procedure at its place.
 ProcedureText readProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
 
-}  // namespace transform
+/// What the IDE calls a module's declarations section where a procedure name goes: "(Declarations)".
+QString declarationsText();
+
+}  // namespace walk

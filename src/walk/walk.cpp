@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: MIT
-// The walk context and the helpers the numbering and indentation walks share.
-#include "transform/walk.h"
+// The walk context and the helpers the walks share.
+#include "walk/walk.h"
 
 #include "common/errors.h"
 #include "syntax/line.h"
-#include "transform/numbering.h"
 
-namespace transform {
+namespace walk {
 
 WalkContext::WalkContext(QString owner, ide::EventLoop* loop, ProgressSink* bar)
     : m_owner(std::move(owner)), m_loop(loop), m_bar(bar) {
@@ -53,8 +52,8 @@ void WalkContext::hideProgress() {
   if (m_bar && m_bar->isVisible()) m_bar->setVisible(false);
 }
 
-bool WalkContext::isOverflow(const std::exception& failure) {
-  return dynamic_cast<const LineNumberOverflow*>(&failure) != nullptr;
+bool WalkContext::endsRun(const std::exception& failure) {
+  return dynamic_cast<const RunStopped*>(&failure) != nullptr;
 }
 
 WalkFailure WalkContext::record(const std::exception& failure, QStringView operation, int messageId,
@@ -68,12 +67,8 @@ WalkFailure WalkContext::record(const std::exception& failure, QStringView opera
     }
   }
   const QString name = operation.toString();
-  return WalkFailure{name,
-                     messageId,
-                     moduleName,
-                     line,
-                     common::recordError(failure, m_owner, name, line),
-                     isOverflow(failure)};
+  return WalkFailure{
+      name, messageId, moduleName, line, common::recordError(failure, m_owner, name, line), endsRun(failure)};
 }
 
 void WalkContext::failed(const std::exception& failure, QStringView operation, int messageId,
@@ -85,7 +80,7 @@ void WalkContext::failed(const std::exception& failure, QStringView operation, i
 
 void WalkContext::lineSkipped(const std::exception& failure, QStringView operation, ide::CodeModule& module,
                               int line) {
-  if (isOverflow(failure)) throw;
+  if (endsRun(failure)) throw;
   if (onLineSkipped) onLineSkipped(record(failure, operation, 0, &module, line));
 }
 
@@ -307,4 +302,8 @@ ProcedureText readProcedure(ide::CodeModule& module, const ide::ProcExtent& exte
   return text;
 }
 
-}  // namespace transform
+QString declarationsText() {
+  return QStringLiteral("(Declarations)");
+}
+
+}  // namespace walk

@@ -2,9 +2,9 @@
 // Whole-file reads, and batches of writes on the POSIX calls themselves: unnamed temporary files, links,
 // renames and flushes, with the IDE's error numbers and the path and the system's reason in the
 // description.
-#include "host/files/fileio.h"
+#include "fileio/fileio.h"
 
-#include "host/files/parallel.h"
+#include "fileio/parallel.h"
 
 #include <QFile>
 #include <QFileInfo>
@@ -26,7 +26,7 @@
 #include <sys/resource.h>
 #include <unistd.h>
 
-namespace host {
+namespace fileio {
 
 namespace {
 
@@ -757,4 +757,4 @@ void FileWriteBatch::State::replaceAll(const std::set<QByteArray>& directories) 
     if (!file.backup.isEmpty()) ::unlink(std::exchange(file.backup, {}).constData());
 }
 
-}  // namespace host
+}  // namespace fileio

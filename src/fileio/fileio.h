@@ -19,7 +19,7 @@
 #include <optional>
 #include <vector>
 
-namespace host {
+namespace fileio {
 
 /// What a file was when it was read or written: enough to tell later whether another program has changed,
 /// created or deleted it since.
@@ -117,4 +117,4 @@ enum class FileStep {
 /// tests; null (the default) fails nothing.
 void setFileFaultHook(std::function<int(FileStep step, const QString& path)> hook);
 
-}  // namespace host
+}  // namespace fileio
