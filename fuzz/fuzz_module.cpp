@@ -71,10 +71,10 @@ enum class Walk { Number, Unnumber, Indent, NumIndent };
 
 /// Runs `walk` over the module; false when it reported a failure (a line grown too long ...).
 bool run(Model& model, Walk walk) {
-  transform::WalkContext context(QStringLiteral("fuzz"), nullptr, nullptr);
+  walk::WalkContext context(QStringLiteral("fuzz"), nullptr, nullptr);
   bool failed = false;
-  context.onFailure = [&](const transform::WalkFailure&) { failed = true; };
-  context.onLineSkipped = [&](const transform::WalkFailure&) { failed = true; };
+  context.onFailure = [&](const walk::WalkFailure&) { failed = true; };
+  context.onLineSkipped = [&](const walk::WalkFailure&) { failed = true; };
   switch (walk) {
     case Walk::Number:
     case Walk::Unnumber:

@@ -53,7 +53,7 @@ struct Target {
 };
 
 /// A walk's progress bar that only counts its steps (one per worker); `onChange` is told of every move.
-class StepCounter final : public transform::ProgressSink {
+class StepCounter final : public walk::ProgressSink {
  public:
   int minimum() const override { return m_minimum; }
   void setMinimum(int minimum) override { m_minimum = minimum; }
@@ -153,21 +153,21 @@ Effective effectiveKind(TransformKind kind, const codestyle::Style& style, bool 
   return {TransformKind::NumIndent, kind != TransformKind::Unnumber};
 }
 
-transform::ProgressUnit progressUnitOf(const Effective& walk) {
+walk::ProgressUnit progressUnitOf(const Effective& walk) {
   return walk.kind == TransformKind::Number || walk.kind == TransformKind::Unnumber
-             ? transform::ProgressUnit::Members
-             : transform::ProgressUnit::Lines;
+             ? walk::ProgressUnit::Members
+             : walk::ProgressUnit::Lines;
 }
 
-qint64 unitsOf(const Target& target, transform::ProgressUnit unit) {
+qint64 unitsOf(const Target& target, walk::ProgressUnit unit) {
   if (target.member) return 1;
-  if (unit == transform::ProgressUnit::Members) return target.module->Members()->Count();
+  if (unit == walk::ProgressUnit::Members) return target.module->Members()->Count();
   return target.module->CountOfLines() - target.module->CountOfDeclarationLines();
 }
 
 /// Walks one module (or one member of it) as `walk` says, with `style`. With `numberOf`, numbered lines
 /// get the number it gives their module line.
-void walkTarget(transform::WalkContext& context, const Target& target, const Effective& walk,
+void walkTarget(walk::WalkContext& context, const Target& target, const Effective& walk,
                 const codestyle::Style& style, std::function<qint32(int)> numberOf) {
   const transform::NumberingOptions numbering = style.numbering();
   const transform::IndentationOptions indentation = style.indentation();
@@ -203,7 +203,7 @@ void walkTarget(transform::WalkContext& context, const Target& target, const Eff
   }
 }
 
-QString failureText(const transform::WalkFailure& failure) {
+QString failureText(const walk::WalkFailure& failure) {
   const QString where =
       failure.line > 0 ? QStringLiteral("%1, line %2").arg(failure.module).arg(failure.line) : failure.module;
   const QString what =
@@ -338,11 +338,11 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
 
   struct Report {
     size_t unit;
-    transform::WalkFailure failure;
+    walk::WalkFailure failure;
   };
   std::mutex reportsMutex;
   std::vector<Report> reports;
-  const size_t workers = host::threadsFor(units.size());
+  const size_t workers = fileio::threadsFor(units.size());
   // Every worker's bar counts its own steps; the first one shows the sum on the terminal.
   std::vector<std::unique_ptr<StepCounter>> counters;
   for (size_t w = 0; w < workers; ++w)
@@ -354,15 +354,15 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
     bar.setValue(std::min(steps, bar.maximum()));
   };
   bar.setMinimum(0);
-  bar.setMaximum(std::max(1, std::min<qint32>(range, transform::ProgressScale::kMaxSteps)));
+  bar.setMaximum(std::max(1, std::min<qint32>(range, walk::ProgressScale::kMaxSteps)));
   bar.setValue(0);
   bar.setVisible(true);
   // Each module's walk touches that module alone, so the modules are walked side by side on every core.
-  host::WorkQueue queue(units.size());
-  host::runWorkers(workers, [&](size_t worker) {
-    transform::WalkContext context(QStringLiteral("quimbel"), nullptr, counters[worker].get());
+  fileio::WorkQueue queue(units.size());
+  fileio::runWorkers(workers, [&](size_t worker) {
+    walk::WalkContext context(QStringLiteral("quimbel"), nullptr, counters[worker].get());
     size_t current = 0;
-    const auto report = [&](const transform::WalkFailure& failure) {
+    const auto report = [&](const walk::WalkFailure& failure) {
       const std::lock_guard lock(reportsMutex);
       reports.push_back({current, failure});
     };
@@ -425,7 +425,7 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
       const QString path = module->input->shownPath(*module->component);
       QByteArray before;
       try {
-        before = fromStdin ? standardInput->bytes : host::readFileBytes(module->component->filePath());
+        before = fromStdin ? standardInput->bytes : fileio::readFileBytes(module->component->filePath());
       } catch (const ide::Error& error) {
         printError(namingFileOnce(path, error.description()));
         return kInputError;
@@ -458,14 +458,14 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
       components.push_back(module->component);
     host::addToBatch(batch, components);
     batch.commit();
-  } catch (const host::FilesChangedOnDisk& error) {
+  } catch (const fileio::FilesChangedOnDisk& error) {
     for (const QString& path : error.changed)
       printError(QStringLiteral("%1: changed by another program since it was read").arg(path));
     for (const QString& path : error.deleted)
       printError(QStringLiteral("%1: deleted by another program since it was read").arg(path));
     printError(QStringLiteral("nothing was written"));
     return kOutputError;
-  } catch (const host::SaveHalfDone& error) {
+  } catch (const fileio::SaveHalfDone& error) {
     printError(error.description());
     return kPartlyWritten;
   } catch (const ide::Error& error) {

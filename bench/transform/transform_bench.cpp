@@ -24,13 +24,13 @@ const gen::TemporaryGroup& corpus() {
 struct Model {
   std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
   ide::Ref<ide::VBProject> project;
-  transform::WalkContext context{QStringLiteral("bench"), &vbe->Platform().loop(), nullptr};
+  walk::WalkContext context{QStringLiteral("bench"), &vbe->Platform().loop(), nullptr};
   int failures = 0;
 
   Model() {
     project = vbe->open(corpus().projectFile()).front();
-    context.onFailure = [this](const transform::WalkFailure&) { ++failures; };
-    context.onLineSkipped = [this](const transform::WalkFailure&) { ++failures; };
+    context.onFailure = [this](const walk::WalkFailure&) { ++failures; };
+    context.onLineSkipped = [this](const walk::WalkFailure&) { ++failures; };
   }
   void number(bool add) { transform::NumberingWalk(context, 10000, 5).NumberProject(project, add); }
 };

@@ -9,6 +9,8 @@
 
 namespace transform {
 
+using namespace walk;
+
 NumberBox::NumberBox(QWidget* parent) : QLineEdit(parent) {
   // The validator stops typed letters; pasting is refused as a whole below, as the IDE's boxes do.
   setValidator(new QRegularExpressionValidator(QRegularExpression(QStringLiteral("[0-9]*")), this));

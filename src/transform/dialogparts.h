@@ -14,9 +14,6 @@ class QProgressBar;
 
 namespace transform {
 
-// The transforms are walks: the walk framework's names read as their own.
-using namespace walk;
-
 /// An edit box that takes digits only: letters can be neither typed nor pasted (Ctrl+V, Shift+Insert,
 /// a context menu or a drop). Getting the focus selects the whole text, so a new value replaces the old.
 class NumberBox final : public QLineEdit {
@@ -32,7 +29,7 @@ class NumberBox final : public QLineEdit {
 
 /// A QProgressBar seen by the walks. Visibility is the bar's own (shown or hidden by the dialog's
 /// run), not whether the dialog is on screen.
-class ProgressBarSink final : public ProgressSink {
+class ProgressBarSink final : public walk::ProgressSink {
  public:
   explicit ProgressBarSink(QProgressBar& bar) : m_bar(bar) {}
 
@@ -52,11 +49,12 @@ class ProgressBarSink final : public ProgressSink {
 /// What a dialog says about a failure of its walk over `scope`: `message` (the walk's fixed text), then the
 /// module (when the walk did not name it, the one the scope walks) and the code-window line it happened
 /// at, and why, in the dialog's language.
-QString walkFailureText(const QString& message, const WalkFailure& failure, ide::VBE& vbe, PROG_MODE scope);
+QString walkFailureText(const QString& message, const walk::WalkFailure& failure, ide::VBE& vbe,
+                        walk::PROG_MODE scope);
 
 /// The fixed message of a failed run over `scope`: the indentation's (5130, 5129, 5128) for `indenting`,
 /// else the numbering's (5121, 5122, 5123).
-int walkMessageId(PROG_MODE scope, bool indenting);
+int walkMessageId(walk::PROG_MODE scope, bool indenting);
 
 /// Shows the arrow-and-hourglass cursor while it lives.
 class BusyCursor {

@@ -17,6 +17,8 @@
 
 namespace transform {
 
+using namespace walk;
+
 namespace {
 
 // The numbering that number-and-indent applies when the indenter hands it the run.

@@ -25,9 +25,6 @@ class QRadioButton;
 
 namespace transform {
 
-// The transforms are walks: the walk framework's names read as their own.
-using namespace walk;
-
 /// Idle → Running (Indent disabled, "&Cancelar") → the dialog closes itself at the end of the run.
 /// Cancel during a run ends the walk at its next yield. The unit and the choice of tabs or spaces are
 /// read from the settings when the dialog opens and written back when it closes.
@@ -65,8 +62,8 @@ class frmIndenter final : public QDialog {
   void cmdIndent_Click();
   void cmdCancel_Click();
   void cancelRun();
-  void walk(PROG_MODE scope, qint32 unit);
-  PROG_MODE scope() const;
+  void walk(walk::PROG_MODE scope, qint32 unit);
+  walk::PROG_MODE scope() const;
   void Form_Unload();
 
   ide::Ref<ide::VBE> m_vbe;
@@ -83,7 +80,7 @@ class frmIndenter final : public QDialog {
   QGroupBox* m_frUse;
 
   ProgressBarSink m_bar;
-  WalkContext m_context;
+  walk::WalkContext m_context;
   std::unique_ptr<CNumIndent> m_numIndent;
   ide::Connection m_numIndentError;
   bool m_running = false;

@@ -19,6 +19,8 @@
 
 namespace transform {
 
+using namespace walk;
+
 namespace {
 
 // How long the finished run stays on screen before the dialog closes itself.

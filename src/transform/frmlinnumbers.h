@@ -26,9 +26,6 @@ class QRadioButton;
 
 namespace transform {
 
-// The transforms are walks: the walk framework's names read as their own.
-using namespace walk;
-
 /// Idle (bar hidden, Add and Remove enabled, "&Fechar") → Running (bar shown, both disabled,
 /// "&Cancelar") → a second after the run the dialog closes itself. Cancel during a run ends the walk at
 /// its next yield and closes the dialog; so does closing the window. Message boxes go through the IDE's
@@ -73,9 +70,9 @@ class frmLinNumbers final : public QDialog {
   void cmdCancel_Click();
   void cancelRun();
   void run(bool add);
-  void walk(PROG_MODE scope, bool add);
+  void walk(walk::PROG_MODE scope, bool add);
   bool readBox(QLineEdit* box, qint32& field, int messageId);
-  PROG_MODE scope() const;
+  walk::PROG_MODE scope() const;
   void closeAfterWait();
   void backToIdle();
   void killCloseTimer();
@@ -99,7 +96,7 @@ class frmLinNumbers final : public QDialog {
   qint32 m_startNumber = 0;
   qint32 m_interval = 0;
   ProgressBarSink m_bar;
-  WalkContext m_context;
+  walk::WalkContext m_context;
   std::unique_ptr<CNumIndent> m_numIndent;
   ide::Connection m_numIndentError;
   std::optional<BusyCursor> m_cursor;

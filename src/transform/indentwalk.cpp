@@ -9,6 +9,8 @@
 
 namespace transform {
 
+using namespace walk;
+
 IndentationWalk::IndentationWalk(WalkContext& context, IndentMode mode, qint32 spaces)
     : m_context(context), m_indenter(mode, spaces) {}
 

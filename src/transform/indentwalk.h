@@ -8,9 +8,6 @@
 
 namespace transform {
 
-// The transforms are walks: the walk framework's names read as their own.
-using namespace walk;
-
 /// Re-indents code. Walks report their failures through the context with their fixed messages (5130 for
 /// a project, 5129 for a module, 5128 for a member or the current procedure) and end; a line that cannot
 /// be rewritten is passed over. Progress: every procedure advances the bar by its line count, every
@@ -18,7 +15,7 @@ using namespace walk;
 class IndentationWalk {
  public:
   /// `spaces` is the unit in space mode (at least 1; ide::Error 5 otherwise).
-  IndentationWalk(WalkContext& context, IndentMode mode, qint32 spaces);
+  IndentationWalk(walk::WalkContext& context, IndentMode mode, qint32 spaces);
 
   void IndentProject(const ide::Ref<ide::VBProject>& project);
   /// The procedures of every method and property, then the declarations (unless cancelled).
@@ -35,18 +32,18 @@ class IndentationWalk {
   /// The same for the procedure at its place.
   void IndentProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
   /// Indents a procedure's lines in memory, as IndentProcedure does in the module.
-  void indentText(ProcedureText& text);
+  void indentText(walk::ProcedureText& text);
 
   /// Indents the declarations section: Type, Enum and #If blocks one unit in, the rest at the margin.
   void IndentDeclarations(ide::CodeModule& module);
 
  private:
   /// Sets the indenter up for a procedure; returns whether its header goes on on the next line.
-  bool beginProcedure(const ProcedureText& text);
+  bool beginProcedure(const walk::ProcedureText& text);
 
-  WalkContext& m_context;
+  walk::WalkContext& m_context;
   Indenter m_indenter;
-  ProcedureCache m_procedures;
+  walk::ProcedureCache m_procedures;
 };
 
 }  // namespace transform

@@ -10,6 +10,8 @@
 
 namespace transform {
 
+using namespace walk;
+
 NumberingWalk::NumberingWalk(WalkContext& context, qint32 startNumber, qint32 interval)
     : m_context(context), m_startNumber(startNumber), m_interval(interval) {}
 

@@ -9,16 +9,13 @@
 
 namespace transform {
 
-// The transforms are walks: the walk framework's names read as their own.
-using namespace walk;
-
 /// Adds or removes line numbers. Walks report their failures through the context with their fixed
 /// messages (5121 for a project, 5122 for a module, 5123 for a member or the current procedure) and end;
 /// a line that cannot be rewritten is passed over. A line number past the 32-bit range stops the run.
 class NumberingWalk {
  public:
   /// Every procedure is numbered from `startNumber` in steps of `interval`.
-  NumberingWalk(WalkContext& context, qint32 startNumber, qint32 interval);
+  NumberingWalk(walk::WalkContext& context, qint32 startNumber, qint32 interval);
 
   /// Every component of `project` with code, related documents passed over.
   void NumberProject(const ide::Ref<ide::VBProject>& project, bool add);
@@ -42,7 +39,7 @@ class NumberingWalk {
 
   /// Numbers (`add`) or unnumbers a procedure's lines in memory, as the two walks above do in the module:
   /// number-and-indent writes each line once, numbered and indented.
-  void numberText(ProcedureText& text, bool add) const;
+  void numberText(walk::ProcedureText& text, bool add) const;
 
   /// Gives each numbered line the number `numberOf` returns for its module line, instead of counting from
   /// the start number (the command-line tool's numbers that are the lines of the file).
@@ -57,11 +54,11 @@ class NumberingWalk {
   /// The running number a procedure starts from; a line number overflow when it leaves the 32-bit range.
   qint32 numberBeforeFirst() const;
 
-  WalkContext& m_context;
+  walk::WalkContext& m_context;
   qint32 m_startNumber;
   qint32 m_interval;
   std::function<qint32(int)> m_numberOf;
-  ProcedureCache m_procedures;
+  walk::ProcedureCache m_procedures;
 };
 
 }  // namespace transform

@@ -6,6 +6,8 @@
 
 namespace transform {
 
+using namespace walk;
+
 NumIndentWalk::NumIndentWalk(WalkContext& context, qint32 startNumber, qint32 interval, IndentMode mode,
                              qint32 spaces, bool add)
     : m_context(context),

@@ -16,8 +16,8 @@ namespace transform {
 /// the next component or member; a line number past the 32-bit range stops the run.
 class NumIndentWalk {
  public:
-  NumIndentWalk(WalkContext& context, qint32 startNumber, qint32 interval, IndentMode mode, qint32 spaces,
-                bool add);
+  NumIndentWalk(walk::WalkContext& context, qint32 startNumber, qint32 interval, IndentMode mode,
+                qint32 spaces, bool add);
 
   void NumIndentProject(const ide::Ref<ide::VBProject>& project);
   /// Every method and property, then the declarations (indented, never numbered).
@@ -35,11 +35,11 @@ class NumIndentWalk {
   void memberProcedures(const ide::Ref<ide::CodeModule>& module, const ide::Ref<ide::Member>& member);
   void numIndentProcedure(ide::CodeModule& module, const ide::ProcExtent& extent);
 
-  WalkContext& m_context;
+  walk::WalkContext& m_context;
   NumberingWalk m_numbering;
   IndentationWalk m_indentation;
   bool m_add;
-  ProcedureCache m_procedures;
+  walk::ProcedureCache m_procedures;
 };
 
 /// The number-and-indent command: one run over a scope of the IDE, reporting on the caller's progress
@@ -55,26 +55,26 @@ class CNumIndent {
   /// the procedure at the caret (`Unit`). `Use` chooses spaces (`lngSpaces` per level) over one tab per
   /// level. `Progbar` may be null. Raises Begining, then Error for each failure, then Finished unless
   /// cancelled.
-  void DoIt(PROG_MODE Unit, ProgressSink* Progbar, qint32 StartNumber, qint32 lngInterval, bool Use,
-            qint32 lngSpaces, bool add);
+  void DoIt(walk::PROG_MODE Unit, walk::ProgressSink* Progbar, qint32 StartNumber, qint32 lngInterval,
+            bool Use, qint32 lngSpaces, bool add);
   /// Ends a run at its next yield. May be called from work the IDE's loop runs during DoIt.
   void Cancel();
 
   /// The least time between two runs of the IDE's loop during a walk (tests set 0 to yield every time).
-  void setYieldInterval(WalkContext::Clock::duration interval) { m_yieldInterval = interval; }
+  void setYieldInterval(walk::WalkContext::Clock::duration interval) { m_yieldInterval = interval; }
 
   ide::Signal<> Begining;
   /// The error number, a blank, its description, a line feed and where it happened.
   ide::Signal<const QString& /*strError*/> Error;
   /// The same failure, with the walk, module and line it happened in (raised just before Error).
-  ide::Signal<const WalkFailure&> Failed;
+  ide::Signal<const walk::WalkFailure&> Failed;
   ide::Signal<> Finished;
 
  private:
   ide::Ref<ide::VBE> m_vbe;
-  WalkContext* m_context = nullptr;  // the running walk's context, for Cancel
+  walk::WalkContext* m_context = nullptr;  // the running walk's context, for Cancel
   bool m_cancel = false;
-  WalkContext::Clock::duration m_yieldInterval = std::chrono::milliseconds(5);
+  walk::WalkContext::Clock::duration m_yieldInterval = std::chrono::milliseconds(5);
 };
 
 }  // namespace transform

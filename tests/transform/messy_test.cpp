@@ -14,6 +14,8 @@
 #include <random>
 
 namespace transform {
+
+using namespace walk;
 namespace {
 
 using test::Ide;

@@ -14,6 +14,8 @@
 #include <limits>
 
 namespace transform {
+
+using namespace walk;
 namespace {
 
 using test::Ide;

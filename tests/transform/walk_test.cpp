@@ -20,6 +20,8 @@
 #include <limits>
 
 namespace transform {
+
+using namespace walk;
 namespace {
 
 using test::Ide;

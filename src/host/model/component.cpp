@@ -16,6 +16,8 @@
 #include <QFileInfo>
 
 namespace host {
+
+using namespace fileio;
 namespace {
 
 bool hasModuleText(ide::ComponentType type) {

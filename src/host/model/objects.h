@@ -21,9 +21,6 @@
 
 namespace host {
 
-// The model reads and writes its files through the file layer's base; its names read as the model's own.
-using namespace fileio;
-
 class VbeImpl;
 class ProjectImpl;
 class ComponentImpl;
@@ -40,23 +37,23 @@ class ControlImpl;
 /// component or project notes what it saved and the file event is fired.
 struct SaveBatch {
   /// Told the file's new stamp, or null when the file does not hold its new content.
-  using Done = std::function<void(const FileStamp* written)>;
+  using Done = std::function<void(const fileio::FileStamp* written)>;
   SaveBatch();
   ~SaveBatch();
-  void add(FileWriteBatch::File file, Done done);
+  void add(fileio::FileWriteBatch::File file, Done done);
   /// Several files at once, written side by side.
-  void addAll(std::vector<FileWriteBatch::File> files, std::vector<Done> done);
+  void addAll(std::vector<fileio::FileWriteBatch::File> files, std::vector<Done> done);
   /// Commits the files, then runs every `done`, also when the commit fails (which is thrown then).
   void commit();
 
-  std::unique_ptr<FileWriteBatch> files;
+  std::unique_ptr<fileio::FileWriteBatch> files;
   std::vector<Done> done;
 };
 
 /// The stamp of what was read from `path`, when `stamp` was taken of that path.
-std::optional<FileStamp> stampFor(const std::optional<FileStamp>& stamp, const QString& path);
+std::optional<fileio::FileStamp> stampFor(const std::optional<fileio::FileStamp>& stamp, const QString& path);
 /// Takes a new stamp when `stamp` is one of `paths` (the user chose to overwrite what is there now).
-void restampIfListed(std::optional<FileStamp>& stamp, const QStringList& paths);
+void restampIfListed(std::optional<fileio::FileStamp>& stamp, const QStringList& paths);
 
 /// The kind of file a component is kept in, as file events report it.
 ide::FileType fileTypeOf(ide::ComponentType type);
@@ -227,7 +224,7 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   /// What to do once the batch holding this component's file is done: note it saved, tell the IDE.
   SaveBatch::Done whenWritten();
   /// The file as it was read or last written (to tell whether another program changed it since).
-  std::optional<FileStamp> fileStamp() const { return stampFor(m_stamp, m_filePath); }
+  std::optional<fileio::FileStamp> fileStamp() const { return stampFor(m_stamp, m_filePath); }
   /// The file on disk becomes the one to overwrite, whatever another program did to it.
   void acceptFileOnDisk(const QStringList& paths) {
     restampIfListed(m_stamp, paths);
@@ -273,8 +270,8 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   std::shared_ptr<WindowImpl> m_designerWindow;
   quint64 m_savedChangeCount = 0;
   bool m_changed = false;  // header, form or name changed since the last save
-  std::optional<FileStamp> m_stamp;
-  std::optional<FileStamp> m_binaryStamp;  // the form's binary file as read or last written
+  std::optional<fileio::FileStamp> m_stamp;
+  std::optional<fileio::FileStamp> m_binaryStamp;  // the form's binary file as read or last written
 };
 
 /// Adds the files of several components to `batch`, put together side by side.
@@ -377,7 +374,7 @@ class ProjectImpl final : public ide::VBProject,
   std::vector<bool> m_entryMissing;
   bool m_changed = false;
   bool m_detached = false;
-  std::optional<FileStamp> m_stamp;
+  std::optional<fileio::FileStamp> m_stamp;
 };
 
 }  // namespace host

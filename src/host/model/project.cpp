@@ -10,6 +10,8 @@
 #include <QFileInfo>
 
 namespace host {
+
+using namespace fileio;
 namespace {
 
 ide::ComponentType typeOfEntry(ComponentKind kind) {

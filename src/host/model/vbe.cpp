@@ -16,6 +16,8 @@
 #include <QFileInfo>
 
 namespace host {
+
+using namespace fileio;
 namespace {
 
 template <class T>

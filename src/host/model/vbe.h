@@ -173,7 +173,7 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   std::unique_ptr<GroupFile> m_group;
   bool m_groupChanged = false;
   std::vector<MissingFile> m_missingProjects;
-  std::optional<FileStamp> m_groupStamp;
+  std::optional<fileio::FileStamp> m_groupStamp;
   std::function<void(int)> m_commandHandler;
 };
 
