@@ -8,16 +8,7 @@
 # Usage: bench/cli/list_scaling.sh [BUILD_DIR]   (default: build; build it in Release first)
 set -euo pipefail
 
-build=${1:-build}
-quimbel="$build/bin/quimbel"
-generator="$build/bin/quimbel-gen"
-for tool in "$quimbel" "$generator"; do
-  [ -x "$tool" ] || { echo "list_scaling: $tool is missing; build the quimbel and quimbel-gen targets" >&2; exit 2; }
-done
-
-work=$(mktemp -d)
-trap 'rm -rf "$work"' EXIT
-export QUIMBEL_CONFIG_DIR="$work/config"
+source "$(dirname "$0")/../tools.sh" "${1:-build}"
 
 sizes=(250000 1000000 2000000)
 # Processor time (user + system) is what grows with the work; the wall clock of a busy machine is shown too.

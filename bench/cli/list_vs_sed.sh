@@ -7,22 +7,11 @@
 # Usage: bench/cli/list_vs_sed.sh [BUILD_DIR]   (default: build; build it in Release first)
 set -euo pipefail
 
-build=${1:-build}
-quimbel="$build/bin/quimbel"
-generator="$build/bin/quimbel-gen"
-for tool in "$quimbel" "$generator"; do
-  [ -x "$tool" ] || { echo "list_vs_sed: $tool is missing; build the quimbel and quimbel-gen targets" >&2; exit 2; }
-done
-
-work=$(mktemp -d)
-trap 'rm -rf "$work"' EXIT
-export QUIMBEL_CONFIG_DIR="$work/config"
+source "$(dirname "$0")/../tools.sh" "${1:-build}"
 "$generator" --lines 1000000 --components 200 --seed 7 "$work/source" > /dev/null
 mapfile -t files < <(find "$work/source" -type f \( -name '*.bas' -o -name '*.cls' -o -name '*.frm' \))
 cat "${files[@]}" > /dev/null  # both start from a warm page cache
 
-now() { date +%s.%N; }
-best() { printf '%s\n' "$@" | sort -g | head -n 1; }
 tool_times=()
 sed_times=()
 for run in 1 2 3; do

@@ -8,20 +8,10 @@
 # Usage: bench/find/find_vs_grep.sh [BUILD_DIR]   (default: build; build it in Release first)
 set -euo pipefail
 
-build=${1:-build}
-quimbel="$build/bin/quimbel"
-generator="$build/bin/quimbel-gen"
-for tool in "$quimbel" "$generator"; do
-  [ -x "$tool" ] || { echo "find_vs_grep: $tool is missing; build the quimbel and quimbel-gen targets" >&2; exit 2; }
-done
-
-work=$(mktemp -d)
-trap 'rm -rf "$work"' EXIT
+source "$(dirname "$0")/../tools.sh" "${1:-build}"
 "$generator" --lines 1000000 --components 200 --projects 4 --seed 7 "$work/source" > /dev/null
 word=Boolean
 
-now() { date +%s.%N; }
-best() { printf '%s\n' "$@" | sort -g | head -n 1; }
 
 cat "$work"/source/*/* > /dev/null  # both start from a warm page cache
 # One word with tens of thousands of occurrences, one with none: reading and printing are both measured.

@@ -8,23 +8,11 @@
 # Usage: bench/transform/numindent_vs_sed.sh [BUILD_DIR]   (default: build; build it in Release first)
 set -euo pipefail
 
-build=${1:-build}
-quimbel="$build/bin/quimbel"
-generator="$build/bin/quimbel-gen"
-for tool in "$quimbel" "$generator"; do
-  [ -x "$tool" ] || { echo "numindent_vs_sed: $tool is missing; build the quimbel and quimbel-gen targets" >&2; exit 2; }
-done
-
-work=$(mktemp -d)
-trap 'rm -rf "$work"' EXIT
-# The settings' defaults (start 10000, interval 5, tabs), not the user's.
-export QUIMBEL_CONFIG_DIR="$work/config"
+source "$(dirname "$0")/../tools.sh" "${1:-build}"
 
 "$generator" --lines 1000000 --components 200 --seed 7 "$work/source" > /dev/null
 project=Projeto1/Projeto1.vbp
 
-now() { date +%s.%N; }
-best() { printf '%s\n' "$@" | sort -g | head -n 1; }
 
 tool_times=()
 sed_times=()
