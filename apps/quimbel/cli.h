@@ -64,9 +64,8 @@ std::optional<QStringList> expandInputs(const InputOptions& options);
 /// Applies --encoding for the whole run.
 void useEncoding(const InputOptions& options);
 
-/// Warns on standard error that a module read in the ANSI code page is UTF-8: when `bytes` are (the
-/// other form has been checked).
-void warnIfUtf8(const QString& shownPath, QByteArrayView bytes);
+/// Warns on standard error that a module read in the ANSI code page is UTF-8 (as its component or the
+/// fast scan found it).
 void warnUtf8(const QString& shownPath);
 
 /// The same file as another path (links followed), for running over each file once.

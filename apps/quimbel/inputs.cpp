@@ -102,10 +102,6 @@ void useEncoding(const InputOptions& options) {
   host::setSourceEncoding(options.utf8 ? host::SourceEncoding::Utf8 : host::SourceEncoding::Ansi);
 }
 
-void warnIfUtf8(const QString& shownPath, QByteArrayView bytes) {
-  if (host::sourceEncoding() == host::SourceEncoding::Ansi && host::looksLikeUtf8(bytes)) warnUtf8(shownPath);
-}
-
 void warnUtf8(const QString& shownPath) {
   printError(QStringLiteral("%1: warning: this module is UTF-8, but VB6 modules are in the ANSI code page "
                             "(Windows-1252), in which each of its accented letters reads as two characters; "

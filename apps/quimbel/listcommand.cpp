@@ -157,10 +157,7 @@ int runList(const ListOptions& options) {
       if (options.input.exclusions.excludes(component->filePath())) continue;
       const QString path = shownPath(component->filePath());
       auto module = component->codeModule();
-      if (module) {
-        QFile file(component->filePath());
-        if (file.open(QIODevice::ReadOnly)) warnIfUtf8(path, file.readAll());
-      }
+      if (module && component->looksLikeUtf8()) warnUtf8(path);
       if (options.json) {
         components.append(componentJson(*component, path));
         continue;

@@ -328,13 +328,9 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
     totalUnits += unitsOf(unit, progressUnitOf(walks.back()));
   }
   const qint32 range = qint32(std::min<qint64>(totalUnits, std::numeric_limits<qint32>::max()));
-  if (!fromStdin)
-    for (const Walked& module : walked) {
-      QFile file(module.component->filePath());
-      if (file.open(QIODevice::ReadOnly))
-        warnIfUtf8(module.input->shownPath(*module.component), file.readAll());
-    }
-  if (fromStdin) warnIfUtf8(standardInput->name, standardInput->bytes);
+  for (const Walked& module : walked)
+    if (module.component->looksLikeUtf8())
+      warnUtf8(fromStdin ? standardInput->name : module.input->shownPath(*module.component));
 
   struct Report {
     size_t unit;

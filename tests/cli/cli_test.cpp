@@ -972,6 +972,9 @@ TEST(Encoding, AUtf8ModuleIsNamedAndUtf8ReadsAndWritesItByteForByte) {
   EXPECT_EQ(result.code, 1);
   EXPECT_TRUE(result.err.startsWith(u"quimbel: Calculo.bas: warning: this module is UTF-8"_qs))
       << result.err.toStdString();
+  for (const QStringList& other : {QStringList{u"list"_qs}, QStringList{u"indent"_qs, u"--check"_qs}})
+    EXPECT_EQ(tool.run(other + QStringList{u"Calculo.bas"_qs}, work.dir.path()).err.count(u"is UTF-8"_qs), 1)
+        << other.join(u' ').toStdString();
   result =
       tool.run({u"find"_qs, u"--encoding"_qs, u"utf-8"_qs, u"preços"_qs, u"Calculo.bas"_qs}, work.dir.path());
   EXPECT_EQ(result.out, u"Calculo.bas:3:14: ' Cálculo de preços\n"_qs);

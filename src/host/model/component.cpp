@@ -1,7 +1,5 @@
 // SPDX-License-Identifier: MIT
 // Components: their files, names, code modules, designers and windows.
-#include <QElapsedTimer>
-#include <cstdio>
 #include "fileio/fileio.h"
 #include "fileio/parallel.h"
 #include "host/files/ansi.h"
@@ -160,7 +158,9 @@ void ComponentImpl::load() {
     return;
   }
   FileStamp stamp;
-  adopt(parseModule(readFileBytes(m_filePath, &stamp), m_filePath));
+  const QByteArray bytes = readFileBytes(m_filePath, &stamp);
+  m_looksLikeUtf8 = sourceEncoding() == SourceEncoding::Ansi && host::looksLikeUtf8(bytes);
+  adopt(parseModule(bytes, m_filePath));
   m_stamp = std::move(stamp);
   if (m_name.isEmpty()) m_name = QFileInfo(m_filePath).completeBaseName();
   loadBinary();

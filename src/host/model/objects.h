@@ -247,6 +247,9 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   /// yet, the one the IDE gives it after the form's file (or name).
   QString binaryFileName();
   bool hasCode() const { return m_module != nullptr; }
+  /// The module's file, as last read, is UTF-8 with accented letters although modules are read in the
+  /// ANSI code page (a file another editor wrote): worth a warning.
+  bool looksLikeUtf8() const { return m_looksLikeUtf8; }
   bool hasDesigner() const { return m_source.form.has_value(); }
   void markChanged() { m_changed = true; }
   /// Left the IDE: removed from its project or its project closed.
@@ -270,6 +273,7 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   std::shared_ptr<WindowImpl> m_designerWindow;
   quint64 m_savedChangeCount = 0;
   bool m_changed = false;  // header, form or name changed since the last save
+  bool m_looksLikeUtf8 = false;
   std::optional<fileio::FileStamp> m_stamp;
   std::optional<fileio::FileStamp> m_binaryStamp;  // the form's binary file as read or last written
 };
