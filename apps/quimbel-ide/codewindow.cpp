@@ -301,14 +301,10 @@ void CodeWindow::updateView() {
       return;
     }
     const int line = std::min(m_binding->pane()->selection().startLine, std::max(1, text.countOfLines()));
-    const std::vector<ide::ProcExtent> extents = text.procedureExtents();
-    const auto around = std::find_if(extents.begin(), extents.end(), [line](const ide::ProcExtent& extent) {
-      return line >= extent.startLine && line < extent.startLine + extent.countLines;
-    });
-    if (around == extents.end())
-      m_editor->showLines(1, std::max(1, text.countOfDeclarationLines()));
-    else
+    if (const auto around = text.extentOfLine(line))
       m_editor->showLines(around->startLine, around->startLine + around->countLines - 1);
+    else
+      m_editor->showLines(1, std::max(1, text.countOfDeclarationLines()));
   } catch (const ide::Error& error) {
     // A module the index cannot answer for is shown whole.
     qCDebug(lcIde) << "the code window shows its whole module:" << error.description();

@@ -414,26 +414,37 @@ std::vector<ide::ProcExtent> CodeText::procedureExtents() {
   const Index& idx = index();
   std::vector<ide::ProcExtent> extents;
   extents.reserve(idx.procs.size());
-  for (size_t i = 0; i < idx.procs.size(); ++i) {
-    const ProcInfo& proc = idx.procs[i];
-    const int start = startLineOf(i);
-    extents.push_back(
-        {proc.name, proc.kind, start, proc.bodyLine, proc.headerEnd, lastLineOf(i) - start + 1});
-  }
+  for (size_t i = 0; i < idx.procs.size(); ++i)
+    extents.push_back(extentAt(i));
   return extents;
 }
 
-QString CodeText::procOfLine(int line, ide::ProcKind& kind) {
+ide::ProcExtent CodeText::extentAt(size_t i) const {
+  const ProcInfo& proc = m_index->procs[i];
+  const int start = startLineOf(i);
+  return {proc.name, proc.kind, start, proc.bodyLine, proc.headerEnd, lastLineOf(i) - start + 1};
+}
+
+const ProcInfo* CodeText::owner(int line) {
   checkLineNumber(line, countOfLines());
   const Index& idx = index();
-  kind = ide::ProcKind::Proc;
-  if (idx.procs.empty() || line <= idx.declarationLines) return {};
+  if (idx.procs.empty() || line <= idx.declarationLines) return nullptr;
   // The owner is the first procedure whose End line is at or below the line; the last one owns the rest.
   auto it = std::lower_bound(idx.procs.begin(), idx.procs.end(), line,
                              [](const ProcInfo& proc, int value) { return proc.endLine < value; });
-  if (it == idx.procs.end()) it = std::prev(idx.procs.end());
-  kind = it->kind;
-  return it->name;
+  return it == idx.procs.end() ? &idx.procs.back() : &*it;
+}
+
+QString CodeText::procOfLine(int line, ide::ProcKind& kind) {
+  const ProcInfo* proc = owner(line);
+  kind = proc ? proc->kind : ide::ProcKind::Proc;
+  return proc ? proc->name : QString();
+}
+
+std::optional<ide::ProcExtent> CodeText::extentOfLine(int line) {
+  const ProcInfo* proc = owner(line);
+  if (!proc) return std::nullopt;
+  return extentAt(static_cast<size_t>(proc - m_index->procs.data()));
 }
 
 const std::vector<MemberInfo>& CodeText::members() {

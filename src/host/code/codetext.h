@@ -103,6 +103,8 @@ class CodeText {
   const std::vector<ProcInfo>& procedures();
   /// Every procedure in line order with its extent, found by its place (not by its name).
   std::vector<ide::ProcExtent> procedureExtents();
+  /// The extent of the procedure that holds `line`; nothing for a line of the declarations.
+  std::optional<ide::ProcExtent> extentOfLine(int line);
 
   const std::vector<MemberInfo>& members();
   std::optional<MemberInfo> member(QStringView name);
@@ -154,9 +156,13 @@ class CodeText {
   bool continuesStructural(int lineNumber) const;
   /// The name a header declares when `lineNumber` is one of its lines, else empty.
   QString headerNameAt(int lineNumber) const;
+  /// The procedure that holds `line` (checked), or none for a line of the declarations.
+  const ProcInfo* owner(int line);
   /// The first and last line of the extent of procedure `i` of the index.
   int startLineOf(size_t i) const;
   int lastLineOf(size_t i) const;
+  /// Procedure `i` of the index with its extent.
+  ide::ProcExtent extentAt(size_t i) const;
   QString statementText(int firstLine, int lastLine) const;
   int statementEnd(int firstLine) const;
   int memberAnchorLine(QStringView member);
