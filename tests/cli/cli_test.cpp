@@ -114,41 +114,32 @@ struct Workspace {
 TEST(CommandLine, BadCommandLinesExitWithTwoAndSayWhy) {
   Workspace work;
   Tool tool;
-  const QList<QStringList> bad = {
-      {},
-      {u"renumber"_qs, work.file},
-      {u"number"_qs},
-      {u"number"_qs, u"--bogus"_qs, work.file},
-      {u"number"_qs, u"--start"_qs, u"dez"_qs, work.file},
-      {u"number"_qs, u"--start"_qs, u"-5"_qs, work.file},
-      {u"number"_qs, u"--interval"_qs, u"0"_qs, work.file},
-      {u"number"_qs, u"--start"_qs, u"99999999999"_qs, work.file},
-      {u"number"_qs, u"--tabs"_qs, work.file},
-      {u"indent"_qs, u"--spaces"_qs, u"0"_qs, work.file},
-      {u"indent"_qs, u"--tabs"_qs, u"--spaces"_qs, u"2"_qs, work.file},
-      {u"indent"_qs, u"--remove"_qs, work.file},
-      {u"unnumber"_qs, u"--module"_qs, u"Calculo"_qs, u"--procedure"_qs, u"Calculo.Preco"_qs, work.file},
+  const std::pair<QStringList, QString> bad[] = {
+      {{}, {}},
+      {{u"renumber"_qs, work.file}, {}},
+      {{u"number"_qs}, {}},
+      {{u"number"_qs, u"--bogus"_qs, work.file}, {}},
+      {{u"number"_qs, u"--start"_qs, u"dez"_qs, work.file}, {}},
+      {{u"number"_qs, u"--start"_qs, u"-5"_qs, work.file}, {}},
+      {{u"number"_qs, u"--interval"_qs, u"0"_qs, work.file}, {}},
+      {{u"number"_qs, u"--start"_qs, u"99999999999"_qs, work.file}, {}},
+      {{u"number"_qs, u"--tabs"_qs, work.file}, {}},
+      {{u"indent"_qs, u"--spaces"_qs, u"0"_qs, work.file}, {}},
+      {{u"indent"_qs, u"--tabs"_qs, u"--spaces"_qs, u"2"_qs, work.file}, {}},
+      {{u"indent"_qs, u"--remove"_qs, work.file}, {}},
+      {{u"unnumber"_qs, u"--module"_qs, u"Calculo"_qs, u"--procedure"_qs, u"Calculo.Preco"_qs, work.file},
+       {}},
+      // A scope that names nothing.
+      {{u"number"_qs, u"--module"_qs, u"Nada"_qs, work.file}, u"no module 'Nada'"_qs},
+      {{u"number"_qs, u"--procedure"_qs, u"Calculo.Nada"_qs, work.file}, u"no procedure 'Calculo.Nada'"_qs},
+      {{u"number"_qs, u"--procedure"_qs, u"Preco"_qs, work.file}, u"MODULE.NAME"_qs},
   };
-  for (const QStringList& arguments : bad) {
+  for (const auto& [arguments, message] : bad) {
     const Result result = tool.run(arguments);
     EXPECT_EQ(result.code, 2) << arguments.join(u' ').toStdString();
     EXPECT_TRUE(result.err.startsWith(u"quimbel: "_qs)) << result.err.toStdString();
+    EXPECT_TRUE(result.err.contains(message)) << result.err.toStdString();
   }
-  EXPECT_EQ(work.bytes(), kCalculo);
-}
-
-TEST(CommandLine, AScopeThatNamesNothingIsAUsageError) {
-  Workspace work;
-  Tool tool;
-  Result result = tool.run({u"number"_qs, u"--module"_qs, u"Nada"_qs, work.file});
-  EXPECT_EQ(result.code, 2);
-  EXPECT_TRUE(result.err.contains(u"no module 'Nada'"_qs)) << result.err.toStdString();
-  result = tool.run({u"number"_qs, u"--procedure"_qs, u"Calculo.Nada"_qs, work.file});
-  EXPECT_EQ(result.code, 2);
-  EXPECT_TRUE(result.err.contains(u"no procedure 'Calculo.Nada'"_qs)) << result.err.toStdString();
-  result = tool.run({u"number"_qs, u"--procedure"_qs, u"Preco"_qs, work.file});
-  EXPECT_EQ(result.code, 2);
-  EXPECT_TRUE(result.err.contains(u"MODULE.NAME"_qs)) << result.err.toStdString();
   EXPECT_EQ(work.bytes(), kCalculo);
 }
 
@@ -206,29 +197,26 @@ TEST(UnreadableInput, ExitsWithThreeNamingTheFileAndWritesNothing) {
 }
 
 TEST(UnreadableInput, CodeTheCommandCannotRewriteStopsItAndNothingIsWritten) {
-  // Numbering would take this line past the IDE's 1023 characters.
+  // Numbering would take this line past the IDE's 1023 characters, or the numbers past the largest.
   const QByteArray longLine = "s = \"" + QByteArray(1015, 'a') + "\"";
-  Workspace work(
-      "Attribute VB_Name = \"Longo\"\r\nSub A()\r\nAttribute A.VB_Description = \"x\"\r\nx = 1\r\n" +
-      longLine + "\r\nEnd Sub\r\n");
-  const QByteArray before = work.bytes();
+  const std::tuple<QByteArray, QStringList, QString> runs[] = {
+      {"Attribute VB_Name = \"Longo\"\r\nSub A()\r\nAttribute A.VB_Description = \"x\"\r\nx = 1\r\n" +
+           longLine + "\r\nEnd Sub\r\n",
+       {},
+       u"Calculo.bas, line 5: Longo, line 3: Line too long"_qs},
+      {kCalculo,
+       {u"--start"_qs, u"2147483647"_qs, u"--interval"_qs, u"1"_qs},
+       u"line numbers would pass 2147483647"_qs},
+  };
   Tool tool;
-  const Result result = tool.run({u"number"_qs, work.file});
-  EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(u"Calculo.bas, line 5: Longo, line 3: Line too long"_qs))
-      << result.err.toStdString();
-  EXPECT_TRUE(result.err.contains(u"nothing was written"_qs)) << result.err.toStdString();
-  EXPECT_EQ(work.bytes(), before);
-}
-
-TEST(UnreadableInput, NumbersPastTheLargestStopTheRun) {
-  Workspace work;
-  Tool tool;
-  const Result result =
-      tool.run({u"number"_qs, u"--start"_qs, u"2147483647"_qs, u"--interval"_qs, u"1"_qs, work.file});
-  EXPECT_EQ(result.code, 3);
-  EXPECT_TRUE(result.err.contains(u"line numbers would pass 2147483647"_qs)) << result.err.toStdString();
-  EXPECT_EQ(work.bytes(), kCalculo);
+  for (const auto& [module, options, message] : runs) {
+    Workspace work(module);
+    const Result result = tool.run(QStringList{u"number"_qs} + options + QStringList{work.file});
+    EXPECT_EQ(result.code, 3);
+    EXPECT_TRUE(result.err.contains(message)) << result.err.toStdString();
+    EXPECT_TRUE(result.err.contains(u"nothing was written"_qs)) << result.err.toStdString();
+    EXPECT_EQ(work.bytes(), module);
+  }
 }
 
 // ---------------------------------------------------------------------------------------------------

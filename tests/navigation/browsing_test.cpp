@@ -120,23 +120,6 @@ TEST(Browsing, MovingElsewhereWhileBrowsingDropsThePlacesAheadAndRecordsNothing)
   EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseForward]);
 }
 
-TEST(Browsing, BackToAPlaceWhoseComponentWasRemovedEmptiesTheHistory) {
-  Browsing ide;
-  ide.go(ide.two, 1);
-  ide.stay(3000);
-  ide.go(ide.one, 1);
-  ide.stay(3000);
-  ASSERT_EQ(ide.places(), QStringList{u"modDois.Proc1"_qs});
-  // Removed while the program runs: the add-in leaves components alone then.
-  ide.addIn.vbe->setMode(ide::IdeMode::Run);
-  ide.two->Collection()->Remove(ide.two);
-  ide.addIn.vbe->setMode(ide::IdeMode::Design);
-  EXPECT_EQ(ide.histories().HistoryCount(), 1);
-  ide.addIn.clickToolBar(common::CommandId::BrowseBackward);
-  EXPECT_EQ(ide.histories().HistoryCount(), 0);
-  EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseBackward]);
-}
-
 TEST(Browsing, RemovingAComponentInDesignModeTakesOutItsPlaces) {
   Browsing ide;
   ide.go(ide.two, 1);

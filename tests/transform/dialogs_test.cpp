@@ -319,28 +319,19 @@ TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
   EXPECT_FALSE(scene.loop().activeTimers());
 }
 
-TEST(LineNumberingDialog, ACancelClickedAsTheRunStartsStopsTheOneCommandRouteToo) {
-  Scene scene(true);
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
-  dialog.show();
-  dialog.opNumbers(0)->setChecked(true);
-  scene.loop().post([&] { dialog.cmdCancel()->click(); });  // runs in the yield before the walk
-  dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first), kFirst);
-  EXPECT_EQ(linesOf(*scene.second), kSecond);
-  EXPECT_FALSE(dialog.isVisible());
-}
-
-TEST(LineNumberingDialog, ClosingTheWindowDuringARunCancelsIt) {
-  Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
-  dialog.show();
-  dialog.opNumbers(0)->setChecked(true);
-  scene.loop().post([&] { dialog.close(); });  // runs in the run's first yield
-  dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first), kFirst);
-  EXPECT_EQ(linesOf(*scene.second), kSecond);
-  EXPECT_FALSE(dialog.isVisible());
+TEST(LineNumberingDialog, ACancelOrACloseAsTheRunStartsStopsEitherRoute) {
+  for (const bool oneCommand : {true, false}) {
+    Scene scene(oneCommand);
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
+    dialog.show();
+    dialog.opNumbers(0)->setChecked(true);
+    // Runs in the run's first yield, before the walk.
+    scene.loop().post([&] { oneCommand ? dialog.cmdCancel()->click() : (void)dialog.close(); });
+    dialog.cmdAdd()->click();
+    EXPECT_EQ(linesOf(*scene.first), kFirst);
+    EXPECT_EQ(linesOf(*scene.second), kSecond);
+    EXPECT_FALSE(dialog.isVisible());
+  }
 }
 
 TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {
