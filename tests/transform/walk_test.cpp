@@ -87,33 +87,6 @@ QStringList indentedModule() {
   return lines;
 }
 
-// kModule numbered from 10000 in steps of 5 and indented with tabs: the numbers in a six-character column.
-QStringList numIndentedModule() {
-  const QString column(6, u' ');
-  QStringList lines = kModule;
-  lines[4] = column + u"\tByVal b As Long, _"_qs;
-  lines[5] = column + u"\tByVal c As Long)"_qs;
-  lines[6] = u"10000 \tDim x As Long"_qs;
-  lines[7] = u"10005 \tx = a + _"_qs;
-  lines[8] = column + u"\t\tb"_qs;
-  lines[9] = u"10010 \tSelect Case x"_qs;
-  lines[10] = column + u"\t\tCase 1"_qs;
-  lines[11] = u"10015 \t\t\tx = 2"_qs;
-  lines[12] = u"10020 \tEnd Select"_qs;
-  lines[13] = u"10025 \tIf x > 1 Then"_qs;
-  lines[14] = u"10030 \t\tx = 3"_qs;
-  lines[15] = u"10035 \tElse"_qs;
-  lines[16] = u"10040 \t\tx = 4"_qs;
-  lines[17] = u"10045 \tEnd If"_qs;
-  lines[18] = column + u"\tErro:"_qs;
-  lines[19] = column + u"\t' nota"_qs;
-  lines[20] = column + u"\t#If DEPURACAO Then"_qs;
-  lines[21] = u"10050 \t\tDebug.Print x"_qs;
-  lines[22] = column + u"\t#End If"_qs;
-  lines[27] = u"10000 \tBeta = 1"_qs;
-  return lines;
-}
-
 struct Failures {
   std::vector<WalkFailure> walks;
   std::vector<WalkFailure> lines;
@@ -298,20 +271,6 @@ TEST(IndentationWalk, IndentsProceduresAndLeavesDeclarationsAndTrailingCommentsA
   EXPECT_EQ(module->Members()->Count(), 3);
 }
 
-TEST(IndentationWalk, IndentingTwiceChangesNothingTheSecondTime) {
-  for (const IndentMode mode : {IndentMode::Spaces, IndentMode::Tabs}) {
-    Ide ide;
-    auto module = ide.addModule(kModule);
-    Walk run;
-    IndentationWalk(run.context, mode, 3).IndentModule(module);
-    const QStringList once = linesOf(*module);
-    const quint64 edits = Ide::edits(module);
-    IndentationWalk(run.context, mode, 3).IndentModule(module);
-    EXPECT_EQ(linesOf(*module), once);
-    EXPECT_EQ(Ide::edits(module), edits) << "lines that did not change were replaced";
-  }
-}
-
 TEST(IndentationWalk, DeclarationsIndentTypesAndEnums) {
   const QStringList lines = {
       u"Private Type Ponto"_qs, u"X As Long"_qs,    u"      Y As Long"_qs, u"   End Type"_qs,
@@ -430,18 +389,38 @@ TEST(Walks, ALineThatWouldGrowTooLongIsPassedOverAndTheWalkGoesOn) {
 // ---------------------------------------------------------------------------------------------------
 // Number-and-indent
 
-TEST(NumIndentWalk, NumbersThenIndentsEachProcedureInANumberColumn) {
+TEST(NumIndentWalk, AContinuedHeaderSitsInTheNumberColumn) {
   Ide ide;
   auto module = ide.addModule(kModule);
   Walk run;
   NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), numIndentedModule());
+  const QString column(6, u' ');
+  EXPECT_EQ(linesOf(*module).mid(3, 4),
+            (QStringList{kModule[3], column + u"\tByVal b As Long, _"_qs, column + u"\tByVal c As Long)"_qs,
+                         u"10000 \tDim x As Long"_qs}));
+}
 
-  // Renumbering widens each number's blank and re-indenting takes it away: no line is replaced at all.
-  const quint64 edits = Ide::edits(module);
-  NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), numIndentedModule());
-  EXPECT_EQ(Ide::edits(module), edits);
+// A line the walk would not change is not replaced: running again edits nothing.
+TEST(Walks, RunningASecondTimeReplacesNoLine) {
+  const std::function<void(WalkContext&, const ide::Ref<ide::CodeModule>&)> walks[] = {
+      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Spaces, 3).IndentModule(m); },
+      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Tabs, 3).IndentModule(m); },
+      // Renumbering widens each number's blank and re-indenting takes it away again.
+      [](WalkContext& c, auto& m) {
+        NumIndentWalk(c, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(m);
+      },
+  };
+  for (size_t w = 0; w < std::size(walks); ++w) {
+    Ide ide;
+    auto module = ide.addModule(kModule);
+    Walk run;
+    walks[w](run.context, module);
+    const QStringList once = linesOf(*module);
+    const quint64 edits = Ide::edits(module);
+    walks[w](run.context, module);
+    EXPECT_EQ(linesOf(*module), once) << "walk " << w;
+    EXPECT_EQ(Ide::edits(module), edits) << "walk " << w;
+  }
 }
 
 // ---------------------------------------------------------------------------------------------------
