@@ -108,29 +108,6 @@ struct Walk {
 // ---------------------------------------------------------------------------------------------------
 // Numbering
 
-TEST(NumberingWalk, RenumberingANumberedProcedureKeepsItsColumnAndIndentingTreatsItAsTheOriginal) {
-  const QStringList lines = {
-      u"Sub Gravar()"_qs,    u"10        On Error GoTo Erro"_qs,
-      u"20        x = 1"_qs, u"Erro:"_qs,
-      u"30        y = 2"_qs, u"End Sub"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  NumberingWalk(run.context, 10, 10).NumberModule(module, true);
-  EXPECT_EQ(linesOf(*module), lines);
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
-  const QStringList indented = {lines[0],           u"10     On Error GoTo Erro"_qs,
-                                u"20     x = 1"_qs, u"       Erro:"_qs,
-                                u"30     y = 2"_qs, lines[5]};
-  EXPECT_EQ(linesOf(*module), indented);
-
-  // The original, indented the same way, is the same text.
-  auto original = ide.addModule(lines);
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(original);
-  EXPECT_EQ(linesOf(*original), indented);
-}
-
 TEST(NumberingWalk, EachKindOfModuleLineIsNumberedOrLeftAsTheIdeListsIt) {
   const struct {
     const char* what;
@@ -269,19 +246,6 @@ TEST(IndentationWalk, IndentsProceduresAndLeavesDeclarationsAndTrailingCommentsA
   EXPECT_EQ(module->ProcBodyLine(u"Alpha"_qs, ide::ProcKind::Proc), 4);
   EXPECT_EQ(module->ProcCountLines(u"Alpha"_qs, ide::ProcKind::Proc), 23);
   EXPECT_EQ(module->Members()->Count(), 3);
-}
-
-TEST(IndentationWalk, DeclarationsIndentTypesAndEnums) {
-  const QStringList lines = {
-      u"Private Type Ponto"_qs, u"X As Long"_qs,    u"      Y As Long"_qs, u"   End Type"_qs,
-      u"\tPublic Enum Cor"_qs,  u"Vermelho = 1"_qs, u"End Enum"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentDeclarations(*module);
-  EXPECT_EQ(linesOf(*module), (QStringList{lines[0], u"    X As Long"_qs, u"    Y As Long"_qs, u"End Type"_qs,
-                                           u"Public Enum Cor"_qs, u"    Vermelho = 1"_qs, lines[6]}));
 }
 
 TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
