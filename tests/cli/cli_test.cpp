@@ -396,17 +396,6 @@ TEST(CheckAndDiff, DistantChangesMakeSeparateHunks) {
   EXPECT_EQ(work.bytes(), module);
 }
 
-TEST(CheckAndDiff, GroupPathsAreShownFromTheCurrentDirectory) {
-  ExampleCopy copy;
-  Tool tool;
-  const Result result = tool.run({u"indent"_qs, u"--tabs"_qs, u"--diff"_qs, u"--procedure"_qs,
-                                  u"modApi.NomeDoUsuario"_qs, u"Demo.vbg"_qs},
-                                 copy.path(QString()));
-  EXPECT_EQ(result.code, 0) << result.err.toStdString();
-  EXPECT_TRUE(result.out.startsWith(u"--- a/Utilitarios/modApi.bas\n+++ b/Utilitarios/modApi.bas\n@@ "_qs))
-      << result.out.toStdString();
-}
-
 // ---------------------------------------------------------------------------------------------------
 // Messy projects and input that is not VB6 code
 

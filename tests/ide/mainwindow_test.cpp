@@ -243,13 +243,6 @@ TEST_F(HotKeys, AHotKeyTheChainPassesOnReachesTheEditor) {
   EXPECT_TRUE(allSelected()) << "Ctrl+A went on to the editor, which selected everything";
 }
 
-TEST_F(HotKeys, AnUnregisteredCombinationReachesTheEditorUnchanged) {
-  HotKeyHook hook(windows(), m_hwnd, true);
-  QTest::keyClick(m_code->editor(), Qt::Key_A, Qt::ControlModifier);
-  EXPECT_TRUE(hook.received.empty());
-  EXPECT_TRUE(allSelected());
-}
-
 TEST_F(HotKeys, ARegisteredHotKeyGoesBeforeAMenuShortcut) {
   // Ctrl+R is the menu's Project Explorer shortcut, which moves the focus to the explorer.
   {
