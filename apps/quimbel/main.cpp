@@ -157,6 +157,7 @@ enum Takes : unsigned {
   kFileLines = 1024,  // --file-lines
   kNumIndent = 2048,  // --numindent, --no-numindent
   kOneFile = 4096,    // one file of any kind instead of files
+  kNoFiles = 8192,    // no files: the command talks over standard input and output
 };
 
 struct Command {
@@ -219,6 +220,11 @@ const Command kCommands[] = {
      kProject | kTaskActions | kJson, [](const CommandLine& c) { return runTasks(c.taskOptions()); }},
     {"favorites", "List the project's favorites: module, procedure and the line they open at.",
      kProject | kJson, [](const CommandLine& c) { return runFavorites(c.taskOptions()); }},
+    {"lsp",
+     "Serve editors as a language server on standard input and output: formatting, numbering code "
+     "actions, symbols, folding, references and diagnostics. Files are never written; edits go to the "
+     "editor.",
+     kNoFiles, [](const CommandLine&) { return runLsp(); }},
 };
 
 void addTaskActions(CLI::App& app, CommandLine& line) {
@@ -245,6 +251,7 @@ void addOptions(CLI::App& app, unsigned takes, CommandLine& line) {
     if (takes & kTaskActions) addTaskActions(app, line);
     return;
   }
+  if (takes & kNoFiles) return;
   if (takes & kSearch) {
     app.add_option("text", line.text, "The text to look for")->required();
     app.add_flag("-w,--whole-word", line.wholeWord, "Only whole words");
