@@ -148,6 +148,7 @@ class Reader {
   Outline m_outline;
   std::optional<Symbol> m_procedure;
   std::optional<Open> m_procedureOpen;
+  bool m_bodyStarted = false;  // a statement of the open procedure's body came
   std::optional<Symbol> m_typeOrEnum;
   std::vector<Open> m_blocks;
   std::vector<Open> m_directives;
@@ -200,6 +201,8 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
     case Kind::ProcHeader: {
       const auto header = syntax::parseProcHeader(text);
       if (!header) return;
+      // Another header before the body (#If ... #Else around the header): the same procedure.
+      if (m_procedure && !m_bodyStarted) return;
       if (m_procedure) {
         problem(*m_procedureOpen,
                 QStringLiteral("%1 has no End before the next procedure: indentation cannot "
@@ -222,6 +225,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
       symbol.nameLength = int(at < 0 ? 0 : header->name.size());
       m_procedure = std::move(symbol);
       m_procedureOpen = here;
+      m_bodyStarted = false;
       return;
     }
     case Kind::ProcEnd:
@@ -236,6 +240,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
   }
 
   if (m_procedure) {
+    m_bodyStarted = true;
     switch (kind) {
       case Kind::If:
         if (transform::IsBlockIf(text)) m_blocks.push_back(here);

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "lsp/protocol.h"
 
+#include <QJsonArray>
 #include <QJsonDocument>
 
 namespace lsp {
@@ -38,28 +39,66 @@ std::optional<QByteArray> MessageReader::next(bool* framingError) {
   }
 }
 
-QByteArray frame(const QJsonObject& message) {
-  const QByteArray body = QJsonDocument(message).toJson(QJsonDocument::Compact);
-  return "Content-Length: " + QByteArray::number(body.size()) + "\r\n\r\n" + body;
+QByteArray frame(QByteArrayView body) {
+  return "Content-Length: " + QByteArray::number(body.size()) + "\r\n\r\n" + body.toByteArray();
 }
 
-QJsonObject response(const QJsonValue& id, const QJsonValue& result) {
-  return {{QStringLiteral("jsonrpc"), QStringLiteral("2.0")},
-          {QStringLiteral("id"), id},
-          {QStringLiteral("result"), result}};
+namespace {
+
+QByteArray compact(const QJsonObject& object) {
+  return QJsonDocument(object).toJson(QJsonDocument::Compact);
 }
 
-QJsonObject errorResponse(const QJsonValue& id, const Failure& failure) {
-  return {{QStringLiteral("jsonrpc"), QStringLiteral("2.0")},
-          {QStringLiteral("id"), id},
-          {QStringLiteral("error"), QJsonObject{{QStringLiteral("code"), failure.code},
-                                                {QStringLiteral("message"), failure.message}}}};
+}  // namespace
+
+QByteArray response(const QJsonValue& id, const QJsonValue& result) {
+  return compact({{QStringLiteral("jsonrpc"), QStringLiteral("2.0")},
+                  {QStringLiteral("id"), id},
+                  {QStringLiteral("result"), result}});
 }
 
-QJsonObject notification(const QString& method, const QJsonValue& params) {
-  return {{QStringLiteral("jsonrpc"), QStringLiteral("2.0")},
-          {QStringLiteral("method"), method},
-          {QStringLiteral("params"), params}};
+QByteArray response(const QJsonValue& id, QByteArrayView resultJson) {
+  // The id as JSON: the one-element array's text without its brackets.
+  const QByteArray idJson = QJsonDocument(QJsonArray{id}).toJson(QJsonDocument::Compact).chopped(1).sliced(1);
+  return "{\"jsonrpc\":\"2.0\",\"id\":" + idJson + ",\"result\":" + resultJson.toByteArray() + '}';
+}
+
+QByteArray errorResponse(const QJsonValue& id, const Failure& failure) {
+  return compact({{QStringLiteral("jsonrpc"), QStringLiteral("2.0")},
+                  {QStringLiteral("id"), id},
+                  {QStringLiteral("error"), QJsonObject{{QStringLiteral("code"), failure.code},
+                                                        {QStringLiteral("message"), failure.message}}}});
+}
+
+QByteArray notification(const QString& method, const QJsonObject& params) {
+  return compact({{QStringLiteral("jsonrpc"), QStringLiteral("2.0")},
+                  {QStringLiteral("method"), method},
+                  {QStringLiteral("params"), params}});
+}
+
+void appendJsonString(QByteArray& out, QStringView text) {
+  out += '"';
+  for (qsizetype i = 0; i < text.size(); ++i) {
+    const char16_t u = text[i].unicode();
+    if (u == u'"' || u == u'\\') {
+      out += '\\';
+      out += char(u);
+    } else if (u < 0x20) {
+      out += "\\u00";
+      out += "0123456789abcdef"[u >> 4];
+      out += "0123456789abcdef"[u & 15];
+    } else if (u < 0x80) {
+      out += char(u);
+    } else {
+      // A run of other characters at once, so that surrogate pairs stay together.
+      qsizetype end = i + 1;
+      while (end < text.size() && text[end].unicode() >= 0x80)
+        ++end;
+      out += text.sliced(i, end - i).toUtf8();
+      i = end - 1;
+    }
+  }
+  out += '"';
 }
 
 }  // namespace lsp

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <QByteArray>
+#include <QByteArrayView>
 #include <QJsonObject>
 #include <QJsonValue>
 #include <QString>
@@ -42,11 +43,17 @@ class MessageReader {
   QByteArray m_buffer;
 };
 
-/// The frame of one outgoing message.
-QByteArray frame(const QJsonObject& message);
+/// The frame of one outgoing message body.
+QByteArray frame(QByteArrayView body);
 
-QJsonObject response(const QJsonValue& id, const QJsonValue& result);
-QJsonObject errorResponse(const QJsonValue& id, const Failure& failure);
-QJsonObject notification(const QString& method, const QJsonValue& params);
+/// Message bodies (compact JSON). A result may come as JSON text already written (a long list of edits is
+/// written straight into text, not built as objects first).
+QByteArray response(const QJsonValue& id, const QJsonValue& result);
+QByteArray response(const QJsonValue& id, QByteArrayView resultJson);
+QByteArray errorResponse(const QJsonValue& id, const Failure& failure);
+QByteArray notification(const QString& method, const QJsonObject& params);
+
+/// `text` as a JSON string literal, quotes included (UTF-8).
+void appendJsonString(QByteArray& out, QStringView text);
 
 }  // namespace lsp

@@ -41,25 +41,42 @@ void walkModule(walk::WalkContext& context, const ide::Ref<ide::CodeModule>& mod
   }
 }
 
-/// The edits from `before` to `after`, texts with the same lines: per changed line, the part that changed.
-std::variant<std::vector<TextEdit>, Failure> lineEdits(QStringView before, QStringView after) {
-  const LineIndex old(before);
-  const LineIndex now(after);
-  if (old.count() != now.count()) return failure(QStringLiteral("the walk changed the number of lines"));
+/// Where the line that starts at `from` ends (its text, before the line end) and where the next begins.
+std::pair<qsizetype, qsizetype> lineAt(QByteArrayView bytes, qsizetype from) {
+  qsizetype end = from;
+  while (end < bytes.size() && bytes[end] != '\n' && bytes[end] != '\r')
+    ++end;
+  qsizetype next = end;
+  if (next < bytes.size())
+    next += bytes[next] == '\r' && next + 1 < bytes.size() && bytes[next + 1] == '\n' ? 2 : 1;
+  return {end, next};
+}
+
+/// The edits from `before` to `after`, files of the same lines in the ANSI code page: per changed line, the
+/// part that changed. A byte of the code page is one UTF-16 unit, so byte columns are the protocol's.
+std::variant<std::vector<TextEdit>, Failure> lineEdits(QByteArrayView before, QByteArrayView after) {
   std::vector<TextEdit> edits;
-  for (int i = 0; i < old.count(); ++i) {
-    const QStringView a = old.line(before, i);
-    const QStringView b = now.line(after, i);
-    if (a == b) continue;
+  qsizetype a = 0;
+  qsizetype b = 0;
+  for (int line = 0; a < before.size() || b < after.size(); ++line) {
+    if (a >= before.size() || b >= after.size())
+      return failure(QStringLiteral("the walk changed the number of lines"));
+    const auto [aEnd, aNext] = lineAt(before, a);
+    const auto [bEnd, bNext] = lineAt(after, b);
+    const QByteArrayView old = before.sliced(a, aEnd - a);
+    const QByteArrayView now = after.sliced(b, bEnd - b);
+    a = aNext;
+    b = bNext;
+    if (old == now) continue;
     qsizetype prefix = 0;
-    while (prefix < a.size() && prefix < b.size() && a[prefix] == b[prefix])
+    while (prefix < old.size() && prefix < now.size() && old[prefix] == now[prefix])
       ++prefix;
     qsizetype suffix = 0;
-    while (suffix < a.size() - prefix && suffix < b.size() - prefix &&
-           a[a.size() - 1 - suffix] == b[b.size() - 1 - suffix])
+    while (suffix < old.size() - prefix && suffix < now.size() - prefix &&
+           old[old.size() - 1 - suffix] == now[now.size() - 1 - suffix])
       ++suffix;
-    edits.push_back({{{i, int(prefix)}, {i, int(a.size() - suffix)}},
-                     b.mid(prefix, b.size() - prefix - suffix).toString()});
+    edits.push_back({{{line, int(prefix)}, {line, int(old.size() - suffix)}},
+                     host::decodeAnsi(now.sliced(prefix, now.size() - prefix - suffix))});
   }
   return edits;
 }
@@ -118,7 +135,7 @@ std::variant<std::vector<TextEdit>, Failure> rewriteModule(const RewriteJob& job
     if (!component->IsDirty()) return std::vector<TextEdit>{};
     const auto after = component->fileContents(true);
     if (!after) return std::vector<TextEdit>{};
-    return lineEdits(job.text, host::decodeAnsi(*after));
+    return lineEdits(*bytes, *after);
   } catch (const ide::Error& error) {
     return failure(QString(error.description()).replace(copy, fileName));
   }

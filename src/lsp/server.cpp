@@ -15,6 +15,7 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <charconv>
 
 #include <unistd.h>
 
@@ -75,6 +76,30 @@ QJsonArray toJson(const std::vector<TextEdit>& edits) {
     array.append(QJsonObject{{QStringLiteral("range"), toJson(edit.range)},
                              {QStringLiteral("newText"), edit.newText}});
   return array;
+}
+
+/// The same written straight into JSON text: a format of a large module answers with an edit per line.
+QByteArray editsJson(const std::vector<TextEdit>& edits) {
+  QByteArray out;
+  out.reserve(qsizetype(edits.size()) * 100 + 2);
+  out += '[';
+  char number[16];
+  const auto append = [&](const char* text, int value) {
+    out += text;
+    out.append(number, std::to_chars(number, number + sizeof number, value).ptr - number);
+  };
+  for (const TextEdit& edit : edits) {
+    if (out.size() > 1) out += ',';
+    append("{\"range\":{\"start\":{\"line\":", edit.range.start.line);
+    append(",\"character\":", edit.range.start.character);
+    append("},\"end\":{\"line\":", edit.range.end.line);
+    append(",\"character\":", edit.range.end.character);
+    out += "}},\"newText\":";
+    appendJsonString(out, edit.newText);
+    out += '}';
+  }
+  out += ']';
+  return out;
 }
 
 QJsonObject symbolJson(const Symbol& symbol, const std::vector<QStringView>& lines) {
@@ -189,6 +214,8 @@ void Server::request(const QJsonValue& id, const QString& method, const QJsonObj
   }
   if (const auto* failure = std::get_if<Failure>(&result))
     m_sink(errorResponse(id, *failure));
+  else if (const auto* text = std::get_if<JsonText>(&result))
+    m_sink(response(id, text->text));
   else
     m_sink(response(id, std::get<QJsonValue>(result)));
 }
@@ -418,7 +445,7 @@ Server::Result Server::formatting(const QJsonObject& params, bool range) {
       return edit.range.start.line < lines->start.line || edit.range.start.line > last;
     });
   }
-  return toJson(all);
+  return JsonText{editsJson(all)};
 }
 
 Server::Result Server::codeActions(const QJsonObject& params) {
@@ -734,7 +761,7 @@ int serve(int input, int output, const QString& version) {
         done += written;
     }
   };
-  Server server([&](const QJsonObject& message) { writeAll(frame(message)); }, version);
+  Server server([&](const QByteArray& body) { writeAll(frame(body)); }, version);
   MessageReader reader;
   char buffer[65536];
   while (!server.exited() && !writeFailed) {

@@ -22,7 +22,8 @@ namespace lsp {
 
 class Server {
  public:
-  using Sink = std::function<void(const QJsonObject&)>;
+  /// Receives each outgoing message body (compact JSON), to be framed.
+  using Sink = std::function<void(const QByteArray&)>;
   /// `version` is what initialize reports.
   Server(Sink sink, QString version);
   ~Server();
@@ -37,7 +38,11 @@ class Server {
   int exitCode() const { return m_shutdown ? 0 : 1; }
 
  private:
-  using Result = std::variant<QJsonValue, Failure>;
+  /// A result already written as JSON text.
+  struct JsonText {
+    QByteArray text;
+  };
+  using Result = std::variant<QJsonValue, Failure, JsonText>;
 
   void request(const QJsonValue& id, const QString& method, const QJsonObject& params);
   void notify(const QString& method, const QJsonObject& params);
