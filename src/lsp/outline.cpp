@@ -240,7 +240,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
   }
 
   if (m_procedure) {
-    m_bodyStarted = true;
+    if (!syntax::isDirective(kind)) m_bodyStarted = true;
     switch (kind) {
       case Kind::If:
         if (transform::IsBlockIf(text)) m_blocks.push_back(here);

@@ -205,11 +205,11 @@ void Server::request(const QJsonValue& id, const QString& method, const QJsonObj
   } else {
     try {
       result = dispatch(method, params);
+    } catch (const ide::Error& error) {
+      // A file the core cannot read or use: the request fails, the server goes on.
+      result = Failure{kRequestFailed, error.description()};
     } catch (const std::exception& failure) {
-      // ide::Error and the like from the core: the request fails, the server goes on.
-      const auto* ideError = dynamic_cast<const ide::Error*>(&failure);
-      result = Failure{kInternalError,
-                       ideError ? ideError->description() : QString::fromLocal8Bit(failure.what())};
+      result = Failure{kInternalError, QString::fromLocal8Bit(failure.what())};
     }
   }
   if (const auto* failure = std::get_if<Failure>(&result))

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // The language server: the protocol's life cycle and each request in-process on a copy of the example
 // group, and Neovim as a real client whose written file must hold what the command-line tool writes.
+#include "host/files/ansi.h"
 #include "lsp/server.h"
 #include "testproject.h"
 
@@ -245,6 +246,96 @@ TEST(LanguageServer, FormatsAndNumbersOnlyWhereAsked) {
   const QJsonObject refused = client.request(u"textDocument/formatting"_qs, params);
   EXPECT_EQ(errorCode(refused), lsp::kRequestFailed);
   EXPECT_TRUE(refused[u"error"_qs][u"message"_qs].toString().contains(u"line 10"_qs));
+}
+
+// The outline's reading of blocks: what balances, what does not, and what each shape declares.
+TEST(LanguageServer, OutlineTellsWhichBlocksDoNotBalance) {
+  struct Case {
+    const char* code;
+    const char* symbols;     // name:kind, in order
+    const char* imbalances;  // line:message start, in order
+  };
+  const Case cases[] = {
+      {"Sub A()\nIf x Then y = 1 Else y = 2\nIf x Then ' block\nEnd If\nEnd Sub", "A:12", ""},
+      {"Sub A()\n10 If x Then\n20 End If\nFor i = 1 To 2\nFor j = 1 To 2\nNext j, i\nEnd Sub", "A:12", ""},
+      {"Sub A()\nIf x And _\n  y Then\nEnd Sub", "A:12", "1:If is never closed"},
+      {"Sub A()\nFor i = 1 To 2: Next\nEnd Sub", "A:12", "1:For is never closed"},
+      {"Sub A()\nWith x\nEnd If\nEnd With\nEnd Sub", "A:12", "2:End If closes no block"},
+      {"#If W Then\nSub A(x As Long)\n#Else\nSub A(x As Integer)\n#End If\nx = 1\nEnd Sub", "A:12", ""},
+      {"Sub A()\nx = 1\nFunction B()\nEnd Function\n#If W Then", "A:12 B:12",
+       "0:A has no End|4:#If is never closed"},
+      {"Private Type T\n  a As Long\nEnd Type\nPublic Const K = 1, L = 2\nProperty Get P()\nEnd Property",
+       "T:23 K:14 L:14 P:7", ""},
+      {"Public Enum E\n  One\nSub A()\nEnd Sub", "A:12", "0:Enum is never closed"},
+  };
+  for (const Case& c : cases) {
+    const QString code = QString::fromLatin1(c.code);
+    const lsp::LineIndex index(code);
+    const lsp::Outline outline = lsp::readOutline(lsp::splitLines(code, index), 0);
+    QStringList symbols;
+    for (const lsp::Symbol& symbol : outline.symbols)
+      symbols << u"%1:%2"_qs.arg(symbol.name).arg(int(symbol.kind));
+    QStringList imbalances;
+    for (const lsp::Imbalance& imbalance : outline.imbalances)
+      imbalances << QString::number(imbalance.line) + u':' + imbalance.message;
+    EXPECT_EQ(symbols.join(u' '), QLatin1StringView(c.symbols)) << c.code;
+    const QStringList expected = QString::fromLatin1(c.imbalances).split(u'|', Qt::SkipEmptyParts);
+    ASSERT_EQ(imbalances.size(), expected.size()) << c.code << "\n" << imbalances.join(u'\n').toStdString();
+    for (qsizetype i = 0; i < expected.size(); ++i)
+      EXPECT_TRUE(imbalances[i].startsWith(expected[i])) << imbalances[i].toStdString();
+    for (const lsp::Fold& fold : outline.folds)
+      EXPECT_TRUE(fold.startLine <= fold.endLine && fold.endLine < index.count()) << c.code;
+  }
+}
+
+// A project-wide action, its edits asked for when chosen: the modules the editor has not opened are read
+// in the code page, and the edits give the bytes `quimbel numindent` writes.
+TEST(LanguageServer, ProjectActionsEditWhatTheCommandLineRewrites) {
+  ExampleCopy editor;
+  ExampleCopy tool;
+  Client client;
+  client.result(
+      u"initialize"_qs,
+      {{u"capabilities"_qs,
+        QJsonObject{
+            {u"textDocument"_qs,
+             QJsonObject{{u"codeAction"_qs,
+                          QJsonObject{{u"resolveSupport"_qs,
+                                       QJsonObject{{u"properties"_qs, QJsonArray{u"edit"_qs}}}}}}}}}}});
+  const QString path = editor.path(u"Loja/modPrincipal.bas"_qs);
+  client.open(path, host::decodeAnsi(readBytes(path)));
+  QJsonObject where = document(path);
+  where.insert(u"range"_qs, QJsonObject{{u"start"_qs, QJsonObject{{u"line"_qs, 0}, {u"character"_qs, 0}}},
+                                        {u"end"_qs, QJsonObject{{u"line"_qs, 0}, {u"character"_qs, 0}}}});
+  where.insert(u"context"_qs, QJsonObject{{u"only"_qs, QJsonArray{u"source.quimbel.numindent"_qs}}});
+  QJsonObject chosen;
+  for (const QJsonValue action : client.result(u"textDocument/codeAction"_qs, where).toArray())
+    if (action[u"title"_qs] == u"Number and indent (project Loja)"_qs) chosen = action.toObject();
+  ASSERT_FALSE(chosen.isEmpty());
+  EXPECT_FALSE(chosen.contains(u"edit"_qs));
+  const QJsonObject changes =
+      client.result(u"codeAction/resolve"_qs, chosen)[u"edit"_qs][u"changes"_qs].toObject();
+
+  QProcess numindent;
+  numindent.setProcessEnvironment(QProcessEnvironment::systemEnvironment());
+  numindent.start(QStringLiteral(QUIMBEL_BINARY), {u"numindent"_qs, tool.path(u"Loja/Loja.vbp"_qs)});
+  ASSERT_TRUE(numindent.waitForFinished(60000));
+  ASSERT_EQ(numindent.exitCode(), 0);
+  int changed = 0;
+  for (const QString& name : QDir(editor.path(u"Loja"_qs)).entryList(QDir::Files)) {
+    QString text = host::decodeAnsi(readBytes(editor.path(u"Loja/"_qs + name)));
+    const QJsonArray edits = changes.value(uri(editor.path(u"Loja/"_qs + name))).toArray();
+    const lsp::LineIndex index(text);
+    for (qsizetype i = edits.size(); i-- > 0;) {  // from the end, so that offsets stay valid
+      const auto range = lsp::rangeFrom(edits[i][u"range"_qs]);
+      const qsizetype from = index.offset(text, range->start);
+      text.replace(from, index.offset(text, range->end) - from, edits[i][u"newText"_qs].toString());
+    }
+    changed += !edits.isEmpty();
+    EXPECT_EQ(host::encodeAnsi(text).value_or(QByteArray()), readBytes(tool.path(u"Loja/"_qs + name)))
+        << name.toStdString();
+  }
+  EXPECT_GT(changed, 5);
 }
 
 // Neovim formats a module and numbers it through the server and writes it: the bytes are those the
