@@ -11,6 +11,7 @@
 #include <QDir>
 #include <QDirIterator>
 #include <QFile>
+#include <QJsonArray>
 #include <QJsonDocument>
 #include <QTemporaryDir>
 
@@ -80,6 +81,25 @@ void BM_FormatModule100k(benchmark::State& state) {
   state.counters["answer_bytes"] = double(session.bytes);
 }
 BENCHMARK(BM_FormatModule100k)->Unit(benchmark::kMillisecond)->Iterations(5);
+
+// A keystroke in the same module: the edit applied and the module's diagnostics published (no target).
+void BM_TypeInModule100k(benchmark::State& state) {
+  const gen::TemporaryGroup corpus({100'000, 1, 1, 7});
+  const QString module = firstModule(corpus.projectFile());
+  Session session;
+  session.open(module);
+  int version = 1;
+  const QJsonObject at{{u"line"_qs, 50'000}, {u"character"_qs, 0}};
+  for (auto _ : state)
+    session.send(
+        u"textDocument/didChange"_qs,
+        {{u"textDocument"_qs, QJsonObject{{u"uri"_qs, lsp::uriOfPath(module)}, {u"version"_qs, ++version}}},
+         {u"contentChanges"_qs,
+          QJsonArray{QJsonObject{{u"range"_qs, QJsonObject{{u"start"_qs, at}, {u"end"_qs, at}}},
+                                 {u"text"_qs, u" "_qs}}}}},
+        false);
+}
+BENCHMARK(BM_TypeInModule100k)->Unit(benchmark::kMillisecond)->Iterations(5);
 
 void BM_WorkspaceSymbols1M(benchmark::State& state) {
   const gen::TemporaryGroup corpus({1'000'000, 200, 4, 7});

@@ -359,6 +359,7 @@ void Server::didChange(const QJsonObject& params) {
   const auto found = m_documents.find(item.value(QLatin1StringView("uri")).toString());
   if (found == m_documents.end()) return;
   Document& document = *found->second;
+  m_readings.erase(document.uri());  // it points into the text
   for (const QJsonValue change : params.value(QLatin1StringView("contentChanges")).toArray())
     if (!document.applyChange(change.toObject())) return;
   document.setVersion(item.value(QLatin1StringView("version")).toInt(document.version() + 1));
