@@ -114,6 +114,17 @@ std::optional<syntax::Token> wordAfter(QStringView text, int skipWords) {
   return std::nullopt;
 }
 
+/// Where `name` stands on `line` as a word of its own (not inside "Public" for a name "Pub"); -1 if not.
+qsizetype wordColumn(QStringView line, QStringView name) {
+  syntax::Tokenizer tokens(line);
+  syntax::Token token;
+  while (tokens.next(token))
+    if (token.type == syntax::Token::Type::Word &&
+        line.mid(token.start, token.length).compare(name, Qt::CaseInsensitive) == 0)
+      return token.start;
+  return -1;
+}
+
 struct Open {
   Kind kind;
   int line;
@@ -220,7 +231,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
       symbol.detail = procDetail(*header);
       symbol.kind = header->kind == ide::ProcKind::Proc ? SymbolKind::Function : SymbolKind::Property;
       symbol.line = first;
-      const qsizetype at = firstLine.indexOf(header->name, 0, Qt::CaseInsensitive);
+      const qsizetype at = wordColumn(firstLine, header->name);
       symbol.nameColumn = int(at < 0 ? 0 : at);
       symbol.nameLength = int(at < 0 ? 0 : header->name.size());
       m_procedure = std::move(symbol);
@@ -254,7 +265,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
         return;
       case Kind::Next: {
         // "Next j, i" ends two loops.
-        const int loops = int(text.count(u',')) + 1;
+        const int loops = int(syntax::codePart(text).count(u',')) + 1;
         for (int i = 0; i < loops; ++i)
           close(m_blocks, Kind::For, here);
         return;
@@ -282,7 +293,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
     }
     if (syntax::isDirective(kind)) return;
     if (const auto word = wordAfter(text, 0)) {
-      const qsizetype at = firstLine.indexOf(text.mid(word->start, word->length));
+      const qsizetype at = wordColumn(firstLine, text.mid(word->start, word->length));
       m_typeOrEnum->children.push_back(
           {text.mid(word->start, word->length).toString(),
            m_typeOrEnum->kind == SymbolKind::Enum ? SymbolKind::EnumMember : SymbolKind::Field,
@@ -305,7 +316,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
       symbol.kind = kind == Kind::TypeBegin ? SymbolKind::Struct : SymbolKind::Enum;
       symbol.detail = kind == Kind::TypeBegin ? QStringLiteral("Type") : QStringLiteral("Enum");
       symbol.line = first;
-      const qsizetype at = firstLine.indexOf(symbol.name);
+      const qsizetype at = wordColumn(firstLine, symbol.name);
       symbol.nameColumn = int(std::max<qsizetype>(at, 0));
       symbol.nameLength = int(symbol.name.size());
       m_typeOrEnum = std::move(symbol);
@@ -337,7 +348,7 @@ void Reader::statement(int first, int last, QStringView firstLine, const QString
         symbol.endLine = last;
         // The name on the statement's line where it stands there (a continued list may carry it below).
         for (int line = first; line <= last; ++line) {
-          const qsizetype at = m_lines[size_t(line)].indexOf(name);
+          const qsizetype at = wordColumn(m_lines[size_t(line)], name);
           if (at < 0) continue;
           symbol.line = line;
           symbol.nameColumn = int(at);

@@ -18,12 +18,16 @@ namespace {
 // How far up from a module's folder its project and group are looked for.
 constexpr int kFoldersUp = 4;
 
+}  // namespace
+
 bool sameFile(const QString& a, const QString& b) {
   const QFileInfo left(a);
   const QFileInfo right(b);
   if (left.exists() && right.exists()) return left.canonicalFilePath() == right.canonicalFilePath();
   return QDir::cleanPath(left.absoluteFilePath()) == QDir::cleanPath(right.absoluteFilePath());
 }
+
+namespace {
 
 /// The files named *.<suffix> (any letter case) in `folder` and up to kFoldersUp folders above it.
 QStringList filesAbove(const QString& folder, const QString& suffix) {

@@ -40,6 +40,9 @@ QString projectOf(const QString& modulePath);
 /// The group file that lists `projectPath`, looked for in the project's folder and the folders above it.
 QString groupOf(const QString& projectPath);
 
+/// The two paths name one file (links followed; paths of files that do not exist compared as written).
+bool sameFile(const QString& a, const QString& b);
+
 /// A module file's text in the ANSI code page (Windows-1252).
 std::variant<QString, Failure> readModuleText(const QString& path);
 

@@ -24,7 +24,7 @@ namespace lsp {
 namespace {
 
 constexpr int kLongestLine = 1023;
-// The workspace's symbols answer with at most this many (the best of them first: the query's prefix).
+// The workspace's symbols answer with at most this many, module by module in the projects' order.
 constexpr qsizetype kMostSymbols = 10000;
 
 Failure invalidParams(const QString& message) {
@@ -70,15 +70,7 @@ std::variant<codestyle::Style, Failure> styleFor(const QString& path, const QJso
   return style;
 }
 
-QJsonArray toJson(const std::vector<TextEdit>& edits) {
-  QJsonArray array;
-  for (const TextEdit& edit : edits)
-    array.append(QJsonObject{{QStringLiteral("range"), toJson(edit.range)},
-                             {QStringLiteral("newText"), edit.newText}});
-  return array;
-}
-
-/// The same written straight into JSON text: a format of a large module answers with an edit per line.
+/// Edits as JSON text, written straight: a format of a large module answers with an edit per line.
 QByteArray editsJson(const std::vector<TextEdit>& edits) {
   QByteArray out;
   out.reserve(qsizetype(edits.size()) * 100 + 2);
@@ -130,11 +122,8 @@ bool isListingFile(const QString& path) {
   return suffix == QLatin1StringView("vbp") || suffix == QLatin1StringView("vbg");
 }
 
-bool sameFile(const QString& a, const QString& b) {
-  return QFileInfo(a).canonicalFilePath() == QFileInfo(b).canonicalFilePath() && QFileInfo::exists(a);
-}
-
-QString identifierAt(QStringView line, int column, int* start) {
+/// The identifier at or just before `column`.
+QString identifierAt(QStringView line, int column) {
   const auto isWordChar = [](QChar c) { return c.isLetterOrNumber() || c == u'_'; };
   qsizetype from = std::min<qsizetype>(column, line.size());
   qsizetype to = from;
@@ -142,7 +131,6 @@ QString identifierAt(QStringView line, int column, int* start) {
     --from;
   while (to < line.size() && isWordChar(line[to]))
     ++to;
-  *start = int(from);
   return line.mid(from, to - from).toString();
 }
 
@@ -428,6 +416,8 @@ Server::Result Server::formatting(const QJsonObject& params, bool range) {
   const auto found = documentOf(params);
   if (const auto* failure = std::get_if<Failure>(&found)) return *failure;
   Document& document = *std::get<Document*>(found);
+  if (!isModuleFile(document.path()))
+    return Failure{kRequestFailed, QStringLiteral("%1 is no VB6 module file").arg(document.path())};
   std::optional<Range> lines;
   if (range && !(lines = rangeFrom(params.value(QLatin1StringView("range")))))
     return invalidParams(QStringLiteral("no range"));
@@ -554,7 +544,8 @@ Server::Result Server::resolveCodeAction(QJsonObject action) {
                                                  : QString()});
     if (const auto* failure = std::get_if<Failure>(&edits)) return *failure;
     if (!std::get<std::vector<TextEdit>>(edits).empty())
-      changes.insert(module.uri, toJson(std::get<std::vector<TextEdit>>(edits)));
+      changes.insert(module.uri,
+                     QJsonDocument::fromJson(editsJson(std::get<std::vector<TextEdit>>(edits))).array());
   }
   action.insert(QStringLiteral("edit"), QJsonObject{{QStringLiteral("changes"), changes}});
   return action;
@@ -566,6 +557,7 @@ Server::Result Server::resolveCodeAction(QJsonObject action) {
 Server::Result Server::documentSymbols(const QJsonObject& params) {
   const auto found = documentOf(params);
   if (const auto* failure = std::get_if<Failure>(&found)) return *failure;
+  if (!isModuleFile(std::get<Document*>(found)->path())) return QJsonArray();
   const Reading& reading = readingOf(*std::get<Document*>(found));
   if (const auto* failure = std::get_if<Failure>(&reading.layout)) return *failure;
   QJsonArray symbols;
@@ -577,6 +569,7 @@ Server::Result Server::documentSymbols(const QJsonObject& params) {
 Server::Result Server::foldingRanges(const QJsonObject& params) {
   const auto found = documentOf(params);
   if (const auto* failure = std::get_if<Failure>(&found)) return *failure;
+  if (!isModuleFile(std::get<Document*>(found)->path())) return QJsonArray();
   const Reading& reading = readingOf(*std::get<Document*>(found));
   if (const auto* failure = std::get_if<Failure>(&reading.layout)) return *failure;
   std::vector<Fold> folds = reading.outline.folds;
@@ -687,8 +680,8 @@ Server::Result Server::references(const QJsonObject& params) {
   Document& document = *std::get<Document*>(found);
   const auto position = positionFrom(params.value(QLatin1StringView("position")));
   if (!position) return invalidParams(QStringLiteral("no position"));
-  int start = 0;
-  const QString word = identifierAt(document.line(position->line), position->character, &start);
+  if (!isModuleFile(document.path())) return QJsonValue(QJsonValue::Null);
+  const QString word = identifierAt(document.line(position->line), position->character);
   if (word.isEmpty()) return QJsonValue(QJsonValue::Null);
 
   // The project as the IDE opens it, with the open modules as the editor holds them.

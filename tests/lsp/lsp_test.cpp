@@ -252,21 +252,23 @@ TEST(LanguageServer, FormatsAndNumbersOnlyWhereAsked) {
 TEST(LanguageServer, OutlineTellsWhichBlocksDoNotBalance) {
   struct Case {
     const char* code;
-    const char* symbols;     // name:kind, in order
+    const char* symbols;     // name:kind@column of the name, in order
     const char* imbalances;  // line:message start, in order
   };
   const Case cases[] = {
-      {"Sub A()\nIf x Then y = 1 Else y = 2\nIf x Then ' block\nEnd If\nEnd Sub", "A:12", ""},
-      {"Sub A()\n10 If x Then\n20 End If\nFor i = 1 To 2\nFor j = 1 To 2\nNext j, i\nEnd Sub", "A:12", ""},
-      {"Sub A()\nIf x And _\n  y Then\nEnd Sub", "A:12", "1:If is never closed"},
-      {"Sub A()\nFor i = 1 To 2: Next\nEnd Sub", "A:12", "1:For is never closed"},
-      {"Sub A()\nWith x\nEnd If\nEnd With\nEnd Sub", "A:12", "2:End If closes no block"},
-      {"#If W Then\nSub A(x As Long)\n#Else\nSub A(x As Integer)\n#End If\nx = 1\nEnd Sub", "A:12", ""},
-      {"Sub A()\nx = 1\nFunction B()\nEnd Function\n#If W Then", "A:12 B:12",
+      {"Sub A()\nIf x Then y = 1 Else y = 2\nIf x Then ' block\nEnd If\nEnd Sub", "A:12@4", ""},
+      {"Sub A()\n10 If x Then\n20 End If\nFor i = 1 To 2\nFor j = 1 To 2\nNext j, i ' a, b\nEnd Sub",
+       "A:12@4", ""},
+      {"Sub A()\nIf x And _\n  y Then\nEnd Sub", "A:12@4", "1:If is never closed"},
+      {"Sub A()\nFor i = 1 To 2: Next\nEnd Sub", "A:12@4", "1:For is never closed"},
+      {"Sub A()\nWith x\nEnd If\nEnd With\nEnd Sub", "A:12@4", "2:End If closes no block"},
+      {"#If W Then\nSub A(x As Long)\n#Else\nSub A(x As Integer)\n#End If\nx = 1\nEnd Sub", "A:12@4", ""},
+      {"Sub A()\nx = 1\nFunction B()\nEnd Function\n#If W Then", "A:12@4 B:12@9",
        "0:A has no End|4:#If is never closed"},
-      {"Private Type T\n  a As Long\nEnd Type\nPublic Const K = 1, L = 2\nProperty Get P()\nEnd Property",
-       "T:23 K:14 L:14 P:7", ""},
-      {"Public Enum E\n  One\nSub A()\nEnd Sub", "A:12", "0:Enum is never closed"},
+      {"Private Type T\n  a As Long\nEnd Type\nPublic Const K = 1, L = 2\nDim D As Long\nProperty Get "
+       "Pub()\nEnd Property",
+       "T:23@13 K:14@13 L:14@20 D:13@4 Pub:7@13", ""},
+      {"Public Enum E\n  One\nSub A()\nEnd Sub", "A:12@4", "0:Enum is never closed"},
   };
   for (const Case& c : cases) {
     const QString code = QString::fromLatin1(c.code);
@@ -274,7 +276,7 @@ TEST(LanguageServer, OutlineTellsWhichBlocksDoNotBalance) {
     const lsp::Outline outline = lsp::readOutline(lsp::splitLines(code, index), 0);
     QStringList symbols;
     for (const lsp::Symbol& symbol : outline.symbols)
-      symbols << u"%1:%2"_qs.arg(symbol.name).arg(int(symbol.kind));
+      symbols << u"%1:%2@%3"_qs.arg(symbol.name).arg(int(symbol.kind)).arg(symbol.nameColumn);
     QStringList imbalances;
     for (const lsp::Imbalance& imbalance : outline.imbalances)
       imbalances << QString::number(imbalance.line) + u':' + imbalance.message;
