@@ -88,6 +88,7 @@ struct CommandLine {
   bool fileLines = false;
   bool check = false;
   bool diff = false;
+  bool stdio = false;
   // config, tasks and favorites.
   std::string file;
   std::string project;
@@ -251,7 +252,12 @@ void addOptions(CLI::App& app, unsigned takes, CommandLine& line) {
     if (takes & kTaskActions) addTaskActions(app, line);
     return;
   }
-  if (takes & kNoFiles) return;
+  if (takes & kNoFiles) {
+    // Clients that start servers with --stdio (VS Code's stdio transport, many editor configurations).
+    app.add_flag("--stdio", line.stdio,
+                 "Talk over standard input and output (the only way; accepted for clients that say so)");
+    return;
+  }
   if (takes & kSearch) {
     app.add_option("text", line.text, "The text to look for")->required();
     app.add_flag("-w,--whole-word", line.wholeWord, "Only whole words");

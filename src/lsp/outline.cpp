@@ -136,7 +136,7 @@ class Reader {
  public:
   explicit Reader(const std::vector<QStringView>& lines) : m_lines(lines) {}
 
-  void statement(int first, int last, QStringView firstLine, const QString& joined);
+  void statement(int first, int last, QStringView firstLine, QStringView joined);
   Outline finish();
 
  private:
@@ -186,11 +186,11 @@ void Reader::endProcedure(int line) {
   m_procedure.reset();
 }
 
-void Reader::statement(int first, int last, QStringView firstLine, const QString& joined) {
+void Reader::statement(int first, int last, QStringView firstLine, QStringView joined) {
   qsizetype indent = 0;
   while (indent < firstLine.size() && firstLine[indent].isSpace())
     ++indent;
-  QStringView text = QStringView(joined).trimmed();
+  QStringView text = joined.trimmed();
   // A line number in front of a statement is no part of it.
   if (const syntax::NumberPrefix prefix = syntax::numberPrefix(text)) {
     if (prefix.form != syntax::NumberPrefix::Form::Colon && prefix.form != syntax::NumberPrefix::Form::Blank)
@@ -383,6 +383,16 @@ Outline readOutline(const std::vector<QStringView>& lines, int firstCodeLine) {
   Reader reader(lines);
   syntax::Carry carry;
   std::vector<QStringView> statement;
+  QString joined;
+  // A statement on one line is read where it stands; only continued ones are joined.
+  const auto read = [&](int first, int last) {
+    if (statement.size() == 1 && !syntax::continues(statement.front())) {
+      reader.statement(first, last, lines[size_t(first)], statement.front());
+    } else {
+      joined = syntax::joinContinuedLines(statement);
+      reader.statement(first, last, lines[size_t(first)], joined);
+    }
+  };
   int first = firstCodeLine;
   for (int i = firstCodeLine; i < int(lines.size()); ++i) {
     const QStringView line = lines[size_t(i)];
@@ -395,12 +405,9 @@ Outline readOutline(const std::vector<QStringView>& lines, int firstCodeLine) {
     const bool inComment = carry.inComment;
     carry = syntax::carryAfter(line, carry);
     if (!inComment) statement.push_back(line);
-    if (!carry.continued && !statement.empty())
-      reader.statement(first, i, lines[size_t(first)], syntax::joinContinuedLines(statement));
+    if (!carry.continued && !statement.empty()) read(first, i);
   }
-  if (carry.continued && !statement.empty())
-    reader.statement(first, int(lines.size()) - 1, lines[size_t(first)],
-                     syntax::joinContinuedLines(statement));
+  if (carry.continued && !statement.empty()) read(first, int(lines.size()) - 1);
   return reader.finish();
 }
 

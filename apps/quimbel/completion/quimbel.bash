@@ -44,7 +44,7 @@ _quimbel() {
     config) options="--start --interval --tabs --spaces --numindent --no-numindent --help" ;;
     tasks) options="--json --help" ;;
     favorites) options="--json --help" ;;
-    lsp) options="--help" ;;
+    lsp) options="--stdio --help" ;;
   esac
 
   case $prev in
