@@ -40,7 +40,10 @@ std::optional<QByteArray> MessageReader::next(bool* framingError) {
 }
 
 QByteArray frame(QByteArrayView body) {
-  return "Content-Length: " + QByteArray::number(body.size()) + "\r\n\r\n" + body.toByteArray();
+  QByteArray framed = "Content-Length: " + QByteArray::number(body.size()) + "\r\n\r\n";
+  framed.reserve(framed.size() + body.size());
+  framed.append(body);
+  return framed;
 }
 
 namespace {
@@ -60,7 +63,11 @@ QByteArray response(const QJsonValue& id, const QJsonValue& result) {
 QByteArray response(const QJsonValue& id, QByteArrayView resultJson) {
   // The id as JSON: the one-element array's text without its brackets.
   const QByteArray idJson = QJsonDocument(QJsonArray{id}).toJson(QJsonDocument::Compact).chopped(1).sliced(1);
-  return "{\"jsonrpc\":\"2.0\",\"id\":" + idJson + ",\"result\":" + resultJson.toByteArray() + '}';
+  QByteArray body = "{\"jsonrpc\":\"2.0\",\"id\":" + idJson + ",\"result\":";
+  body.reserve(body.size() + resultJson.size() + 1);
+  body.append(resultJson);
+  body.append('}');
+  return body;
 }
 
 QByteArray errorResponse(const QJsonValue& id, const Failure& failure) {
