@@ -83,7 +83,21 @@ std::variant<std::vector<TextEdit>, Failure> lineEdits(QByteArrayView before, QB
 
 }  // namespace
 
-std::variant<std::vector<TextEdit>, Failure> rewriteModule(const RewriteJob& job) {
+struct ModuleRewriter::Model {
+  // The copy outlives the model that read it.
+  QTemporaryDir folder;
+  std::shared_ptr<host::VbeImpl> vbe;
+};
+
+ModuleRewriter::ModuleRewriter() = default;
+ModuleRewriter::~ModuleRewriter() = default;
+
+void ModuleRewriter::release() {
+  m_last.reset();
+}
+
+std::variant<std::vector<TextEdit>, Failure> ModuleRewriter::rewrite(const RewriteJob& job) {
+  release();
   const QString fileName = QFileInfo(job.path).fileName();
   qsizetype bad = -1;
   const auto bytes = host::encodeAnsi(job.text, &bad);
@@ -95,18 +109,18 @@ std::variant<std::vector<TextEdit>, Failure> rewriteModule(const RewriteJob& job
                        .arg(job.text[bad].unicode(), 4, 16, QLatin1Char('0')));
   }
   // The IDE model reads modules from files: the text goes into one of its own, under the module's name.
-  QTemporaryDir folder;
-  const QString copy = folder.filePath(fileName);
+  m_last = std::make_unique<Model>();
+  const QString copy = m_last->folder.filePath(fileName);
   QFile file(copy);
-  if (!folder.isValid() || !file.open(QIODevice::WriteOnly) || file.write(*bytes) != bytes->size() ||
+  if (!m_last->folder.isValid() || !file.open(QIODevice::WriteOnly) || file.write(*bytes) != bytes->size() ||
       !file.flush())
     return failure(
         QStringLiteral("cannot keep a copy of %1 to work on: %2").arg(fileName, file.errorString()));
   file.close();
 
   try {
-    const auto vbe = host::VbeImpl::create();
-    const auto project = vbe->openModuleFile(copy);
+    m_last->vbe = host::VbeImpl::create();
+    const auto project = m_last->vbe->openModuleFile(copy);
     const auto component = project->components().front();
     const ide::Ref<ide::CodeModule> module = component->codeModule();
     if (!module) return std::vector<TextEdit>{};

@@ -10,6 +10,7 @@
 
 #include <QString>
 
+#include <memory>
 #include <variant>
 #include <vector>
 
@@ -33,9 +34,25 @@ struct RewriteJob {
   QString procedure;
 };
 
-/// The edits that turn `job.text` into what the command-line tool writes: `quimbel indent` for Indent
-/// (never numbering, whatever the style joins to it: a format touches only leading blanks), `number`,
-/// `unnumber` (both re-indenting where the style joins the two) and `numindent`.
-std::variant<std::vector<TextEdit>, Failure> rewriteModule(const RewriteJob& job);
+/// Rewrites modules for an editor. The IDE model of the last module rewritten is kept until release(), so
+/// that taking a large module apart comes after the answer, not before it.
+class ModuleRewriter {
+ public:
+  ModuleRewriter();
+  ~ModuleRewriter();
+  ModuleRewriter(const ModuleRewriter&) = delete;
+  ModuleRewriter& operator=(const ModuleRewriter&) = delete;
+
+  /// The edits that turn `job.text` into what the command-line tool writes: `quimbel indent` for Indent
+  /// (never numbering, whatever the style joins to it: a format touches only leading blanks), `number`,
+  /// `unnumber` (both re-indenting where the style joins the two) and `numindent`.
+  std::variant<std::vector<TextEdit>, Failure> rewrite(const RewriteJob& job);
+  /// Lets the last module's model go (and its temporary copy).
+  void release();
+
+ private:
+  struct Model;
+  std::unique_ptr<Model> m_last;
+};
 
 }  // namespace lsp

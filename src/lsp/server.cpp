@@ -184,6 +184,10 @@ Server::Server(Sink sink, QString version) : m_sink(std::move(sink)), m_version(
 
 Server::~Server() = default;
 
+void Server::idle() {
+  m_rewriter.release();
+}
+
 void Server::framingError() {
   m_sink(
       errorResponse(QJsonValue::Null, {kParseError, QStringLiteral("a message without a Content-Length")}));
@@ -458,7 +462,7 @@ Server::Result Server::formatting(const QJsonObject& params, bool range) {
     return invalidParams(QStringLiteral("no range"));
   const auto style = styleFor(document.path(), params.value(QLatin1StringView("options")).toObject());
   if (const auto* failure = std::get_if<Failure>(&style)) return *failure;
-  auto edits = rewriteModule(
+  auto edits = m_rewriter.rewrite(
       {document.path(), document.text(), Rewrite::Indent, std::get<codestyle::Style>(style), QString()});
   if (const auto* failure = std::get_if<Failure>(&edits)) return *failure;
   std::vector<TextEdit>& all = std::get<std::vector<TextEdit>>(edits);
@@ -573,7 +577,7 @@ Server::Result Server::resolveCodeAction(QJsonObject action) {
   for (const Module& module : modules) {
     const auto style = styleFor(module.path);
     if (const auto* failure = std::get_if<Failure>(&style)) return *failure;
-    const auto edits = rewriteModule(
+    const auto edits = m_rewriter.rewrite(
         {module.path, module.text, kind->rewrite, std::get<codestyle::Style>(style),
          scope == QLatin1StringView("procedure") ? data.value(QLatin1StringView("procedure")).toString()
                                                  : QString()});
@@ -808,6 +812,7 @@ int serve(int input, int output, const QString& version) {
       if (!body) break;
       server.handle(*body);
     }
+    server.idle();
   }
   return writeFailed ? 1 : server.exitCode();
 }

@@ -8,6 +8,7 @@
 #include "lsp/outline.h"
 #include "lsp/projects.h"
 #include "lsp/protocol.h"
+#include "lsp/rewrite.h"
 
 #include <QDateTime>
 #include <QHash>
@@ -32,6 +33,8 @@ class Server {
   void handle(QByteArrayView body);
   /// A header block that framed no message: answered as unreadable JSON.
   void framingError();
+  /// No message is waiting: work left for later is done now (taking apart the last rewritten module).
+  void idle();
 
   /// The client sent exit: the process ends with exitCode() (0 after shutdown, 1 otherwise).
   bool exited() const { return m_exited; }
@@ -81,6 +84,7 @@ class Server {
 
   Sink m_sink;
   QString m_version;
+  ModuleRewriter m_rewriter;
   bool m_initialized = false;
   bool m_shutdown = false;
   bool m_exited = false;
