@@ -308,17 +308,6 @@ End Sub)");
   EXPECT_EQ(indented(input), expected);
 }
 
-TEST(NumberColumn, ColumnIsStableAcrossRunsInTabMode) {
-  QStringList lines = linesOf("Sub Foo()\n10000 x = 1\n30   ' nota\ny = 2\nEnd Sub");
-  Indenter indenter(IndentMode::Tabs, 1);
-  indentProcedure(lines, indenter);
-  const QStringList expected = linesOf("Sub Foo()\n10000 \tx = 1\n30    \t' nota\n      \ty = 2\nEnd Sub");
-  EXPECT_EQ(lines, expected);
-  EXPECT_EQ(indentProcedure(lines, indenter), 0);
-  EXPECT_EQ(lines, expected);
-  EXPECT_EQ(indenter.numberColumn(), u"      "_qs);
-}
-
 // --- Declarations ---
 
 TEST(IndentDeclarations, IndentsTypesEnumsAndDirectives) {

@@ -294,6 +294,7 @@ struct Transforms {
   WalkContext context{u"frmLinNumbers"_qs, nullptr, nullptr};
   int failures = 0;
   int staleIndexes = 0;
+  int needlessEdits = 0;
   Transforms() {
     context.onFailure = [this](const WalkFailure&) { ++failures; };
     context.onLineSkipped = [this](const WalkFailure&) { ++failures; };
@@ -301,8 +302,11 @@ struct Transforms {
   template <typename Walk>
   QStringList apply(const QStringList& lines, Walk walk) {
     auto module = ide.addModule(lines);
+    const quint64 before = Ide::edits(module);
     walk(module);
     const QStringList result = linesOf(*module);
+    // A line the walk would not change is not replaced.
+    if (result == lines && Ide::edits(module) != before) ++needlessEdits;
     // The index the edits kept up to date answers as one built afresh from the result.
     if (module->Procedures() != ide.addModule(result)->Procedures()) ++staleIndexes;
     return result;
@@ -380,6 +384,7 @@ TEST(MessyModules, TheIndexAndTheWalksKeepTheirInvariants) {
       ASSERT_EQ(firstDifference(withoutNumbers(*changed), code), "");
     ASSERT_EQ(t.failures, 0);
     ASSERT_EQ(t.staleIndexes, 0);
+    ASSERT_EQ(t.needlessEdits, 0);
   }
 }
 
