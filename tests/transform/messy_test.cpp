@@ -361,6 +361,7 @@ TEST(MessyModules, TheIndexAndTheWalksKeepTheirInvariants) {
     const QStringList indented = t.indent(generated.lines);
     ASSERT_EQ(firstDifference(t.indent(indented), indented), "") << "indenting twice";
     const QStringList tabbed = t.indent(generated.lines, IndentMode::Tabs);
+    const QStringList both = t.numIndent(generated.lines);
     // Where the shape tells the level, the line has that many units (four spaces or a tab) and its text.
     for (qsizetype i = 0; i < generated.lines.size(); ++i) {
       const int level = generated.levels[size_t(i)];
@@ -372,10 +373,18 @@ TEST(MessyModules, TheIndexAndTheWalksKeepTheirInvariants) {
       } else if (level >= 0) {
         ASSERT_EQ(indented[i], QString(4 * level, u' ') + text) << "line " << i + 1;
         ASSERT_EQ(tabbed[i], QString(level, u'\t') + text) << "line " << i + 1;
+        // Numbered and indented, a procedure's line has a column of six holding its number or blanks (none
+        // when nothing in the procedure takes a number), then the same levels.
+        if (level > 0 && i >= module->CountOfDeclarationLines() && both[i] != QString(level, u'\t') + text) {
+          ASSERT_GT(both[i].size(), 6) << "line " << i + 1;
+          const QString column = both[i].first(6);
+          ASSERT_TRUE(column == QString(6, u' ') || (column.first(5).toInt() >= 10000 && column[5] == u' '))
+              << "line " << i + 1 << ": " << both[i].toStdString();
+          ASSERT_EQ(both[i].sliced(6), QString(level, u'\t') + text) << "line " << i + 1;
+        }
       }
     }
     ASSERT_EQ(firstDifference(t.indent(tabbed, IndentMode::Tabs), tabbed), "") << "indenting twice, tabs";
-    const QStringList both = t.numIndent(generated.lines);
     ASSERT_EQ(firstDifference(t.numIndent(both), both), "") << "number-and-indent twice";
     ASSERT_EQ(firstDifference(t.numberThenIndent(generated.lines), both), "") << "numbering, then indenting";
     // Nothing but numbers and leading blanks changes.
