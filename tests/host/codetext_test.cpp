@@ -381,7 +381,8 @@ void expectSameAnswers(CodeText& edited) {
 
 TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
   // Lines that make and unmake structure: headers (also continued ones), End lines, declarations, Type and
-  // Enum blocks, comments, blanks, continuation marks, and ordinary statements.
+  // Enum blocks, comments, blanks, continuation marks; and ordinary statements, which let the index move
+  // procedures instead of reading their headers again.
   const QStringList pool = {
       u"Public Sub Alfa()"_qs,
       u"Private Function Beta( _"_qs,
@@ -409,38 +410,13 @@ TEST(Editing, TheIndexStaysRightAfterEveryKindOfEdit) {
       u"Enum E"_qs,
       u"End Enum"_qs,
       u"    sUB As Long"_qs,
+      u"    x = x + 1"_qs,
+      u"    If a Then b = 1"_qs,
+      u"    Dim k As Long"_qs,
   };
-  std::mt19937 random(20261206);
-  auto pick = [&] { return pool[static_cast<int>(random() % static_cast<unsigned>(pool.size()))]; };
-  CodeText text;
-  loadLines(text, kPropertyModule);
-  for (int step = 0; step < 1500; ++step) {
-    const int count = text.countOfLines();
-    const unsigned op = random() % 5;
-    if (op == 0 || count == 0) {
-      text.insertLines(1 + static_cast<int>(random() % static_cast<unsigned>(count + 1)),
-                       pick() + "\r\n" + pick());
-    } else if (op == 1 && count > 3) {
-      const int first = 1 + static_cast<int>(random() % static_cast<unsigned>(count));
-      text.deleteLines(first, std::min(1 + static_cast<int>(random() % 3), count - first + 1));
-    } else if (op == 2) {
-      text.replaceLine(1 + static_cast<int>(random() % static_cast<unsigned>(count)), pick() + "\n" + pick());
-    } else {
-      text.replaceLine(1 + static_cast<int>(random() % static_cast<unsigned>(count)), pick());
-    }
-    if (step % 10 == 0) {
-      SCOPED_TRACE(step);
-      expectSameAnswers(text);
-      if (HasFatalFailure()) return;
-    }
-  }
-  expectSameAnswers(text);
-}
-
-TEST(Editing, TheIndexFollowsLinesAddedAndRemovedInsideProcedures) {
-  // Ordinary lines only, so that the index moves procedures instead of reading their headers again; the
-  // module has a continued header and procedures without End lines, in the middle and at the end.
-  const QStringList module = {
+  const qsizetype ordinary = 3;  // the last lines of the pool
+  // A continued header and procedures without End lines, in the middle and at the end.
+  const QStringList open = {
       u"Option Explicit"_qs,  u"Dim a As Long"_qs,
       u"Sub Alfa()"_qs,       u"    a = 1"_qs,
       u"End Sub"_qs,          QString(),
@@ -451,30 +427,36 @@ TEST(Editing, TheIndexFollowsLinesAddedAndRemovedInsideProcedures) {
       u"    Delta = a"_qs,    u"End Property"_qs,
       u"Sub Epsilon()"_qs,    u"    a = 3"_qs,
   };
-  const QStringList pool = {u"    x = x + 1"_qs, u"' nota"_qs, QString(), u"    If a Then b = 1"_qs,
-                            u"    Dim k As Long"_qs};
-  std::mt19937 random(7);
-  auto pick = [&] { return pool[static_cast<int>(random() % static_cast<unsigned>(pool.size()))]; };
-  CodeText text;
-  loadLines(text, module);
-  for (int step = 0; step < 600; ++step) {
-    const int count = text.countOfLines();
-    // Below the declarations: the lines above the first header are the declarations' business.
-    const int low = 4;
-    if (random() % 2 == 0 || count < 25) {
-      const int at = low + static_cast<int>(random() % static_cast<unsigned>(count - low + 2));
-      text.insertLines(at, random() % 3 == 0 ? pick() + "\r\n" + pick() : pick());
-    } else {
-      const int first = low + static_cast<int>(random() % static_cast<unsigned>(count - low + 1));
-      const QString line = text.line(first);
-      if (syntax::isStructural(syntax::classify(line).kind) || syntax::continues(line) ||
-          (first > 1 && syntax::continues(text.line(first - 1))))
-        continue;  // keep the structure: this test is about lines that come and go around it
-      text.deleteLines(first, 1);
+  for (const QStringList& start : {kPropertyModule, open}) {
+    std::mt19937 random(20261206);
+    auto pick = [&](qsizetype from = 0) {
+      return pool[from + static_cast<qsizetype>(random() % static_cast<unsigned>(pool.size() - from))];
+    };
+    auto below = [&](int n) { return static_cast<int>(random() % static_cast<unsigned>(n)); };
+    CodeText text;
+    loadLines(text, start);
+    for (int step = 0; step < 1500; ++step) {
+      const int count = text.countOfLines();
+      const unsigned op = random() % 6;
+      if (op == 0 || count == 0) {
+        text.insertLines(1 + below(count + 1), pick() + "\r\n" + pick());
+      } else if (op == 1 && count > 3) {
+        const int first = 1 + below(count);
+        text.deleteLines(first, std::min(1 + below(3), count - first + 1));
+      } else if (op == 2) {
+        text.replaceLine(1 + below(count), pick() + "\n" + pick());
+      } else if (op == 3) {
+        text.replaceLine(1 + below(count), pick());
+      } else {
+        text.insertLines(1 + below(count + 1), pick(pool.size() - ordinary));
+      }
+      if (step % 5 == 0) {
+        SCOPED_TRACE(step);
+        expectSameAnswers(text);
+        if (HasFatalFailure()) return;
+      }
     }
-    SCOPED_TRACE(step);
     expectSameAnswers(text);
-    if (HasFatalFailure()) return;
   }
 }
 

@@ -21,7 +21,8 @@ namespace {
 using test::Ide;
 using test::linesOf;
 
-/// A random module, and how many procedures it declares (alternative headers of one procedure count once).
+/// A random module, how many procedures it declares (alternative headers of one procedure count once), and
+/// the level of indentation each line should get, known from how it was generated.
 class MessyModule {
  public:
   explicit MessyModule(quint32 seed) : m_random(seed) {
@@ -34,6 +35,8 @@ class MessyModule {
 
   QStringList lines;
   int procedures = 0;
+  static constexpr int kAsWritten = -2, kUnknown = -1;
+  std::vector<int> levels;
 
  private:
   bool chance(int percent) { return int(m_random() % 100) < percent; }
@@ -42,7 +45,14 @@ class MessyModule {
   QString pick(const char16_t* const (&texts)[N]) {
     return QString::fromUtf16(texts[below(int(N))]);
   }
-  void add(const QString& line) { lines << line; }
+  void add(const QString& line, int level = kAsWritten) {
+    lines << line;
+    levels.push_back(level);
+  }
+  // A line of a procedure body, carelessly indented, `deeper` levels below the current one.
+  void code(const QString& text, int deeper = 0) {
+    add(indent() + text, m_level < 0 ? kUnknown : m_level + deeper);
+  }
   QString indent() { return pick({u"", u"    ", u"\t", u"  \t", u"        "}); }
   QString mark() { return pick({u" _", u"\t_", u"  _", u" \t_"}); }
   QString name() {
@@ -59,13 +69,13 @@ class MessyModule {
           add(u"Private m_Valor As Long"_qs);
           break;
         case 1:
-          add(u"Public Const TAXA = 1 ' taxa _"_qs), add(u"   continua o comentário"_qs);
+          add(u"Public Const TAXA = 1 ' taxa _"_qs), add(u"   continua o comentário"_qs, kUnknown);
           break;
         case 2:
-          add(u"Private Type TPonto"_qs), add(u"    X As Long"_qs), add(u"End Type"_qs);
+          add(u"Private Type TPonto"_qs), add(u"    X As Long"_qs, 1), add(u"End Type"_qs);
           break;
         case 3:
-          add(u"Public Enum ECor"_qs), add(u"    corAzul = 1"_qs), add(u"End Enum"_qs);
+          add(u"Public Enum ECor"_qs), add(u"    corAzul = 1"_qs, 1), add(u"End Enum"_qs);
           break;
         case 4:
           add(u"#Const DEPURA = 1"_qs);
@@ -74,7 +84,7 @@ class MessyModule {
           add(u"Private Declare Function GetTickCount Lib \"kernel32\" () As Long"_qs);
           break;
         default:
-          add(u"Dim sCaminho As String,"_qs + mark()), add(u"\tsNome As String"_qs);
+          add(u"Dim sCaminho As String,"_qs + mark()), add(u"\tsNome As String"_qs, 1);
           break;
       }
     }
@@ -82,13 +92,16 @@ class MessyModule {
 
   void procedureShape() {
     add(QString());
-    if (chance(20)) add(u"' procedimento"_qs);
+    // After a one-line procedure the walk takes a comment before the next header as that procedure's.
+    if (chance(20)) add(u"' procedimento"_qs, m_oneLine ? kUnknown : kAsWritten);
+    m_oneLine = false;
     const QString procName = name();
     const bool function = chance(40);
     switch (below(6)) {
       case 0:  // one line, as interface classes are written
         add(u"Public Sub "_qs + procName + u"(ByVal d As Long): End Sub"_qs);
         ++procedures;
+        m_oneLine = true;
         return;
       case 1:  // the same procedure in two branches, one of them compiled
         add(u"#If DEPURA Then"_qs);
@@ -100,10 +113,10 @@ class MessyModule {
       case 2: {  // one body under alternative headers
         add(u"#If Win64 Then"_qs);
         headerLines(procName, function);
-        add(u"#Else"_qs);
+        add(u"#Else"_qs, kUnknown);
         headerLines(procName, function);
-        add(u"#End If"_qs);
-        body(procName, function);
+        add(u"#End If"_qs, kUnknown);
+        body(procName, function, false);
         ++procedures;
         return;
       }
@@ -118,28 +131,37 @@ class MessyModule {
     const QString kind = function ? u"Function "_qs : u"Sub "_qs;
     if (chance(30)) {
       add(scope + kind + procName + u"(ByVal a As Long,"_qs + mark());
-      add(u"        ByVal b As String)"_qs + (function ? u" As Long"_qs : QString()));
+      add(u"        ByVal b As String)"_qs + (function ? u" As Long"_qs : QString()), m_header);
     } else {
       add(scope + kind + procName + u"(ByVal a As Long)"_qs + (function ? u" As Long"_qs : QString()));
     }
   }
 
   void procedure(const QString& procName, bool function) {
+    m_header = 1;
+    m_headerStart = lines.size();
     headerLines(procName, function);
+    m_header = kUnknown;
     body(procName, function);
     ++procedures;
   }
 
-  void body(const QString& procName, bool function) {
+  // A numeric label sets a number column for the whole procedure: its levels are not checked.
+  void body(const QString& procName, bool function, bool checked = true) {
     m_label = 0;
+    m_level = checked ? 1 : kUnknown;
     if (chance(40)) {
       m_label = 100 * (1 + below(9));
-      add(indent() + u"On Error GoTo "_qs + QString::number(m_label));
+      m_level = kUnknown;
+      for (qsizetype i = m_headerStart; i < lines.size(); ++i)
+        levels[size_t(i)] = std::min(levels[size_t(i)], int(kUnknown));
+      code(u"On Error GoTo "_qs + QString::number(m_label));
     }
     block(procName, 0);
     if (m_label) {
-      add(indent() + u"Exit "_qs + (function ? u"Function"_qs : u"Sub"_qs));
-      add(chance(50) ? QString::number(m_label) + u":"_qs : QString::number(m_label) + u" Resume Next"_qs);
+      code(u"Exit "_qs + (function ? u"Function"_qs : u"Sub"_qs));
+      add(chance(50) ? QString::number(m_label) + u":"_qs : QString::number(m_label) + u" Resume Next"_qs,
+          kUnknown);
     }
     if (chance(20)) add(QString());
     add(function ? u"End Function"_qs : u"End Sub"_qs);
@@ -151,74 +173,83 @@ class MessyModule {
       (depth < 3 && chance(30)) ? nested(procName, depth + 1) : statement(procName);
   }
 
+  // The body of a block, `deeper` levels below its opener.
+  void inner(const QString& procName, int depth, int deeper = 1) {
+    const int level = m_level;
+    if (m_level >= 0) m_level += deeper;
+    block(procName, depth);
+    m_level = level;
+  }
+
   void nested(const QString& procName, int depth) {
     switch (below(6)) {
       case 0:
-        add(indent() + u"If a > 1 Then"_qs);
-        block(procName, depth);
-        if (chance(50)) add(indent() + u"ElseIf a = 0 Then"_qs), block(procName, depth);
-        if (chance(50)) add(indent() + u"Else"_qs), block(procName, depth);
-        add(indent() + u"End If"_qs);
+        code(u"If a > 1 Then"_qs);
+        inner(procName, depth);
+        if (chance(50)) code(u"ElseIf a = 0 Then"_qs), inner(procName, depth);
+        if (chance(50)) code(u"Else"_qs), inner(procName, depth);
+        code(u"End If"_qs);
         break;
       case 1:
-        add(indent() + u"For i = 1 To a"_qs), block(procName, depth), add(indent() + u"Next i"_qs);
+        code(u"For i = 1 To a"_qs), inner(procName, depth), code(u"Next i"_qs);
         break;
       case 2:
-        add(indent() + u"Do While a > 0"_qs), block(procName, depth), add(indent() + u"Loop"_qs);
+        code(u"Do While a > 0"_qs), inner(procName, depth), code(u"Loop"_qs);
         break;
-      case 3:
-        add(indent() + u"Select Case a"_qs);
-        add(indent() + u"Case 1, 2"_qs), block(procName, depth);
-        add(indent() + u"Case Else"_qs), block(procName, depth);
-        add(indent() + u"End Select"_qs);
+      case 3:  // Case lines one level in, their bodies two
+        code(u"Select Case a"_qs);
+        code(u"Case 1, 2"_qs, 1), inner(procName, depth, 2);
+        code(u"Case Else"_qs, 1), inner(procName, depth, 2);
+        code(u"End Select"_qs);
         break;
       case 4:
-        add(indent() + u"With oPedido"_qs), add(indent() + u".Print \"a\""_qs), block(procName, depth);
-        add(indent() + u"End With"_qs);
+        code(u"With oPedido"_qs), code(u".Print \"a\""_qs, 1), inner(procName, depth);
+        code(u"End With"_qs);
         break;
       default:
-        add(indent() + u"#If DEPURA Then"_qs), block(procName, depth), add(indent() + u"#End If"_qs);
+        code(u"#If DEPURA Then"_qs), inner(procName, depth), code(u"#End If"_qs);
         break;
     }
   }
 
+  // Continuation lines one level in; a continued comment goes on as a continued statement does.
   void statement(const QString& procName) {
     switch (below(12)) {
       case 0:
-        add(indent() + u"x = a + 1"_qs);
+        code(u"x = a + 1"_qs);
         break;
       case 1:
-        add(indent() + u"x = a +"_qs + mark()), add(indent() + u"2"_qs);
+        code(u"x = a +"_qs + mark()), code(u"2"_qs, 1);
         break;
       case 2:
-        add(indent() + u"y = Soma(1,"_qs + mark()), add(u"20 + a, 3)"_qs);
+        code(u"y = Soma(1,"_qs + mark()), add(u"20 + a, 3)"_qs, m_level < 0 ? kUnknown : m_level + 1);
         break;
       case 3:
-        add(indent() + u"' nota _"_qs), add(u"   segue a nota"_qs);
+        code(u"' nota _"_qs), add(u"   segue a nota"_qs, m_level < 0 ? kUnknown : m_level + 1);
         break;
       case 4:
-        add(indent() + u"Rem GoTo 10"_qs);
+        code(u"Rem GoTo 10"_qs);
         break;
       case 5:
-        add(u"Saida:"_qs);
+        add(u"Saida:"_qs, m_level);
         break;
       case 6:
-        add(indent() + u"MsgBox \"a: b ' c _\" & s ' fim"_qs);
+        code(u"MsgBox \"a: b ' c _\" & s ' fim"_qs);
         break;
       case 7:
-        add(indent() + u"If a Then x = 1 Else x = 2"_qs);
+        code(u"If a Then x = 1 Else x = 2"_qs);
         break;
       case 8:
-        add(indent() + u"oPedido.Name = ModificadorDaño: rs.Close"_qs);
+        code(u"oPedido.Name = ModificadorDaño: rs.Close"_qs);
         break;
       case 9:
-        add(indent() + procName + u" = x"_qs);
+        code(procName + u" = x"_qs);
         break;
       case 10:
-        add(indent() + u": x = 1"_qs);
+        code(u": x = 1"_qs);
         break;
       default:
-        add(indent() + u"Debug.Print Err.Number"_qs);
+        code(u"Debug.Print Err.Number"_qs);
         break;
     }
   }
@@ -226,6 +257,10 @@ class MessyModule {
   std::mt19937 m_random;
   int m_names = 0;
   int m_label = 0;
+  int m_level = kUnknown;
+  int m_header = kUnknown;  // the level of a header's continuation lines, where known
+  qsizetype m_headerStart = 0;
+  bool m_oneLine = false;
 };
 
 /// Each line without its line number and leading blanks; a continuation line keeps a leading number.
@@ -259,6 +294,7 @@ struct Transforms {
   WalkContext context{u"frmLinNumbers"_qs, nullptr, nullptr};
   int failures = 0;
   int staleIndexes = 0;
+  int needlessEdits = 0;
   Transforms() {
     context.onFailure = [this](const WalkFailure&) { ++failures; };
     context.onLineSkipped = [this](const WalkFailure&) { ++failures; };
@@ -266,8 +302,11 @@ struct Transforms {
   template <typename Walk>
   QStringList apply(const QStringList& lines, Walk walk) {
     auto module = ide.addModule(lines);
+    const quint64 before = Ide::edits(module);
     walk(module);
     const QStringList result = linesOf(*module);
+    // A line the walk would not change is not replaced.
+    if (result == lines && Ide::edits(module) != before) ++needlessEdits;
     // The index the edits kept up to date answers as one built afresh from the result.
     if (module->Procedures() != ide.addModule(result)->Procedures()) ++staleIndexes;
     return result;
@@ -322,8 +361,30 @@ TEST(MessyModules, TheIndexAndTheWalksKeepTheirInvariants) {
     const QStringList indented = t.indent(generated.lines);
     ASSERT_EQ(firstDifference(t.indent(indented), indented), "") << "indenting twice";
     const QStringList tabbed = t.indent(generated.lines, IndentMode::Tabs);
-    ASSERT_EQ(firstDifference(t.indent(tabbed, IndentMode::Tabs), tabbed), "") << "indenting twice, tabs";
     const QStringList both = t.numIndent(generated.lines);
+    // Where the shape tells the level, the line has that many units (four spaces or a tab) and its text.
+    for (qsizetype i = 0; i < generated.lines.size(); ++i) {
+      const int level = generated.levels[size_t(i)];
+      const QString& line = generated.lines[i];
+      const QString text = line.sliced(syntax::leadingBlanks(line).size());
+      if (level == MessyModule::kAsWritten) {
+        ASSERT_EQ(indented[i], line) << "line " << i + 1;
+        ASSERT_EQ(tabbed[i], line) << "line " << i + 1;
+      } else if (level >= 0) {
+        ASSERT_EQ(indented[i], QString(4 * level, u' ') + text) << "line " << i + 1;
+        ASSERT_EQ(tabbed[i], QString(level, u'\t') + text) << "line " << i + 1;
+        // Numbered and indented, a procedure's line has a column of six holding its number or blanks (none
+        // when nothing in the procedure takes a number), then the same levels.
+        if (level > 0 && i >= module->CountOfDeclarationLines() && both[i] != QString(level, u'\t') + text) {
+          ASSERT_GT(both[i].size(), 6) << "line " << i + 1;
+          const QString column = both[i].first(6);
+          ASSERT_TRUE(column == QString(6, u' ') || (column.first(5).toInt() >= 10000 && column[5] == u' '))
+              << "line " << i + 1 << ": " << both[i].toStdString();
+          ASSERT_EQ(both[i].sliced(6), QString(level, u'\t') + text) << "line " << i + 1;
+        }
+      }
+    }
+    ASSERT_EQ(firstDifference(t.indent(tabbed, IndentMode::Tabs), tabbed), "") << "indenting twice, tabs";
     ASSERT_EQ(firstDifference(t.numIndent(both), both), "") << "number-and-indent twice";
     ASSERT_EQ(firstDifference(t.numberThenIndent(generated.lines), both), "") << "numbering, then indenting";
     // Nothing but numbers and leading blanks changes.
@@ -332,6 +393,7 @@ TEST(MessyModules, TheIndexAndTheWalksKeepTheirInvariants) {
       ASSERT_EQ(firstDifference(withoutNumbers(*changed), code), "");
     ASSERT_EQ(t.failures, 0);
     ASSERT_EQ(t.staleIndexes, 0);
+    ASSERT_EQ(t.needlessEdits, 0);
   }
 }
 

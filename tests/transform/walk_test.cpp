@@ -61,32 +61,6 @@ const QStringList kModule = {
     u"' fim do módulo"_qs,                      // 30
 };
 
-// kModule indented with two spaces.
-QStringList indentedModule() {
-  QStringList lines = kModule;
-  lines[4] = u"  ByVal b As Long, _"_qs;
-  lines[5] = u"  ByVal c As Long)"_qs;
-  lines[6] = u"  Dim x As Long"_qs;
-  lines[7] = u"  x = a + _"_qs;
-  lines[8] = u"    b"_qs;
-  lines[9] = u"  Select Case x"_qs;
-  lines[10] = u"    Case 1"_qs;
-  lines[11] = u"      x = 2"_qs;
-  lines[12] = u"  End Select"_qs;
-  lines[13] = u"  If x > 1 Then"_qs;
-  lines[14] = u"    x = 3"_qs;
-  lines[15] = u"  Else"_qs;
-  lines[16] = u"    x = 4"_qs;
-  lines[17] = u"  End If"_qs;
-  lines[18] = u"  Erro:"_qs;
-  lines[19] = u"  ' nota"_qs;
-  lines[20] = u"  #If DEPURACAO Then"_qs;
-  lines[21] = u"    Debug.Print x"_qs;
-  lines[22] = u"  #End If"_qs;
-  lines[27] = u"  Beta = 1"_qs;
-  return lines;
-}
-
 struct Failures {
   std::vector<WalkFailure> walks;
   std::vector<WalkFailure> lines;
@@ -236,18 +210,6 @@ TEST(NumberingWalk, ANumberPastTheLargestStopsTheRunWithTheMessageOfItsScope) {
 // ---------------------------------------------------------------------------------------------------
 // Indentation
 
-TEST(IndentationWalk, IndentsProceduresAndLeavesDeclarationsAndTrailingCommentsAtTheMargin) {
-  Ide ide;
-  auto module = ide.addModule(kModule);
-  Walk run;
-  IndentationWalk(run.context, IndentMode::Spaces, 2).IndentModule(module);
-  EXPECT_EQ(linesOf(*module), indentedModule());
-  // The header's continuation lines were re-indented; the procedures are still where they were.
-  EXPECT_EQ(module->ProcBodyLine(u"Alpha"_qs, ide::ProcKind::Proc), 4);
-  EXPECT_EQ(module->ProcCountLines(u"Alpha"_qs, ide::ProcKind::Proc), 23);
-  EXPECT_EQ(module->Members()->Count(), 3);
-}
-
 TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
   Ide ide;
   auto module = ide.addModule(kModule);
@@ -362,29 +324,6 @@ TEST(NumIndentWalk, AContinuedHeaderSitsInTheNumberColumn) {
   EXPECT_EQ(linesOf(*module).mid(3, 4),
             (QStringList{kModule[3], column + u"\tByVal b As Long, _"_qs, column + u"\tByVal c As Long)"_qs,
                          u"10000 \tDim x As Long"_qs}));
-}
-
-// A line the walk would not change is not replaced: running again edits nothing.
-TEST(Walks, RunningASecondTimeReplacesNoLine) {
-  const std::function<void(WalkContext&, const ide::Ref<ide::CodeModule>&)> walks[] = {
-      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Spaces, 3).IndentModule(m); },
-      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Tabs, 3).IndentModule(m); },
-      // Renumbering widens each number's blank and re-indenting takes it away again.
-      [](WalkContext& c, auto& m) {
-        NumIndentWalk(c, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(m);
-      },
-  };
-  for (size_t w = 0; w < std::size(walks); ++w) {
-    Ide ide;
-    auto module = ide.addModule(kModule);
-    Walk run;
-    walks[w](run.context, module);
-    const QStringList once = linesOf(*module);
-    const quint64 edits = Ide::edits(module);
-    walks[w](run.context, module);
-    EXPECT_EQ(linesOf(*module), once) << "walk " << w;
-    EXPECT_EQ(Ide::edits(module), edits) << "walk " << w;
-  }
 }
 
 // ---------------------------------------------------------------------------------------------------
