@@ -113,6 +113,12 @@ void CodeText::load(std::vector<SourceLine> code, std::vector<MemberAttributeLin
   touch(1, removed, countOfLines(), true);
 }
 
+void CodeText::shrinkToFit() {
+  m_lines.shrink_to_fit();
+  m_markers.shrink_to_fit();
+  if (!m_indexValid) *m_index = Index();
+}
+
 void CodeText::store(std::vector<SourceLine>& code, std::vector<MemberAttributeLine>& attributes) {
   code.clear();
   attributes.clear();
