@@ -78,7 +78,7 @@ void splitCode(std::vector<SourceLine>::const_iterator begin, std::vector<Source
   source.code.reserve(source.code.size() + static_cast<std::size_t>(end - begin));
   bool continued = false;
   for (auto line = begin; line != end; ++line) {
-    if (!continued && syntax::classify(line->text).kind == syntax::Kind::Attribute) {
+    if (!continued && syntax::isAttributeStatement(line->text)) {
       source.memberAttributes.push_back(MemberAttributeLine{static_cast<int>(source.code.size()), *line});
       continue;
     }

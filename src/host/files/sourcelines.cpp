@@ -1,12 +1,13 @@
 // SPDX-License-Identifier: MIT
-// Line splitting in one pass over the bytes: each byte is looked at once, to find the line end, a NUL that
-// marks a binary file, and the length limit the IDE enforces.
+// Line splitting: each line's end is found, a NUL that marks a binary file refused, and the length limit
+// the IDE enforces kept.
 #include "host/files/sourcelines.h"
 
 #include "host/files/ansi.h"
 #include "ide/error.h"
 
 #include <algorithm>
+#include <cstring>
 
 namespace host {
 namespace {
@@ -46,16 +47,24 @@ LineSpan nextLine(QByteArrayView bytes, qsizetype& position, const QString& file
   const char* data = bytes.data();
   const qsizetype size = bytes.size();
   LineSpan line{position};
-  while (position < size) {
-    const char byte = data[position];
-    if (byte == '\n' || byte == '\r') break;
-    if (byte == '\0') throwLineError(fileName, lineNumber, QStringLiteral("not a text file"));
-    ++position;
+  // memchr finds the line feed many bytes at a time, within the longest line allowed (so that a file of
+  // lone CRs is not searched to its end for every line); the line's own bytes are then searched for what
+  // ends it sooner (a lone CR) or makes the file binary (NUL).
+  const qsizetype window = std::min<qsizetype>(size - position, kMaxLineLength + 1);
+  const auto* feed = static_cast<const char*>(std::memchr(data + position, '\n', size_t(window)));
+  qsizetype end = feed ? feed - data : position + window;
+  if (const auto* cr = static_cast<const char*>(std::memchr(data + position, '\r', size_t(end - position))))
+    end = cr - data;
+  if (std::memchr(data + position, '\0', size_t(end - position)))
+    throwLineError(fileName, lineNumber, QStringLiteral("not a text file"));
+  if (end - line.start > kMaxLineLength) {
+    // A NUL further on says more than the length does.
+    for (; end < size && data[end] != '\n' && data[end] != '\r'; ++end)
+      if (data[end] == '\0') throwLineError(fileName, lineNumber, QStringLiteral("not a text file"));
+    throwLineError(fileName, lineNumber, QStringLiteral("line longer than %1 characters").arg(kMaxLineLength));
   }
-  line.length = position - line.start;
-  if (line.length > kMaxLineLength)
-    throwLineError(fileName, lineNumber,
-                   QStringLiteral("line longer than %1 characters").arg(kMaxLineLength));
+  line.length = end - line.start;
+  position = end;
   if (position < size) {
     if (data[position] == '\n') {
       line.end = LineEnd::LF;
