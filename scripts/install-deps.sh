@@ -14,6 +14,7 @@ packages=(
   libgsf-1-dev python3-olefile
   libgtest-dev libgmock-dev libbenchmark-dev
   libcli11-dev libssl-dev libeditorconfig-dev
+  neovim
 )
 
 missing=()

@@ -163,6 +163,9 @@ struct FindCommandOptions {
 
 int runFind(const FindCommandOptions& options);
 
+/// `quimbel lsp`: the language server on standard input and output until the client sends exit.
+int runLsp();
+
 /// Writes a line to standard output / standard error, in the terminal's encoding.
 void printLine(const QString& text);
 void printError(const QString& text);

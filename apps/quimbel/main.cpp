@@ -88,6 +88,7 @@ struct CommandLine {
   bool fileLines = false;
   bool check = false;
   bool diff = false;
+  bool stdio = false;
   // config, tasks and favorites.
   std::string file;
   std::string project;
@@ -157,6 +158,7 @@ enum Takes : unsigned {
   kFileLines = 1024,  // --file-lines
   kNumIndent = 2048,  // --numindent, --no-numindent
   kOneFile = 4096,    // one file of any kind instead of files
+  kNoFiles = 8192,    // no files: the command talks over standard input and output
 };
 
 struct Command {
@@ -219,6 +221,11 @@ const Command kCommands[] = {
      kProject | kTaskActions | kJson, [](const CommandLine& c) { return runTasks(c.taskOptions()); }},
     {"favorites", "List the project's favorites: module, procedure and the line they open at.",
      kProject | kJson, [](const CommandLine& c) { return runFavorites(c.taskOptions()); }},
+    {"lsp",
+     "Serve editors as a language server on standard input and output: formatting, numbering code "
+     "actions, symbols, folding, references and diagnostics. Files are never written; edits go to the "
+     "editor.",
+     kNoFiles, [](const CommandLine&) { return runLsp(); }},
 };
 
 void addTaskActions(CLI::App& app, CommandLine& line) {
@@ -243,6 +250,12 @@ void addOptions(CLI::App& app, unsigned takes, CommandLine& line) {
   if (takes & kProject) {
     app.add_option("project", line.project, "Project file (.vbp)")->required();
     if (takes & kTaskActions) addTaskActions(app, line);
+    return;
+  }
+  if (takes & kNoFiles) {
+    // Clients that start servers with --stdio (VS Code's stdio transport, many editor configurations).
+    app.add_flag("--stdio", line.stdio,
+                 "Talk over standard input and output (the only way; accepted for clients that say so)");
     return;
   }
   if (takes & kSearch) {

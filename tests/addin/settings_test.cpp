@@ -1,10 +1,8 @@
 // SPDX-License-Identifier: MIT
-// The options read at start-up, the machine configuration, the error convention and the help pages.
+// The machine configuration and the help pages.
 #include "addin/help.h"
 #include "addin/machineconfig.h"
 #include "addinfixture.h"
-#include "common/errors.h"
-#include "common/options.h"
 
 #include <gtest/gtest.h>
 
@@ -16,37 +14,6 @@
 
 namespace addin::test {
 namespace {
-
-TEST(Options, AFreshUserHasEveryOptionOnButRenamingInCode) {
-  AddInEnvironment environment;
-  common::SettingsStore store(common::SettingsStore::userStorePath());
-  const common::Options options = common::GetOptionsFromRegistry(store);
-  EXPECT_TRUE(options.OneCommandNumIndent);
-  EXPECT_TRUE(options.ShowProperties);
-  EXPECT_EQ(options.ColorOnFocus, u"&HFFFF&"_qs);
-  EXPECT_TRUE(options.LabelsTransparent);
-  EXPECT_TRUE(options.ClearTextProperty);
-  EXPECT_TRUE(options.FormsPosition);
-  EXPECT_TRUE(options.FormsBorder);
-  EXPECT_TRUE(options.SelectTextBoxOnFocus);
-  EXPECT_TRUE(options.TextBoxUpperCase);
-  EXPECT_FALSE(options.RenameInCodeOnControlRenamed);
-}
-
-TEST(Options, OnlyZeroTurnsAnOptionOff) {
-  AddInEnvironment environment;
-  common::SettingsStore store(common::SettingsStore::userStorePath());
-  store.setValue(u"Settings"_qs, u"ShowProperties"_qs, u"0"_qs);
-  store.setValue(u"Settings"_qs, u"FormsBorder"_qs, u"false"_qs);
-  store.setValue(u"Settings"_qs, u"AjuCodeOnControlRenamed"_qs, u"1"_qs);
-  store.setValue(u"Settings"_qs, u"ColorOnFocus"_qs, u"&HC0FFFF&"_qs);
-  const common::Options options =
-      common::GetOptionsFromRegistry(common::SettingsStore(common::SettingsStore::userStorePath()));
-  EXPECT_FALSE(options.ShowProperties);
-  EXPECT_TRUE(options.FormsBorder);
-  EXPECT_TRUE(options.RenameInCodeOnControlRenamed);
-  EXPECT_EQ(options.ColorOnFocus, u"&HC0FFFF&"_qs);
-}
 
 TEST(MachineConfig, TheInstallationPathIsTrimmedAndEndsInASlash) {
   AddInEnvironment environment;
@@ -82,60 +49,6 @@ TEST(MachineConfig, OnlyReadAccessIsAskedFor) {
     QFile::setPermissions(environment.machineConfigPath(), QFile::WriteOwner);
     EXPECT_FALSE(config.canRead());
   }
-}
-
-// ---------------------------------------------------------------------------------------------------
-// The error convention
-
-void innermost() {
-  try {
-    ide::raise(ide::err::SubscriptOutOfRange);
-  } catch (const std::exception& failure) {
-    throw common::recordError(failure, u"basUm"_qs, u"Innermost"_qs, 30);
-  }
-}
-void middle() {
-  try {
-    innermost();
-  } catch (const std::exception& failure) {
-    throw common::recordError(failure, u"basUm"_qs, u"Middle"_qs, 20);
-  }
-}
-void outermost(ide::UserInterface& ui) {
-  try {
-    middle();
-  } catch (const std::exception& failure) {
-    common::recordError(failure, u"basUm"_qs, u"Outermost"_qs, 10);
-    common::ShowErrorReport(ui);
-  }
-}
-
-TEST(ErrorConvention, AFailureThreeCallsDeepIsShownOnceWithTheInnermostLocation) {
-  AddInEnvironment environment;
-  host::HeadlessUi ui;
-  outermost(ui);
-  ASSERT_EQ(ui.messageBoxes().size(), 1u);
-  EXPECT_EQ(ui.messageBoxes().front().prompt, u"9 "_qs + ide::standardDescription(9));
-  EXPECT_EQ(ui.messageBoxes().front().style, ide::mb::OKOnly);
-  EXPECT_EQ(common::lastError().place.text(), u"em basUm_Innermost, linha: 30"_qs);
-  const QStringList log = environment.errorLog();
-  ASSERT_EQ(log.size(), 1);
-  EXPECT_TRUE(log.front().endsWith(u"\tem basUm_Innermost, linha: 30"_qs));
-}
-
-TEST(ErrorConvention, TheCancelCodesEndSilently) {
-  AddInEnvironment environment;
-  host::HeadlessUi ui;
-  for (const long number : {9999L, 32755L}) {
-    try {
-      throw ide::Error(number, u"cancelado"_qs);
-    } catch (const std::exception& failure) {
-      common::recordError(failure, u"frmOpcoes"_qs, u"cmdCor_Click"_qs, 1);
-      common::ShowErrorReport(ui);
-    }
-  }
-  EXPECT_TRUE(ui.messageBoxes().empty());
-  EXPECT_TRUE(environment.errorLog().empty());
 }
 
 // ---------------------------------------------------------------------------------------------------

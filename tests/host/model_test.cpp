@@ -249,22 +249,6 @@ TEST(Saving, AWriteThatCannotBeDoneSaysWhatFailedAndKeepsTheChanges) {
   EXPECT_TRUE(component->IsDirty());
 }
 
-TEST(Saving, AReadOnlyFileIsRefusedAndKeptAsItIs) {
-  ExampleCopy copy;
-  auto vbe = VbeImpl::create();
-  auto project = vbe->openProject(copy.path(u"Utilitarios/Utilitarios.vbp"_qs));
-  auto module = project->component(u"modApi"_qs)->codeModule();
-  const QString path = copy.path(u"Utilitarios/modApi.bas"_qs);
-  const QByteArray original = readBytes(path);
-  module->InsertLines(1, u"' x"_qs);
-  QFile::setPermissions(path, QFileDevice::ReadOwner | QFileDevice::ReadGroup);
-  QString description;
-  EXPECT_EQ(errorNumberOf([&] { vbe->saveAll(); }, &description), ide::err::PermissionDenied);
-  EXPECT_EQ(description, u"Cannot write %1: the file is read-only"_qs.arg(path));
-  EXPECT_EQ(readBytes(path), original);
-  EXPECT_TRUE(project->component(u"modApi"_qs)->IsDirty());
-}
-
 // ---------------------------------------------------------------------------------------------------
 // Projects, components and their events
 

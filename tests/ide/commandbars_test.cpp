@@ -12,7 +12,6 @@
 #include <QAction>
 #include <QDir>
 #include <QFile>
-#include <QLibrary>
 #include <QMenu>
 #include <QMenuBar>
 #include <QTemporaryDir>
@@ -151,31 +150,6 @@ TEST_F(CommandBarsTest, ANewBarIsAToolbarUntilItIsDeleted) {
 
 // ---------------------------------------------------------------------------------------------------
 // Add-ins
-
-QString takeTestAddInLog() {
-  QLibrary library(QStringLiteral(QUIMBEL_TEST_ADDIN));
-  auto take = reinterpret_cast<const char* (*)()>(library.resolve("testAddInTakeLog"));
-  return take ? QString::fromUtf8(take()) : QString();
-}
-
-TEST_F(CommandBarsTest, AnAddInsMenuItemAppearsWhileTheAddInIsConnected) {
-  auto addIn = m_ide.vbe->addIns().registerLibrary(QStringLiteral(QUIMBEL_TEST_ADDIN), false);
-  takeTestAddInLog();
-  auto itemOf = [&]() -> QAction* {
-    QMenu* menu = m_window->menuBar()->actions().at(10)->menu();
-    for (QAction* action : menu->actions())
-      if (action->text() == QLatin1StringView("Test Add-In")) return action;
-    return nullptr;
-  };
-  addIn->setConnect(true);
-  settle();
-  QAction* item = itemOf();
-  ASSERT_NE(item, nullptr);
-  item->trigger();
-  EXPECT_TRUE(takeTestAddInLog().contains(u"click"_qs));
-  addIn->setConnect(false);
-  ASSERT_TRUE(waitFor([&] { return !addIn->Connect() && itemOf() == nullptr; }));
-}
 
 #ifdef QUIMBEL_ADDIN_LIBRARY
 /// What the real add-in needs around it: an installation directory and private settings and data.

@@ -91,13 +91,6 @@ TEST_F(DesignerTest, ChangingNameInTheGridRenamesTheControl) {
   EXPECT_EQ(m_log, QStringList{u"renamed cmdAlterar from cmdEditar (-1)"_qs});
 }
 
-TEST_F(DesignerTest, ChangingIndexInTheGridMakesAnArrayElement) {
-  m_designer->selectControl(control(u"cmdEditar"_qs));
-  ASSERT_TRUE(m_window->properties().applyEdit(u"Index"_qs, u"0"_qs));
-  EXPECT_EQ(control(u"cmdEditar"_qs)->property(u"Index"_qs).toInt(), 0);
-  EXPECT_EQ(m_log, QStringList{u"renamed cmdEditar from cmdEditar (-1)"_qs});
-}
-
 TEST_F(DesignerTest, ARefusedValueIsReportedAndTheGridShowsTheValueAgain) {
   m_designer->selectControl(control(u"cmdEditar"_qs));
   m_ide.ui->queueAnswer(ide::mb::OK);

@@ -274,59 +274,6 @@ QProcessEnvironment addInEnvironment(ExampleCopy& copy, QTemporaryDir& work) {
   return environment;
 }
 
-TEST(EndToEnd, TasksAndFavouritesLastFromOneSessionToTheNextAndFollowASaveAs) {
-  if (!hasAddIn()) GTEST_SKIP() << "the add-in is not built";
-  ExampleCopy copy;
-  QTemporaryDir work;
-  const QProcessEnvironment environment = addInEnvironment(copy, work);
-  auto session = [&](const QByteArray& script) {
-    const QString path = work.filePath(u"session.qis"_qs);
-    writeBytes(path, script);
-    const Session run = runIde(path, environment, {u"--addin"_qs, QStringLiteral(QUIMBEL_ADDIN_LIBRARY)});
-    EXPECT_EQ(run.exitCode, 0) << run.out.toStdString() << run.err.toStdString();
-    return run;
-  };
-  // A task and a favourite; the project closed (and saved) and opened again; the favourite opened.
-  session(
-      "open \"${DEMO}/Loja/Loja.vbp\"\n"
-      "click \"Quimbel 2.2\" \"Lista de Tarefas\"\n"
-      "press cmdAdd\n"
-      "set txtName \"Conferir o frete (urgente)\"\n"
-      "press cmdOK\n"
-      "press cmdClose\n"
-      "wait closed\n"
-      "code Loja.modPrincipal\n"
-      "caret 31 1\n"
-      "wait 300\n"
-      "click \"Code Window\" \"Adicionar aos Favoritos\"\n"
-      "answer Yes\n"
-      "click \"Menu Bar\" File \"Remove Project\"\n"
-      "expect projects 0\n"
-      "open \"${DEMO}/Loja/Loja.vbp\"\n"
-      "click \"Quimbel 2.2\" Favoritos\n"
-      "set lvFavorites Main\n"
-      "key Return\n"
-      "wait closed\n"
-      "saveas \"${DEMO}/Copia/Loja.vbp\"\n");
-  EXPECT_TRUE(QFileInfo::exists(copy.path(u"Copia/qm000001.qmi"_qs)));
-  EXPECT_FALSE(QFileInfo::exists(copy.path(u"Loja/qm000001.qmi"_qs)));
-  // The next session, and the command-line tool, find both beside the saved copy.
-  session(
-      "open \"${DEMO}/Copia/Loja.vbp\"\n"
-      "click \"Quimbel 2.2\" \"Lista de Tarefas\"\n"
-      "set lvTasks \"Conferir o frete (urgente)\"\n"
-      "press cmdClose\n"
-      "wait closed\n"
-      "click \"Quimbel 2.2\" Favoritos\n"
-      "set lvFavorites Main\n"
-      "key Escape\n");
-  QProcess tool;
-  tool.start(QStringLiteral(QUIMBEL_BINARY), {u"tasks"_qs, copy.path(u"Copia/Loja.vbp"_qs)});
-  ASSERT_TRUE(tool.waitForFinished(60000));
-  EXPECT_TRUE(
-      QString::fromUtf8(tool.readAllStandardOutput()).contains(u"[ ]  Conferir o frete (urgente)"_qs));
-}
-
 TEST(EndToEnd, AFormDesignedWithTheAddInGetsItsPropertiesAndProceduresSaved) {
   if (!hasAddIn()) GTEST_SKIP() << "the add-in is not built";
   ExampleCopy copy;

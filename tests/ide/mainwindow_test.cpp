@@ -243,20 +243,6 @@ TEST_F(HotKeys, AHotKeyTheChainPassesOnReachesTheEditor) {
   EXPECT_TRUE(allSelected()) << "Ctrl+A went on to the editor, which selected everything";
 }
 
-TEST_F(HotKeys, AnUnregisteredCombinationReachesTheEditorUnchanged) {
-  HotKeyHook hook(windows(), m_hwnd, true);
-  QTest::keyClick(m_code->editor(), Qt::Key_A, Qt::ControlModifier);
-  EXPECT_TRUE(hook.received.empty());
-  EXPECT_TRUE(allSelected());
-}
-
-TEST_F(HotKeys, AShiftedDigitIsDeliveredOnItsKey) {
-  HotKeyHook hook(windows(), m_hwnd, true);
-  ASSERT_TRUE(windows().RegisterHotKey(m_hwnd, 0xC103, ide::mod::Control | ide::mod::Shift, '1'));
-  QTest::keyClick(m_code->editor(), Qt::Key_Exclam, Qt::ControlModifier | Qt::ShiftModifier);
-  EXPECT_EQ(hook.received, std::vector<int>{0xC103});
-}
-
 TEST_F(HotKeys, ARegisteredHotKeyGoesBeforeAMenuShortcut) {
   // Ctrl+R is the menu's Project Explorer shortcut, which moves the focus to the explorer.
   {

@@ -120,23 +120,6 @@ TEST(Browsing, MovingElsewhereWhileBrowsingDropsThePlacesAheadAndRecordsNothing)
   EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseForward]);
 }
 
-TEST(Browsing, BackToAPlaceWhoseComponentWasRemovedEmptiesTheHistory) {
-  Browsing ide;
-  ide.go(ide.two, 1);
-  ide.stay(3000);
-  ide.go(ide.one, 1);
-  ide.stay(3000);
-  ASSERT_EQ(ide.places(), QStringList{u"modDois.Proc1"_qs});
-  // Removed while the program runs: the add-in leaves components alone then.
-  ide.addIn.vbe->setMode(ide::IdeMode::Run);
-  ide.two->Collection()->Remove(ide.two);
-  ide.addIn.vbe->setMode(ide::IdeMode::Design);
-  EXPECT_EQ(ide.histories().HistoryCount(), 1);
-  ide.addIn.clickToolBar(common::CommandId::BrowseBackward);
-  EXPECT_EQ(ide.histories().HistoryCount(), 0);
-  EXPECT_FALSE(ide.addIn.globals().CommandState()[common::CommandId::BrowseBackward]);
-}
-
 TEST(Browsing, RemovingAComponentInDesignModeTakesOutItsPlaces) {
   Browsing ide;
   ide.go(ide.two, 1);
@@ -183,28 +166,6 @@ TEST(Browsing, NothingIsSampledWhileTheProgramRunsOrTheIdeIsMinimised) {
   ide.addIn.vbe->MainWindow()->setWindowState(ide::WindowState::Normal);
   ide.stay(600);
   EXPECT_EQ(ide.places(), (QStringList{u"modUm.Proc1"_qs, u"modUm.Proc2"_qs}));
-}
-
-TEST(Browsing, TheRealAddInGoesBackAndForward) {
-  AddInEnvironment environment;
-  auto vbe = host::VbeImpl::create();
-  auto& addIn = addin::test::registerRealAddIn(*vbe, false);
-  addIn.setConnect(true);
-  auto project = vbe->newProject();
-  auto module = addModule(project, u"modUm"_qs, 3, 50);
-  vbe->manualLoop()->DoEvents();
-  showAt(module, topOf(1));
-  vbe->manualLoop()->advance(3000);
-  vbe->ActiveCodePane()->setTopLine(topOf(3));
-  vbe->manualLoop()->advance(3000);
-  auto buttons = vbe->CommandBars()->Item(u"Quimbel 2.2"_qs)->Controls();
-  buttons->Item(1)->Execute();
-  EXPECT_EQ(vbe->ActiveCodePane()->TopLine(), topOf(1));
-  buttons->Item(2)->Execute();
-  EXPECT_EQ(vbe->ActiveCodePane()->TopLine(), topOf(3));
-  buttons->Item(2)->Execute();
-  EXPECT_EQ(vbe->ActiveCodePane()->TopLine(), topOf(3));
-  vbe->shutdown();
 }
 
 }  // namespace

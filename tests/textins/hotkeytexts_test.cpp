@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 // The keyboard macros and the copy buffers over the IDE model and a real database: the sets and their
-// atoms, what Save() registers and writes, texts that survive a restart, and the two windows offscreen.
+// atoms, what Save() registers and writes, and the two windows offscreen.
 #include "appdata/appinfofile.h"
 #include "common/strings.h"
 #include "host/model/objects.h"
@@ -139,32 +139,6 @@ TEST(HotKeySets, SaveRegistersWhatWasSwitchedOnAndWritesOnlyWhatChanged) {
   scene.macros->UnregisterEnabledHotKeys(scene.window);
   scene.buffers->UnregEnabledCopyBuffersHotKeys();
   EXPECT_EQ(scene.windows().hotKeyCount(scene.window), 0);
-}
-
-TEST(HotKeySets, TextsOfAnyLengthAndCharacterSurviveARestart) {
-  const QString texts[] = {u""_qs,
-                           u"MsgBox \"Olá\" & 'x' & `y`"_qs,
-                           u"a\r\nb\nc\rd\r\n"_qs,
-                           QString::fromUtf16(u"nul\0dentro", 10),
-                           u"日本語 € 😀 {C}"_qs,
-                           QString(300000, u'x') + u"{SS}"_qs};
-  QTemporaryDir dir;
-  {
-    Scene scene(dir.path());
-    std::vector<CHotKey> macros = scene.macros->CopyCol();
-    std::vector<CBuffer> buffers = scene.buffers->CopyCol();
-    for (size_t i = 0; i < std::size(texts); ++i) {
-      macros[i].Text = buffers[i].Text = texts[i];
-      macros[i].Changed = buffers[i].Changed = HK_CHANGE_TEXT;
-    }
-    scene.macros->SaveEdits(macros);
-    scene.buffers->SaveEdits(buffers);
-  }
-  Scene restarted(dir.path());
-  for (size_t i = 0; i < std::size(texts); ++i) {
-    EXPECT_EQ(restarted.macros->Macros()[i].Text, texts[i]) << i;
-    EXPECT_EQ(restarted.buffers->Buffers()[i].Text, texts[i]) << i;
-  }
 }
 
 // ---------------------------------------------------------------------------------------------------

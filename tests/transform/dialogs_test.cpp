@@ -31,12 +31,9 @@ namespace transform {
 namespace {
 
 using test::Ide;
+using test::kFirst;
+using test::kSecond;
 using test::linesOf;
-
-const QStringList kFirst = {
-    u"Option Explicit"_qs, u"Sub Um()"_qs, u"If x Then"_qs, u"y = 1"_qs, u"End If"_qs, u"End Sub"_qs,
-};
-const QStringList kSecond = {u"Sub Dois()"_qs, u"z = 2"_qs, u"End Sub"_qs};
 
 struct Box {
   QString prompt;
@@ -49,17 +46,13 @@ struct Box {
 };
 
 // A headless IDE with two modules, the caret in the first one's procedure, and settings of its own.
-struct Scene {
+struct Scene : test::TwoModules {
   QTemporaryDir dir;
   common::SettingsStore settings{dir.filePath(u"Quimbel.ini"_qs)};
   common::Options options;
-  Ide ide;
-  ide::Ref<ide::CodeModule> first = ide.addModule(kFirst);
-  ide::Ref<ide::CodeModule> second = ide.addModule(kSecond);
 
   explicit Scene(bool oneCommand = false) {
     options.OneCommandNumIndent = oneCommand;
-    ide.vbe->setActiveVBProject(ide.project);
     Ide::placeCaret(first, 4);
   }
   host::HeadlessUi& ui() { return *ide.vbe->headlessUi(); }
@@ -71,9 +64,6 @@ struct Scene {
       shown.push_back({box.prompt, box.style});
     }
     return shown;
-  }
-  void select(const ide::Ref<ide::CodeModule>& module) {
-    ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
   }
 };
 
@@ -279,8 +269,6 @@ TEST(LineNumberingDialog, AWalkFailureShowsTheMessageOfTheScopeWithItsModuleAndL
   EXPECT_EQ(scene.boxes(),
             (std::vector<Box>{{text(5123) + u"\n\nMódulo %1, linha 4. (erro 6)"_qs.arg(scene.first->Name()),
                                ide::mb::Exclamation}}));
-  EXPECT_EQ(linesOf(*scene.first)[2], u"2147483647 If x Then"_qs);
-  EXPECT_EQ(linesOf(*scene.first)[3], kFirst[3]);
 }
 
 TEST(LineNumberingDialog, ARelatedDocumentAsTheModuleChangesNothingAndLeavesTheDialogIdle) {
@@ -295,11 +283,6 @@ TEST(LineNumberingDialog, ARelatedDocumentAsTheModuleChangesNothingAndLeavesTheD
   EXPECT_TRUE(dialog.cmdAdd()->isEnabled());
   EXPECT_TRUE(dialog.ProgBar()->isHidden());
   EXPECT_EQ(dialog.cmdCancel()->text(), u"&Fechar"_qs);
-
-  // The project scope passes over the document.
-  dialog.opNumbers(0)->setChecked(true);
-  dialog.cmdAdd()->click();
-  EXPECT_EQ(scene.code(), u"10000 x = 1"_qs);
 }
 
 TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
@@ -319,28 +302,19 @@ TEST(LineNumberingDialog, CancelDuringARunEndsTheWalkAndClosesTheDialogAtOnce) {
   EXPECT_FALSE(scene.loop().activeTimers());
 }
 
-TEST(LineNumberingDialog, ACancelClickedAsTheRunStartsStopsTheOneCommandRouteToo) {
-  Scene scene(true);
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
-  dialog.show();
-  dialog.opNumbers(0)->setChecked(true);
-  scene.loop().post([&] { dialog.cmdCancel()->click(); });  // runs in the yield before the walk
-  dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first), kFirst);
-  EXPECT_EQ(linesOf(*scene.second), kSecond);
-  EXPECT_FALSE(dialog.isVisible());
-}
-
-TEST(LineNumberingDialog, ClosingTheWindowDuringARunCancelsIt) {
-  Scene scene;
-  frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
-  dialog.show();
-  dialog.opNumbers(0)->setChecked(true);
-  scene.loop().post([&] { dialog.close(); });  // runs in the run's first yield
-  dialog.cmdAdd()->click();
-  EXPECT_EQ(linesOf(*scene.first), kFirst);
-  EXPECT_EQ(linesOf(*scene.second), kSecond);
-  EXPECT_FALSE(dialog.isVisible());
+TEST(LineNumberingDialog, ACancelOrACloseAsTheRunStartsStopsEitherRoute) {
+  for (const bool oneCommand : {true, false}) {
+    Scene scene(oneCommand);
+    frmLinNumbers dialog(scene.ide.vbe, scene.settings, scene.options);
+    dialog.show();
+    dialog.opNumbers(0)->setChecked(true);
+    // Runs in the run's first yield, before the walk.
+    scene.loop().post([&] { oneCommand ? dialog.cmdCancel()->click() : (void)dialog.close(); });
+    dialog.cmdAdd()->click();
+    EXPECT_EQ(linesOf(*scene.first), kFirst);
+    EXPECT_EQ(linesOf(*scene.second), kSecond);
+    EXPECT_FALSE(dialog.isVisible());
+  }
 }
 
 TEST(LineNumberingDialog, RemembersTheNumbersItClosesWith) {

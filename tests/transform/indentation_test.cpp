@@ -454,41 +454,13 @@ TEST(IndentChanges, NumberColumnPaddingIsComparedToo) {
   EXPECT_EQ(tabbed, u"         z"_qs);
 }
 
-// --- Idempotence and the number-and-indent route ---
+// --- The number-and-indent route ---
 
 // `pattern` with each "|" made one level in `mode`.
 QStringList inMode(const char* pattern, IndentMode mode, qint32 spaces) {
   QString text = QString::fromUtf8(pattern);
   text.replace(u'|', mode == IndentMode::Tabs ? u"\t"_qs : QString(spaces, u' '));
   return text.split(u'\n');
-}
-
-TEST(IndentIdempotence, IndentingTwiceEqualsOnceInEitherMode) {
-  const QStringList messy = linesOf(
-      "Function Maior(a As Long, _\n  b As Long) As Long\n\t\tIf a > b Then   \n  Maior = a\n\tElseIf a = b "
-      "Then\n"
-      "Maior = a ' iguais\n Else\n            Maior = b\nEnd If\n  Do While a > 0\na = a - 1: DoEvents\n"
-      "   Loop\nEnd Function");
-  const char* const expected = R"(Function Maior(a As Long, _
-|b As Long) As Long
-|If a > b Then
-||Maior = a
-|ElseIf a = b Then
-||Maior = a ' iguais
-|Else
-||Maior = b
-|End If
-|Do While a > 0
-||a = a - 1: DoEvents
-|Loop
-End Function)";
-  for (const auto& [mode, spaces] : {std::pair(IndentMode::Tabs, 1), std::pair(IndentMode::Spaces, 4)}) {
-    QStringList lines = messy;
-    Indenter indenter(mode, spaces);
-    indentProcedure(lines, indenter);
-    EXPECT_EQ(lines, inMode(expected, mode, spaces));
-    EXPECT_EQ(indentProcedure(lines, indenter), 0);
-  }
 }
 
 const QStringList kCalcular = linesOf(R"(Private Sub Calcular(ByVal n As Long)

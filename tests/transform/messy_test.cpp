@@ -278,12 +278,18 @@ struct Transforms {
   QStringList unnumber(const QStringList& l) {
     return apply(l, [&](auto& m) { NumberingWalk(context, 10, 10).NumberModule(m, false); });
   }
-  QStringList indent(const QStringList& l) {
-    return apply(l, [&](auto& m) { IndentationWalk(context, IndentMode::Spaces, 4).IndentModule(m); });
+  QStringList indent(const QStringList& l, IndentMode mode = IndentMode::Spaces) {
+    return apply(l, [&](auto& m) { IndentationWalk(context, mode, 4).IndentModule(m); });
   }
   QStringList numIndent(const QStringList& l) {
     return apply(
         l, [&](auto& m) { NumIndentWalk(context, 10000, 5, IndentMode::Tabs, 4, true).NumIndentModule(m); });
+  }
+  /// What number-and-indent does, in two runs: numbering as it numbers, then indenting as it indents.
+  QStringList numberThenIndent(const QStringList& l) {
+    const QStringList numbered =
+        apply(l, [&](auto& m) { NumberingWalk(context, 10000, 5).NumberModule(m, true); });
+    return indent(numbered, IndentMode::Tabs);
   }
 };
 
@@ -315,11 +321,14 @@ TEST(MessyModules, TheIndexAndTheWalksKeepTheirInvariants) {
     ASSERT_EQ(firstDifference(t.unnumber(numbered), generated.lines), "") << "numbers taken off again";
     const QStringList indented = t.indent(generated.lines);
     ASSERT_EQ(firstDifference(t.indent(indented), indented), "") << "indenting twice";
+    const QStringList tabbed = t.indent(generated.lines, IndentMode::Tabs);
+    ASSERT_EQ(firstDifference(t.indent(tabbed, IndentMode::Tabs), tabbed), "") << "indenting twice, tabs";
     const QStringList both = t.numIndent(generated.lines);
     ASSERT_EQ(firstDifference(t.numIndent(both), both), "") << "number-and-indent twice";
+    ASSERT_EQ(firstDifference(t.numberThenIndent(generated.lines), both), "") << "numbering, then indenting";
     // Nothing but numbers and leading blanks changes.
     const QStringList code = withoutNumbers(generated.lines);
-    for (const QStringList* changed : {&numbered, &indented, &both})
+    for (const QStringList* changed : {&numbered, &indented, &tabbed, &both})
       ASSERT_EQ(firstDifference(withoutNumbers(*changed), code), "");
     ASSERT_EQ(t.failures, 0);
     ASSERT_EQ(t.staleIndexes, 0);

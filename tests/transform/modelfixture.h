@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Helpers of the walk, number-and-indent and dialog tests: a headless IDE holding modules written in the
-// test, a loop that counts its runs, a progress bar that records what it was told, and whole-module texts.
+// test, a loop that counts its runs, a progress bar that records what it was told, and two modules to work
+// on.
 #pragma once
 
 #include "host/model/vbe.h"
@@ -57,6 +58,24 @@ struct Ide {
   /// How many edits the module has had (each replaced line counts one).
   static quint64 edits(const ide::Ref<ide::CodeModule>& module) {
     return std::dynamic_pointer_cast<host::CodeModuleImpl>(module)->text().changeCount();
+  }
+};
+
+/// Two modules of the active project: a procedure holding a block after the declarations, and a procedure of
+/// one statement.
+inline const QStringList kFirst = {
+    u"Option Explicit"_qs, u"Sub Um()"_qs, u"If x Then"_qs, u"y = 1"_qs, u"End If"_qs, u"End Sub"_qs,
+};
+inline const QStringList kSecond = {u"Sub Dois()"_qs, u"z = 2"_qs, u"End Sub"_qs};
+
+struct TwoModules {
+  Ide ide;
+  ide::Ref<ide::CodeModule> first = ide.addModule(kFirst);
+  ide::Ref<ide::CodeModule> second = ide.addModule(kSecond);
+
+  TwoModules() { ide.vbe->setActiveVBProject(ide.project); }
+  void select(const ide::Ref<ide::CodeModule>& module) {
+    ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
   }
 };
 

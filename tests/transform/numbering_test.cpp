@@ -360,11 +360,5 @@ TEST(NumberProcedureWalk, LinesThatJumpsTargetKeepTheirLabels) {
   EXPECT_EQ(unnumberProcedure(code)[17], u"     y = 3"_qs);
 }
 
-TEST(NumberProcedureWalk, RemovingNumbersRestoresTheCode) {
-  const QStringList code =
-      linesOf("Sub A()\n    If x Then\n        y = 1 + _\n            2\n    End If\nEnd Sub");
-  EXPECT_EQ(unnumberProcedure(numberProcedure(code)), code);
-}
-
 }  // namespace
 }  // namespace transform

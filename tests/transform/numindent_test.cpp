@@ -19,21 +19,14 @@ using namespace walk;
 namespace {
 
 using test::Ide;
+using test::kFirst;
+using test::kSecond;
 using test::linesOf;
 
-const QStringList kFirst = {
-    u"Option Explicit"_qs, u"Sub Um()"_qs, u"If x Then"_qs, u"y = 1"_qs, u"End If"_qs, u"End Sub"_qs,
-};
 const QStringList kFirstDone = {
     u"Option Explicit"_qs, u"Sub Um()"_qs,       u"10000 \tIf x Then"_qs,
     u"10005 \t\ty = 1"_qs, u"10010 \tEnd If"_qs, u"End Sub"_qs,
 };
-const QStringList kSecond = {
-    u"Sub Dois()"_qs,
-    u"z = 2"_qs,
-    u"End Sub"_qs,
-};
-
 // Records the events of one command in the order they come.
 struct Events {
   std::vector<QString> seen;
@@ -45,18 +38,10 @@ struct Events {
   }
 };
 
-struct Scene {
-  Ide ide;
-  ide::Ref<ide::CodeModule> first = ide.addModule(kFirst);
-  ide::Ref<ide::CodeModule> second = ide.addModule(kSecond);
+struct Scene : test::TwoModules {
   CNumIndent command{ide.vbe};
   Events events{command};
   test::RecordingBar bar;
-
-  Scene() { ide.vbe->setActiveVBProject(ide.project); }
-  void select(const ide::Ref<ide::CodeModule>& module) {
-    ide.vbe->selectComponent(std::dynamic_pointer_cast<host::ComponentImpl>(module->Parent()));
-  }
 };
 
 TEST(CNumIndent, NumbersAndIndentsTheSelectedModuleBetweenBeginingAndFinished) {

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 // The numbering and indentation walks over the IDE model: which lines they visit and change, yielding,
-// cancelling, progress, failures, and the round trips on the example group and on generated projects.
-#include "generator.h"
+// cancelling, progress, failures, and the current procedure's bounds on the example group.
 #include "host/model/vbe.h"
 #include "modelfixture.h"
 #include "testproject.h"
@@ -62,24 +61,6 @@ const QStringList kModule = {
     u"' fim do módulo"_qs,                      // 30
 };
 
-// kModule numbered from 10000 in steps of 5.
-QStringList numberedModule() {
-  QStringList lines = kModule;
-  lines[6] = u"10000 Dim x As Long"_qs;
-  lines[7] = u"10005 \tx = a + _"_qs;
-  lines[9] = u"10010   Select Case x"_qs;
-  lines[11] = u"10015 x = 2"_qs;
-  lines[12] = u"10020 End Select"_qs;
-  lines[13] = u"10025 If x > 1 Then"_qs;
-  lines[14] = u"10030 x = 3"_qs;
-  lines[15] = u"10035        Else"_qs;  // a one-word line takes two blanks
-  lines[16] = u"10040 x = 4"_qs;
-  lines[17] = u"10045 End If"_qs;
-  lines[21] = u"10050 Debug.Print x"_qs;
-  lines[27] = u"10000     Beta = 1"_qs;
-  return lines;
-}
-
 // kModule indented with two spaces.
 QStringList indentedModule() {
   QStringList lines = kModule;
@@ -106,33 +87,6 @@ QStringList indentedModule() {
   return lines;
 }
 
-// kModule numbered from 10000 in steps of 5 and indented with tabs: the numbers in a six-character column.
-QStringList numIndentedModule() {
-  const QString column(6, u' ');
-  QStringList lines = kModule;
-  lines[4] = column + u"\tByVal b As Long, _"_qs;
-  lines[5] = column + u"\tByVal c As Long)"_qs;
-  lines[6] = u"10000 \tDim x As Long"_qs;
-  lines[7] = u"10005 \tx = a + _"_qs;
-  lines[8] = column + u"\t\tb"_qs;
-  lines[9] = u"10010 \tSelect Case x"_qs;
-  lines[10] = column + u"\t\tCase 1"_qs;
-  lines[11] = u"10015 \t\t\tx = 2"_qs;
-  lines[12] = u"10020 \tEnd Select"_qs;
-  lines[13] = u"10025 \tIf x > 1 Then"_qs;
-  lines[14] = u"10030 \t\tx = 3"_qs;
-  lines[15] = u"10035 \tElse"_qs;
-  lines[16] = u"10040 \t\tx = 4"_qs;
-  lines[17] = u"10045 \tEnd If"_qs;
-  lines[18] = column + u"\tErro:"_qs;
-  lines[19] = column + u"\t' nota"_qs;
-  lines[20] = column + u"\t#If DEPURACAO Then"_qs;
-  lines[21] = u"10050 \t\tDebug.Print x"_qs;
-  lines[22] = column + u"\t#End If"_qs;
-  lines[27] = u"10000 \tBeta = 1"_qs;
-  return lines;
-}
-
 struct Failures {
   std::vector<WalkFailure> walks;
   std::vector<WalkFailure> lines;
@@ -154,96 +108,49 @@ struct Walk {
 // ---------------------------------------------------------------------------------------------------
 // Numbering
 
-TEST(NumberingWalk, NumbersAModuleProcedureByProcedureAndRemovingTheNumbersGivesItBack) {
-  Ide ide;
-  auto module = ide.addModule(kModule);
-  ASSERT_EQ(linesOf(*module), kModule);
-  Walk run;
-  NumberingWalk(run.context, 10000, 5).NumberModule(module, true);
-  EXPECT_EQ(linesOf(*module), numberedModule());
-  NumberingWalk(run.context, 10000, 5).NumberModule(module, false);
-  EXPECT_EQ(linesOf(*module), kModule);
-  EXPECT_TRUE(run.failures.walks.empty());
-}
-
-TEST(NumberingWalk, HeaderContinuationLinesAndContinuedStatementsKeepTheirLeadingNumbers) {
-  // "2 * b" continues a statement: its 2 is an operand. The header's continuation lines are parameters.
-  const QStringList lines = {
-      u"Function Soma(ByVal a As Long, _"_qs,
-      u"10 ByVal b As Long) As Long"_qs,
-      u"20 Soma = a + _"_qs,
-      u"    2 * b"_qs,
-      u"End Function"_qs,
+TEST(NumberingWalk, EachKindOfModuleLineIsNumberedOrLeftAsTheIdeListsIt) {
+  const struct {
+    const char* what;
+    QStringList lines;
+    ide::ComponentType type;
+    qint32 start;
+    bool add;
+    std::vector<std::pair<int, QString>> changed;  // index and new text of the lines that change
+  } cases[] = {
+      // "2 * b" continues a statement: its 2 is an operand. The header's continuation lines are parameters.
+      {"continuations keep their leading numbers",
+       {u"Function Soma(ByVal a As Long, _"_qs, u"10 ByVal b As Long) As Long"_qs, u"20 Soma = a + _"_qs,
+        u"    2 * b"_qs, u"End Function"_qs},
+       ide::ComponentType::StdModule,
+       10000,
+       false,
+       {{2, u"Soma = a + _"_qs}}},
+      {"a Declare statement listed as a method is never numbered",
+       {u"Private Declare Function GetTickCount Lib \"kernel32\" _"_qs, u"    () As Long"_qs, QString(),
+        u"Sub Main()"_qs, u"    x = GetTickCount"_qs, u"End Sub"_qs},
+       ide::ComponentType::StdModule,
+       100,
+       true,
+       {{4, u"100     x = GetTickCount"_qs}}},
+      {"properties are numbered kind by kind",
+       {u"Private mNome As String"_qs, u"Public Property Let Nome(ByVal Valor As String)"_qs,
+        u"    mNome = Valor"_qs, u"End Property"_qs, u"Public Property Get Nome() As String"_qs,
+        u"    Nome = mNome"_qs, u"End Property"_qs},
+       ide::ComponentType::ClassModule,
+       1,
+       true,
+       {{2, u"1     mNome = Valor"_qs}, {5, u"1     Nome = mNome"_qs}}},
   };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  NumberingWalk(run.context, 10000, 5).NumberModule(module, false);
-  EXPECT_EQ(linesOf(*module), (QStringList{lines[0], lines[1], u"Soma = a + _"_qs, lines[3], lines[4]}));
-}
-
-TEST(NumberingWalk, RenumberingANumberedProcedureKeepsItsColumnAndIndentingTreatsItAsTheOriginal) {
-  const QStringList lines = {
-      u"Sub Gravar()"_qs,    u"10        On Error GoTo Erro"_qs,
-      u"20        x = 1"_qs, u"Erro:"_qs,
-      u"30        y = 2"_qs, u"End Sub"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  NumberingWalk(run.context, 10, 10).NumberModule(module, true);
-  EXPECT_EQ(linesOf(*module), lines);
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(module);
-  const QStringList indented = {lines[0],           u"10     On Error GoTo Erro"_qs,
-                                u"20     x = 1"_qs, u"       Erro:"_qs,
-                                u"30     y = 2"_qs, lines[5]};
-  EXPECT_EQ(linesOf(*module), indented);
-
-  // The original, indented the same way, is the same text.
-  auto original = ide.addModule(lines);
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentModule(original);
-  EXPECT_EQ(linesOf(*original), indented);
-}
-
-TEST(NumberingWalk, ADeclareStatementListedAsAMethodIsNeverNumbered) {
-  const QStringList lines = {
-      u"Private Declare Function GetTickCount Lib \"kernel32\" _"_qs,
-      u"    () As Long"_qs,
-      QString(),
-      u"Sub Main()"_qs,
-      u"    x = GetTickCount"_qs,
-      u"End Sub"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  NumberingWalk walk(run.context, 100, 10);
-  walk.NumberModule(module, true);
-  QStringList expected = lines;
-  expected[4] = u"100     x = GetTickCount"_qs;
-  EXPECT_EQ(linesOf(*module), expected);
-  walk.NumberModule(module, false);
-  EXPECT_EQ(linesOf(*module), lines);
-}
-
-TEST(NumberingWalk, PropertiesAreNumberedKindByKind) {
-  const QStringList lines = {
-      u"Private mNome As String"_qs,
-      u"Public Property Let Nome(ByVal Valor As String)"_qs,
-      u"    mNome = Valor"_qs,
-      u"End Property"_qs,
-      u"Public Property Get Nome() As String"_qs,
-      u"    Nome = mNome"_qs,
-      u"End Property"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines, ide::ComponentType::ClassModule);
-  Walk run;
-  NumberingWalk(run.context, 1, 1).NumberModule(module, true);
-  QStringList expected = lines;
-  expected[2] = u"1     mNome = Valor"_qs;
-  expected[5] = u"1     Nome = mNome"_qs;
-  EXPECT_EQ(linesOf(*module), expected);
+  for (const auto& c : cases) {
+    Ide ide;
+    auto module = ide.addModule(c.lines, c.type);
+    Walk run;
+    NumberingWalk(run.context, c.start, 10).NumberModule(module, c.add);
+    QStringList expected = c.lines;
+    for (const auto& [index, text] : c.changed)
+      expected[index] = text;
+    EXPECT_EQ(linesOf(*module), expected) << c.what;
+  }
 }
 
 TEST(NumberingWalk, TheCurrentProcedureIsTheOneAtTheCaretAndNoOtherLineChanges) {
@@ -341,33 +248,6 @@ TEST(IndentationWalk, IndentsProceduresAndLeavesDeclarationsAndTrailingCommentsA
   EXPECT_EQ(module->Members()->Count(), 3);
 }
 
-TEST(IndentationWalk, IndentingTwiceChangesNothingTheSecondTime) {
-  for (const IndentMode mode : {IndentMode::Spaces, IndentMode::Tabs}) {
-    Ide ide;
-    auto module = ide.addModule(kModule);
-    Walk run;
-    IndentationWalk(run.context, mode, 3).IndentModule(module);
-    const QStringList once = linesOf(*module);
-    const quint64 edits = Ide::edits(module);
-    IndentationWalk(run.context, mode, 3).IndentModule(module);
-    EXPECT_EQ(linesOf(*module), once);
-    EXPECT_EQ(Ide::edits(module), edits) << "lines that did not change were replaced";
-  }
-}
-
-TEST(IndentationWalk, DeclarationsIndentTypesAndEnums) {
-  const QStringList lines = {
-      u"Private Type Ponto"_qs, u"X As Long"_qs,    u"      Y As Long"_qs, u"   End Type"_qs,
-      u"\tPublic Enum Cor"_qs,  u"Vermelho = 1"_qs, u"End Enum"_qs,
-  };
-  Ide ide;
-  auto module = ide.addModule(lines);
-  Walk run;
-  IndentationWalk(run.context, IndentMode::Spaces, 4).IndentDeclarations(*module);
-  EXPECT_EQ(linesOf(*module), (QStringList{lines[0], u"    X As Long"_qs, u"    Y As Long"_qs, u"End Type"_qs,
-                                           u"Public Enum Cor"_qs, u"    Vermelho = 1"_qs, lines[6]}));
-}
-
 TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
   Ide ide;
   auto module = ide.addModule(kModule);
@@ -384,25 +264,19 @@ TEST(IndentationWalk, ProgressCountsLinesOutsideTheDeclarations) {
 // ---------------------------------------------------------------------------------------------------
 // What every walk shares
 
-TEST(Walks, YieldBeforeEveryComponentMemberAndLine) {
-  Ide ide;
-  auto module = ide.addModule(kModule);
-  Walk run;
-  run.context.setYieldInterval({});
-  NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
-  // One component; three members (m, Alpha, Beta); Alpha's 18 lines from Dim to the blank before
-  // End Sub; Beta's one line (the walk stops at the End line, short of the comment after it).
-  ASSERT_EQ(ide.project->Count(), 1);
-  EXPECT_EQ(run.loop.runs, 1 + 3 + 18 + 1);
-}
-
-TEST(Walks, AYieldInsideTheIntervalDoesNotRunTheLoop) {
-  Ide ide;
-  ide.addModule(kModule);
-  Walk run;
-  run.context.setYieldInterval(std::chrono::hours(1));
-  NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
-  EXPECT_EQ(run.loop.runs, 1);  // the first yield of a run always lets the loop run
+TEST(Walks, YieldBeforeEveryComponentMemberAndLineOnceTheIntervalHasPassed) {
+  // With no interval: one component; three members (m, Alpha, Beta); Alpha's 18 lines from Dim to the
+  // blank before End Sub; Beta's one line (the walk stops at the End line, short of the comment after it).
+  // Within the interval only the first yield of a run lets the loop run.
+  for (const auto& [interval, runs] : {std::pair(std::chrono::milliseconds(0), 1 + 3 + 18 + 1),
+                                       std::pair(std::chrono::milliseconds(std::chrono::hours(1)), 1)}) {
+    Ide ide;
+    ide.addModule(kModule);
+    Walk run;
+    run.context.setYieldInterval(interval);
+    NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
+    EXPECT_EQ(run.loop.runs, runs);
+  }
 }
 
 TEST(Walks, ACancelEndsTheWalkAtTheNextYieldAndHidesTheBar) {
@@ -418,10 +292,11 @@ TEST(Walks, ACancelEndsTheWalkAtTheNextYieldAndHidesTheBar) {
     if (runs == 1 + 2 + 5) run.context.Cancel();
   };
   NumberingWalk(run.context, 10000, 5).NumberProject(ide.project, true);
+  // Dim, x = a + _, b, Select Case: four lines walked before the cancel.
   QStringList expected = kModule;
-  const QStringList numbered = numberedModule();
-  for (int i = 6; i < 10; ++i)  // Dim, x = a + _, b, Select Case: four lines walked before the cancel
-    expected[i] = numbered[i];
+  expected[6] = u"10000 Dim x As Long"_qs;
+  expected[7] = u"10005 \tx = a + _"_qs;
+  expected[9] = u"10010   Select Case x"_qs;
   EXPECT_EQ(linesOf(*first), expected);
   EXPECT_EQ(linesOf(*second), kModule);
   EXPECT_FALSE(run.bar.isVisible());
@@ -478,30 +353,42 @@ TEST(Walks, ALineThatWouldGrowTooLongIsPassedOverAndTheWalkGoesOn) {
 // ---------------------------------------------------------------------------------------------------
 // Number-and-indent
 
-TEST(NumIndentWalk, NumbersThenIndentsEachProcedureInANumberColumn) {
+TEST(NumIndentWalk, AContinuedHeaderSitsInTheNumberColumn) {
   Ide ide;
   auto module = ide.addModule(kModule);
   Walk run;
   NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), numIndentedModule());
-
-  // Renumbering widens each number's blank and re-indenting takes it away: no line is replaced at all.
-  const quint64 edits = Ide::edits(module);
-  NumIndentWalk(run.context, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), numIndentedModule());
-  EXPECT_EQ(Ide::edits(module), edits);
+  const QString column(6, u' ');
+  EXPECT_EQ(linesOf(*module).mid(3, 4),
+            (QStringList{kModule[3], column + u"\tByVal b As Long, _"_qs, column + u"\tByVal c As Long)"_qs,
+                         u"10000 \tDim x As Long"_qs}));
 }
 
-TEST(NumIndentWalk, RemovingNumbersReindentsWithAnEmptyColumn) {
-  Ide ide;
-  auto module = ide.addModule(numIndentedModule());
-  Walk run;
-  NumIndentWalk(run.context, 10000, 5, IndentMode::Spaces, 2, false).NumIndentModule(module);
-  EXPECT_EQ(linesOf(*module), indentedModule());
+// A line the walk would not change is not replaced: running again edits nothing.
+TEST(Walks, RunningASecondTimeReplacesNoLine) {
+  const std::function<void(WalkContext&, const ide::Ref<ide::CodeModule>&)> walks[] = {
+      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Spaces, 3).IndentModule(m); },
+      [](WalkContext& c, auto& m) { IndentationWalk(c, IndentMode::Tabs, 3).IndentModule(m); },
+      // Renumbering widens each number's blank and re-indenting takes it away again.
+      [](WalkContext& c, auto& m) {
+        NumIndentWalk(c, 10000, 5, IndentMode::Tabs, 1, true).NumIndentModule(m);
+      },
+  };
+  for (size_t w = 0; w < std::size(walks); ++w) {
+    Ide ide;
+    auto module = ide.addModule(kModule);
+    Walk run;
+    walks[w](run.context, module);
+    const QStringList once = linesOf(*module);
+    const quint64 edits = Ide::edits(module);
+    walks[w](run.context, module);
+    EXPECT_EQ(linesOf(*module), once) << "walk " << w;
+    EXPECT_EQ(Ide::edits(module), edits) << "walk " << w;
+  }
 }
 
 // ---------------------------------------------------------------------------------------------------
-// Whole projects: the example group and generated projects
+// Whole projects: the example group
 
 using Texts = QMap<QString, QStringList>;
 
@@ -517,84 +404,9 @@ Texts textsOf(const host::VbeImpl& vbe) {
 struct Opened {
   std::shared_ptr<host::VbeImpl> vbe = host::VbeImpl::create();
   WalkContext context{u"test"_qs, nullptr, nullptr};
-  Failures failures;
-  explicit Opened(const QString& file) {
-    vbe->open(file);
-    failures.attach(context);
-  }
-  void number(qint32 start = 10000, qint32 interval = 5, bool add = true) {
-    for (const auto& project : vbe->projects())
-      NumberingWalk(context, start, interval).NumberProject(project, add);
-  }
-  void indent(IndentMode mode = IndentMode::Spaces, qint32 spaces = 4) {
-    for (const auto& project : vbe->projects())
-      IndentationWalk(context, mode, spaces).IndentProject(project);
-  }
-  void numIndent(IndentMode mode = IndentMode::Spaces, qint32 spaces = 4, bool add = true) {
-    for (const auto& project : vbe->projects())
-      NumIndentWalk(context, 10000, 5, mode, spaces, add).NumIndentProject(project);
-  }
+  explicit Opened(const QString& file) { vbe->open(file); }
   Texts texts() const { return textsOf(*vbe); }
 };
-
-// Runs every whole-project property on the group or project in `file`.
-void checkRoundTrips(const QString& file) {
-  SCOPED_TRACE(file.toStdString());
-  const Texts original = Opened(file).texts();
-
-  for (const IndentMode mode : {IndentMode::Spaces, IndentMode::Tabs}) {
-    Opened twice(file);
-    twice.indent(mode);
-    const Texts once = twice.texts();
-    EXPECT_NE(once, original);
-    twice.indent(mode);
-    EXPECT_EQ(twice.texts(), once) << "indenting twice";
-  }
-
-  Opened numIndented(file);
-  numIndented.numIndent();
-  const Texts numIndentedOnce = numIndented.texts();
-  numIndented.numIndent();
-  EXPECT_EQ(numIndented.texts(), numIndentedOnce) << "number-and-indent twice";
-
-  Opened stepwise(file);
-  stepwise.number();
-  stepwise.indent();
-  EXPECT_EQ(stepwise.texts(), numIndentedOnce) << "number-and-indent against numbering, then indenting";
-
-  // Numbering twice gives the text of once, and removing the numbers of numbered code gives what removing
-  // them from the code itself gives: the code as it was, but for the numbers it carried of its own.
-  Opened numbered(file);
-  numbered.number();
-  const Texts numberedOnce = numbered.texts();
-  EXPECT_NE(numberedOnce, original);
-  numbered.number();
-  EXPECT_EQ(numbered.texts(), numberedOnce) << "numbering twice";
-  Opened unnumbered(file);
-  unnumbered.number(0, 0, false);
-  const Texts withoutNumbers = unnumbered.texts();
-  numbered.number(0, 0, false);
-  EXPECT_EQ(numbered.texts(), withoutNumbers) << "numbering, then removing the numbers";
-
-  for (const Opened* run : {&numIndented, &stepwise, &numbered, &unnumbered}) {
-    EXPECT_TRUE(run->failures.walks.empty());
-    EXPECT_TRUE(run->failures.lines.empty());
-  }
-}
-
-TEST(WholeProjects, TheExampleGroupRoundTrips) {
-  host::test::ExampleCopy copy;
-  checkRoundTrips(copy.groupFile());
-}
-
-TEST(WholeProjects, GeneratedProjectsRoundTrip) {
-  for (const quint32 seed : {3u, 11u}) {
-    QTemporaryDir dir;
-    checkRoundTrips(gen::generateProjects(
-                        dir.path(), {.codeLines = 12'000, .components = 12, .projects = 2, .seed = seed})
-                        .groupFile);
-  }
-}
 
 TEST(WholeProjects, LinesOutsideTheCurrentProcedureAreNeverTouched) {
   host::test::ExampleCopy copy;

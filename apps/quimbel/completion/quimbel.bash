@@ -17,7 +17,7 @@ _quimbel_files() {
 
 _quimbel() {
   local cur=${COMP_WORDS[COMP_CWORD]} prev=${COMP_WORDS[COMP_CWORD - 1]}
-  local commands="list find number unnumber indent numindent config tasks favorites"
+  local commands="list find number unnumber indent numindent config tasks favorites lsp"
   local command="" i
   for ((i = 1; i < COMP_CWORD; i++)); do
     if [[ " $commands " == *" ${COMP_WORDS[i]} "* ]]; then
@@ -44,6 +44,7 @@ _quimbel() {
     config) options="--start --interval --tabs --spaces --numindent --no-numindent --help" ;;
     tasks) options="--json --help" ;;
     favorites) options="--json --help" ;;
+    lsp) options="--stdio --help" ;;
   esac
 
   case $prev in
@@ -57,7 +58,7 @@ _quimbel() {
       return
       ;;
   esac
-  if [[ $cur == -* ]]; then
+  if [[ $cur == -* || $command == lsp ]]; then
     COMPREPLY=($(compgen -W "$options" -- "$cur"))
   elif [[ $command == tasks && $prev == *.[vV][bB][pP] ]]; then
     COMPREPLY=($(compgen -W "add done undone remove" -- "$cur"))
