@@ -121,12 +121,12 @@ void CodeModuleImpl::checkEditable() {
 }
 
 void CodeModuleImpl::checkWritable() {
-  checkEditable();
+  // Called for every line a walk replaces: each owner is locked once.
   auto component = m_component.lock();
+  auto project = component ? component->project() : nullptr;
+  if (!project) ide::raise(ide::err::ObjectVariableNotSet);
   // While the program runs its code is read-only, for add-ins as in the code window.
-  auto project = component->project();
-  if (auto vbe = project ? project->vbe() : nullptr; vbe && vbe->mode() == ide::IdeMode::Run)
-    ide::raise(ide::err::CannotEdit);
+  if (auto vbe = project->vbe(); vbe && vbe->mode() == ide::IdeMode::Run) ide::raise(ide::err::CannotEdit);
 }
 
 void CodeModuleImpl::InsertLines(int line, const QString& text) {
