@@ -72,18 +72,18 @@ std::size_t parseHead(const FormDescription::Lines& lines, ModuleSource& source,
   return position;
 }
 
-/// Appends the code lines to `source`, moving the hidden attribute lines aside.
-void splitCode(std::vector<SourceLine>::const_iterator begin, std::vector<SourceLine>::const_iterator end,
-               ModuleSource& source) {
-  source.code.reserve(source.code.size() + static_cast<std::size_t>(end - begin));
+/// Appends the code lines to `source`, moving the hidden attribute lines aside; `lines` are taken.
+void splitCode(std::vector<SourceLine>& lines, ModuleSource& source) {
+  source.code.reserve(source.code.size() + lines.size());
   bool continued = false;
-  for (auto line = begin; line != end; ++line) {
-    if (!continued && syntax::isAttributeStatement(line->text)) {
-      source.memberAttributes.push_back(MemberAttributeLine{static_cast<int>(source.code.size()), *line});
+  for (SourceLine& line : lines) {
+    if (!continued && syntax::isAttributeStatement(line.text)) {
+      source.memberAttributes.push_back(
+          MemberAttributeLine{static_cast<int>(source.code.size()), std::move(line)});
       continue;
     }
-    source.code.push_back(*line);
-    continued = syntax::continues(line->text);
+    continued = syntax::continues(line.text);
+    source.code.push_back(std::move(line));
   }
 }
 
@@ -93,7 +93,8 @@ ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QStrin
   ModuleSource source;
   const std::size_t codeStart = parseHead(
       [&](std::size_t index) { return index < lines.size() ? &lines[index] : nullptr; }, source, fileName);
-  splitCode(lines.begin() + static_cast<std::ptrdiff_t>(codeStart), lines.end(), source);
+  std::vector<SourceLine> code(lines.begin() + static_cast<std::ptrdiff_t>(codeStart), lines.end());
+  splitCode(code, source);
   return source;
 }
 
@@ -108,8 +109,8 @@ ModuleHead parseModuleHead(QByteArrayView bytes, const QString& fileName) {
 }
 
 void parseModuleCode(QByteArrayView code, const QString& fileName, int firstLine, ModuleSource& into) {
-  const std::vector<SourceLine> lines = readSourceLines(code, fileName, firstLine);
-  splitCode(lines.begin(), lines.end(), into);
+  std::vector<SourceLine> lines = readSourceLines(code, fileName, firstLine);
+  splitCode(lines, into);
 }
 
 ModuleSource parseModule(QByteArrayView bytes, const QString& fileName) {

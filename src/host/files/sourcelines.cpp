@@ -61,7 +61,8 @@ LineSpan nextLine(QByteArrayView bytes, qsizetype& position, const QString& file
     // A NUL further on says more than the length does.
     for (; end < size && data[end] != '\n' && data[end] != '\r'; ++end)
       if (data[end] == '\0') throwLineError(fileName, lineNumber, QStringLiteral("not a text file"));
-    throwLineError(fileName, lineNumber, QStringLiteral("line longer than %1 characters").arg(kMaxLineLength));
+    throwLineError(fileName, lineNumber,
+                   QStringLiteral("line longer than %1 characters").arg(kMaxLineLength));
   }
   line.length = end - line.start;
   position = end;
@@ -83,7 +84,13 @@ LineSpan nextLine(QByteArrayView bytes, qsizetype& position, const QString& file
 }  // namespace
 
 std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fileName, int firstLine) {
+  // Counted first (memchr is far quicker than growing the vector): one allocation for every line.
+  size_t feeds = 0;
+  for (const char *at = bytes.data(), *end = at + bytes.size();
+       (at = static_cast<const char*>(std::memchr(at, '\n', size_t(end - at)))); ++at)
+    ++feeds;
   std::vector<SourceLine> lines;
+  lines.reserve(feeds + 1);
   qsizetype position = 0;
   while (position < bytes.size()) {
     const LineSpan span = nextLine(bytes, position, fileName, firstLine + static_cast<int>(lines.size()) + 1);
