@@ -2,6 +2,7 @@
 // `quimbel list`: how the tool reads a project: its components, their members and the extents of every
 // procedure, as the IDE's object model answers them.
 #include "cli.h"
+#include "fileio/parallel.h"
 #include "host/model/vbe.h"
 
 #include <QDir>
@@ -120,6 +121,63 @@ QJsonObject componentJson(host::ComponentImpl& component, const QString& path) {
   return object;
 }
 
+/// What `quimbel list` says of one component: lines of text (or TSV), or a JSON object.
+struct Listing {
+  QByteArray text;
+  QJsonObject json;
+};
+
+Listing listComponent(host::ComponentImpl& component, const QString& path, const ListOptions& options) {
+  Listing listing;
+  if (options.json) {
+    listing.json = componentJson(component, path);
+    return listing;
+  }
+  QString out;
+  const auto line = [&](const QString& text) {
+    out += text;
+    out += u'\n';
+  };
+  auto module = component.codeModule();
+  if (options.tsv) {
+    if (!module) return listing;
+    auto& text = module->text();
+    line(QStringLiteral("%1\t(declarations)\t0\t0\t0\t%2").arg(path).arg(text.countOfDeclarationLines()));
+    for (const ide::ProcExtent& proc : text.procedureExtents()) {
+      line(QStringLiteral("%1\t%2\t%3\t%4\t%5\t%6")
+               .arg(path, proc.name)
+               .arg(static_cast<int>(proc.kind))
+               .arg(proc.startLine)
+               .arg(proc.bodyLine)
+               .arg(proc.countLines));
+    }
+    listing.text = out.toLocal8Bit();
+    return listing;
+  }
+  line(QStringLiteral("  %1 %2  %3").arg(host::componentTypeName(component.Type()), component.Name(), path));
+  if (module) {
+    auto& text = module->text();
+    line(QStringLiteral("    %1 lines, declarations 1-%2")
+             .arg(text.countOfLines())
+             .arg(text.countOfDeclarationLines()));
+    const std::vector<ide::ProcExtent> extents = text.procedureExtents();
+    const auto byMember = proceduresByMember(extents);
+    for (const host::MemberInfo& member : text.members()) {
+      line(QStringLiteral("    %1 %2 %3")
+               .arg(scopeName(member.scope), memberTypeName(member.type), member.name));
+      for (const size_t i : byMember.value(member.name.toCaseFolded())) {
+        line(QStringLiteral("      %1: start %2, body %3, lines %4")
+                 .arg(procedureKeyword(text.procedures()[i]))
+                 .arg(extents[i].startLine)
+                 .arg(extents[i].bodyLine)
+                 .arg(extents[i].countLines));
+      }
+    }
+  }
+  listing.text = out.toLocal8Bit();
+  return listing;
+}
+
 }  // namespace
 
 int runList(const ListOptions& options) {
@@ -127,6 +185,7 @@ int runList(const ListOptions& options) {
   const auto files = expandInputs(options.input);
   if (!files) return kInputError;
   auto vbe = host::VbeImpl::create();
+  vbe->setReadsCodeOnDemand(true);
   // Module files are listed under the path the user gave; the rest under their path from here. A module
   // file that an open project holds is listed with that project only.
   QHash<QString, QString> givenPaths;
@@ -152,51 +211,30 @@ int runList(const ListOptions& options) {
                     .arg(project->Name(), projectTypeName(project->Type()),
                          projectFile.isEmpty() ? QString() : QStringLiteral("  ") + projectFile));
     }
+    std::vector<std::shared_ptr<host::ComponentImpl>> listed;
+    for (const auto& component : project->components())
+      if (!options.input.exclusions.excludes(component->filePath())) listed.push_back(component);
+    // Each component is read, listed and freed on its own, side by side on every core; the lists are
+    // printed in the project's order.
+    std::vector<Listing> listings(listed.size());
+    std::vector<std::exception_ptr> failures;
+    fileio::parallelFor(
+        listed.size(),
+        [&](size_t i) {
+          host::ComponentImpl& component = *listed[i];
+          listings[i] = listComponent(component, shownPath(component.filePath()), options);
+          component.unloadCode();
+        },
+        failures);
+    for (const std::exception_ptr& failure : failures)
+      if (failure) std::rethrow_exception(failure);
     QJsonArray components;
-    for (const auto& component : project->components()) {
-      if (options.input.exclusions.excludes(component->filePath())) continue;
-      const QString path = shownPath(component->filePath());
-      auto module = component->codeModule();
-      if (module && component->looksLikeUtf8()) warnUtf8(path);
-      if (options.json) {
-        components.append(componentJson(*component, path));
-        continue;
-      }
-      if (options.tsv) {
-        if (!module) continue;
-        auto& text = module->text();
-        printLine(
-            QStringLiteral("%1\t(declarations)\t0\t0\t0\t%2").arg(path).arg(text.countOfDeclarationLines()));
-        for (const ide::ProcExtent& proc : text.procedureExtents()) {
-          printLine(QStringLiteral("%1\t%2\t%3\t%4\t%5\t%6")
-                        .arg(path, proc.name)
-                        .arg(static_cast<int>(proc.kind))
-                        .arg(proc.startLine)
-                        .arg(proc.bodyLine)
-                        .arg(proc.countLines));
-        }
-        continue;
-      }
-      printLine(QStringLiteral("  %1 %2  %3")
-                    .arg(host::componentTypeName(component->Type()), component->Name(), path));
-      if (!module) continue;
-      auto& text = module->text();
-      printLine(QStringLiteral("    %1 lines, declarations 1-%2")
-                    .arg(text.countOfLines())
-                    .arg(text.countOfDeclarationLines()));
-      const std::vector<ide::ProcExtent> extents = text.procedureExtents();
-      const auto byMember = proceduresByMember(extents);
-      for (const host::MemberInfo& member : text.members()) {
-        printLine(QStringLiteral("    %1 %2 %3")
-                      .arg(scopeName(member.scope), memberTypeName(member.type), member.name));
-        for (const size_t i : byMember.value(member.name.toCaseFolded())) {
-          printLine(QStringLiteral("      %1: start %2, body %3, lines %4")
-                        .arg(procedureKeyword(text.procedures()[i]))
-                        .arg(extents[i].startLine)
-                        .arg(extents[i].bodyLine)
-                        .arg(extents[i].countLines));
-        }
-      }
+    for (size_t i = 0; i < listed.size(); ++i) {
+      if (listed[i]->codeModule() && listed[i]->looksLikeUtf8()) warnUtf8(shownPath(listed[i]->filePath()));
+      if (options.json)
+        components.append(listings[i].json);
+      else
+        printBytes(listings[i].text);
     }
     if (options.json)
       projects.append(QJsonObject{

@@ -52,27 +52,37 @@ struct Target {
   ide::Ref<ide::Member> member;
 };
 
-/// A walk's progress bar that only counts its steps (one per worker); `onChange` is told of every move.
-class StepCounter final : public walk::ProgressSink {
+/// A worker's share of the terminal's bar: the bytes of the modules it finished, and the part of its
+/// current module that the walk's bar (this one) shows done. Read by another worker while it moves.
+class WorkerBar final : public walk::ProgressSink {
  public:
-  int minimum() const override { return m_minimum; }
-  void setMinimum(int minimum) override { m_minimum = minimum; }
-  int maximum() const override { return m_maximum; }
-  void setMaximum(int maximum) override { m_maximum = maximum; }
+  int minimum() const override { return 0; }
+  void setMinimum(int) override {}
+  int maximum() const override { return m_maximum.load(std::memory_order_relaxed); }
+  void setMaximum(int maximum) override { m_maximum.store(std::max(1, maximum), std::memory_order_relaxed); }
   int value() const override { return m_value.load(std::memory_order_relaxed); }
   void setValue(int value) override {
     m_value.store(value, std::memory_order_relaxed);
     if (onChange) onChange();
   }
-  bool isVisible() const override { return m_visible; }
-  void setVisible(bool visible) override { m_visible = visible; }
+  bool isVisible() const override { return false; }
+  void setVisible(bool) override {}
+
+  void startModule(qint64 bytes) { m_current.store(bytes, std::memory_order_relaxed); }
+  void finishModule() {
+    m_done.fetch_add(m_current.exchange(0, std::memory_order_relaxed), std::memory_order_relaxed);
+    setValue(0);
+  }
+  qint64 bytesDone() const {
+    return m_done.load(std::memory_order_relaxed) + m_current.load() * value() / maximum();
+  }
   std::function<void()> onChange;
 
  private:
-  int m_minimum = 0;
-  int m_maximum = 1;
+  std::atomic<int> m_maximum{1};
   std::atomic<int> m_value{0};
-  bool m_visible = false;
+  std::atomic<qint64> m_current{0};
+  std::atomic<qint64> m_done{0};
 };
 
 // A module the run may change.
@@ -287,6 +297,8 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
   for (qsizetype i = 0; i < files.size(); ++i) {
     Input& input = inputs[size_t(i)];
     input.file = files[i];
+    // Each module's lines are made when its walk starts and freed once its file is written.
+    input.vbe->setReadsCodeOnDemand(true);
     if (!openInput(*input.vbe, input.file, input.givenPaths, fromStdin ? standardInput->name : QString()))
       return kInputError;
     missing += reportMissingFiles(*input.vbe);
@@ -312,7 +324,8 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
   const codestyle::Resolver resolver(options.style, &settings);
   std::vector<codestyle::Style> styles;
   std::vector<Effective> walks;
-  qint64 totalUnits = 0;
+  std::vector<qint64> sizes;  // what each unit weighs on the bar: its file's size
+  qint64 totalSize = 0;
   for (const Target& unit : units) {
     host::ComponentImpl* component = componentOf(unit.module);
     const QString stylePath =
@@ -325,9 +338,10 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
     }
     styles.push_back(std::get<codestyle::Style>(style));
     walks.push_back(effectiveKind(kind, styles.back(), options.remove));
-    totalUnits += unitsOf(unit, progressUnitOf(walks.back()));
+    const auto stamp = component->fileStamp();
+    sizes.push_back(std::max<qint64>(1, stamp ? stamp->size : 0));
+    totalSize += sizes.back();
   }
-  const qint32 range = qint32(std::min<qint64>(totalUnits, std::numeric_limits<qint32>::max()));
   for (const Walked& module : walked)
     if (module.component->looksLikeUtf8())
       warnUtf8(fromStdin ? standardInput->name : module.input->shownPath(*module.component));
@@ -338,42 +352,72 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
   };
   std::mutex reportsMutex;
   std::vector<Report> reports;
+  // Written as each module is done, so that a module's lines are freed as soon as its walk ends; put in
+  // place together at the end, or not at all.
+  const bool writing = !fromStdin && !options.check && !options.diff;
+  host::SaveBatch batch;
+  std::mutex batchMutex;
+  std::exception_ptr writeFailure;
+  std::atomic<bool> stopping{false};
   const size_t workers = fileio::threadsFor(units.size());
-  // Every worker's bar counts its own steps; the first one shows the sum on the terminal.
-  std::vector<std::unique_ptr<StepCounter>> counters;
+  // Every worker has a bar of its own; the first one shows the sum on the terminal.
+  std::vector<std::unique_ptr<WorkerBar>> workerBars;
   for (size_t w = 0; w < workers; ++w)
-    counters.push_back(std::make_unique<StepCounter>());
-  counters.front()->onChange = [&] {
-    int steps = 0;
-    for (const auto& counter : counters)
-      steps += counter->value();
-    bar.setValue(std::min(steps, bar.maximum()));
-  };
+    workerBars.push_back(std::make_unique<WorkerBar>());
   bar.setMinimum(0);
-  bar.setMaximum(std::max(1, std::min<qint32>(range, walk::ProgressScale::kMaxSteps)));
+  bar.setMaximum(walk::ProgressScale::kMaxSteps);
+  workerBars.front()->onChange = [&] {
+    qint64 done = 0;
+    for (const auto& workerBar : workerBars)
+      done += workerBar->bytesDone();
+    bar.setValue(int(std::min<qint64>(walk::ProgressScale::kMaxSteps, done * walk::ProgressScale::kMaxSteps /
+                                                                          std::max<qint64>(1, totalSize))));
+  };
   bar.setValue(0);
   bar.setVisible(true);
   // Each module's walk touches that module alone, so the modules are walked side by side on every core.
   fileio::WorkQueue queue(units.size());
   fileio::runWorkers(workers, [&](size_t worker) {
-    walk::WalkContext context(QStringLiteral("quimbel"), nullptr, counters[worker].get());
+    WorkerBar& workerBar = *workerBars[worker];
+    walk::WalkContext context(QStringLiteral("quimbel"), nullptr, &workerBar);
     size_t current = 0;
+    bool unitFailed = false;
     const auto report = [&](const walk::WalkFailure& failure) {
+      unitFailed = true;
       const std::lock_guard lock(reportsMutex);
       reports.push_back({current, failure});
     };
     context.onFailure = report;
     context.onLineSkipped = report;
-    context.SetProgressRange(range);
     while (queue.take(current)) {
-      if (context.stopped()) break;
+      if (context.stopped() || stopping.load()) break;
       const Target& unit = units[current];
+      host::ComponentImpl& component = *componentOf(unit.module);
+      unitFailed = false;
+      workerBar.startModule(sizes[current]);
+      context.SetProgressRange(qint32(std::min<qint64>(unitsOf(unit, progressUnitOf(walks[current])),
+                                                       std::numeric_limits<qint32>::max())));
       std::function<qint32(int)> numberOf;
       if (options.fileLines && walks[current].add && walks[current].kind != TransformKind::Indent) {
-        auto lines = std::make_shared<std::vector<int>>(fileLinesOf(*componentOf(unit.module)));
+        auto lines = std::make_shared<std::vector<int>>(fileLinesOf(component));
         numberOf = [lines](int moduleLine) { return qint32(lines->at(size_t(moduleLine) - 1)); };
       }
       walkTarget(context, unit, walks[current], styles[current], std::move(numberOf));
+      workerBar.finishModule();
+      // A module with failures keeps its lines: the report names their places in the file.
+      if (!writing || unitFailed) continue;
+      try {
+        std::optional<QByteArray> contents = component.fileContents();
+        if (contents) {
+          const std::lock_guard lock(batchMutex);
+          batch.add({component.filePath(), *contents, component.fileStamp()}, component.whenWritten());
+        }
+        component.unloadCode(contents ? &*contents : nullptr);
+      } catch (...) {
+        const std::lock_guard lock(batchMutex);
+        if (!writeFailure) writeFailure = std::current_exception();
+        stopping = true;
+      }
     }
   });
   bar.setVisible(false);
@@ -447,12 +491,8 @@ int runTransform(const TransformOptions& options, TransformKind kind) {
   }
 
   // All files are replaced together, once every one of them is written: a failure changes none.
-  host::SaveBatch batch;
   try {
-    std::vector<std::shared_ptr<host::ComponentImpl>> components;
-    for (const Walked* module : changed)
-      components.push_back(module->component);
-    host::addToBatch(batch, components);
+    if (writeFailure) std::rethrow_exception(writeFailure);
     batch.commit();
   } catch (const fileio::FilesChangedOnDisk& error) {
     for (const QString& path : error.changed)

@@ -262,6 +262,12 @@ Statement classify(QStringView text) noexcept {
   return classifyText(view(text));
 }
 
+bool isAttributeStatement(QStringView text) noexcept {
+  // Most lines are told apart by their first character alone.
+  const qsizetype first = skipBlanks(text, 0);
+  return first < text.size() && (text[first].unicode() | 0x20) == u'a' && classify(text).kind == Kind::Attribute;
+}
+
 Statement classify(QByteArrayView text) noexcept {
   return classifyText(view(text));
 }

@@ -108,6 +108,9 @@ struct Statement {
 Statement classify(QStringView text) noexcept;
 Statement classify(QByteArrayView text) noexcept;
 
+/// Whether classify(text) is Kind::Attribute, told quickly.
+bool isAttributeStatement(QStringView text) noexcept;
+
 /// The kind of a physical line: Continuation when the line above continues onto it, else what its
 /// statement is.
 inline Kind kindOf(QStringView line, bool continuation) noexcept {

@@ -131,21 +131,82 @@ TEST(RoundTrip, AModuleFileOpensAloneAndSavesInPlace) {
   EXPECT_FALSE(QFileInfo::exists(copy.path(u"Loja/Project1.vbp"_qs)));
 }
 
-TEST(BadInput, FailuresNameTheFileAndLineAndAddNothing) {
+// Tools that walk one module after the other read each module's code when first used and free it after.
+TEST(RoundTrip, CodeReadOnDemandAnswersAsReadAtOnceAndFreedKeepsItsEdits) {
   ExampleCopy copy;
-  auto vbe = VbeImpl::create();
-  QString description;
+  auto atOnce = VbeImpl::create();
+  atOnce->open(copy.groupFile());
+  auto onDemand = VbeImpl::create();
+  onDemand->setReadsCodeOnDemand(true);
+  onDemand->open(copy.groupFile());
+  const auto textOf = [](ComponentImpl& component) {
+    auto module = component.codeModule();
+    return module->Lines(1, module->CountOfLines()) + u'|' + QString::number(module->Members()->Count());
+  };
+  for (const auto& project : atOnce->projects())
+    for (const auto& component : project->components()) {
+      if (!component->hasCode()) continue;
+      auto other = componentOf(onDemand, project->Name(), component->Name());
+      ASSERT_TRUE(other);
+      EXPECT_FALSE(other->codeModule()->isLoaded()) << other->Name().toStdString();
+      EXPECT_EQ(textOf(*other), textOf(*component));
+      EXPECT_EQ(other->codeModule()->Procedures(), component->codeModule()->Procedures());
+    }
 
-  EXPECT_EQ(errorNumberOf([&] { vbe->open(copy.path(u"Nada.vbp"_qs)); }, &description),
-            ide::err::FileNotFound);
-  EXPECT_TRUE(description.contains(u"Nada.vbp"_qs));
+  // Freed unchanged, freed with edits, and kept while a code pane shows it.
+  auto clientes = componentOf(onDemand, u"Loja"_qs, u"clsClientes"_qs);
+  auto principal = componentOf(onDemand, u"Loja"_qs, u"modPrincipal"_qs);
+  auto pedidos = componentOf(onDemand, u"Loja"_qs, u"clsPedido"_qs);
+  ASSERT_TRUE(clientes && principal && pedidos);
+  clientes->codeModule()->InsertLines(1, u"' editado"_qs);
+  const QString edited = textOf(*clientes);
+  const QString unchanged = textOf(*principal);
+  pedidos->codeModule()->CodePane();
+  for (const auto& component : {clientes, principal, pedidos})
+    component->unloadCode();
+  EXPECT_FALSE(clientes->codeModule()->isLoaded());
+  EXPECT_FALSE(principal->codeModule()->isLoaded());
+  EXPECT_TRUE(pedidos->codeModule()->isLoaded());
+  EXPECT_TRUE(clientes->IsDirty());
+  EXPECT_FALSE(principal->IsDirty());
+  EXPECT_EQ(textOf(*clientes), edited);
+  EXPECT_EQ(textOf(*principal), unchanged);
+  onDemand->saveAll();
+  EXPECT_FALSE(clientes->IsDirty());
+  auto reopened = VbeImpl::create();
+  reopened->open(copy.groupFile());
+  EXPECT_EQ(textOf(*componentOf(reopened, u"Loja"_qs, u"clsClientes"_qs)), edited);
+}
 
-  // A form whose description lacks its End.
-  const QString form = copy.path(u"Utilitarios/Quebrado.frm"_qs);
-  writeBytes(form, "VERSION 5.00\r\nBegin VB.Form Quebrado \r\n   Caption = \"x\"\r\n");
-  EXPECT_EQ(errorNumberOf([&] { vbe->open(form); }, &description), 321);
-  EXPECT_TRUE(description.contains(u"Quebrado.frm, line"_qs)) << description.toStdString();
-  EXPECT_EQ(vbe->VBProjects()->Count(), 0);
+TEST(BadInput, FailuresNameTheFileAndLineAndAddNothing) {
+  for (const bool onDemand : {false, true}) {
+    SCOPED_TRACE(onDemand ? "read on demand" : "read at once");
+    ExampleCopy copy;
+    auto vbe = VbeImpl::create();
+    vbe->setReadsCodeOnDemand(onDemand);
+    QString description;
+
+    EXPECT_EQ(errorNumberOf([&] { vbe->open(copy.path(u"Nada.vbp"_qs)); }, &description),
+              ide::err::FileNotFound);
+    EXPECT_TRUE(description.contains(u"Nada.vbp"_qs));
+
+    // A form whose description lacks its End.
+    const QString form = copy.path(u"Utilitarios/Quebrado.frm"_qs);
+    writeBytes(form, "VERSION 5.00\r\nBegin VB.Form Quebrado \r\n   Caption = \"x\"\r\n");
+    EXPECT_EQ(errorNumberOf([&] { vbe->open(form); }, &description), 321);
+    EXPECT_TRUE(description.contains(u"Quebrado.frm, line"_qs)) << description.toStdString();
+
+    // A line over the IDE's limit, and a file that is not text.
+    const QString longLine = copy.path(u"Longa.bas"_qs);
+    writeBytes(longLine, "Attribute VB_Name = \"Longa\"\r\n' ok\r\n" + QByteArray(1024, 'x') + "\r\n");
+    EXPECT_EQ(errorNumberOf([&] { vbe->open(longLine); }, &description), 321);
+    EXPECT_TRUE(description.contains(u"Longa.bas, line 3"_qs)) << description.toStdString();
+    const QString binary = copy.path(u"Binario.bas"_qs);
+    writeBytes(binary, QByteArray("Attribute VB_Name = \"B\"\r\n\0\1\2", 28));
+    EXPECT_EQ(errorNumberOf([&] { vbe->open(binary); }, &description), 321);
+
+    EXPECT_EQ(vbe->VBProjects()->Count(), 0);
+  }
 }
 
 TEST(MessyProjects, EntriesKeepTheirSpellingAndMissingFilesTheirLines) {

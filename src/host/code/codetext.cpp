@@ -113,6 +113,12 @@ void CodeText::load(std::vector<SourceLine> code, std::vector<MemberAttributeLin
   touch(1, removed, countOfLines(), true);
 }
 
+void CodeText::shrinkToFit() {
+  m_lines.shrink_to_fit();
+  m_markers.shrink_to_fit();
+  if (!m_indexValid) *m_index = Index();
+}
+
 void CodeText::store(std::vector<SourceLine>& code, std::vector<MemberAttributeLine>& attributes) {
   code.clear();
   attributes.clear();
@@ -714,8 +720,11 @@ void CodeText::replaceLine(int line, QStringView text, const QString* shared) {
   const bool continuation = i > 0 && m_lines[i - 1].continues;
 
   if (!severalLines) {
-    const syntax::Kind lineKind = syntax::kindOf(text, continuation);
-    const bool continues = syntax::continues(text);
+    // Indenting changes only leading blanks, which say nothing of a line's kind: it is not read again.
+    const auto afterBlanks = [](QStringView line) { return line.sliced(syntax::leadingBlanks(line).size()); };
+    const bool reindented = afterBlanks(text) == afterBlanks(target.text);
+    const syntax::Kind lineKind = reindented ? target.kind : syntax::kindOf(text, continuation);
+    const bool continues = reindented ? target.continues : syntax::continues(text);
     // Re-indenting a directive, an End or a Type line keeps the structure: only a changed kind, a header
     // that says something else or a changed continuation moves it.
     const bool sameShape = lineKind == target.kind && continues == target.continues &&

@@ -78,6 +78,8 @@ class CodeText {
   void load(std::vector<SourceLine> code, std::vector<MemberAttributeLine> attributes);
   /// The content as file lines, hidden attribute lines at their places (owner names brought up to date).
   void store(std::vector<SourceLine>& code, std::vector<MemberAttributeLine>& attributes);
+  /// Gives back the memory that lines no longer there held.
+  void shrinkToFit();
 
   int countOfLines() const { return static_cast<int>(m_lines.size()); }
   /// Line `n` (1 to countOfLines), unchecked.

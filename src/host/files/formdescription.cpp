@@ -542,13 +542,13 @@ std::unique_ptr<FormNode> FormNode::clone(FormNode* parent) const {
 
 class FormParser {
  public:
-  FormParser(const std::vector<SourceLine>& lines, std::size_t& position, const QString& fileName)
+  FormParser(const FormDescription::Lines& lines, std::size_t& position, const QString& fileName)
       : m_lines(lines), m_position(position), m_fileName(fileName) {}
 
   /// Parses the Begin block at the current line.
   std::unique_ptr<FormNode> parseNode(FormNode* parent, int depth) {
     const std::size_t beginIndex = m_position;
-    const SourceLine& beginLine = m_lines[beginIndex];
+    const SourceLine& beginLine = *m_lines(beginIndex);
     if (depth > kMaxNesting) fail(beginIndex, QStringLiteral("controls nested too deeply"));
     qsizetype classStart = 0;
     qsizetype nameStart = 0;
@@ -568,9 +568,9 @@ class FormParser {
   std::unique_ptr<PropertyBlock> parseBlock(int depth) {
     const std::size_t beginIndex = m_position;
     if (depth > kMaxNesting) fail(beginIndex, QStringLiteral("property groups nested too deeply"));
-    if (wordAt(m_lines[beginIndex].text, 1).isEmpty())
-      fail(beginIndex, QStringLiteral("BeginProperty without a name"));
-    auto block = PropertyBlock::create(m_lines[beginIndex], SourceLine{});
+    const SourceLine& beginLine = *m_lines(beginIndex);
+    if (wordAt(beginLine.text, 1).isEmpty()) fail(beginIndex, QStringLiteral("BeginProperty without a name"));
+    auto block = PropertyBlock::create(beginLine, SourceLine{});
     parseBody(*block, nullptr, depth);
     return block;
   }
@@ -579,8 +579,8 @@ class FormParser {
   /// BeginProperty group, where controls cannot appear.
   void parseBody(PropertyGroup& group, FormNode* node, int depth) {
     const std::size_t beginIndex = m_position++;
-    while (m_position < m_lines.size()) {
-      const SourceLine& line = m_lines[m_position];
+    while (const SourceLine* next = m_lines(m_position)) {
+      const SourceLine& line = *next;
       switch (classifyLine(line.text)) {
         case LineKind::Blank:
           group.m_items.emplace_back(PropertyGroup::OtherLine{line});
@@ -616,7 +616,7 @@ class FormParser {
       }
     }
     fail(beginIndex, QStringLiteral("%1 has no matching %2")
-                         .arg(m_lines[beginIndex].text.trimmed(),
+                         .arg(m_lines(beginIndex)->text.trimmed(),
                               node ? QStringLiteral("End") : QStringLiteral("EndProperty")));
   }
 
@@ -625,7 +625,7 @@ class FormParser {
                      QStringLiteral("%1, line %2: %3").arg(m_fileName).arg(lineIndex + 1).arg(problem));
   }
 
-  const std::vector<SourceLine>& m_lines;
+  const FormDescription::Lines& m_lines;
   std::size_t& m_position;
   const QString& m_fileName;
 };
@@ -656,9 +656,9 @@ FormDescription::FormDescription(FormDescription&&) noexcept = default;
 FormDescription& FormDescription::operator=(FormDescription&&) noexcept = default;
 FormDescription::~FormDescription() = default;
 
-FormDescription FormDescription::parse(const std::vector<SourceLine>& lines, std::size_t& position,
-                                       const QString& fileName) {
-  if (position >= lines.size() || classifyLine(lines[position].text) != LineKind::Begin) {
+FormDescription FormDescription::parse(const Lines& lines, std::size_t& position, const QString& fileName) {
+  const SourceLine* first = lines(position);
+  if (!first || classifyLine(first->text) != LineKind::Begin) {
     throw ide::Error(ide::err::InvalidFileFormat,
                      QStringLiteral("%1, line %2: a form description must start with Begin")
                          .arg(fileName)
@@ -666,6 +666,12 @@ FormDescription FormDescription::parse(const std::vector<SourceLine>& lines, std
   }
   FormParser parser(lines, position, fileName);
   return FormDescription(parser.parseNode(nullptr, 0));
+}
+
+FormDescription FormDescription::parse(const std::vector<SourceLine>& lines, std::size_t& position,
+                                       const QString& fileName) {
+  return parse([&](std::size_t index) { return index < lines.size() ? &lines[index] : nullptr; }, position,
+               fileName);
 }
 
 void FormDescription::appendLines(std::vector<SourceLine>& out) const {

@@ -216,6 +216,9 @@ class FormDescription {
   /// errors report: ide::Error 321 "<fileName>, line <n>: ..." for a block without its End, a property
   /// group without its EndProperty, or a line that is none of Begin, End, BeginProperty, EndProperty,
   /// "Name = value" or blank.
+  /// `lines` gives line `index` of the file, or null past its end.
+  using Lines = std::function<const SourceLine*(std::size_t index)>;
+  static FormDescription parse(const Lines& lines, std::size_t& position, const QString& fileName);
   static FormDescription parse(const std::vector<SourceLine>& lines, std::size_t& position,
                                const QString& fileName);
 

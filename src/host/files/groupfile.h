@@ -49,7 +49,6 @@ class GroupFile {
   std::size_t projectLine(int index) const;
 
  private:
-
   std::vector<SourceLine> m_lines;
 };
 

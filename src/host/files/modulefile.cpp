@@ -38,52 +38,85 @@ bool isObjectLine(QStringView text) {
 
 }  // namespace
 
-ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QString& fileName) {
-  ModuleSource source;
-  std::size_t position = 0;
-  const std::size_t count = lines.size();
+namespace {
 
-  if (count > 0 && startsWithWord(lines[0].text, u"VERSION")) {
-    source.preamble.push_back(lines[position++]);
-    while (position < count && isObjectLine(lines[position].text))
-      source.preamble.push_back(lines[position++]);
+/// Reads the header parts from `lines` into `source`; returns the index of the first line after them.
+std::size_t parseHead(const FormDescription::Lines& lines, ModuleSource& source, const QString& fileName) {
+  std::size_t position = 0;
+  const SourceLine* line = lines(position);
+  if (line && startsWithWord(line->text, u"VERSION")) {
+    source.preamble.push_back(*line);
+    while ((line = lines(++position)) && isObjectLine(line->text))
+      source.preamble.push_back(*line);
     qsizetype afterBegin = 0;
-    if (position < count && startsWithWord(lines[position].text, u"Begin", &afterBegin)) {
-      if (syntax::skipBlanks(lines[position].text, afterBegin) == lines[position].text.size()) {
+    if (line && startsWithWord(line->text, u"Begin", &afterBegin)) {
+      if (syntax::skipBlanks(line->text, afterBegin) == line->text.size()) {
         // A class's BEGIN ... END block of persisted settings: kept raw.
         const std::size_t beginIndex = position;
-        std::size_t end = position + 1;
-        while (end < count && lines[end].text.trimmed().compare(u"END", Qt::CaseInsensitive) != 0)
-          ++end;
-        if (end == count) failAt(fileName, beginIndex, QStringLiteral("BEGIN without END"));
-        source.preamble.insert(source.preamble.end(), lines.begin() + static_cast<std::ptrdiff_t>(position),
-                               lines.begin() + static_cast<std::ptrdiff_t>(end + 1));
-        position = end + 1;
+        do {
+          source.preamble.push_back(*line);
+          line = lines(++position);
+        } while (line && line->text.trimmed().compare(u"END", Qt::CaseInsensitive) != 0);
+        if (!line) failAt(fileName, beginIndex, QStringLiteral("BEGIN without END"));
+        source.preamble.push_back(*line);
+        ++position;
       } else {
         source.form = FormDescription::parse(lines, position, fileName);
       }
     }
   }
-  while (position < count && syntax::isModuleAttribute(lines[position].text)) {
-    source.moduleAttributes.push_back(lines[position++]);
+  while ((line = lines(position)) && syntax::isModuleAttribute(line->text)) {
+    source.moduleAttributes.push_back(*line);
+    ++position;
   }
+  return position;
+}
 
-  source.code.reserve(count - position);
+/// Appends the code lines to `source`, moving the hidden attribute lines aside; `lines` are taken.
+void splitCode(std::vector<SourceLine>& lines, ModuleSource& source) {
+  source.code.reserve(source.code.size() + lines.size());
   bool continued = false;
-  for (; position < count; ++position) {
-    const SourceLine& line = lines[position];
-    if (!continued && syntax::classify(line.text).kind == syntax::Kind::Attribute) {
-      source.memberAttributes.push_back(MemberAttributeLine{static_cast<int>(source.code.size()), line});
+  for (SourceLine& line : lines) {
+    if (!continued && syntax::isAttributeStatement(line.text)) {
+      source.memberAttributes.push_back(
+          MemberAttributeLine{static_cast<int>(source.code.size()), std::move(line)});
       continue;
     }
-    source.code.push_back(line);
     continued = syntax::continues(line.text);
+    source.code.push_back(std::move(line));
   }
+}
+
+}  // namespace
+
+ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QString& fileName) {
+  ModuleSource source;
+  const std::size_t codeStart = parseHead(
+      [&](std::size_t index) { return index < lines.size() ? &lines[index] : nullptr; }, source, fileName);
+  std::vector<SourceLine> code(lines.begin() + static_cast<std::ptrdiff_t>(codeStart), lines.end());
+  splitCode(code, source);
   return source;
 }
 
+ModuleHead parseModuleHead(QByteArrayView bytes, const QString& fileName) {
+  ModuleHead head;
+  SourceLineReader reader(bytes, fileName);
+  head.codeLine =
+      static_cast<int>(parseHead([&](std::size_t index) { return reader.at(index); }, head.source, fileName));
+  // The reader may have read the first code line too, to see that it is not part of the head.
+  head.codeOffset = reader.start(static_cast<std::size_t>(head.codeLine));
+  return head;
+}
+
+void parseModuleCode(QByteArrayView code, const QString& fileName, int firstLine, ModuleSource& into) {
+  std::vector<SourceLine> lines = readSourceLines(code, fileName, firstLine);
+  splitCode(lines, into);
+}
+
 ModuleSource parseModule(QByteArrayView bytes, const QString& fileName) {
-  return parseModuleLines(readSourceLines(bytes, fileName), fileName);
+  ModuleHead head = parseModuleHead(bytes, fileName);
+  parseModuleCode(bytes.sliced(head.codeOffset), fileName, head.codeLine, head.source);
+  return std::move(head.source);
 }
 
 QByteArray writeModule(const ModuleSource& source, const QString& fileName) {

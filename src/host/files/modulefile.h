@@ -39,6 +39,20 @@ struct ModuleSource {
 /// refuses, a BEGIN without END, and a malformed form description.
 ModuleSource parseModule(QByteArrayView bytes, const QString& fileName);
 
+/// A module file read up to its code: the header parts (no code yet), and where the code starts.
+struct ModuleHead {
+  ModuleSource source;
+  qsizetype codeOffset = 0;  // the byte where the code starts
+  int codeLine = 0;          // the 0-based line where the code starts
+};
+
+/// The head of parseModule, reading no line of the code but the first.
+ModuleHead parseModuleHead(QByteArrayView bytes, const QString& fileName);
+
+/// The code part of parseModule: `code` is the file from its line `firstLine` (0-based) on; appends the
+/// code and member attribute lines to `into`.
+void parseModuleCode(QByteArrayView code, const QString& fileName, int firstLine, ModuleSource& into);
+
 /// The same from lines already read.
 ModuleSource parseModuleLines(const std::vector<SourceLine>& lines, const QString& fileName);
 

@@ -1,12 +1,13 @@
 // SPDX-License-Identifier: MIT
-// Line splitting in one pass over the bytes: each byte is looked at once, to find the line end, a NUL that
-// marks a binary file, and the length limit the IDE enforces.
+// Line splitting: each line's end is found, a NUL that marks a binary file refused, and the length limit
+// the IDE enforces kept.
 #include "host/files/sourcelines.h"
 
 #include "host/files/ansi.h"
 #include "ide/error.h"
 
 #include <algorithm>
+#include <cstring>
 
 namespace host {
 namespace {
@@ -32,44 +33,85 @@ QByteArrayView lineEndBytes(LineEnd end) {
   return {};
 }
 
-std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fileName) {
-  std::vector<SourceLine> lines;
+namespace {
+
+/// The line that starts at `position`: its length and line end; `position` moves to the next line.
+/// Refuses a NUL byte and an overlong line, naming `lineNumber` (1-based).
+struct LineSpan {
+  qsizetype start = 0;
+  qsizetype length = 0;
+  LineEnd end = LineEnd::None;
+};
+
+LineSpan nextLine(QByteArrayView bytes, qsizetype& position, const QString& fileName, int lineNumber) {
   const char* data = bytes.data();
   const qsizetype size = bytes.size();
-  qsizetype lineStart = 0;
+  LineSpan line{position};
+  // memchr finds the line feed many bytes at a time, within the longest line allowed (so that a file of
+  // lone CRs is not searched to its end for every line); the line's own bytes are then searched for what
+  // ends it sooner (a lone CR) or makes the file binary (NUL).
+  const qsizetype window = std::min<qsizetype>(size - position, kMaxLineLength + 1);
+  const auto* feed = static_cast<const char*>(std::memchr(data + position, '\n', size_t(window)));
+  qsizetype end = feed ? feed - data : position + window;
+  if (const auto* cr = static_cast<const char*>(std::memchr(data + position, '\r', size_t(end - position))))
+    end = cr - data;
+  if (std::memchr(data + position, '\0', size_t(end - position)))
+    throwLineError(fileName, lineNumber, QStringLiteral("not a text file"));
+  if (end - line.start > kMaxLineLength) {
+    // A NUL further on says more than the length does.
+    for (; end < size && data[end] != '\n' && data[end] != '\r'; ++end)
+      if (data[end] == '\0') throwLineError(fileName, lineNumber, QStringLiteral("not a text file"));
+    throwLineError(fileName, lineNumber,
+                   QStringLiteral("line longer than %1 characters").arg(kMaxLineLength));
+  }
+  line.length = end - line.start;
+  position = end;
+  if (position < size) {
+    if (data[position] == '\n') {
+      line.end = LineEnd::LF;
+      position += 1;
+    } else if (position + 1 < size && data[position + 1] == '\n') {
+      line.end = LineEnd::CRLF;
+      position += 2;
+    } else {
+      line.end = LineEnd::CR;
+      position += 1;
+    }
+  }
+  return line;
+}
+
+}  // namespace
+
+std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fileName, int firstLine) {
+  // Counted first (memchr is far quicker than growing the vector): one allocation for every line.
+  size_t feeds = 0;
+  for (const char *at = bytes.data(), *end = at + bytes.size();
+       (at = static_cast<const char*>(std::memchr(at, '\n', size_t(end - at)))); ++at)
+    ++feeds;
+  std::vector<SourceLine> lines;
+  lines.reserve(feeds + 1);
   qsizetype position = 0;
-  while (lineStart < size) {
-    // Find the end of this line, refusing binary content on the way.
-    while (position < size) {
-      const char byte = data[position];
-      if (byte == '\n' || byte == '\r') break;
-      if (byte == '\0') {
-        throwLineError(fileName, static_cast<int>(lines.size()) + 1, QStringLiteral("not a text file"));
-      }
-      ++position;
-    }
-    const qsizetype length = position - lineStart;
-    if (length > kMaxLineLength) {
-      throwLineError(fileName, static_cast<int>(lines.size()) + 1,
-                     QStringLiteral("line longer than %1 characters").arg(kMaxLineLength));
-    }
-    SourceLine line{decodeAnsi(QByteArrayView(data + lineStart, length)), LineEnd::None};
-    if (position < size) {
-      if (data[position] == '\n') {
-        line.end = LineEnd::LF;
-        position += 1;
-      } else if (position + 1 < size && data[position + 1] == '\n') {
-        line.end = LineEnd::CRLF;
-        position += 2;
-      } else {
-        line.end = LineEnd::CR;
-        position += 1;
-      }
-    }
-    lines.push_back(std::move(line));
-    lineStart = position;
+  while (position < bytes.size()) {
+    const LineSpan span = nextLine(bytes, position, fileName, firstLine + static_cast<int>(lines.size()) + 1);
+    lines.push_back({decodeAnsi(bytes.sliced(span.start, span.length)), span.end});
   }
   return lines;
+}
+
+void checkSourceLines(QByteArrayView bytes, const QString& fileName, int firstLine) {
+  qsizetype position = 0;
+  for (int line = firstLine + 1; position < bytes.size(); ++line)
+    nextLine(bytes, position, fileName, line);
+}
+
+const SourceLine* SourceLineReader::at(std::size_t index) {
+  while (m_lines.size() <= index && m_position < m_bytes.size()) {
+    const LineSpan span = nextLine(m_bytes, m_position, m_fileName, static_cast<int>(m_lines.size()) + 1);
+    m_lines.push_back({decodeAnsi(m_bytes.sliced(span.start, span.length)), span.end});
+    m_starts.push_back(span.start);
+  }
+  return index < m_lines.size() ? &m_lines[index] : nullptr;
 }
 
 LineEnd lineEndToWrite(const SourceLine& line, LineEnd previous) {

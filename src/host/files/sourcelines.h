@@ -29,7 +29,30 @@ QByteArrayView lineEndBytes(LineEnd end);
 /// kMaxLineLength characters is refused. Both throw ide::Error (number 321) whose description names
 /// `fileName` and the 1-based line, e.g. "Module1.bas, line 12: line longer than 1023 characters".
 /// The last line has LineEnd::None when the file does not end with a line end; an empty file gives no lines.
-std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fileName);
+/// `firstLine` is the 0-based line of the file that `bytes` start at, for the messages.
+std::vector<SourceLine> readSourceLines(QByteArrayView bytes, const QString& fileName, int firstLine = 0);
+
+/// Refuses what readSourceLines refuses, without making the lines: `bytes` start at line `firstLine`
+/// (0-based) of the file, for the messages.
+void checkSourceLines(QByteArrayView bytes, const QString& fileName, int firstLine = 0);
+
+/// The lines of readSourceLines, each read when first asked for: a reader of a file's head makes no
+/// more of them than it looks at.
+class SourceLineReader {
+ public:
+  SourceLineReader(QByteArrayView bytes, const QString& fileName) : m_bytes(bytes), m_fileName(fileName) {}
+  /// Line `index` (0-based), read up to it; null past the file's end.
+  const SourceLine* at(std::size_t index);
+  /// The byte where line `index` starts: a line read, or the one after the last read.
+  qsizetype start(std::size_t index) const { return index < m_starts.size() ? m_starts[index] : m_position; }
+
+ private:
+  QByteArrayView m_bytes;
+  const QString& m_fileName;
+  qsizetype m_position = 0;
+  std::vector<SourceLine> m_lines;
+  std::vector<qsizetype> m_starts;
+};
 
 /// Joins lines back into ANSI bytes. Throws ide::Error (number 321) naming `fileName` and the line when a
 /// character cannot be written in the code page.

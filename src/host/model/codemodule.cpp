@@ -121,49 +121,85 @@ void CodeModuleImpl::checkEditable() {
 }
 
 void CodeModuleImpl::checkWritable() {
-  checkEditable();
+  // Called for every line a walk replaces: each owner is locked once.
   auto component = m_component.lock();
+  auto project = component ? component->project() : nullptr;
+  if (!project) ide::raise(ide::err::ObjectVariableNotSet);
   // While the program runs its code is read-only, for add-ins as in the code window.
-  auto project = component->project();
-  if (auto vbe = project ? project->vbe() : nullptr; vbe && vbe->mode() == ide::IdeMode::Run)
-    ide::raise(ide::err::CannotEdit);
+  if (auto vbe = project->vbe(); vbe && vbe->mode() == ide::IdeMode::Run) ide::raise(ide::err::CannotEdit);
 }
 
 void CodeModuleImpl::InsertLines(int line, const QString& text) {
   checkWritable();
-  m_text.insertLines(line, text);
+  this->text().insertLines(line, text);
 }
 
 void CodeModuleImpl::DeleteLines(int startLine, int count) {
   checkWritable();
-  m_text.deleteLines(startLine, count);
+  text().deleteLines(startLine, count);
 }
 
 void CodeModuleImpl::ReplaceLine(int line, const QString& text) {
   checkWritable();
-  m_text.replaceLine(line, text);
+  this->text().replaceLine(line, text);
 }
 
 void CodeModuleImpl::AddFromString(const QString& text) {
   checkWritable();
-  m_text.addFromString(text);
+  this->text().addFromString(text);
 }
 
 int CodeModuleImpl::ProcStartLine(const QString& procName, ide::ProcKind kind) {
-  return m_text.procStartLine(procName, kind);
+  return text().procStartLine(procName, kind);
 }
 
 int CodeModuleImpl::ProcBodyLine(const QString& procName, ide::ProcKind kind) {
-  return m_text.procBodyLine(procName, kind);
+  return text().procBodyLine(procName, kind);
 }
 
 int CodeModuleImpl::ProcCountLines(const QString& procName, ide::ProcKind kind) {
-  return m_text.procCountLines(procName, kind);
+  return text().procCountLines(procName, kind);
 }
 
 bool CodeModuleImpl::Find(const QString& target, int& startLine, int& startColumn, int& endLine,
                           int& endColumn, bool wholeWord, bool matchCase, bool patternSearch) {
-  return m_text.find(target, startLine, startColumn, endLine, endColumn, wholeWord, matchCase, patternSearch);
+  return text().find(target, startLine, startColumn, endLine, endColumn, wholeWord, matchCase, patternSearch);
+}
+
+void CodeModuleImpl::load(std::vector<SourceLine> code, std::vector<MemberAttributeLine> attributes) {
+  m_editsBefore = changeCount();
+  m_unread.reset();
+  m_madeFrom.reset();
+  m_text.load(std::move(code), std::move(attributes));
+  m_madeAt = m_text.changeCount();
+}
+
+void CodeModuleImpl::loadLater(Unread code) {
+  m_editsBefore = changeCount();
+  if (!m_unread) m_text.load({}, {});
+  m_text.shrinkToFit();
+  m_madeFrom.reset();
+  m_unread = std::move(code);
+}
+
+bool CodeModuleImpl::unload(std::optional<Unread> code) {
+  if (m_pane || m_unread) return false;
+  if (!code && (!m_madeFrom || changeCount() != m_editsBefore)) return false;
+  loadLater(code ? std::move(*code) : std::move(*m_madeFrom));
+  return true;
+}
+
+void CodeModuleImpl::readUnread() {
+  ModuleSource parts;
+  parseModuleCode(QByteArrayView(m_unread->bytes).sliced(m_unread->offset), m_unread->fileName,
+                  m_unread->firstLine, parts);
+  m_madeFrom = std::exchange(m_unread, std::nullopt);
+  m_text.load(std::move(parts.code), std::move(parts.memberAttributes));
+  m_madeAt = m_text.changeCount();
+}
+
+quint64 CodeModuleImpl::changeCount() const {
+  return m_unread ? m_editsBefore : m_editsBefore + (m_text.changeCount() - m_madeAt);
 }
 
 void CodeModuleImpl::linesChanged(int firstLine, int removed, int inserted) {

@@ -160,7 +160,7 @@ void ComponentImpl::load() {
   FileStamp stamp;
   const QByteArray bytes = readFileBytes(m_filePath, &stamp);
   m_looksLikeUtf8 = sourceEncoding() == SourceEncoding::Ansi && host::looksLikeUtf8(bytes);
-  adopt(parseModule(bytes, m_filePath));
+  adopt(bytes, m_filePath);
   m_stamp = std::move(stamp);
   if (m_name.isEmpty()) m_name = QFileInfo(m_filePath).completeBaseName();
   loadBinary();
@@ -225,22 +225,32 @@ void ComponentImpl::addBinaryToBatch(SaveBatch& batch) {
 void ComponentImpl::create(const QString& name) {
   const auto bytes = encodeAnsi(newComponentText(m_type, name));
   if (!bytes) ide::raise(ide::err::InvalidName);
-  adopt(parseModule(*bytes, name));
+  adopt(*bytes, name);
   m_changed = true;
 }
 
-void ComponentImpl::adopt(ModuleSource source) {
-  m_source = std::move(source);
+void ComponentImpl::adopt(const QByteArray& bytes, const QString& fileName) {
+  ModuleHead head = parseModuleHead(bytes, fileName);
+  m_source = std::move(head.source);
   m_name = moduleName(m_source);
   if (m_source.form &&
       m_source.form->root().className().compare(QLatin1StringView("VB.MDIForm"), Qt::CaseInsensitive) == 0)
     m_type = ide::ComponentType::VBMDIForm;
   auto self = shared_from_this();
   m_module = std::make_shared<CodeModuleImpl>(self);
-  m_module->text().load(std::move(m_source.code), std::move(m_source.memberAttributes));
-  m_source.code.clear();
-  m_source.memberAttributes.clear();
-  m_savedChangeCount = m_module->text().changeCount();
+  const QByteArrayView code = QByteArrayView(bytes).sliced(head.codeOffset);
+  auto project = m_project.lock();
+  auto vbe = project ? project->vbe() : nullptr;
+  if (vbe && vbe->readsCodeOnDemand()) {
+    // What would make reading the lines fail is refused now, while the file is being opened.
+    checkSourceLines(code, fileName, head.codeLine);
+    m_module->loadLater({bytes, head.codeOffset, head.codeLine, fileName});
+  } else {
+    ModuleSource parts;
+    parseModuleCode(code, fileName, head.codeLine, parts);
+    m_module->load(std::move(parts.code), std::move(parts.memberAttributes));
+  }
+  m_savedChangeCount = m_module->changeCount();
   if (m_source.form) m_form = std::make_shared<FormImpl>(self, *m_source.form);
 }
 
@@ -272,7 +282,7 @@ void ComponentImpl::addToBatch(SaveBatch& batch, bool force) {
 
 SaveBatch::Done ComponentImpl::whenWritten() {
   // What is being written is the module as it is now.
-  const quint64 savedChangeCount = m_module->text().changeCount();
+  const quint64 savedChangeCount = m_module->changeCount();
   return [self = shared_from_this(), savedChangeCount, path = m_filePath](const FileStamp* written) {
     if (written) {
       self->m_savedChangeCount = savedChangeCount;
@@ -307,7 +317,22 @@ void addToBatch(SaveBatch& batch, const std::vector<std::shared_ptr<ComponentImp
 
 bool ComponentImpl::IsDirty() {
   if (m_changed) return true;
-  return m_module && m_module->text().changeCount() != m_savedChangeCount;
+  return m_module && m_module->changeCount() != m_savedChangeCount;
+}
+
+void ComponentImpl::unloadCode(const QByteArray* contents) {
+  if (!m_module || !m_module->isLoaded() || m_module->hasPane() || m_filePath.isEmpty()) return;
+  if (m_module->unload()) return;
+  QByteArray bytes;
+  ModuleHead head;
+  try {
+    bytes = contents ? *contents : *fileContents(true);
+    head = parseModuleHead(bytes, m_filePath);
+    checkSourceLines(QByteArrayView(bytes).sliced(head.codeOffset), m_filePath, head.codeLine);
+  } catch (const ide::Error&) {
+    return;  // kept as lines: they cannot be written, or not read back
+  }
+  m_module->unload(CodeModuleImpl::Unread{std::move(bytes), head.codeOffset, head.codeLine, m_filePath});
 }
 
 void ComponentImpl::setName(const QString& name) {

@@ -152,9 +152,9 @@ class CodeModuleImpl final : public ide::CodeModule,
   QString Name() override;
   ide::Ref<ide::CodePane> CodePane() override;
   ide::Ref<ide::Members> Members() override;
-  QString Lines(int startLine, int count) override { return m_text.lines(startLine, count); }
-  int CountOfLines() override { return m_text.countOfLines(); }
-  int CountOfDeclarationLines() override { return m_text.countOfDeclarationLines(); }
+  QString Lines(int startLine, int count) override { return text().lines(startLine, count); }
+  int CountOfLines() override { return text().countOfLines(); }
+  int CountOfDeclarationLines() override { return text().countOfDeclarationLines(); }
   void InsertLines(int line, const QString& text) override;
   void DeleteLines(int startLine, int count) override;
   void ReplaceLine(int line, const QString& text) override;
@@ -162,12 +162,36 @@ class CodeModuleImpl final : public ide::CodeModule,
   int ProcStartLine(const QString& procName, ide::ProcKind kind) override;
   int ProcBodyLine(const QString& procName, ide::ProcKind kind) override;
   int ProcCountLines(const QString& procName, ide::ProcKind kind) override;
-  QString ProcOfLine(int line, ide::ProcKind& kind) override { return m_text.procOfLine(line, kind); }
-  std::vector<ide::ProcExtent> Procedures() override { return m_text.procedureExtents(); }
+  QString ProcOfLine(int line, ide::ProcKind& kind) override { return text().procOfLine(line, kind); }
+  std::vector<ide::ProcExtent> Procedures() override { return text().procedureExtents(); }
   bool Find(const QString& target, int& startLine, int& startColumn, int& endLine, int& endColumn,
             bool wholeWord, bool matchCase, bool patternSearch) override;
 
-  CodeText& text() { return m_text; }
+  /// Code read from a file and not split into lines yet: the file's bytes from `offset` on, which is
+  /// line `firstLine` (0-based) of the file.
+  struct Unread {
+    QByteArray bytes;
+    qsizetype offset = 0;
+    int firstLine = 0;
+    QString fileName;
+  };
+  /// Takes the code of a file, split into lines.
+  void load(std::vector<SourceLine> code, std::vector<MemberAttributeLine> attributes);
+  /// Takes the code of a file as bytes, split into lines when first used: a tool that works on one
+  /// module after the other then holds the lines of those it is working on only.
+  void loadLater(Unread code);
+  /// Frees the lines, made again when next used from `code` (the module as it stands, in file form), or
+  /// without it from the bytes they were made from while no edit changed them. Not with a code pane,
+  /// which shows the lines; false when nothing was freed.
+  bool unload(std::optional<Unread> code = std::nullopt);
+  bool isLoaded() const { return !m_unread; }
+
+  CodeText& text() {
+    if (m_unread) readUnread();
+    return m_text;
+  }
+  /// Grows with every edit (not with reading the code or freeing its lines).
+  quint64 changeCount() const;
   std::shared_ptr<ComponentImpl> component() const { return m_component.lock(); }
   std::shared_ptr<CodePaneImpl> pane();
   bool hasPane() const { return m_pane != nullptr; }
@@ -178,8 +202,14 @@ class CodeModuleImpl final : public ide::CodeModule,
   /// As checkEditable, and error 40198 while the program runs.
   void checkWritable();
 
+  void readUnread();
+
   std::weak_ptr<ComponentImpl> m_component;
   CodeText m_text;
+  std::optional<Unread> m_unread;
+  std::optional<Unread> m_madeFrom;  // what the lines were made from, until an edit
+  quint64 m_editsBefore = 0;         // edits counted before the lines were last made
+  quint64 m_madeAt = 0;              // the text's change count when they were made
   std::shared_ptr<CodePaneImpl> m_pane;
 };
 
@@ -247,6 +277,10 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   /// yet, the one the IDE gives it after the form's file (or name).
   QString binaryFileName();
   bool hasCode() const { return m_module != nullptr; }
+  /// Frees the lines of the module's code until they are next used; edits stay edits. `contents` is the
+  /// file as fileContents gave it, when the caller has it. Nothing happens with a code window open, or
+  /// when the code as it stands could not be read back (a line grown too long).
+  void unloadCode(const QByteArray* contents = nullptr);
   /// The module's file, as last read, is UTF-8 with accented letters although modules are read in the
   /// ANSI code page (a file another editor wrote): worth a warning.
   bool looksLikeUtf8() const { return m_looksLikeUtf8; }
@@ -257,7 +291,8 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   bool attached() const { return !m_project.expired(); }
 
  private:
-  void adopt(ModuleSource source);
+  /// Takes the module file `bytes` as the component's header and code.
+  void adopt(const QByteArray& bytes, const QString& fileName);
   /// Reads the binary file the form refers to, when there is one (a missing one leaves the references).
   void loadBinary();
   /// Where the binary file is written: beside the form's file, under the name its references give it.

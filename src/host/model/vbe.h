@@ -82,6 +82,10 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   ide::IdeMode mode() const { return m_mode; }
   /// Switches design, run and break mode; the "Standard" bar's Start, Continue, Break and End follow.
   void setMode(ide::IdeMode mode);
+  /// Whether modules opened from now on keep their code as the file's bytes until it is first used (for
+  /// tools that work on one module after the other; the IDE reads every module as it opens).
+  void setReadsCodeOnDemand(bool onDemand) { m_readsCodeOnDemand = onDemand; }
+  bool readsCodeOnDemand() const { return m_readsCodeOnDemand; }
   /// Runs the IDE's own commands that the model does not run itself (the desktop host's file commands).
   void setCommandHandler(std::function<void(int)> handler) { m_commandHandler = std::move(handler); }
   /// Selects a component in the project window (fires its selection); empty clears the selection.
@@ -172,6 +176,7 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   QString m_groupPath;
   std::unique_ptr<GroupFile> m_group;
   bool m_groupChanged = false;
+  bool m_readsCodeOnDemand = false;
   std::vector<MissingFile> m_missingProjects;
   std::optional<fileio::FileStamp> m_groupStamp;
   std::function<void(int)> m_commandHandler;
