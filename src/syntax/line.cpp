@@ -265,7 +265,8 @@ Statement classify(QStringView text) noexcept {
 bool isAttributeStatement(QStringView text) noexcept {
   // Most lines are told apart by their first character alone.
   const qsizetype first = skipBlanks(text, 0);
-  return first < text.size() && (text[first].unicode() | 0x20) == u'a' && classify(text).kind == Kind::Attribute;
+  return first < text.size() && (text[first].unicode() | 0x20) == u'a' &&
+         classify(text).kind == Kind::Attribute;
 }
 
 Statement classify(QByteArrayView text) noexcept {
@@ -415,6 +416,21 @@ QString joinContinuedLines(const std::vector<QStringView>& lines) {
   for (const QStringView line : lines)
     joined += withoutContinuationMark(line);
   return joined;
+}
+
+bool endsProcedureAfterColon(QStringView line) {
+  Tokenizer tokens(line);
+  Token token;
+  bool afterColon = false;
+  while (tokens.next(token)) {
+    if (token.type == Token::Type::Colon) {
+      afterColon = true;
+    } else if (afterColon && token.statementStart && token.type == Token::Type::Word &&
+               classify(line.sliced(token.start)).kind == Kind::ProcEnd) {
+      return true;
+    }
+  }
+  return false;
 }
 
 }  // namespace syntax

@@ -233,6 +233,10 @@ class Tokenizer {
   bool m_first = true;
 };
 
+/// Whether a statement after a colon on `line` ends a procedure ("Sub A(): End Sub"): the header on the
+/// line is then a whole procedure, with no body below it.
+bool endsProcedureAfterColon(QStringView line);
+
 /// The text of a statement spread over several physical lines, joined with the continuation marks
 /// removed.
 QString joinContinuedLines(const std::vector<QStringView>& lines);

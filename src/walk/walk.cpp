@@ -299,6 +299,9 @@ ProcedureText readProcedure(ide::CodeModule& module, const ide::ProcExtent& exte
   }
   text.stop = endLine >= 0 ? endLine : last;
   text.unnumberStop = endLine >= 0 ? endLine : size - 1;
+  // A one-line procedure has no body: what follows it up to the next header is not its code.
+  if (syntax::endsProcedureAfterColon(text.lines[size_t(text.first - 1)]))
+    text.stop = text.unnumberStop = text.first;
   return text;
 }
 

@@ -92,16 +92,13 @@ class MessyModule {
 
   void procedureShape() {
     add(QString());
-    // After a one-line procedure the walk takes a comment before the next header as that procedure's.
-    if (chance(20)) add(u"' procedimento"_qs, m_oneLine ? kUnknown : kAsWritten);
-    m_oneLine = false;
+    if (chance(20)) add(u"' procedimento"_qs, kAsWritten);
     const QString procName = name();
     const bool function = chance(40);
     switch (below(6)) {
       case 0:  // one line, as interface classes are written
         add(u"Public Sub "_qs + procName + u"(ByVal d As Long): End Sub"_qs);
         ++procedures;
-        m_oneLine = true;
         return;
       case 1:  // the same procedure in two branches, one of them compiled
         add(u"#If DEPURA Then"_qs);
@@ -260,7 +257,6 @@ class MessyModule {
   int m_level = kUnknown;
   int m_header = kUnknown;  // the level of a header's continuation lines, where known
   qsizetype m_headerStart = 0;
-  bool m_oneLine = false;
 };
 
 /// Each line without its line number and leading blanks; a continuation line keeps a leading number.
