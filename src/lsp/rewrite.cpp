@@ -8,9 +8,7 @@
 #include "transform/numberwalk.h"
 #include "transform/numindent.h"
 
-#include <QFile>
 #include <QFileInfo>
-#include <QTemporaryDir>
 
 #include <algorithm>
 
@@ -84,8 +82,6 @@ std::variant<std::vector<TextEdit>, Failure> lineEdits(QByteArrayView before, QB
 }  // namespace
 
 struct ModuleRewriter::Model {
-  // The copy outlives the model that read it.
-  QTemporaryDir folder;
   std::shared_ptr<host::VbeImpl> vbe;
 };
 
@@ -108,19 +104,12 @@ std::variant<std::vector<TextEdit>, Failure> ModuleRewriter::rewrite(const Rewri
                        .arg(line)
                        .arg(job.text[bad].unicode(), 4, 16, QLatin1Char('0')));
   }
-  // The IDE model reads modules from files: the text goes into one of its own, under the module's name.
+  // The model takes the editor's text as the module's file, which is neither read nor written.
   m_last = std::make_unique<Model>();
-  const QString copy = m_last->folder.filePath(fileName);
-  QFile file(copy);
-  if (!m_last->folder.isValid() || !file.open(QIODevice::WriteOnly) || file.write(*bytes) != bytes->size() ||
-      !file.flush())
-    return failure(
-        QStringLiteral("cannot keep a copy of %1 to work on: %2").arg(fileName, file.errorString()));
-  file.close();
-
+  const QString path = QFileInfo(job.path).absoluteFilePath();
   try {
     m_last->vbe = host::VbeImpl::create();
-    const auto project = m_last->vbe->openModuleFile(copy);
+    const auto project = m_last->vbe->openModuleFile(path, &*bytes);
     const auto component = project->components().front();
     const ide::Ref<ide::CodeModule> module = component->codeModule();
     if (!module) return std::vector<TextEdit>{};
@@ -151,7 +140,7 @@ std::variant<std::vector<TextEdit>, Failure> ModuleRewriter::rewrite(const Rewri
     if (!after) return std::vector<TextEdit>{};
     return lineEdits(*bytes, *after);
   } catch (const ide::Error& error) {
-    return failure(QString(error.description()).replace(copy, fileName));
+    return failure(QString(error.description()).replace(path, fileName));
   }
 }
 

@@ -47,7 +47,7 @@ class ModuleRewriter {
   /// (never numbering, whatever the style joins to it: a format touches only leading blanks), `number`,
   /// `unnumber` (both re-indenting where the style joins the two) and `numindent`.
   std::variant<std::vector<TextEdit>, Failure> rewrite(const RewriteJob& job);
-  /// Lets the last module's model go (and its temporary copy).
+  /// Lets the last module's model go.
   void release();
 
  private:

@@ -46,6 +46,13 @@ TEST(AnsiTest, RefusesCharactersWithoutAByteAndReportsTheFirst) {
   bad = -1;  // a surrogate pair
   EXPECT_FALSE(encodeAnsi(QString::fromUtf8("x\xF0\x9F\x98\x80"), &bad).has_value());
   EXPECT_EQ(bad, 1);
+
+  // Long texts are narrowed a block at a time: letters above 0x7F and a bad character far into the text.
+  const QString accents = QString(300, u'a') + QString::fromUtf8("ç€") + QString(300, u'b');
+  EXPECT_EQ(encodeAnsi(accents), QByteArray(300, 'a') + "\xE7\x80" + QByteArray(300, 'b'));
+  bad = -1;
+  EXPECT_FALSE(encodeAnsi(accents + QChar(0x4E2D), &bad).has_value());
+  EXPECT_EQ(bad, 602);
 }
 
 TEST(AnsiTest, AppendKeepsWhatWasThereAndStopsAtTheBadCharacter) {

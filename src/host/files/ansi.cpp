@@ -3,6 +3,8 @@
 // per character with a switch only for the 27 characters the code page places in 0x80..0x9F.
 #include "host/files/ansi.h"
 
+#include <algorithm>
+
 #include <array>
 #include <atomic>
 
@@ -221,30 +223,32 @@ QString decodeAnsi(QByteArrayView bytes) {
 bool appendAnsi(QByteArray& out, QStringView text, qsizetype* firstBad) {
   if (sourceEncoding() == SourceEncoding::Utf8) return appendUtf8(out, text, firstBad);
   const qsizetype start = out.size();
-  out.resize(start + text.size());
+  const qsizetype size = text.size();
+  out.resize(start + size);
   char* target = out.data() + start;
   const char16_t* source = text.utf16();
-  // Code is nearly all ASCII: narrow the whole line in one loop the compiler can vectorise, and go over
-  // it character by character only when something above 0x7F was in it.
-  char16_t seen = 0;
-  for (qsizetype i = 0, size = text.size(); i < size; ++i) {
-    target[i] = static_cast<char>(source[i]);
-    seen |= source[i];
-  }
-  if (seen < 0x80) return true;
-  for (qsizetype i = 0, size = text.size(); i < size; ++i) {
-    const char16_t character = source[i];
-    if (character < 0x80 || (character >= 0xA0 && character <= 0xFF)) {
-      target[i] = static_cast<char>(character);
-      continue;
+  // Code is nearly all ASCII: each block is narrowed in one loop the compiler can vectorise, and gone
+  // over character by character only when something above 0x7F was in it.
+  constexpr qsizetype kBlock = 256;
+  for (qsizetype from = 0; from < size; from += kBlock) {
+    const qsizetype to = std::min(size, from + kBlock);
+    char16_t seen = 0;
+    for (qsizetype i = from; i < to; ++i) {
+      target[i] = static_cast<char>(source[i]);
+      seen |= source[i];
     }
-    const int byte = encodeSpecial(character);
-    if (byte < 0) {
-      out.resize(start + i);
-      if (firstBad) *firstBad = i;
-      return false;
+    if (seen < 0x80) continue;
+    for (qsizetype i = from; i < to; ++i) {
+      const char16_t character = source[i];
+      if (character < 0x80 || (character >= 0xA0 && character <= 0xFF)) continue;
+      const int byte = encodeSpecial(character);
+      if (byte < 0) {
+        out.resize(start + i);
+        if (firstBad) *firstBad = i;
+        return false;
+      }
+      target[i] = static_cast<char>(byte);
     }
-    target[i] = static_cast<char>(byte);
   }
   return true;
 }

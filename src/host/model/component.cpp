@@ -150,15 +150,15 @@ ComponentImpl::ComponentImpl(const std::shared_ptr<ProjectImpl>& project, ide::C
 
 ComponentImpl::~ComponentImpl() = default;
 
-void ComponentImpl::load() {
+void ComponentImpl::load(const QByteArray* contents) {
   if (!hasModuleText(m_type)) {
     if (!QFileInfo::exists(m_filePath))
       ide::raise(ide::err::FileNotFound, QStringLiteral("File not found: %1").arg(m_filePath));
     m_name = QFileInfo(m_filePath).fileName();
     return;
   }
-  FileStamp stamp;
-  const QByteArray bytes = readFileBytes(m_filePath, &stamp);
+  std::optional<FileStamp> stamp;
+  const QByteArray bytes = contents ? *contents : readFileBytes(m_filePath, &stamp.emplace());
   m_looksLikeUtf8 = sourceEncoding() == SourceEncoding::Ansi && host::looksLikeUtf8(bytes);
   adopt(bytes, m_filePath);
   m_stamp = std::move(stamp);

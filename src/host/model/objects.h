@@ -237,9 +237,10 @@ class ComponentImpl final : public ide::VBComponent, public std::enable_shared_f
   void Activate() override;
   ide::Ref<ide::Window> DesignerWindow() override;
 
-  /// Reads the component's file (module files, or nothing for binary documents). Throws ide::Error naming
+  /// Reads the component's file (module files, or nothing for binary documents), or takes `contents` as
+  /// what the file holds (an editor's text not saved yet; the file is not read). Throws ide::Error naming
   /// the file and line for anything unreadable.
-  void load();
+  void load(const QByteArray* contents = nullptr);
   /// Sets up a new component of its type, named `name`.
   void create(const QString& name);
   /// Adds the form's binary file to `batch` when a value in it changed.
@@ -376,7 +377,8 @@ class ProjectImpl final : public ide::VBProject,
   /// The project file entry of a component changed (its name or path).
   void componentEntryChanged(ComponentImpl& component, const QString& oldName);
   /// Adds an existing module file; `announce` fires the component's addition (not while opening).
-  std::shared_ptr<ComponentImpl> addExistingFile(const QString& path, bool announce);
+  std::shared_ptr<ComponentImpl> addExistingFile(const QString& path, bool announce,
+                                                 const QByteArray* contents = nullptr);
   /// Left the IDE (closed): its operations that need the IDE fail from now on.
   void detach();
   /// The files the project file listed that were missing when it was loaded, in file order.

@@ -414,13 +414,14 @@ ide::Ref<ide::VBComponent> ProjectImpl::AddFile(const QString& fileName) {
   return addExistingFile(QFileInfo(path).absoluteFilePath(), true);
 }
 
-std::shared_ptr<ComponentImpl> ProjectImpl::addExistingFile(const QString& path, bool announce) {
+std::shared_ptr<ComponentImpl> ProjectImpl::addExistingFile(const QString& path, bool announce,
+                                                            const QByteArray* contents) {
   if (m_detached) ide::raise(ide::err::ObjectVariableNotSet);
   for (const auto& existing : m_components)
     if (QFileInfo(existing->filePath()) == QFileInfo(path))
       ide::raise(ide::err::NameConflict, QStringLiteral("%1 is in the project already").arg(path));
   auto component = std::make_shared<ComponentImpl>(shared_from_this(), typeOfFile(path), path);
-  component->load();
+  component->load(contents);
   if (this->component(component->Name()))
     ide::raise(ide::err::NameConflict,
                QStringLiteral("%1: %2 is the name of another component").arg(path, component->Name()));

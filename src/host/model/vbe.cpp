@@ -527,13 +527,13 @@ std::vector<std::shared_ptr<ProjectImpl>> VbeImpl::openGroup(const QString& path
   return loaded;
 }
 
-std::shared_ptr<ProjectImpl> VbeImpl::openModuleFile(const QString& path) {
+std::shared_ptr<ProjectImpl> VbeImpl::openModuleFile(const QString& path, const QByteArray* contents) {
   auto project = std::make_shared<ProjectImpl>(shared_from_this());
   QString name = QStringLiteral("Project1");
   for (int n = 2; this->project(name); ++n)
     name = QStringLiteral("Project%1").arg(n);
   project->create(ide::ProjectType::StandardExe, name);
-  project->addExistingFile(QFileInfo(path).absoluteFilePath(), false);
+  project->addExistingFile(QFileInfo(path).absoluteFilePath(), false, contents);
   addProject(project);
   return project;
 }

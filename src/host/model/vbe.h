@@ -62,7 +62,9 @@ class VbeImpl final : public ide::VBE, public std::enable_shared_from_this<VbeIm
   std::vector<std::shared_ptr<ProjectImpl>> open(const QString& path);
   std::shared_ptr<ProjectImpl> openProject(const QString& path);
   std::vector<std::shared_ptr<ProjectImpl>> openGroup(const QString& path);
-  std::shared_ptr<ProjectImpl> openModuleFile(const QString& path);
+  /// A module file opened alone, in a project of its own; with `contents`, the module is those bytes
+  /// rather than what the file holds.
+  std::shared_ptr<ProjectImpl> openModuleFile(const QString& path, const QByteArray* contents = nullptr);
   std::shared_ptr<ProjectImpl> newProject(ide::ProjectType type = ide::ProjectType::StandardExe);
   /// Closes a project (its windows too); fires the project's removal.
   void removeProject(const std::shared_ptr<ProjectImpl>& project);
