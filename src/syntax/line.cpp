@@ -262,11 +262,23 @@ Statement classify(QStringView text) noexcept {
   return classifyText(view(text));
 }
 
-bool isAttributeStatement(QStringView text) noexcept {
-  // Most lines are told apart by their first character alone.
+namespace {
+
+/// Whether classify(text) is `kind`, whose statements all begin with `letter` (lower case): most lines are
+/// told apart by their first character alone.
+bool isKindStartingWith(QStringView text, char16_t letter, Kind kind) noexcept {
   const qsizetype first = skipBlanks(text, 0);
-  return first < text.size() && (text[first].unicode() | 0x20) == u'a' &&
-         classify(text).kind == Kind::Attribute;
+  return first < text.size() && (text[first].unicode() | 0x20) == letter && classify(text).kind == kind;
+}
+
+}  // namespace
+
+bool isAttributeStatement(QStringView text) noexcept {
+  return isKindStartingWith(text, u'a', Kind::Attribute);
+}
+
+bool isProcedureEnd(QStringView text) noexcept {
+  return isKindStartingWith(text, u'e', Kind::ProcEnd);
 }
 
 Statement classify(QByteArrayView text) noexcept {

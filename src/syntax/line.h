@@ -110,6 +110,8 @@ Statement classify(QByteArrayView text) noexcept;
 
 /// Whether classify(text) is Kind::Attribute, told quickly.
 bool isAttributeStatement(QStringView text) noexcept;
+/// Whether classify(text) is Kind::ProcEnd, told quickly.
+bool isProcedureEnd(QStringView text) noexcept;
 
 /// The kind of a physical line: Continuation when the line above continues onto it, else what its
 /// statement is.

@@ -294,7 +294,7 @@ ProcedureText readProcedure(ide::CodeModule& module, const ide::ProcExtent& exte
   bool continued = syntax::continues(text.lines[size_t(text.first - 1)]);
   for (qsizetype i = text.first; i < size && endLine < 0; ++i) {
     const QStringView line = text.lines[size_t(i)];
-    if (!continued && syntax::classify(line).kind == syntax::Kind::ProcEnd) endLine = i;
+    if (!continued && syntax::isProcedureEnd(line)) endLine = i;
     continued = syntax::continues(line);
   }
   text.stop = endLine >= 0 ? endLine : last;
